@@ -1,0 +1,109 @@
+// Names and origins from the host layer's database, for lists, suggestions, and to say where a value stands.
+#include "Catalogue.h"
+
+#include "Nearest.h"
+
+#include <TarvikException.h>
+
+#include <fmt/format.h>
+
+namespace catalogue {
+
+namespace {
+
+/// The manager's SPI catalogue is this file, whatever else may be called "spi".
+constexpr const char* SPI_DATABASE = "spi.acd";
+
+bool isOwnFamily(const std::string& family) {
+    return !sameWithoutCase(family, "base") && !sameWithoutCase(family, "spi");
+}
+
+/// Calls `use(piece, offset)` for each piece. An empty text has none.
+template <typename Use>
+void forEachPiece(std::string_view text, char separator, Use use) {
+    for (std::size_t start = 0; !text.empty() && start <= text.size();) {
+        const std::size_t end = std::min(text.find(separator, start), text.size());
+        use(text.substr(start, end - start), start);
+        start = end + 1;
+    }
+}
+
+} // namespace
+
+std::string asText(const Origin& origin) {
+    return fmt::format("{}:{}:{}", origin.file, origin.line, origin.column);
+}
+
+Json asJson(const Origin& origin) {
+    return {{"file", origin.file}, {"line", origin.line}, {"column", origin.column}};
+}
+
+std::map<std::string, Entry> entries(const std::string& database, const std::string& key) {
+    std::map<std::string, Entry> found;
+    const std::optional<AcdStore::Value> value = AcdStore::value(database.c_str(), key.c_str());
+    if (value) {
+        forEachPiece(value->text, ':', [&](std::string_view entry, std::size_t offset) {
+            const AcdStore::Fragment place = value->at(offset);
+            found.insert_or_assign(
+                std::string(entry.substr(0, entry.find(','))),
+                Entry{{std::string(place.file), place.line, place.column}, value->fromSection});
+        });
+    }
+    return found;
+}
+
+std::vector<std::string> list(const std::string& database, const std::string& key) {
+    std::vector<std::string> texts;
+    if (const std::optional<AcdStore::Value> value = AcdStore::value(database.c_str(), key.c_str())) {
+        forEachPiece(value->text, ',', [&](std::string_view text, std::size_t) { texts.emplace_back(text); });
+    }
+    return texts;
+}
+
+std::vector<std::string> families() {
+    std::vector<std::string> own;
+    for (std::string& family : AcdStore::families()) {
+        if (isOwnFamily(family)) {
+            own.push_back(std::move(family));
+        }
+    }
+    return own;
+}
+
+std::vector<Flash> flashes() {
+    std::vector<Flash> all;
+    for (const std::string& family : list(SPI_DATABASE, "DEVICE_FAMILY")) {
+        for (std::string& name : list(SPI_DATABASE, family + "_DEVICES")) {
+            all.push_back({std::move(name), family});
+        }
+    }
+    return all;
+}
+
+std::vector<std::string> names() {
+    std::vector<std::string> all;
+    for (const std::string& family : families()) {
+        all.push_back(family);
+        try {
+            for (std::string& device : AcdStore::devices(family)) {
+                all.push_back(std::move(device));
+            }
+        } catch (const DataNotFoundException&) {
+            // A family that can't be read has no names to offer; the question itself was about another name.
+        }
+    }
+    try {
+        for (Flash& flash : flashes()) {
+            all.push_back(std::move(flash.name));
+        }
+    } catch (const DataNotFoundException&) {
+        // Likewise.
+    }
+    return all;
+}
+
+Failure unknownDevice(const std::string& name) {
+    return {Status::NO, fmt::format("the database has no device \"{}\"{}", name, didYouMean(name, names()))};
+}
+
+} // namespace catalogue

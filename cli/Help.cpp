@@ -1,0 +1,40 @@
+// The layout of the help texts.
+#include "Help.h"
+
+#include "Table.h"
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
+
+#include <sstream>
+
+namespace {
+
+/// Where the descriptions of options begin, and those of commands: their names are shorter.
+constexpr std::size_t OPTION_COLUMN = 28;
+constexpr std::size_t COMMAND_COLUMN = 21;
+
+std::string broken(const std::string& description, std::size_t column) {
+    std::istringstream words(description);
+    const std::vector<std::string> all{std::istream_iterator<std::string>(words), {}};
+    return fmt::format("{}", fmt::join(lines(all, LINE_WIDTH - column, ""), "\n"));
+}
+
+} // namespace
+
+HelpFormatter::HelpFormatter() {
+    column_width(OPTION_COLUMN);
+    label("SUBCOMMAND", "COMMAND");
+    label("REQUIRED", "(required)");
+}
+
+std::string HelpFormatter::make_option_desc(const CLI::Option* option) const {
+    return broken(CLI::Formatter::make_option_desc(option), OPTION_COLUMN);
+}
+
+std::string HelpFormatter::make_subcommand(const CLI::App* command) const {
+    std::ostringstream text;
+    CLI::detail::format_help(text, command->get_display_name(true),
+                             broken(command->get_description(), COMMAND_COLUMN), COMMAND_COLUMN);
+    return text.str();
+}

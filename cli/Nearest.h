@@ -1,0 +1,19 @@
+#pragma once
+
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+/// The candidate that a mistyped text most likely meant, without regard to case; nothing when none is near.
+[[nodiscard]] std::optional<std::string> nearest(std::string_view text,
+                                                 const std::vector<std::string>& candidates);
+
+/// `; did you mean "KS50"?`, or nothing.
+[[nodiscard]] std::string didYouMean(std::string_view text, const std::vector<std::string>& candidates);
+
+/// The same text but for ASCII case?
+[[nodiscard]] bool sameWithoutCase(std::string_view left, std::string_view right);
+
+/// The text in ASCII lower case.
+[[nodiscard]] std::string lowerCase(std::string_view text);

@@ -1,0 +1,141 @@
+// Lists properties: the names come from the database, the values from the manager.
+#include "Properties.h"
+
+#include "Nearest.h"
+#include "Table.h"
+#include "Tool.h"
+
+#include <UT_STR.h>
+#include <tarvik/ConstraintsManager.h>
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
+
+#include <algorithm>
+#include <map>
+
+namespace {
+
+using Entries = std::map<std::string, catalogue::Entry>;
+
+/// What names and places leave of a line for the values.
+std::size_t valueWidth(const Properties& properties, std::size_t indent) {
+    // Two blanks behind each column but the last, and the comma at the end of a broken line.
+    constexpr std::size_t GAPS = 3 * 2 + 1;
+    constexpr std::size_t LEAST = 12;
+    std::size_t key = 0;
+    std::size_t from = 0;
+    std::size_t where = 0;
+    for (const Property& property : properties) {
+        key = std::max(key, property.key.size());
+        from = std::max(from, property.from.size());
+        where = std::max(where, catalogue::asText(property.origin).size());
+    }
+    const std::size_t taken = indent + key + from + where + GAPS;
+    return std::max(LEAST, LINE_WIDTH - std::min(LINE_WIDTH, taken));
+}
+
+/// The property entries of an owner, as the manager loads them: PROPERTIES behind PROPERTY, so it wins.
+Entries propertyEntries(const std::string& owner) {
+    Entries all = catalogue::entries(owner, "PROPERTIES");
+    all.merge(catalogue::entries(owner, "PROPERTY"));
+    return all;
+}
+
+/// The class whose properties stand in for those that the flash lacks; of several the last one. Empty: none.
+std::string flashClass(const std::string& device) {
+    std::string found;
+    for (const char* const name : {"AT1", "ST1", "ST2", "BPI1", "BPI2", "BPI3"}) {
+        const std::vector<std::string> members = catalogue::list("spi.acd", std::string(name) + "_DEVICES");
+        if (std::any_of(members.begin(), members.end(),
+                        [&](const std::string& member) { return sameWithoutCase(member, device); })) {
+            found = name;
+        }
+    }
+    return found;
+}
+
+Entries flashEntries(const std::string& name) {
+    return catalogue::entries("spi.acd", plain(UT_STR::Upper(name.c_str())) + "_PROPERTY");
+}
+
+} // namespace
+
+Properties deviceProperties(ConstraintsManager& manager, const std::string& device) {
+    const Entries own = propertyEntries(device);
+    Entries all = own;
+    all.merge(propertyEntries(plain(manager.getPartFamily(device.c_str()))));
+    Properties properties;
+    for (const auto& [key, entry] : all) {
+        Property property{key, {}, entry.ofDevice ? "device" : "family", entry.origin};
+        for (const StringBase& value : manager.getDeviceStringProperties(device.c_str(), key.c_str())) {
+            property.values.push_back(plain(value));
+        }
+        properties.push_back(std::move(property));
+    }
+    return properties;
+}
+
+Properties flashProperties(const ConstraintsManager& manager, const std::string& device) {
+    Properties properties;
+    const auto add = [&](const std::string& key, const std::string& from, const catalogue::Entry& entry) {
+        properties.push_back(
+            {key, {manager.getSpiDeviceStringProperty(device.c_str(), key.c_str())}, from, entry.origin});
+    };
+    const Entries own = flashEntries(device);
+    for (const auto& [key, entry] : own) {
+        add(key, "device", entry);
+    }
+    if (const std::string name = flashClass(device); !name.empty()) {
+        for (const auto& [key, entry] : flashEntries(name)) {
+            if (own.count(key) == 0) {
+                add(key, name, entry);
+            }
+        }
+    }
+    return properties;
+}
+
+std::string asText(const Properties& properties, std::size_t indent) {
+    Table table({"PROPERTY", "VALUE", "FROM", "WHERE"});
+    const std::size_t width = valueWidth(properties, indent);
+    for (const Property& property : properties) {
+        const std::vector<std::string> values = lines(property.values, width);
+        table.add({property.key, values.empty() ? "(none)" : values.front(), property.from,
+                   catalogue::asText(property.origin)});
+        for (std::size_t i = 1; i < values.size(); ++i) {
+            table.add({"", values[i]});
+        }
+    }
+    return table.text(indent);
+}
+
+Json asJson(const Properties& properties) {
+    Json list = Json::array();
+    for (const Property& property : properties) {
+        Json object{{"key", property.key}, {"values", property.values}, {"from", property.from}};
+        object.update(catalogue::asJson(property.origin));
+        list.push_back(std::move(object));
+    }
+    return list;
+}
+
+std::string asText(const PropertyAnswer& answer) {
+    return fmt::format("{}\n", fmt::join(answer.values, "\n"));
+}
+
+Json asJson(const PropertyAnswer& answer) {
+    return {{"device", answer.device}, {"property", answer.key}, {"values", answer.values}};
+}
+
+Status showProperty(Tool& tool, const PropertyAnswer& answer, const Properties& all) {
+    if (!answer.values.empty()) {
+        return tool.answer(answer);
+    }
+    std::vector<std::string> keys;
+    for (const Property& property : all) {
+        keys.push_back(property.key);
+    }
+    throw Failure(Status::NO, fmt::format("\"{}\" has no property \"{}\"{}", answer.device, answer.key,
+                                          didYouMean(answer.key, keys)));
+}

@@ -1,0 +1,42 @@
+#pragma once
+
+#include "Catalogue.h"
+
+#include <string>
+#include <vector>
+
+class ConstraintsManager;
+class Tool;
+
+/// One property: its values as the manager gives them, and where the database has them from.
+struct Property {
+    std::string key;
+    std::vector<std::string> values; ///< in byte order
+    std::string from;                ///< "device", "family", or the class of an SPI flash
+    catalogue::Origin origin;
+};
+
+using Properties = std::vector<Property>;
+
+/// The properties of a device and of its family.
+[[nodiscard]] Properties deviceProperties(ConstraintsManager& manager, const std::string& device);
+
+/// The properties of an SPI flash and of its class.
+[[nodiscard]] Properties flashProperties(const ConstraintsManager& manager, const std::string& device);
+
+/// A table of properties, behind `indent` blanks.
+[[nodiscard]] std::string asText(const Properties& properties, std::size_t indent);
+[[nodiscard]] Json asJson(const Properties& properties);
+
+/// What was found for one key.
+struct PropertyAnswer {
+    std::string device;
+    std::string key;
+    std::vector<std::string> values;
+};
+
+[[nodiscard]] std::string asText(const PropertyAnswer& answer);
+[[nodiscard]] Json asJson(const PropertyAnswer& answer);
+
+/// Shows the values one a line. No values: the answer is no, with a suggestion from the properties there are.
+[[nodiscard]] Status showProperty(Tool& tool, const PropertyAnswer& answer, const Properties& all);

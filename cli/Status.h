@@ -1,0 +1,21 @@
+#pragma once
+
+#include <stdexcept>
+
+/// How the tool ends.
+enum class Status : int {
+    YES = 0,   ///< yes, or done
+    NO = 1,    ///< no: refused, or not found
+    FAULT = 2, ///< the command line, the database or the output is at fault
+};
+
+/// Ends a command with a message to the user.
+class Failure : public std::runtime_error {
+public:
+    Failure(Status status, const std::string& message) : std::runtime_error(message), m_status(status) {}
+
+    [[nodiscard]] Status status() const noexcept { return m_status; }
+
+private:
+    Status m_status;
+};

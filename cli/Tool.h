@@ -1,0 +1,68 @@
+#pragma once
+
+#include "Json.h"
+#include "Messages.h"
+#include "Output.h"
+#include "Status.h"
+
+#include <string>
+#include <vector>
+
+class ConstraintsManager;
+
+/// What every command works with: the database, the manager, and the one place where answers are shown.
+class Tool {
+public:
+    struct Settings {
+        std::vector<std::string> databases;
+        bool json = false;
+        bool verbose = false;
+    };
+
+    explicit Tool(Settings settings);
+
+    /// Opens the database; a second call does nothing.
+    /// @throw Failure (FAULT) when it is missing or can't be read
+    void openDatabase();
+
+    /// The manager, with exceptions off, on the database.
+    /// @throw Failure (FAULT) as `openDatabase`
+    [[nodiscard]] ConstraintsManager& manager();
+
+    [[nodiscard]] Messages& messages() noexcept { return m_messages; }
+    [[nodiscard]] Output& output() noexcept { return m_output; }
+
+    /// Shows what a command found, as text or as a JSON object, behind the messages that came with it.
+    /// @param facts anything with `std::string asText(facts)` and `Json asJson(facts)`
+    /// @return the status
+    template <typename Facts>
+    [[nodiscard]] Status answer(const Facts& facts, Status status = Status::YES) {
+        if (m_settings.json) {
+            showJson(asJson(facts));
+        } else {
+            showText(asText(facts));
+        }
+        return status;
+    }
+
+    /// Tells the user something beside the answer.
+    void note(const std::string& text) const;
+
+    /// Shows why there is no answer.
+    /// @return the status
+    [[nodiscard]] Status fail(const Failure& failure);
+
+private:
+    void showText(const std::string& text);
+    void showJson(const Json& facts);
+    void writeJson(const Json& facts, const std::vector<Messages::Message>& messages);
+
+    /// Info and debug messages go to standard error; status messages go where text answers go, while in JSON
+    /// they stand in the object alone. Debug messages count only when they were asked for.
+    std::vector<Messages::Message> showMessages();
+
+    Settings m_settings;
+    Messages m_messages;
+    Output m_output;
+    bool m_opened = false;
+};

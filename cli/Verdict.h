@@ -1,0 +1,22 @@
+#pragma once
+
+#include "Json.h"
+
+#include <string>
+
+/// A yes or a no, with what was asked.
+struct Verdict {
+    bool allowed;
+    std::string question; ///< in words
+    Json asked;           ///< the arguments, as the JSON object shows them
+};
+
+[[nodiscard]] inline std::string asText(const Verdict& verdict) {
+    return (verdict.allowed ? "yes: " : "no: ") + verdict.question + '\n';
+}
+
+[[nodiscard]] inline Json asJson(const Verdict& verdict) {
+    Json object{{"allowed", verdict.allowed}};
+    object.update(verdict.asked);
+    return object;
+}

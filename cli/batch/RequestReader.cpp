@@ -1,0 +1,142 @@
+// Reads requests strictly: a name given twice or not known is a fault of the caller that must not go unseen.
+#include "RequestReader.h"
+
+#include <fmt/format.h>
+
+#include <vector>
+
+namespace {
+
+/// Far more than any request needs; what is deeper would exhaust the stack where it is written again.
+constexpr std::size_t DEEPEST = 32;
+constexpr std::size_t MOST_NAMES = 64;
+
+/// Builds a value of what the parser reads, and stops at the first fault.
+class StrictReader : public nlohmann::json_sax<Json> {
+public:
+    [[nodiscard]] Json& value() noexcept { return m_root; }
+    [[nodiscard]] const std::string& fault() const noexcept { return m_fault; }
+
+    /// Behind a fault: the request's id, if it was read to its end.
+    [[nodiscard]] Json takeId() {
+        const bool has = m_root.is_object() && m_root.contains("id");
+        const bool inside = has && m_open.size() > 1 && m_open[1] == &m_root["id"];
+        return has && !inside ? std::move(m_root["id"]) : Json();
+    }
+
+    bool null() override { return put(nullptr); }
+    bool boolean(bool value) override { return put(value); }
+    bool number_integer(std::int64_t value) override { return put(value); }
+    bool number_unsigned(std::uint64_t value) override { return put(value); }
+    bool number_float(double value, const std::string&) override { return put(value); }
+    bool string(std::string& value) override { return put(std::move(value)); }
+    bool binary(Json::binary_t&) override { return refuse("binary values are unknown"); }
+
+    bool start_object(std::size_t) override { return open(Json::object()); }
+    bool end_object() override { return close(); }
+    bool start_array(std::size_t) override { return open(Json::array()); }
+    bool end_array() override { return close(); }
+
+    bool key(std::string& name) override {
+        Json& object = *m_open.back();
+        if (object.contains(name)) {
+            return refuse(fmt::format("the name \"{}\" is given twice", name));
+        }
+        if (object.size() == MOST_NAMES) {
+            return refuse("too many names");
+        }
+        m_name = std::move(name);
+        return true;
+    }
+
+    bool parse_error(std::size_t position, const std::string&, const nlohmann::detail::exception&) override {
+        return refuse(fmt::format("not JSON, see byte {}", position));
+    }
+
+private:
+    bool refuse(std::string fault) {
+        m_fault = std::move(fault);
+        return false;
+    }
+
+    Json& place(Json value) {
+        if (m_open.empty()) {
+            return m_root = std::move(value);
+        }
+        Json& parent = *m_open.back();
+        if (parent.is_array()) {
+            parent.push_back(std::move(value));
+            return parent.back();
+        }
+        return parent[m_name] = std::move(value);
+    }
+
+    bool put(Json value) {
+        place(std::move(value));
+        return true;
+    }
+
+    bool open(Json value) {
+        if (m_open.size() == DEEPEST) {
+            return refuse("nested too deep");
+        }
+        m_open.push_back(&place(std::move(value)));
+        return true;
+    }
+
+    bool close() {
+        m_open.pop_back();
+        return true;
+    }
+
+    Json m_root;
+    std::vector<Json*> m_open; ///< the arrays and objects that are not closed yet
+    std::string m_name;        ///< of the value to come
+    std::string m_fault;
+};
+
+/// Takes the members of a request; @return what is wrong with them.
+std::string takeMembers(Json& object, Request& request) {
+    if (!object.is_object()) {
+        return "a request is an object";
+    }
+    request.arguments = Json::array();
+    bool called = false;
+    std::string fault;
+    for (auto& [name, value] : object.get_ref<Json::object_t&>()) {
+        if (name == "id") {
+            request.id = std::move(value);
+        } else if (name == "call" && value.is_string()) {
+            request.call = std::move(value.get_ref<std::string&>());
+            called = true;
+        } else if (name == "args" && value.is_structured()) {
+            request.arguments = std::move(value);
+        } else if (name == "call") {
+            fault = "\"call\" is a text";
+        } else if (name == "args") {
+            fault = "\"args\" is an array or an object";
+        } else {
+            fault = fmt::format("a request has no \"{}\"", name);
+        }
+    }
+    return !fault.empty() || called ? fault : "a request has a \"call\"";
+}
+
+} // namespace
+
+Request readRequest(std::string_view line) {
+    Request request;
+    // To the parser a NUL is the end of the text; what stands behind it would go unseen.
+    if (line.find('\0') != std::string_view::npos) {
+        request.fault = "a NUL byte";
+        return request;
+    }
+    StrictReader reader;
+    if (Json::sax_parse(line, &reader)) {
+        request.fault = takeMembers(reader.value(), request);
+    } else {
+        request.fault = reader.fault();
+        request.id = reader.takeId();
+    }
+    return request;
+}

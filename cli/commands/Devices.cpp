@@ -1,0 +1,106 @@
+// `devices`: the devices of the database, with family and IDCODE.
+#include "commands/Declarations.h"
+
+#include "Catalogue.h"
+#include "Idcodes.h"
+#include "Nearest.h"
+#include "Table.h"
+#include "Tool.h"
+
+#include <tarvik/ConstraintsManager.h>
+
+#include <CLI/CLI.hpp>
+
+#include <fmt/format.h>
+
+#include <fnmatch.h>
+#include <memory>
+#include <optional>
+#include <unordered_set>
+
+namespace {
+
+struct Arguments {
+    std::string family;
+    std::string glob;
+};
+
+struct Device {
+    std::string name;
+    std::string family;
+    std::optional<IdcodeFinder::Idcode> idcode;
+};
+
+using Devices = std::vector<Device>;
+
+std::string asText(const Devices& devices) {
+    Table table({"DEVICE", "FAMILY", "IDCODE"});
+    for (const Device& device : devices) {
+        table.add({device.name, device.family, device.idcode ? device.idcode->value : "-"});
+    }
+    return table.text();
+}
+
+Json asJson(const Devices& devices) {
+    Json list = Json::array();
+    for (const Device& device : devices) {
+        list.push_back({{"name", device.name},
+                        {"family", device.family},
+                        {"idcode", device.idcode ? Json(device.idcode->value) : Json()}});
+    }
+    return {{"devices", list}};
+}
+
+bool matches(const std::string& glob, const std::string& name) {
+    return glob.empty() || ::fnmatch(glob.c_str(), name.c_str(), FNM_CASEFOLD) == 0;
+}
+
+/// The names that the family filter leaves, each once: the first family that has a device is the one that
+/// answers for it.
+std::vector<std::string> deviceNames(const std::string& wantedFamily) {
+    const std::vector<std::string> families = catalogue::families();
+    std::vector<std::string> names;
+    std::unordered_set<std::string> seen;
+    bool familyFound = false;
+    for (const std::string& family : families) {
+        const bool wanted = wantedFamily.empty() || sameWithoutCase(family, wantedFamily);
+        familyFound = familyFound || wanted;
+        for (std::string& name : AcdStore::devices(family)) {
+            if (seen.insert(lowerCase(name)).second && wanted) {
+                names.push_back(std::move(name));
+            }
+        }
+    }
+    if (!familyFound && !wantedFamily.empty()) {
+        throw Failure(Status::NO, fmt::format("the database has no family \"{}\" with devices{}",
+                                              wantedFamily, didYouMean(wantedFamily, families)));
+    }
+    return names;
+}
+
+Status run(Tool& tool, const Arguments& arguments) {
+    ConstraintsManager& manager = tool.manager();
+    const IdcodeFinder idcodes(manager);
+    Devices devices;
+    for (const std::string& name : deviceNames(arguments.family)) {
+        if (matches(arguments.glob, name)) {
+            devices.push_back({name, plain(manager.getPartFamily(name.c_str())), idcodes.find(name)});
+        }
+    }
+    if (devices.empty()) {
+        throw Failure(Status::NO, arguments.glob.empty()
+                                      ? "there is no such device"
+                                      : fmt::format("no device matches \"{}\"", arguments.glob));
+    }
+    return tool.answer(devices);
+}
+
+} // namespace
+
+Action declareDevices(CLI::App& parser) {
+    auto arguments = std::make_shared<Arguments>();
+    parser.add_option("--family", arguments->family, "Only the devices of this family")->type_name("FAMILY");
+    parser.add_option("GLOB", arguments->glob, "Only the names that match, in any case: * and ? and [...]")
+        ->type_name("");
+    return [arguments](Tool& tool) { return run(tool, *arguments); };
+}

@@ -1,0 +1,54 @@
+// `families`: the part families of the database, with the modes in which their devices may be configured.
+#include "commands/Declarations.h"
+
+#include "Catalogue.h"
+#include "Questions.h"
+#include "Table.h"
+#include "Tool.h"
+
+#include <CLI/CLI.hpp>
+
+#include <fmt/ranges.h>
+
+namespace {
+
+struct Family {
+    std::string name;
+    std::size_t devices;
+    std::vector<std::string> modes;
+};
+
+using Families = std::vector<Family>;
+
+std::string asText(const Families& families) {
+    Table table({"FAMILY", "DEVICES", "MODES"});
+    for (const Family& family : families) {
+        table.add(
+            {family.name, std::to_string(family.devices), fmt::format("{}", fmt::join(family.modes, " "))});
+    }
+    return table.text();
+}
+
+Json asJson(const Families& families) {
+    Json list = Json::array();
+    for (const Family& family : families) {
+        list.push_back({{"name", family.name}, {"devices", family.devices}, {"modes", family.modes}});
+    }
+    return {{"families", list}};
+}
+
+Status run(Tool& tool) {
+    tool.openDatabase();
+    Families families;
+    for (const std::string& name : catalogue::families()) {
+        families.push_back({name, AcdStore::devices(name).size(), questions::modes(tool, name)});
+    }
+    if (const std::size_t flashes = catalogue::flashes().size(); flashes != 0) {
+        families.push_back({"spi", flashes, questions::modes(tool, "spi")});
+    }
+    return tool.answer(families);
+}
+
+} // namespace
+
+Action declareFamilies(CLI::App&) { return run; }

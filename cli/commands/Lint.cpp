@@ -1,0 +1,199 @@
+// `lint`: what is wrong with a database, by file, line and column.
+#include "commands/Declarations.h"
+
+#include "Database.h"
+#include "Tool.h"
+#include "lint/Ignores.h"
+#include "lint/Report.h"
+
+#include <CLI/CLI.hpp>
+
+#include <fmt/format.h>
+
+#include <algorithm>
+#include <memory>
+
+namespace {
+
+struct Arguments {
+    std::vector<std::string> directories;
+    std::vector<std::string> selected;
+    std::vector<std::string> ignored;
+    std::vector<std::string> explained;
+    std::string format = "text";
+    bool strict = false;
+};
+
+bool beginsWithAny(std::string_view code, const std::vector<std::string>& prefixes) {
+    return std::any_of(prefixes.begin(), prefixes.end(),
+                       [code](const std::string& prefix) { return code.starts_with(prefix); });
+}
+
+/// A prefix that fits no code would silently select, or ignore, nothing.
+void requireCodes(const std::vector<std::string>& prefixes) {
+    for (const std::string& prefix : prefixes) {
+        const bool isKnown =
+            std::any_of(lint::rules().begin(), lint::rules().end(),
+                        [&](const lint::Rule* rule) { return rule->code.starts_with(prefix); });
+        if (prefix.empty() || !isKnown) {
+            throw Failure(Status::FAULT,
+                          fmt::format("no code begins with \"{}\"; see: tarvik lint --explain all", prefix));
+        }
+    }
+}
+
+struct Explanations {
+    std::vector<const lint::Rule*> rules;
+};
+
+std::string indented(std::string_view text) {
+    std::string result = "    ";
+    for (const char byte : text) {
+        result += byte;
+        result += byte == '\n' ? "    " : "";
+    }
+    return result + '\n';
+}
+
+/// The words of a text in lines of at most 80 bytes.
+std::string filled(std::string_view text) {
+    constexpr std::size_t LINE_WIDTH = 80;
+    std::string result;
+    std::size_t column = 0;
+    while (!text.empty()) {
+        const std::string_view word = text.substr(0, text.find(' '));
+        const bool fits = column + 1 + word.size() <= LINE_WIDTH;
+        result += column == 0 ? "" : fits ? " " : "\n";
+        column = column == 0 || !fits ? word.size() : column + 1 + word.size();
+        result += word;
+        text.remove_prefix(std::min(word.size() + 1, text.size()));
+    }
+    return result + '\n';
+}
+
+std::string asText(const Explanations& explanations) {
+    std::string text;
+    for (const lint::Rule* rule : explanations.rules) {
+        text += fmt::format("{}{} ({}): {}\n\n{}", text.empty() ? "" : "\n", rule->code, nameOf(rule->level),
+                            rule->title, filled(rule->explanation));
+        if (!rule->example.empty()) {
+            text += "\nFound in:\n\n" + indented(rule->example);
+        }
+    }
+    return text;
+}
+
+Json asJson(const Explanations& explanations) {
+    Json list = Json::array();
+    for (const lint::Rule* rule : explanations.rules) {
+        list.push_back({{"code", rule->code},
+                        {"level", nameOf(rule->level)},
+                        {"title", rule->title},
+                        {"explanation", rule->explanation},
+                        {"example", rule->example}});
+    }
+    return {{"rules", list}};
+}
+
+Status explain(Tool& tool, const Arguments& arguments) {
+    const bool all =
+        std::find(arguments.explained.begin(), arguments.explained.end(), "all") != arguments.explained.end();
+    if (!all) {
+        requireCodes(arguments.explained);
+    }
+    Explanations explanations;
+    for (const lint::Rule* rule : lint::rules()) {
+        if (all || beginsWithAny(rule->code, arguments.explained)) {
+            explanations.rules.push_back(rule);
+        }
+    }
+    return tool.answer(explanations);
+}
+
+bool isWanted(std::string_view code, const Arguments& arguments) {
+    return (arguments.selected.empty() || beginsWithAny(code, arguments.selected)) &&
+           !beginsWithAny(code, arguments.ignored);
+}
+
+lint::Report examine(const lint::Model& model, const Arguments& arguments) {
+    lint::Findings findings;
+    for (const lint::Group& group : lint::groups()) {
+        if (group.check != nullptr) {
+            group.check(model, findings);
+        }
+    }
+    // Comments first: one that ignores a finding is used, whether or not that finding is wanted.
+    std::vector<lint::Finding> all = lint::withoutIgnored(model, findings);
+    std::erase_if(all,
+                  [&](const lint::Finding& finding) { return !isWanted(finding.rule->code, arguments); });
+    return {lint::sorted(std::move(all), model)};
+}
+
+Status show(Tool& tool, const lint::Report& report, const Arguments& arguments) {
+    const bool isRefused =
+        report.count(lint::Level::ERROR) != 0 || (arguments.strict && !report.findings.empty());
+    const Status status = isRefused ? Status::NO : Status::YES;
+    if (arguments.format == "text") {
+        if (!report.findings.empty()) {
+            tool.note(summary(report));
+        }
+        return tool.answer(report, status);
+    }
+    Json document;
+    if (arguments.format == "sarif") {
+        document = asSarif(report);
+    } else {
+        document = {{"version", 1}};
+        document.update(asJson(report));
+        document["messages"] = Json::array();
+    }
+    tool.output().write(oneLine(document) + '\n');
+    tool.output().flush();
+    return status;
+}
+
+Status run(Tool& tool, const Arguments& arguments) {
+    requireCodes(arguments.selected);
+    requireCodes(arguments.ignored);
+    if (!arguments.explained.empty()) {
+        return explain(tool, arguments);
+    }
+    if (arguments.directories.empty()) {
+        tool.openDatabase();
+    } else {
+        ::openDatabase(arguments.directories);
+    }
+    const lint::Model model(AcdLines::ofDatabase());
+    // What the readers said of the lines is found again, with a code.
+    static_cast<void>(tool.messages().take());
+    return show(tool, examine(model, arguments), arguments);
+}
+
+} // namespace
+
+Action declareLint(CLI::App& parser) {
+    auto arguments = std::make_shared<Arguments>();
+    parser
+        .add_option("DIR", arguments->directories,
+                    "The database's directories, layers with the first one on top; without them, the "
+                    "database that the "
+                    "other commands answer from")
+        ->type_name("");
+    const auto addCodes = [&parser](const char* name, std::vector<std::string>& codes,
+                                    const char* description) {
+        parser.add_option(name, codes, description)
+            ->type_name("CODE")
+            ->delimiter(',')
+            ->allow_extra_args(false);
+    };
+    addCodes("--select", arguments->selected,
+             "Tell only what has a code that begins so; several between commas");
+    addCodes("--ignore", arguments->ignored, "Tell nothing that has a code that begins so");
+    addCodes("--explain", arguments->explained,
+             "Explain the codes that begin so, or \"all\", and do nothing else");
+    parser.add_option("--format", arguments->format, "How to tell it: text, json or sarif")
+        ->check(CLI::IsMember({"text", "json", "sarif"}))
+        ->type_name("FORMAT");
+    parser.add_flag("--strict", arguments->strict, "Warnings count as findings too");
+    return [arguments](Tool& tool) { return run(tool, *arguments); };
+}

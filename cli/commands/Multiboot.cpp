@@ -1,0 +1,93 @@
+// `multiboot`: does a device support a multiboot arrangement?
+#include "commands/Declarations.h"
+
+#include "Catalogue.h"
+#include "Multiboot.h"
+#include "Nearest.h"
+#include "Table.h"
+#include "Tool.h"
+#include "Verdict.h"
+
+#include <tarvik/ConstraintsManager.h>
+
+#include <CLI/CLI.hpp>
+
+#include <fmt/format.h>
+
+#include <algorithm>
+#include <memory>
+
+namespace {
+
+struct Arguments {
+    std::string device;
+    std::string type;
+    std::string width;
+    bool lead = false;
+    bool chain = false;
+};
+
+/// The word that a text names, without regard to case.
+/// @param others what else to suggest
+const std::string& readWord(const char* kind, const std::vector<std::string>& words, const std::string& text,
+                            std::vector<std::string> others = {}) {
+    const auto found = std::find_if(words.begin(), words.end(),
+                                    [&](const std::string& word) { return sameWithoutCase(word, text); });
+    if (found == words.end()) {
+        others.insert(others.end(), words.begin(), words.end());
+        throw Failure(Status::FAULT, fmt::format("unknown multiboot {} \"{}\"{}\n{}s, in any case:\n{}", kind,
+                                                 text, didYouMean(text, others), kind, wrapped(words, 2)));
+    }
+    return *found;
+}
+
+/// "BPI" and "TYPE_BPI" are the same type.
+const std::string& readType(const std::string& text) {
+    const std::string prefix = multiboot::TYPE_PREFIX;
+    std::vector<std::string> shortTypes;
+    for (const std::string& type : multiboot::TYPES) {
+        shortTypes.push_back(type.substr(prefix.size()));
+        if (sameWithoutCase(shortTypes.back(), text)) {
+            return type;
+        }
+    }
+    return readWord("type", multiboot::TYPES, text, shortTypes);
+}
+
+Status run(Tool& tool, const Arguments& arguments) {
+    if (!arguments.lead && !arguments.chain) {
+        throw Failure(Status::FAULT, "multiboot takes --lead or --chain\nsee: tarvik multiboot --help");
+    }
+    const std::string& type = readType(arguments.type);
+    const std::string& width = readWord("width", multiboot::WIDTHS, arguments.width);
+    const char* const position = arguments.lead ? "lead" : "chain";
+    ConstraintsManager& manager = tool.manager();
+    const bool supported =
+        manager.isMbBpiSpiSupport(arguments.device.c_str(), type.c_str(), width.c_str(), arguments.lead);
+    const bool known = supported || manager.isKorvelDevice(arguments.device.c_str());
+    const Verdict verdict{
+        supported,
+        fmt::format("{} as {} device of {} {}", arguments.device, position, type, width),
+        {{"device", arguments.device}, {"type", type}, {"width", width}, {"position", position}}};
+    const Status status = tool.answer(verdict, supported ? Status::YES : Status::NO);
+    if (!known) {
+        tool.note(catalogue::unknownDevice(arguments.device).what());
+    }
+    return status;
+}
+
+} // namespace
+
+Action declareMultiboot(CLI::App& parser) {
+    auto arguments = std::make_shared<Arguments>();
+    parser.add_option("DEVICE", arguments->device, "The device")->type_name("")->required();
+    parser.add_option("--type", arguments->type, "BPI, MB_SPI, MB_BPI or MB_QPRM, with or without TYPE_")
+        ->type_name("TYPE")
+        ->required();
+    parser.add_option("--width", arguments->width, "SERIAL, PARALLEL or NONE")
+        ->type_name("WIDTH")
+        ->required();
+    CLI::Option* const lead = parser.add_flag("--lead", arguments->lead, "The device leads the chain");
+    parser.add_flag("--chain", arguments->chain, "The device stands further down the chain")->excludes(lead);
+    return [arguments](Tool& tool) { return run(tool, *arguments); };
+}

@@ -1,0 +1,73 @@
+// `operation-options`: the options that an operation of a device carries in a mode.
+#include "commands/Declarations.h"
+
+#include "Questions.h"
+#include "Tool.h"
+#include "Vocabulary.h"
+
+#include <tarvik/ConstraintsManager.h>
+
+#include <CLI/CLI.hpp>
+
+#include <fmt/format.h>
+
+#include <memory>
+
+namespace {
+
+struct Arguments {
+    std::string device;
+    std::string operation;
+    std::string mode;
+};
+
+struct OperationOptions {
+    std::string device;
+    std::string operation;
+    std::string mode;
+    std::vector<std::string> options;
+};
+
+std::string asText(const OperationOptions& answer) {
+    std::string text;
+    for (const std::string& option : answer.options) {
+        text += option + '\n';
+    }
+    return text;
+}
+
+Json asJson(const OperationOptions& answer) {
+    return {{"device", answer.device},
+            {"operation", answer.operation},
+            {"mode", answer.mode},
+            {"options", answer.options}};
+}
+
+Status run(Tool& tool, const Arguments& arguments) {
+    const TARVIKNS::MODE_TYPE mode = vocabulary::readMode(arguments.mode);
+    // Properties are named by the key of an operation, whatever text stood for it.
+    const std::string& operation = vocabulary::key(vocabulary::readOperation(arguments.operation));
+    ConstraintsManager& manager = tool.manager();
+    OperationOptions answer{arguments.device, operation, vocabulary::key(mode), {}};
+    for (const StringBase& option :
+         manager.getDeviceOperationOptions(arguments.device.c_str(), operation.c_str(), mode)) {
+        answer.options.push_back(plain(option));
+    }
+    questions::requireKnown(manager, arguments.device);
+    const Status status = tool.answer(answer);
+    if (answer.options.empty()) {
+        tool.note(fmt::format("{} of \"{}\" carries no options in mode {}", operation, arguments.device,
+                              answer.mode));
+    }
+    return status;
+}
+
+} // namespace
+
+Action declareOperationOptions(CLI::App& parser) {
+    auto arguments = std::make_shared<Arguments>();
+    parser.add_option("DEVICE", arguments->device, "The device, or a family")->type_name("")->required();
+    parser.add_option("OPERATION", arguments->operation, "The operation")->type_name("")->required();
+    parser.add_option("-m,--mode", arguments->mode, "The configuration mode")->type_name("MODE")->required();
+    return [arguments](Tool& tool) { return run(tool, *arguments); };
+}

@@ -1,0 +1,103 @@
+// `spi`: the SPI and BPI flashes, and their properties.
+#include "commands/Declarations.h"
+
+#include "Nearest.h"
+#include "Properties.h"
+#include "Table.h"
+#include "Tool.h"
+
+#include <tarvik/ConstraintsManager.h>
+
+#include <CLI/CLI.hpp>
+
+#include <fmt/format.h>
+
+#include <memory>
+#include <optional>
+
+namespace {
+
+struct Arguments {
+    std::optional<std::string> device;
+    std::optional<std::string> key;
+};
+
+struct Flashes {
+    std::vector<catalogue::Flash> all;
+};
+
+std::string asText(const Flashes& flashes) {
+    Table table({"FLASH", "FAMILY"});
+    for (const catalogue::Flash& flash : flashes.all) {
+        table.add({flash.name, flash.family});
+    }
+    return table.text();
+}
+
+Json asJson(const Flashes& flashes) {
+    Json list = Json::array();
+    for (const catalogue::Flash& flash : flashes.all) {
+        list.push_back({{"name", flash.name}, {"family", flash.family}});
+    }
+    return {{"flashes", list}};
+}
+
+struct Flash {
+    std::string name;
+    Properties properties;
+};
+
+std::string asText(const Flash& flash) { return asText(flash.properties, 0); }
+
+Json asJson(const Flash& flash) { return {{"device", flash.name}, {"properties", asJson(flash.properties)}}; }
+
+Status listFlashes(Tool& tool) {
+    // The manager's start-up reads what is listed here, and says what is wrong with it.
+    static_cast<void>(tool.manager());
+    return tool.answer(Flashes{catalogue::flashes()});
+}
+
+Failure unknownFlash(const std::string& name) {
+    std::vector<std::string> names;
+    for (const catalogue::Flash& flash : catalogue::flashes()) {
+        names.push_back(flash.name);
+        names.push_back(flash.family);
+    }
+    return {Status::NO, fmt::format("the database has no flash \"{}\"{}", name, didYouMean(name, names))};
+}
+
+Status run(Tool& tool, const Arguments& arguments) {
+    if (!arguments.device) {
+        return listFlashes(tool);
+    }
+    const std::string& device = *arguments.device;
+    const ConstraintsManager& manager = tool.manager();
+    const Properties properties = flashProperties(manager, device);
+    const bool known = manager.isSpiDevice(device.c_str());
+    if (!arguments.key) {
+        if (!known) {
+            throw unknownFlash(device);
+        }
+        return tool.answer(Flash{device, properties});
+    }
+    PropertyAnswer answer{device, *arguments.key, {}};
+    const std::string value = manager.getSpiDeviceStringProperty(device.c_str(), arguments.key->c_str());
+    if (!value.empty()) {
+        answer.values.push_back(value);
+    } else if (!known) {
+        throw unknownFlash(device);
+    }
+    return showProperty(tool, answer, properties);
+}
+
+} // namespace
+
+Action declareSpi(CLI::App& parser) {
+    auto arguments = std::make_shared<Arguments>();
+    parser
+        .add_option("DEVICE", arguments->device,
+                    "The flash, or a family of flashes; without it all are listed")
+        ->type_name("");
+    parser.add_option("KEY", arguments->key, "One property; without it all are shown")->type_name("");
+    return [arguments](Tool& tool) { return run(tool, *arguments); };
+}

@@ -1,0 +1,155 @@
+// `which`: the inverse of `check` and `property`: the devices for which it holds.
+#include "commands/Declarations.h"
+
+#include "Table.h"
+#include "Tool.h"
+#include "Vocabulary.h"
+#include "why/Census.h"
+
+#include <TarvikException.h>
+#include <tarvik/ConstraintsManager.h>
+
+#include <CLI/CLI.hpp>
+
+#include <fmt/format.h>
+
+#include <memory>
+#include <optional>
+
+namespace {
+
+using why::Question;
+using why::Verdict;
+
+struct Arguments {
+    std::optional<std::string> operation;
+    std::optional<std::string> mode;
+    std::optional<std::string> output;
+    std::optional<std::string> property;
+};
+
+struct Holders {
+    Json asked; ///< the arguments, as the JSON object shows them
+    std::vector<why::Entry> devices;
+    std::vector<std::string> faults; ///< devices at which the manager raises
+};
+
+std::string asText(const Holders& holders) {
+    if (holders.devices.empty()) {
+        return {};
+    }
+    Table table({"DEVICE", "FAMILY"});
+    for (const why::Entry& device : holders.devices) {
+        table.add({device.name, device.family});
+    }
+    return table.text();
+}
+
+Json asJson(const Holders& holders) {
+    Json object = holders.asked;
+    Json list = Json::array();
+    for (const why::Entry& device : holders.devices) {
+        list.push_back({{"name", device.name}, {"family", device.family}});
+    }
+    object["devices"] = std::move(list);
+    object["faults"] = holders.faults;
+    return object;
+}
+
+Failure usage() {
+    return {Status::FAULT, "which takes one of\n"
+                           "  --operation OP --mode M --output O\n"
+                           "  --operation OP --mode M\n"
+                           "  --property KEY=VALUE"};
+}
+
+Question readProperty(const Arguments& arguments) {
+    if (arguments.operation || arguments.mode || arguments.output) {
+        throw usage();
+    }
+    const std::string& text = *arguments.property;
+    const std::size_t equals = text.find('=');
+    if (equals == std::string::npos || equals == 0) {
+        throw usage();
+    }
+    Question question;
+    question.kind = Question::Kind::PROPERTY;
+    question.property = text.substr(0, equals);
+    question.value = text.substr(equals + 1);
+    return question;
+}
+
+Question read(const Arguments& arguments) {
+    if (arguments.property) {
+        return readProperty(arguments);
+    }
+    if (!arguments.operation || !arguments.mode) {
+        throw usage();
+    }
+    Question question;
+    question.kind = Question::Kind::OPERATION_IN_MODE;
+    question.operation = vocabulary::readOperation(*arguments.operation);
+    question.mode = vocabulary::readMode(*arguments.mode);
+    if (arguments.output) {
+        question.kind = Question::Kind::OPERATION;
+        question.output = vocabulary::readOutput(*arguments.output);
+    }
+    return question;
+}
+
+Json asked(const Question& question) {
+    Json object = why::inJson(question);
+    object.erase("device");
+    return object;
+}
+
+/// Asks without the message that a device lacks the property: who asks for all devices knows that some do.
+/// What the host layer says when it reads the device is kept.
+Verdict askForProperty(Tool& tool, ConstraintsManager& manager, const Question& question) {
+    try {
+        static_cast<void>(
+            manager.getDeviceStringProperties(question.device.c_str(), question.property.c_str()));
+    } catch (const DataMismatchException&) {
+        return Verdict::FAULT;
+    }
+    const std::size_t issued = tool.messages().count();
+    const Verdict verdict = why::ask(manager, question);
+    tool.messages().forgetBehind(issued);
+    return verdict;
+}
+
+Status run(Tool& tool, const Arguments& arguments) {
+    const Question question = read(arguments);
+    Holders holders{asked(question), {}, {}};
+    const why::Asking ask = [&](ConstraintsManager& manager, const Question& one) {
+        return one.kind == Question::Kind::PROPERTY ? askForProperty(tool, manager, one)
+                                                    : why::ask(manager, one);
+    };
+    for (why::Entry& entry : why::askForAll(tool.manager(), question, ask)) {
+        if (entry.verdict == Verdict::YES) {
+            holders.devices.push_back(std::move(entry));
+        } else if (entry.verdict == Verdict::FAULT) {
+            holders.faults.push_back(std::move(entry.name));
+        }
+    }
+    const Status status = tool.answer(holders, holders.devices.empty() ? Status::NO : Status::YES);
+    if (!holders.faults.empty()) {
+        tool.note(fmt::format("no answer for {} devices, the first \"{}\": see tarvik why",
+                              holders.faults.size(), holders.faults.front()));
+    }
+    if (holders.devices.empty()) {
+        tool.note("there is no such device");
+    }
+    return status;
+}
+
+} // namespace
+
+Action declareWhich(CLI::App& parser) {
+    auto arguments = std::make_shared<Arguments>();
+    parser.add_option("--operation", arguments->operation, "The operation that it allows");
+    parser.add_option("-m,--mode", arguments->mode, "The configuration mode");
+    parser.add_option("-o,--output", arguments->output, "The cable or output file type");
+    parser.add_option("--property", arguments->property, "The property that it has")->type_name("KEY=VALUE");
+    return [arguments](Tool& tool) { return run(tool, *arguments); };
+}

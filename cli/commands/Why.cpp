@@ -1,0 +1,182 @@
+// `why`: the answer of `check`, `options`, `bsdl` or `property`, and the records that lead to it.
+#include "commands/Declarations.h"
+
+#include "Catalogue.h"
+#include "Nearest.h"
+#include "Table.h"
+#include "Tool.h"
+#include "Vocabulary.h"
+#include "why/Explanation.h"
+
+#include <tarvik/ConstraintsManager.h>
+
+#include <CLI/CLI.hpp>
+
+#include <fmt/format.h>
+
+#include <algorithm>
+#include <memory>
+#include <optional>
+
+namespace {
+
+using why::Question;
+using why::Verdict;
+
+struct Arguments {
+    std::optional<std::string> device;
+    std::optional<std::string> mode;
+    std::optional<std::string> output;
+    std::optional<std::string> package;
+    std::optional<std::string> operation;
+    std::optional<std::string> option;
+    std::optional<std::string> bsdl;
+    std::optional<std::string> property;
+    std::optional<std::string> value;
+};
+
+/// Which arguments a kind of question takes.
+struct Form {
+    Question::Kind kind;
+    std::vector<std::optional<std::string> Arguments::*> needed;
+    std::vector<std::optional<std::string> Arguments::*> possible;
+    const char* usage;
+};
+
+const std::vector<std::optional<std::string> Arguments::*> ALL{
+    &Arguments::device, &Arguments::mode, &Arguments::output,   &Arguments::package, &Arguments::operation,
+    &Arguments::option, &Arguments::bsdl, &Arguments::property, &Arguments::value};
+
+const std::vector<Form>& forms() {
+    using A = Arguments;
+    using Kind = Question::Kind;
+    static const std::vector<Form> all{
+        {Kind::OUTPUT, {&A::mode, &A::output}, {}, "--mode M --output O"},
+        {Kind::DEVICE, {&A::device, &A::mode}, {&A::package}, "DEVICE --mode M [--package P]"},
+        {Kind::DEVICE_THROUGH,
+         {&A::device, &A::mode, &A::output},
+         {&A::package},
+         "DEVICE --mode M --output O [--package P]"},
+        {Kind::OPERATION,
+         {&A::device, &A::mode, &A::output, &A::operation},
+         {},
+         "DEVICE --mode M --output O --operation OP"},
+        {Kind::OPERATION_IN_MODE,
+         {&A::device, &A::mode, &A::operation},
+         {},
+         "DEVICE --mode M --operation OP"},
+        {Kind::OPTION,
+         {&A::device, &A::mode, &A::output, &A::option},
+         {&A::package},
+         "DEVICE --mode M --output O --option X [--package P]"},
+        {Kind::BSDL, {&A::device, &A::output, &A::bsdl}, {}, "DEVICE --output O --bsdl OP"},
+        {Kind::PROPERTY, {&A::device, &A::property}, {&A::value}, "DEVICE --property KEY [--value V]"},
+    };
+    return all;
+}
+
+/// Are these arguments all that the form needs, and none that it does not take?
+bool fits(const Form& form, const Arguments& arguments) {
+    return std::all_of(ALL.begin(), ALL.end(), [&](auto member) {
+        const auto holds = [member](const auto& members) {
+            return std::find(members.begin(), members.end(), member) != members.end();
+        };
+        return (arguments.*member).has_value() ? holds(form.needed) || holds(form.possible)
+                                               : !holds(form.needed);
+    });
+}
+
+Question::Kind kindOf(const Arguments& arguments) {
+    std::string usage = "why takes one of";
+    for (const Form& form : forms()) {
+        if (fits(form, arguments)) {
+            return form.kind;
+        }
+        usage += std::string("\n  ") + form.usage;
+    }
+    throw Failure(Status::FAULT, usage);
+}
+
+TARVIKNS::PROGRAM_OPTION readOption(const std::string& text) {
+    const std::vector<std::string>& keys = vocabulary::options();
+    const auto found = std::find(keys.begin(), keys.end(), text);
+    if (found == keys.end()) {
+        throw Failure(Status::FAULT, fmt::format("unknown option \"{}\"{}\noptions, in upper case:\n{}", text,
+                                                 didYouMean(text, keys), wrapped(keys, 2)));
+    }
+    return static_cast<TARVIKNS::PROGRAM_OPTION>(found - keys.begin());
+}
+
+Question read(const Arguments& arguments) {
+    Question question;
+    question.kind = kindOf(arguments);
+    question.device = arguments.device.value_or("");
+    question.package = arguments.package;
+    question.property = arguments.property.value_or("");
+    question.value = arguments.value;
+    if (arguments.mode) {
+        question.mode = vocabulary::readMode(*arguments.mode);
+    }
+    if (arguments.output) {
+        question.output = vocabulary::readOutput(*arguments.output);
+    }
+    if (arguments.operation || arguments.bsdl) {
+        question.operation =
+            vocabulary::readOperation(arguments.operation ? *arguments.operation : *arguments.bsdl);
+    }
+    if (arguments.option) {
+        question.option = readOption(*arguments.option);
+    }
+    return question;
+}
+
+Status status(Verdict verdict) {
+    switch (verdict) {
+    case Verdict::YES:
+        return Status::YES;
+    case Verdict::NO:
+        return Status::NO;
+    case Verdict::FAULT:
+        break;
+    }
+    return Status::FAULT;
+}
+
+Status run(Tool& tool, const Arguments& arguments) {
+    const Question question = read(arguments);
+    ConstraintsManager& manager = tool.manager();
+    const Verdict verdict = why::ask(manager, question);
+    const bool known = !arguments.device || manager.isKorvelDevice(question.device.c_str());
+
+    const why::StartUp facts = why::readStartUp();
+    why::Answer answer{question, verdict, why::explain(facts, question)};
+    if (verdict == Verdict::NO) {
+        for (why::Step& step : why::alternatives(facts, question)) {
+            answer.explanation.steps.push_back(std::move(step));
+        }
+    }
+    const Status result = tool.answer(answer, status(verdict));
+    if (!known) {
+        tool.note(catalogue::unknownDevice(question.device).what());
+    }
+    if (!answer.agrees()) {
+        tool.note("these steps lead to another answer than the manager gives: that is a bug of tarvik");
+    }
+    return result;
+}
+
+} // namespace
+
+Action declareWhy(CLI::App& parser) {
+    auto arguments = std::make_shared<Arguments>();
+    parser.add_option("DEVICE", arguments->device, "The device, or a family");
+    parser.add_option("-m,--mode", arguments->mode, "The configuration mode");
+    parser.add_option("-o,--output", arguments->output, "The cable or output file type");
+    parser.add_option("-p,--package", arguments->package, "The package");
+    parser.add_option("--operation", arguments->operation, "The operation, as `check` takes it");
+    parser.add_option("--option", arguments->option, "The programming option, as `options` lists it");
+    parser.add_option("--bsdl", arguments->bsdl, "The boundary-scan operation, as `bsdl` lists it");
+    parser.add_option("--property", arguments->property, "The property, as `property` takes it");
+    parser.add_option("--value", arguments->value, "The property's value");
+    return [arguments](Tool& tool) { return run(tool, *arguments); };
+}

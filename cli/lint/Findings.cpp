@@ -1,0 +1,99 @@
+// Gathers findings, puts them in order, and names them in a way that outlives edits elsewhere in the file.
+#include "lint/Findings.h"
+
+#include "Nearest.h"
+
+#include <fmt/format.h>
+
+#include <algorithm>
+#include <cstdint>
+#include <map>
+#include <tuple>
+#include <utility>
+
+namespace lint {
+
+namespace {
+
+/// The name of a file without its directories.
+std::string_view fileName(std::string_view path) {
+    const std::size_t slash = path.rfind('/');
+    return slash == path.npos ? path : path.substr(slash + 1);
+}
+
+std::string_view withoutBlanks(std::string_view text) {
+    const std::size_t first = std::min(text.find_first_not_of(" \t"), text.size());
+    return text.substr(first, text.find_last_not_of(" \t\r") + 1 - first);
+}
+
+/// What a finding's fingerprint is made from, its ordinal aside: of a long line what is around the finding.
+std::string subject(const Finding& finding) {
+    constexpr std::size_t LONGEST = 400;
+    std::string text(finding.rule->code);
+    text.append("\n").append(fileName(finding.place.file->path())).append("\n");
+    std::string_view source = finding.place.file->source(finding.place.line);
+    if (source.size() > LONGEST) {
+        const std::size_t at = std::min<std::size_t>(finding.place.column - 1, source.size());
+        source = source.substr(at - std::min(at, LONGEST / 2), LONGEST);
+    }
+    return text.append(withoutBlanks(source));
+}
+
+/// FNV-1a: the same on every machine and in every version.
+std::uint64_t hash(std::string_view text) {
+    std::uint64_t value = 0xcbf29ce484222325U;
+    for (const char byte : text) {
+        value = (value ^ static_cast<unsigned char>(byte)) * 0x100000001b3U;
+    }
+    return value;
+}
+
+} // namespace
+
+void Findings::add(const Rule& rule, const Token& token, std::string text) {
+    // What goes on in the next line is marked up to the end of its first.
+    const std::size_t lineLength = token.place.file->source(token.place.line).size();
+    const std::size_t behind = lineLength - std::min<std::size_t>(lineLength, token.place.column - 1);
+    m_findings.push_back({&rule, token.place, std::min(token.text.size(), behind), std::move(text)});
+}
+
+std::string Findings::didYouMean(std::string_view text, const std::vector<std::string>& candidates) {
+    if (candidates.size() > m_comparisons) {
+        return {};
+    }
+    m_comparisons -= candidates.size();
+    return ::didYouMean(text, candidates);
+}
+
+std::vector<Finding> sorted(std::vector<Finding> findings, const Model& model) {
+    std::map<const AcdLines*, std::size_t> order;
+    for (const AcdLines& file : model.files()) {
+        order.emplace(&file, order.size());
+    }
+    const auto place = [&order](const Finding& finding) {
+        return std::tuple(order.at(finding.place.file), finding.place.line, finding.place.column,
+                          finding.rule->code);
+    };
+    std::stable_sort(findings.begin(), findings.end(), [&place](const Finding& left, const Finding& right) {
+        return place(left) < place(right);
+    });
+    return findings;
+}
+
+std::string quoted(std::string_view text) {
+    constexpr std::size_t LONGEST = 60;
+    return text.size() <= LONGEST ? fmt::format("\"{}\"", text)
+                                  : fmt::format("\"{}...\"", text.substr(0, LONGEST));
+}
+
+std::vector<std::string> fingerprints(const std::vector<Finding>& findings) {
+    std::map<std::string, std::size_t> seen;
+    std::vector<std::string> all;
+    for (const Finding& finding : findings) {
+        const std::string text = subject(finding);
+        all.push_back(fmt::format("{:016x}", hash(fmt::format("{}\n{}", text, seen[text]++))));
+    }
+    return all;
+}
+
+} // namespace lint

@@ -1,0 +1,31 @@
+#pragma once
+
+#include "Json.h"
+#include "lint/Findings.h"
+
+#include <cstddef>
+#include <string>
+#include <vector>
+
+namespace lint {
+
+/// What a run of the linter has to tell.
+struct Report {
+    std::vector<Finding> findings;
+
+    [[nodiscard]] std::size_t count(Level level) const;
+};
+
+/// "2 errors, 1 warning".
+[[nodiscard]] std::string summary(const Report& report);
+
+/// For each finding `file:line:column: error: text [CODE]`, the line of the file, and a caret below.
+[[nodiscard]] std::string asText(const Report& report);
+
+/// An object of all findings.
+[[nodiscard]] Json asJson(const Report& report);
+
+/// A log of SARIF 2.1.0.
+[[nodiscard]] Json asSarif(const Report& report);
+
+} // namespace lint

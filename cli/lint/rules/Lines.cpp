@@ -1,0 +1,105 @@
+// Rules about lines that the reader can make nothing of: each costs the line, and is reported where it stands.
+#include "lint/rules/Groups.h"
+
+#include "lint/Findings.h"
+
+namespace lint {
+
+namespace {
+
+constexpr Rule NO_EQUALS_SIGN{"L101", Level::ERROR, "line without \"=\"",
+                              "A line is a comment, a header or an assignment. One that is none of them is "
+                              "dropped, with all that it goes on "
+                              "with. Often a \"\\\" is missing at the end of the line before.",
+                              "OPERATION = PROGRAM,Bscan,USB2:\n            VERIFY,Bscan,USB2"};
+constexpr Rule EMPTY_KEY{"L102", Level::ERROR, "no key before \"=\"",
+                         "An assignment begins with the key that it sets. Without one the line is dropped.",
+                         "= VENDOR,Korvel"};
+constexpr Rule BLANK_IN_KEY{
+    "L103", Level::ERROR, "blank in a key",
+    "A key is one word; only the blanks around it are dropped. The line is dropped. Often a value that "
+    "should have "
+    "gone on stands there instead, because the \"\\\" before it is missing or followed by a blank.",
+    "BSDL OPERATION = BYPASS,USB2"};
+constexpr Rule NUL_BYTE{
+    "L104", Level::ERROR, "NUL byte",
+    "Values end at a NUL where applications read them, so a line that holds one is dropped. The "
+    "file was damaged, or written in an encoding of two bytes a character.",
+    "PROPERTY = VENDOR,Kor<NUL>vel"};
+constexpr Rule LINE_TOO_LONG{
+    "L105", Level::ERROR, "line of more than 16 MiB",
+    "A line, with all that it goes on with, is dropped when it is longer than 16 MiB. Split it "
+    "by \"+=\".",
+    ""};
+constexpr Rule CONTINUED_AT_END{"L106", Level::ERROR, "file ends behind \"\\\"",
+                                "The last line says that it goes on, and does not: the file may have been "
+                                "cut short, so the line is dropped.",
+                                "PROPERTY = VENDOR,Korvel: \\"};
+constexpr Rule UNCLOSED_HEADER{
+    "L107", Level::ERROR, "header without \"]\"",
+    "A line that begins with \"[\" opens a section. A malformed one is dropped, and so are "
+    "the keys up to the next header, lest they land on another device.",
+    "[KS50"};
+constexpr Rule EMPTY_NAME{
+    "L108", Level::ERROR, "header without a name",
+    "A section is that of a device, so it has a name. The header is dropped, and so are the keys "
+    "up to the next one.",
+    "[]"};
+constexpr Rule BLANK_IN_NAME{
+    "L109", Level::ERROR, "blank in the name of a header",
+    "A device's name is one word, with no blanks around it either. The header is dropped, and "
+    "so are the keys up to the next one.",
+    "[ KS50 ]"};
+constexpr Rule TEXT_BEHIND_HEADER{
+    "L110", Level::ERROR, "text behind a header",
+    "A header ends with its \"]\"; there are no comments behind it. The header is dropped, "
+    "and so are the keys up to the next one.",
+    "[KS50] # the smallest one"};
+
+const Rule* ruleFor(AcdLines::Fault fault) {
+    switch (fault) {
+    case AcdLines::Fault::NO_EQUALS_SIGN:
+        return &NO_EQUALS_SIGN;
+    case AcdLines::Fault::EMPTY_KEY:
+        return &EMPTY_KEY;
+    case AcdLines::Fault::BLANK_IN_KEY:
+        return &BLANK_IN_KEY;
+    case AcdLines::Fault::NUL_BYTE:
+        return &NUL_BYTE;
+    case AcdLines::Fault::LINE_TOO_LONG:
+        return &LINE_TOO_LONG;
+    case AcdLines::Fault::CONTINUED_AT_END:
+        return &CONTINUED_AT_END;
+    case AcdLines::Fault::UNCLOSED_HEADER:
+        return &UNCLOSED_HEADER;
+    case AcdLines::Fault::EMPTY_NAME:
+        return &EMPTY_NAME;
+    case AcdLines::Fault::BLANK_IN_NAME:
+        return &BLANK_IN_NAME;
+    case AcdLines::Fault::TEXT_BEHIND_HEADER:
+        return &TEXT_BEHIND_HEADER;
+    case AcdLines::Fault::NONE:
+        break;
+    }
+    return nullptr;
+}
+
+void check(const Model& model, Findings& findings) {
+    for (const AcdLines& file : model.files()) {
+        for (const AcdLines::Line& line : file.lines()) {
+            if (const Rule* const rule = ruleFor(line.fault)) {
+                findings.add(*rule, {{}, {&file, line.line, line.column}}, line.text);
+            }
+        }
+    }
+}
+
+} // namespace
+
+Group lineRules() {
+    return {{&NO_EQUALS_SIGN, &EMPTY_KEY, &BLANK_IN_KEY, &NUL_BYTE, &LINE_TOO_LONG, &CONTINUED_AT_END,
+             &UNCLOSED_HEADER, &EMPTY_NAME, &BLANK_IN_NAME, &TEXT_BEHIND_HEADER},
+            check};
+}
+
+} // namespace lint

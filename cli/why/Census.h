@@ -1,0 +1,31 @@
+#pragma once
+
+#include "why/Question.h"
+
+#include <functional>
+#include <string>
+#include <vector>
+
+class ConstraintsManager;
+
+namespace why {
+
+/// The answer for one of all devices.
+struct Entry {
+    std::string name;
+    std::string family;
+    Verdict verdict;
+};
+
+using Asking = std::function<Verdict(ConstraintsManager&, const Question&)>;
+
+/// Asks the same question for every device of the database, flashes included.
+///
+/// Each answer is that of a manager that was asked nothing before: the manager handed over must be such a one.
+/// Devices that share a table are asked for once; where one question could change the answer to the next, it is
+/// asked in a process of its own.
+/// @param question whose device is replaced; an operation or a property
+/// @throw Failure (FAULT) when a process can't be started
+[[nodiscard]] std::vector<Entry> askForAll(ConstraintsManager& manager, Question question, const Asking& ask);
+
+} // namespace why

@@ -1,0 +1,41 @@
+# What `cmake --install` puts where, by component: runtime, development, tool, data, documentation.
+include(CMakePackageConfigHelpers)
+
+set(package_directory ${CMAKE_INSTALL_LIBDIR}/cmake/TarvikConstraintsManager)
+set(host_headers ${CMAKE_INSTALL_INCLUDEDIR}/tarvik/host)
+
+# An installed tree can be moved: everything is found from its own place.
+file(RELATIVE_PATH libraries_from_tool /${CMAKE_INSTALL_BINDIR} /${CMAKE_INSTALL_LIBDIR})
+set_target_properties(TarvikHost TarvikConstraintsManager PROPERTIES INSTALL_RPATH "$ORIGIN")
+set_target_properties(TarvikHost PROPERTIES EXPORT_NAME Host)
+set_target_properties(TarvikConstraintsManager PROPERTIES EXPORT_NAME ConstraintsManager)
+target_include_directories(TarvikHost PUBLIC $<INSTALL_INTERFACE:${host_headers}>)
+target_include_directories(TarvikConstraintsManager PUBLIC $<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>)
+
+install(TARGETS TarvikHost TarvikConstraintsManager
+  EXPORT TarvikConstraintsManagerTargets
+  LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT runtime NAMELINK_COMPONENT development)
+install(DIRECTORY include/tarvik DESTINATION ${CMAKE_INSTALL_INCLUDEDIR} COMPONENT development)
+install(DIRECTORY host/include/ DESTINATION ${host_headers} COMPONENT development)
+
+install(EXPORT TarvikConstraintsManagerTargets NAMESPACE Tarvik::
+  DESTINATION ${package_directory} COMPONENT development)
+write_basic_package_version_file(TarvikConstraintsManagerConfigVersion.cmake COMPATIBILITY SameMajorVersion)
+install(FILES
+  cmake/TarvikConstraintsManagerConfig.cmake
+  ${CMAKE_CURRENT_BINARY_DIR}/TarvikConstraintsManagerConfigVersion.cmake
+  DESTINATION ${package_directory} COMPONENT development)
+
+file(RELATIVE_PATH prefix_from_pkgconfig /${CMAKE_INSTALL_LIBDIR}/pkgconfig /)
+configure_file(cmake/tarvik-constraints-manager.pc.in tarvik-constraints-manager.pc @ONLY)
+install(FILES ${CMAKE_CURRENT_BINARY_DIR}/tarvik-constraints-manager.pc
+  DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig COMPONENT development)
+
+if(TARGET tarvik)
+  set_target_properties(tarvik PROPERTIES INSTALL_RPATH "$ORIGIN/${libraries_from_tool}")
+  install(TARGETS tarvik RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT tool)
+endif()
+install(DIRECTORY database/ DESTINATION ${CMAKE_INSTALL_DATADIR}/tarvik/demonstration COMPONENT data)
+install(FILES README.md CHANGELOG.md DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT documentation)
+install(DIRECTORY docs/ DESTINATION ${CMAKE_INSTALL_DOCDIR}/docs COMPONENT documentation)
+install(DIRECTORY examples DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT documentation)

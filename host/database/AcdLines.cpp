@@ -1,0 +1,164 @@
+#include <AcdLines.h>
+
+#include <TarvikException.h>
+
+#include "database/LineReader.h"
+#include "database/Reports.h"
+#include "database/Store.h"
+
+#include <algorithm>
+#include <array>
+#include <memory>
+#include <utility>
+
+// The public view on the grammar: what a walk over a file finds, kept.
+
+namespace {
+
+constexpr std::array KINDS{AcdLines::Kind::HEADER, AcdLines::Kind::ASSIGNMENT, AcdLines::Kind::APPEND,
+                           AcdLines::Kind::FAULT};
+
+[[nodiscard]] AcdLines::Fault publicFault(acd::FaultKind kind) noexcept {
+    using acd::FaultKind;
+    using Fault = AcdLines::Fault;
+    switch (kind) {
+    case FaultKind::NO_EQUALS_SIGN:
+        return Fault::NO_EQUALS_SIGN;
+    case FaultKind::EMPTY_KEY:
+        return Fault::EMPTY_KEY;
+    case FaultKind::BLANK_IN_KEY:
+        return Fault::BLANK_IN_KEY;
+    case FaultKind::NUL_BYTE:
+        return Fault::NUL_BYTE;
+    case FaultKind::LINE_TOO_LONG:
+    case FaultKind::VALUE_TOO_LONG: // never of a single line
+        return Fault::LINE_TOO_LONG;
+    case FaultKind::CONTINUED_AT_END:
+        return Fault::CONTINUED_AT_END;
+    case FaultKind::UNCLOSED_HEADER:
+        return Fault::UNCLOSED_HEADER;
+    case FaultKind::EMPTY_NAME:
+        return Fault::EMPTY_NAME;
+    case FaultKind::BLANK_IN_NAME:
+        return Fault::BLANK_IN_NAME;
+    case FaultKind::TEXT_BEHIND_HEADER:
+        return Fault::TEXT_BEHIND_HEADER;
+    }
+    return Fault::NONE;
+}
+
+[[nodiscard]] AcdLines::Line publicLine(const acd::Line& line) {
+    AcdLines::Line result{};
+    result.kind = KINDS[static_cast<std::size_t>(line.kind)];
+    if (line.kind == acd::Line::Kind::FAULT) {
+        result.line = line.fault.place.line;
+        result.column = line.fault.place.column;
+        result.fault = publicFault(line.fault.kind);
+        result.closesSection = line.fault.closesSection;
+        result.text = acd::describe(line.fault);
+        return result;
+    }
+    result.name = line.name;
+    result.line = line.place.line;
+    result.column = line.place.column;
+    if (line.kind != acd::Line::Kind::HEADER) {
+        result.value = line.value;
+        for (const acd::Piece& piece : line.pieces) {
+            result.fragments.push_back({piece.offset, piece.place.line, piece.place.column});
+        }
+    }
+    return result;
+}
+
+[[nodiscard]] acd::Text readFile(const acd::SourceFile& file) {
+    if (file.text != nullptr) {
+        acd::MemorySource source(*file.text);
+        return acd::readWhole(source);
+    }
+    acd::FileSource source(file.path);
+    return acd::readWhole(source);
+}
+
+} // namespace
+
+std::vector<AcdLines> AcdLines::ofDatabase() {
+    std::vector<AcdLines> all;
+    for (const auto& family : acd::Store::instance().families()) {
+        for (const acd::SourceFile& file : family->files) {
+            try {
+                const acd::Text text = readFile(file);
+                all.emplace_back(std::string_view(text.bytes.get(), text.size), file.path, family->name);
+            } catch (const acd::Unreadable& unreadable) {
+                acd::Reports reports;
+                reports.add(file.path, acd::location::FILE_UNREADABLE, unreadable.what());
+                reports.issue();
+                throw DataNotFoundException(acd::PRODUCT, acd::SOURCE, acd::REVISION,
+                                            acd::location::FILE_UNREADABLE);
+            }
+        }
+    }
+    return all;
+}
+
+AcdLines::AcdLines(std::string_view text, std::string path, std::string family)
+    : m_path(std::move(path)), m_family(std::move(family)), m_source(text.begin(), text.end()),
+      m_joined(m_source) {
+    splitSource();
+    readLines();
+}
+
+void AcdLines::splitSource() {
+    for (std::size_t start = 0; start < m_source.size();) {
+        m_starts.push_back(start);
+        const auto end =
+            std::find(m_source.begin() + static_cast<std::ptrdiff_t>(start), m_source.end(), '\n');
+        start = static_cast<std::size_t>(end - m_source.begin()) + 1;
+    }
+}
+
+std::string_view AcdLines::source(unsigned line) const noexcept {
+    if (line == 0 || line > m_starts.size()) {
+        return {};
+    }
+    const std::size_t start = m_starts[line - 1];
+    const std::size_t next = line < m_starts.size() ? m_starts[line] : m_source.size();
+    std::string_view text(m_source.data() + start, next - start);
+    if (text.ends_with('\n')) {
+        text.remove_suffix(1);
+        text.remove_suffix(text.ends_with('\r') ? 1 : 0);
+    }
+    if (line == 1 && text.starts_with(acd::BYTE_ORDER_MARK)) {
+        text.remove_prefix(acd::BYTE_ORDER_MARK.size());
+    }
+    return text;
+}
+
+void AcdLines::readLines() {
+    acd::LineReader reader(m_joined.data(), m_joined.size());
+    acd::Line line;
+    unsigned taken = 0;
+    while (reader.next(line)) {
+        Line& added = m_lines.emplace_back(publicLine(line));
+        added.lastLine = reader.linesTaken();
+        added.firstLine = addComments(taken + 1, added.lastLine);
+        taken = added.lastLine;
+    }
+    static_cast<void>(addComments(taken + 1, static_cast<unsigned>(m_starts.size())));
+}
+
+/// Keeps the comments of what lies between two lines that mean something.
+/// @return the first line that is neither blank nor a comment
+unsigned AcdLines::addComments(unsigned first, unsigned last) {
+    for (unsigned line = first; line <= last; ++line) {
+        const std::string_view text = source(line);
+        const std::size_t start = text.find_first_not_of(" \t");
+        if (start == text.npos) {
+            continue;
+        }
+        if (text[start] != '#') {
+            return line;
+        }
+        m_comments.push_back({line, static_cast<unsigned>(start) + 1, text.substr(start)});
+    }
+    return last;
+}

@@ -1,0 +1,160 @@
+#include "database/Catalogue.h"
+
+#include <algorithm>
+#include <filesystem>
+#include <system_error>
+#include <utility>
+
+// Finds the files of the families and reads them when they are needed. Every name is looked up among what the
+// listing gave, so that a name never becomes a path.
+
+namespace acd {
+
+namespace {
+
+constexpr std::string_view ENDING = ".acd";
+
+/// The family that a file name stands for; empty when it is no database's name.
+[[nodiscard]] std::string_view familyName(std::string_view fileName) noexcept {
+    const std::size_t length = fileName.size() - std::min(fileName.size(), ENDING.size());
+    return sameName(fileName.substr(length), ENDING) ? fileName.substr(0, length) : std::string_view();
+}
+
+[[nodiscard]] std::string joinPath(const std::string& directory, const std::string& name) {
+    return directory.ends_with('/') ? directory + name : directory + '/' + name;
+}
+
+[[nodiscard]] std::string workingDirectory() {
+    std::error_code error;
+    return std::filesystem::current_path(error).string();
+}
+
+/// Reads what is in a file, unless that failed before; the first failure is reported.
+/// @return whether it was read
+template <typename Read>
+bool attempt(SourceFile& file, Reports& reports, Read read) {
+    if (file.isUnreadable) {
+        return false;
+    }
+    try {
+        read();
+        return true;
+    } catch (const Unreadable& unreadable) {
+        reports.add(file.path, location::FILE_UNREADABLE, unreadable.what());
+        file.isUnreadable = true;
+        return false;
+    }
+}
+
+} // namespace
+
+Catalogue::Catalogue(const std::vector<std::string>& directories, Reports& reports)
+    : m_workingDirectory(workingDirectory()) {
+    std::uint32_t layer = 0;
+    for (auto directory = directories.rbegin(); directory != directories.rend(); ++directory, ++layer) {
+        try {
+            std::vector<std::string> names = listDirectory(*directory);
+            std::sort(names.begin(), names.end());
+            for (const std::string& name : names) {
+                addFile(name, {joinPath(*directory, name), layer, nullptr});
+            }
+        } catch (const Unreadable& unreadable) {
+            reports.add(*directory, location::DIRECTORY_UNREADABLE, unreadable.what());
+        }
+    }
+    sort();
+}
+
+Catalogue::Catalogue(std::shared_ptr<const MemoryFiles> files) : m_memoryFiles(std::move(files)) {
+    for (const auto& [name, text] : *m_memoryFiles) {
+        addFile(name, {name, 0, &text});
+    }
+    sort();
+}
+
+/// Adds a file to its family. Of two in one layer whose names differ in case only the first one counts.
+void Catalogue::addFile(std::string_view fileName, SourceFile file) {
+    const std::string_view name = familyName(fileName);
+    if (name.empty()) {
+        return;
+    }
+    Family* known = family(name);
+    if (known == nullptr) {
+        known = m_families.emplace_back(std::make_unique<Family>()).get();
+        known->fileName = fileName;
+        known->name = name;
+        m_names.add(known->name);
+    } else if (known->files.back().layer == file.layer) {
+        return;
+    }
+    known->files.push_back(std::move(file));
+}
+
+void Catalogue::sort() {
+    std::sort(m_families.begin(), m_families.end(),
+              [](const auto& left, const auto& right) { return left->fileName < right->fileName; });
+    m_names = {};
+    for (const auto& family : m_families) {
+        m_names.add(family->name);
+    }
+}
+
+Family* Catalogue::family(std::string_view name) const noexcept {
+    const std::uint32_t ordinal = m_names.find(name);
+    return ordinal == NameTable::NONE ? nullptr : m_families[ordinal].get();
+}
+
+Family* Catalogue::familyOfFile(std::string_view fileName) const noexcept {
+    return family(familyName(fileName));
+}
+
+Family* Catalogue::familyOfDevice(std::string_view device, Reports& reports) {
+    if (!m_devices) {
+        m_devices = makeIndex(reports);
+    }
+    const std::uint32_t ordinal = m_devices->family(device);
+    return ordinal == DeviceIndex::NONE ? nullptr : m_families[ordinal].get();
+}
+
+DeviceIndex Catalogue::makeIndex(Reports& reports) const {
+    DeviceIndex index;
+    HeaderScan scan;
+    for (std::uint32_t ordinal = 0; ordinal != m_families.size(); ++ordinal) {
+        for (SourceFile& file : m_families[ordinal]->files) {
+            attempt(file, reports, [&] { index.add(scan.names([&] { return open(file); }), ordinal); });
+        }
+    }
+    return index;
+}
+
+const Database* Catalogue::database(Family& family, Reports& reports) const {
+    if (family.database != nullptr) {
+        return family.database.get();
+    }
+    std::vector<LayerText> layers;
+    for (SourceFile& file : family.files) {
+        attempt(file, reports, [&] { layers.push_back({file.path, readWhole(*open(file))}); });
+    }
+    if (layers.size() != family.files.size()) {
+        return nullptr;
+    }
+    std::vector<LayerFault> faults;
+    auto database = std::make_unique<const Database>(std::move(layers), faults);
+    Reports found;
+    for (const LayerFault& fault : faults) {
+        found.add(database->path(fault.layer), fault.fault);
+    }
+    family.database = std::move(database);
+    reports.add(std::move(found));
+    return family.database.get();
+}
+
+std::unique_ptr<ByteSource> Catalogue::open(const SourceFile& file) const {
+    if (file.text != nullptr) {
+        return std::make_unique<MemorySource>(*file.text);
+    }
+    return std::make_unique<FileSource>(file.path.starts_with('/') ? file.path
+                                                                   : joinPath(m_workingDirectory, file.path));
+}
+
+} // namespace acd

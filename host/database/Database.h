@@ -1,0 +1,113 @@
+#pragma once
+
+#include "database/Fault.h"
+#include "database/FileReading.h"
+#include "database/NameTable.h"
+
+#include <cstddef>
+#include <cstdint>
+#include <memory>
+#include <span>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace acd {
+
+/// One layer's file of a family, read but not yet taken apart.
+struct LayerText {
+    std::string path;
+    Text text;
+};
+
+/// A fault and the layer in whose file it is.
+struct LayerFault {
+    std::uint32_t layer;
+    Fault fault;
+};
+
+/// Where a piece of a value was written.
+struct Fragment {
+    std::uint32_t offset; ///< of its first byte in the value
+    Place place;
+    std::uint32_t layer;
+};
+
+/// The value of a key. Small, since there is one for each of very many facts.
+class Value {
+public:
+    [[nodiscard]] std::string_view key() const noexcept { return {m_key, m_keyLength}; }
+    [[nodiscard]] std::string_view text() const noexcept { return {m_text, m_textLength}; }
+
+private:
+    friend class DatabaseBuilder;
+    friend class Database;
+
+    const char* m_key;
+    const char* m_text;
+    std::uint32_t m_keyLength;
+    std::uint32_t m_textLength;
+    std::uint32_t m_firstFragment;
+    std::uint32_t m_fragmentCount;
+};
+
+/// The keys of one device, or those of the family itself.
+class Section {
+private:
+    friend class DatabaseBuilder;
+    friend class Database;
+
+    std::uint32_t m_first = 0; ///< its values stand together, in order of their keys
+    std::uint32_t m_count = 0;
+};
+
+/// What the files of one family say, layer over layer. Never changes once it is made.
+class Database {
+public:
+    /// Without a single key.
+    Database() = default;
+
+    /// Takes the files apart.
+    /// @param layers the bottom one first
+    /// @param faults what is wrong with them is added here
+    /// @param longestValue what no value may grow over by appending, at most 4 GiB
+    explicit Database(std::vector<LayerText> layers, std::vector<LayerFault>& faults,
+                      std::size_t longestValue = LARGEST_FILE);
+
+    Database(const Database&) = delete;
+    Database& operator=(const Database&) = delete;
+
+    /// The names of the sections, in the order in which they open first.
+    [[nodiscard]] const NameTable& sectionNames() const noexcept { return m_sectionNames; }
+
+    /// The section of a device; null when there is none.
+    [[nodiscard]] const Section* section(std::string_view name) const noexcept;
+
+    /// The place of a section among all, the family's own (null) being 0.
+    [[nodiscard]] std::size_t ordinal(const Section* section) const noexcept;
+
+    /// The value of a key: the section's, else the family's own. Null for `section` asks the family alone.
+    [[nodiscard]] const Value* find(const Section* section, std::string_view key) const noexcept;
+
+    /// Whether a value is the section's, not the family's own.
+    [[nodiscard]] bool holds(const Section& section, const Value& value) const noexcept;
+
+    /// The origin of a value, in order; one fragment at least.
+    [[nodiscard]] std::span<const Fragment> fragments(const Value& value) const noexcept;
+
+    [[nodiscard]] std::string_view path(std::uint32_t layer) const noexcept { return m_layers[layer].path; }
+
+private:
+    friend class DatabaseBuilder;
+
+    [[nodiscard]] const Value* findIn(const Section& section, std::string_view key) const noexcept;
+
+    std::vector<LayerText> m_layers;
+    NameTable m_sectionNames;
+    std::vector<Section> m_sections{1}; ///< the family's own first
+    std::vector<Value> m_values;
+    std::vector<Fragment> m_fragments;
+    std::vector<std::unique_ptr<char[]>> m_joinedTexts; ///< of values that were appended to
+};
+
+} // namespace acd

@@ -1,0 +1,110 @@
+#pragma once
+
+#include "database/Fault.h"
+
+#include <cstddef>
+#include <cstdint>
+#include <string_view>
+#include <vector>
+
+namespace acd {
+
+/// Skipped at the start of a file.
+inline constexpr std::string_view BYTE_ORDER_MARK = "\xEF\xBB\xBF";
+
+[[nodiscard]] constexpr bool isBlank(char byte) noexcept { return byte == ' ' || byte == '\t'; }
+
+/// The offset of the first blank; the size of the text when there is none.
+[[nodiscard]] constexpr std::size_t findBlank(std::string_view text) noexcept {
+    std::size_t offset = 0;
+    while (offset != text.size() && !isBlank(text[offset])) {
+        ++offset;
+    }
+    return offset;
+}
+
+/// The text without the blanks at its end.
+[[nodiscard]] std::string_view withoutTrailingBlanks(std::string_view text) noexcept;
+
+/// What a header line says: a name, or what is wrong with it.
+struct Header {
+    std::string_view name; ///< empty for a malformed header
+    FaultKind fault;       ///< of a malformed header only, as are the following
+    std::size_t offset;    ///< of the fault in the line
+    std::string_view fragment;
+};
+
+/// Reads a line that begins with `[` and does not end with a blank.
+[[nodiscard]] Header parseHeader(std::string_view line) noexcept;
+
+/// Where a piece of a joined text was written.
+struct Piece {
+    std::uint32_t offset; ///< of its first byte in the text
+    Place place;
+};
+
+/// One line of a database file as it is meant: continuations joined, comments and blank lines gone.
+struct Line {
+    enum class Kind {
+        HEADER,     ///< opens the section `name`
+        ASSIGNMENT, ///< `name = value`
+        APPEND,     ///< `name += value`
+        FAULT,      ///< means nothing
+    };
+
+    Kind kind = Kind::FAULT;
+    std::string_view name;
+    Place place{}; ///< of the name
+    std::string_view value;
+    std::vector<Piece> pieces; ///< of the value, in order; one at least
+    Fault fault{};             ///< of kind `FAULT` only
+};
+
+/// Walks over the text of a database file, line by line as they are meant. The one place that knows the
+/// grammar.
+///
+/// The kind of a line is decided by its first physical line: a comment (`#`) never goes on, anything else
+/// does behind a `\`, and what it goes on with is neither comment nor header.
+class LineReader {
+public:
+    static constexpr std::size_t LONGEST_LINE = std::size_t{16} << 20;
+
+    /// The text is changed: lines that go on are joined in place, so that a value is one view into it. It
+    /// must outlive the lines.
+    /// @param size at most 4 GiB
+    LineReader(char* text, std::size_t size) noexcept;
+
+    /// Reads the next line into `line`, whose memory is used again.
+    /// @return false at the end of the text
+    [[nodiscard]] bool next(Line& line);
+
+    /// How many lines of the text were taken so far: the number of the last one of the line read last.
+    [[nodiscard]] std::uint32_t linesTaken() const noexcept { return m_lineNumber; }
+
+private:
+    struct PhysicalLine {
+        char* begin; ///< its first byte that is no blank
+        char* end;
+        Place place; ///< of `begin`
+
+        [[nodiscard]] bool goesOn() const noexcept { return begin != end && end[-1] == '\\'; }
+    };
+
+    [[nodiscard]] PhysicalLine takePhysicalLine() noexcept;
+    [[nodiscard]] bool join(const PhysicalLine& first);
+    void readHeader(Line& line) const;
+    void readAssignment(Line& line) const;
+    void placeValue(Line& line) const;
+    void fail(Line& line, FaultKind kind, std::size_t offset, std::string_view fragment) const;
+    [[nodiscard]] Place placeOf(std::size_t offset) const noexcept;
+
+    char* m_next;
+    char* m_end;
+    std::uint32_t m_lineNumber = 0;
+    bool m_holdsNul;
+
+    std::string_view m_text; ///< the current line, joined, without blanks at its ends
+    std::vector<Piece> m_pieces;
+};
+
+} // namespace acd

@@ -1,0 +1,97 @@
+#include <PM_DEVKEY.h>
+
+#include "database/Database.h"
+#include "database/Store.h"
+
+#include <algorithm>
+
+// Keyed reading with two levels of splitting. Lists are read item by item, so the accessor keeps its place:
+// the value of the latest key, the latest item and the latest field in it.
+
+namespace {
+
+[[nodiscard]] std::string_view orEmpty(const char* text) noexcept {
+    return text == nullptr ? std::string_view() : std::string_view(text);
+}
+
+} // namespace
+
+void PM_DEVKEY::Cursor::start(std::string_view text, std::string_view separator) noexcept {
+    index = 0;
+    position = 0;
+    findEnd(text, separator);
+}
+
+bool PM_DEVKEY::Cursor::moveTo(std::size_t wanted, std::string_view text,
+                               std::string_view separator) noexcept {
+    if (wanted < index) {
+        start(text, separator);
+    }
+    while (index != wanted && end != text.size()) {
+        ++index;
+        position = end + separator.size();
+        findEnd(text, separator);
+    }
+    return index == wanted;
+}
+
+void PM_DEVKEY::Cursor::findEnd(std::string_view text, std::string_view separator) noexcept {
+    // An empty separator would be found everywhere; it separates nothing.
+    end = separator.empty() ? text.size() : std::min(text.find(separator, position), text.size());
+}
+
+PM_DEVKEY::PM_DEVKEY(const char* file, const PM_PIC&, unsigned char, unsigned char, unsigned char)
+    : PM_DEVKEY(acd::Store::instance().databaseOfFile(orEmpty(file)), nullptr) {}
+
+PM_DEVKEY::PM_DEVKEY(const acd::Database& database, const acd::Section* section) noexcept
+    : m_database(database), m_section(section) {}
+
+const char* PM_DEVKEY::getstringbykey(const char* key, const char* separator, short index,
+                                      const char* subSeparator, short subIndex) {
+    if (key == nullptr || index < 0 || (subSeparator != nullptr && subIndex < 0)) {
+        return nullptr;
+    }
+    select(key, orEmpty(separator));
+    if (m_value.empty() || !moveToItem(static_cast<std::size_t>(index))) {
+        return nullptr;
+    }
+    std::string_view piece = m_item.piece(m_value);
+    if (subSeparator != nullptr) {
+        if (m_subSeparator != subSeparator) {
+            m_subSeparator = subSeparator;
+            m_field.start(piece, m_subSeparator);
+        }
+        if (!m_field.moveTo(static_cast<std::size_t>(subIndex), piece, m_subSeparator)) {
+            return nullptr;
+        }
+        piece = m_field.piece(piece);
+    }
+    m_result = piece;
+    return m_result.c_str();
+}
+
+/// Makes the value of `key` the current one, split at `separator`.
+void PM_DEVKEY::select(std::string_view key, std::string_view separator) {
+    if (m_key == key && m_separator == separator) {
+        return;
+    }
+    // Nothing is current while memory may run out: no key is empty.
+    m_key.clear();
+    m_value = {};
+    m_separator = separator;
+    m_key = key;
+    if (const acd::Value* const value = m_database.find(m_section, key)) {
+        m_value = value->text();
+        m_item.start(m_value, m_separator);
+        m_field.start(m_item.piece(m_value), m_subSeparator);
+    }
+}
+
+bool PM_DEVKEY::moveToItem(std::size_t index) noexcept {
+    const std::size_t former = m_item.index;
+    const bool found = m_item.moveTo(index, m_value, m_separator);
+    if (m_item.index != former) {
+        m_field.start(m_item.piece(m_value), m_subSeparator);
+    }
+    return found;
+}

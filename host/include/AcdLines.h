@@ -1,0 +1,101 @@
+#pragma once
+
+#include <cstddef>
+#include <string>
+#include <string_view>
+#include <vector>
+
+/// The lines of one database file as they are meant: continuations joined, blank lines gone, comments apart.
+///
+/// For tools that tell what a file says and what is wrong with it. Whoever wants answers asks `AcdReader`.
+class __attribute__((visibility("default"))) AcdLines {
+public:
+    enum class Kind {
+        HEADER,     ///< `[name]`
+        ASSIGNMENT, ///< `name = value`
+        APPEND,     ///< `name += value`
+        FAULT,      ///< means nothing
+    };
+
+    /// What can be wrong with a line.
+    enum class Fault {
+        NONE,
+        NO_EQUALS_SIGN,
+        EMPTY_KEY,
+        BLANK_IN_KEY,
+        NUL_BYTE,
+        LINE_TOO_LONG,
+        CONTINUED_AT_END, ///< `\` at the end of the file
+        UNCLOSED_HEADER,
+        EMPTY_NAME,
+        BLANK_IN_NAME,
+        TEXT_BEHIND_HEADER,
+    };
+
+    /// Where a piece of a value was written; lines and columns are counted from 1, columns in bytes.
+    struct Fragment {
+        std::size_t offset; ///< of its first byte in the value
+        unsigned line;
+        unsigned column;
+    };
+
+    struct Line {
+        Kind kind;
+        unsigned firstLine; ///< the lines of the file that it consists of
+        unsigned lastLine;
+        std::string_view name;           ///< of a section, or the key; empty for a fault
+        std::string_view value;          ///< empty for headers and faults
+        std::vector<Fragment> fragments; ///< of the value, in order; one at least, even of an empty value
+        unsigned line;                   ///< of the name, or of the fault
+        unsigned column;
+        Fault fault;        ///< `NONE` for all other kinds
+        bool closesSection; ///< a header's fault: the keys up to the next header belong to nothing
+        std::string text;   ///< what the fault is, in words
+    };
+
+    /// A comment, from its `#` on.
+    struct Comment {
+        unsigned line;
+        unsigned column;
+        std::string_view text;
+    };
+
+    /// All files of the search path, or all memory files: by family in byte order of the file names, and of a
+    /// family the bottom layer first.
+    /// @throw DataNotFoundException when a file can't be read; an info message that names it goes before
+    [[nodiscard]] static std::vector<AcdLines> ofDatabase();
+
+    /// Takes a text apart.
+    /// @param path how the file is shown
+    /// @param family the name of its family, as the readers spell it
+    explicit AcdLines(std::string_view text, std::string path = {}, std::string family = {});
+
+    AcdLines(const AcdLines&) = delete;
+    AcdLines& operator=(const AcdLines&) = delete;
+    AcdLines(AcdLines&&) noexcept = default;
+    AcdLines& operator=(AcdLines&&) noexcept = default;
+
+    [[nodiscard]] const std::string& path() const noexcept { return m_path; }
+    [[nodiscard]] const std::string& family() const noexcept { return m_family; }
+
+    /// The lines, and the comments, in the order of the file. Their texts live as long as this object,
+    /// wherever it is moved.
+    [[nodiscard]] const std::vector<Line>& lines() const noexcept { return m_lines; }
+    [[nodiscard]] const std::vector<Comment>& comments() const noexcept { return m_comments; }
+
+    /// A line of the file as it stands there, without its end; empty where there is none.
+    [[nodiscard]] std::string_view source(unsigned line) const noexcept;
+
+private:
+    void splitSource();
+    void readLines();
+    [[nodiscard]] unsigned addComments(unsigned first, unsigned last);
+
+    std::string m_path;
+    std::string m_family;
+    std::vector<char> m_source; ///< vectors, since their texts stay where they are when they are moved
+    std::vector<char> m_joined; ///< the same bytes with continuations joined: what the lines' texts are
+    std::vector<std::size_t> m_starts; ///< of the lines in the source
+    std::vector<Line> m_lines;
+    std::vector<Comment> m_comments;
+};

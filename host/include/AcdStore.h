@@ -1,0 +1,67 @@
+#pragma once
+
+#include <cstddef>
+#include <map>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+/// Which databases there are, and what stands where in them.
+///
+/// The readers answer from one store a process. Where it looks is settled before the first reader: by
+/// `setSearchPath` or `setMemoryFiles`, else by the environment variable TARVIK_DATABASE (directories
+/// separated by ":"; ignored in a set-user-id process), else by the installed share/tarvik/database.
+/// What has been read lives as long as the process.
+class __attribute__((visibility("default"))) AcdStore {
+public:
+    /// Looks in these directories, the first one on top: where several hold a file, its keys replace or, with
+    /// `+=`, extend those of the layers below. Call it before the first reader.
+    static void setSearchPath(std::vector<std::string> directories);
+
+    /// Holds these files, name ("kestrel.acd") to text, in place of any directory. Call it before the first
+    /// reader.
+    static void setMemoryFiles(std::map<std::string, std::string> files);
+
+    /// The directories that are looked in, top first; empty for memory files.
+    [[nodiscard]] static std::vector<std::string> searchPath();
+
+    /// The family names, as their files spell them, in byte order of the file names; "base" and "spi" are
+    /// among them when they have a file.
+    [[nodiscard]] static std::vector<std::string> families();
+
+    /// The device names of a family, as its file spells them, in the order in which their sections open.
+    /// @throw DataNotFoundException when the family's file can't be read
+    [[nodiscard]] static std::vector<std::string> devices(const std::string& family);
+
+    /// Where a piece of a value was written. A value is one fragment, or several where lines are continued or
+    /// texts appended.
+    struct Fragment {
+        std::size_t offset;    ///< of its first byte in the value
+        std::string_view file; ///< the path, or the name of a memory file
+        unsigned line;         ///< counted from 1
+        unsigned column;       ///< counted from 1, in bytes
+    };
+
+    /// A value with its origin.
+    struct Value {
+        std::string_view text;
+        std::vector<Fragment> fragments; ///< in order; never empty
+        bool fromSection;                ///< false: one of the family's own keys
+
+        /// The fragment that byte `offset` of the text stands in, its column moved to that byte.
+        [[nodiscard]] Fragment at(std::size_t offset) const;
+    };
+
+    /// The value that an accessor opened by `name` gives for `key`; nothing when there is none. The texts
+    /// live as long as the process.
+    /// @throw DataNotFoundException when the family's file can't be read
+    [[nodiscard]] static std::optional<Value> value(const char* name, const char* key);
+
+private:
+    friend class TarvikTestPeer;
+
+    /// Forgets everything, the search path included, as if nothing had been asked yet. All readers and
+    /// accessors become invalid.
+    static void forget();
+};

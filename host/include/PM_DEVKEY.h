@@ -1,0 +1,75 @@
+#pragma once
+
+#include <cstddef>
+#include <string>
+#include <string_view>
+
+class PM_PIC;
+
+namespace acd {
+class Database;
+class Section;
+} // namespace acd
+
+/// Reads keyed values of one database: a device's accessor sees its family's keys behind its own.
+class __attribute__((visibility("default"))) PM_DEVKEY {
+public:
+    /// Opens the file called `file` (for example "spi.acd") on a configuration. The flags are passed through
+    /// unchanged and have no meaning to this library. No such file gives an empty database.
+    /// @throw DataNotFoundException when the file is there but can't be read
+    PM_DEVKEY(const char* file, const PM_PIC& configuration, unsigned char flag1, unsigned char flag2,
+              unsigned char flag3);
+
+    /// The accessor of one section of a database, or of the family's own keys when `section` is null. Both
+    /// must outlive the accessor.
+    PM_DEVKEY(const acd::Database& database, const acd::Section* section) noexcept;
+
+    PM_DEVKEY(const PM_DEVKEY&) = delete;
+    PM_DEVKEY& operator=(const PM_DEVKEY&) = delete;
+
+    /// Reads one item, or one field of an item.
+    ///
+    /// The key's value is split at `separator`; with a `subSeparator`, item `index` is split again and its
+    /// part `subIndex` is the result. n separators make n+1 pieces and nothing is trimmed; an empty value has
+    /// no items, an empty item has one empty field.
+    /// @param key matched exactly, case included
+    /// @param separator where items end; null or empty: the whole value is item 0
+    /// @param index counted from 0 to 32767; reading 0, 1, 2, ... in order costs time linear in the list
+    /// @param subSeparator where fields end; null: the whole item is the result
+    /// @param subIndex counted from 0 to 32767; not read without `subSeparator`
+    /// @return the text, valid until the next call on this accessor; null when the key, the item or the field
+    ///         does not exist
+    [[nodiscard]] const char* getstringbykey(const char* key, const char* separator, short index,
+                                             const char* subSeparator, short subIndex);
+
+private:
+    /// Where a walk over the pieces of a text stands.
+    struct Cursor {
+        std::size_t index = 0;
+        std::size_t position = 0; ///< of the piece's first byte
+        std::size_t end = 0;      ///< behind its last one
+
+        void start(std::string_view text, std::string_view separator) noexcept;
+        bool moveTo(std::size_t wanted, std::string_view text, std::string_view separator) noexcept;
+        void findEnd(std::string_view text, std::string_view separator) noexcept;
+        [[nodiscard]] std::string_view piece(std::string_view text) const noexcept {
+            return text.substr(position, end - position);
+        }
+    };
+
+    void select(std::string_view key, std::string_view separator);
+    bool moveToItem(std::size_t index) noexcept;
+
+    const acd::Database& m_database;
+    const acd::Section* m_section;
+
+    std::string m_key;
+    std::string m_separator;
+    std::string_view m_value;
+    Cursor m_item;
+
+    std::string m_subSeparator;
+    Cursor m_field;
+
+    std::string m_result;
+};

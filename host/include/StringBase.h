@@ -1,0 +1,87 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <string>
+#include <string_view>
+
+/// A byte string with length: the text type of every interface and container of the system.
+///
+/// Any byte may stand in it, NUL included; nothing is ever interpreted as a character encoding. Case is that
+/// of ASCII alone: bytes over 127 have none. A null text counts as the empty text wherever one is accepted.
+class __attribute__((visibility("default"))) StringBase {
+public:
+    /// What `GetIndexOfFirstChar` answers for an absent character: all bits set.
+    static constexpr std::size_t NOT_FOUND = static_cast<std::size_t>(-1);
+
+    StringBase() noexcept = default;
+
+    /// Copies a NUL-terminated text; null gives the empty text.
+    StringBase(const char* text) : m_text(text == nullptr ? "" : text) {}
+
+    /// Copies `length` bytes, NULs included. `bytes` may be null when `length` is 0.
+    StringBase(const char* bytes, std::size_t length) : m_text(std::string_view(bytes, length)) {}
+
+    StringBase& operator=(const char* text) {
+        m_text = text == nullptr ? "" : text;
+        return *this;
+    }
+    StringBase& operator+=(const char* text) {
+        m_text += text == nullptr ? "" : text;
+        return *this;
+    }
+    StringBase& operator+=(const StringBase& text) {
+        m_text += text.m_text;
+        return *this;
+    }
+
+    /// The bytes, NUL-terminated; valid until this object is changed or destroyed.
+    [[nodiscard]] const char* c_str() const noexcept { return m_text.c_str(); }
+
+    /// The number of bytes, without the terminator.
+    [[nodiscard]] std::size_t GetLength() const noexcept { return m_text.size(); }
+
+    /// Becomes a finished text: `%%` gives `%`, any other `%` stands as it is.
+    void Format(const char* text);
+
+    /// Becomes what printf would print. A null text formats as `(null)`. A template only so that overload
+    /// resolution prefers the finished text where there are no further arguments.
+    template <typename Formatted = void>
+    [[gnu::format(printf, 2, 3)]] void Format(const char* format, ...);
+
+    void MakeUpper() noexcept;
+    void MakeLower() noexcept;
+
+    /// The index of the first `wanted` at or behind `from`; `NOT_FOUND` when there is none.
+    [[nodiscard]] std::size_t GetIndexOfFirstChar(char wanted, std::size_t from = 0) const noexcept {
+        return m_text.find(wanted, from);
+    }
+
+    /// Keeps the first `length` bytes; a text that is no longer than that stays as it is.
+    void Truncate(std::size_t length) noexcept;
+
+    /// Byte order, as unsigned bytes, the shorter first on a tie: negative, 0 or positive.
+    [[nodiscard]] int Compare(const StringBase& other) const noexcept { return m_text.compare(other.m_text); }
+
+    /// As `Compare`, without regard to ASCII case.
+    [[nodiscard]] int ICompare(const StringBase& other) const noexcept;
+
+    /// The CRC-32 (the one of Ethernet and zip) of the bytes.
+    [[nodiscard]] std::uint32_t CRC32() const noexcept { return CRC32(m_text.data(), m_text.size()); }
+
+    /// The CRC-32 of `length` bytes, going on from `former`: the checksum of a text can be taken piece by
+    /// piece, without joining the pieces.
+    [[nodiscard]] static std::uint32_t CRC32(const char* bytes, std::size_t length,
+                                             std::uint32_t former = 0) noexcept;
+
+private:
+    std::string m_text;
+};
+
+/// Same length and same bytes.
+[[nodiscard]] inline bool operator==(const StringBase& left, const StringBase& right) noexcept {
+    return left.GetLength() == right.GetLength() && left.Compare(right) == 0;
+}
+[[nodiscard]] inline bool operator!=(const StringBase& left, const StringBase& right) noexcept {
+    return !(left == right);
+}

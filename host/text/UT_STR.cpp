@@ -1,0 +1,58 @@
+#include "UT_STR.h"
+
+#include "text/Ascii.h"
+
+#include <cstdint>
+#include <limits>
+#include <string_view>
+
+// Operations on NUL-terminated texts.
+
+namespace {
+
+std::string_view view(const char* text) noexcept {
+    return text == nullptr ? std::string_view() : std::string_view(text);
+}
+
+bool isBlank(char byte) noexcept { return byte == ' ' || (byte >= '\t' && byte <= '\r'); }
+
+bool isDigit(char byte) noexcept { return byte >= '0' && byte <= '9'; }
+
+} // namespace
+
+int UT_STR::Compare(const char* left, const char* right) noexcept { return view(left).compare(view(right)); }
+
+int UT_STR::ICompare(const char* left, const char* right) noexcept {
+    return ascii::compareIgnoringCase(view(left), view(right));
+}
+
+long UT_STR::AToL(const char* text) noexcept {
+    if (text == nullptr) {
+        return 0;
+    }
+    while (isBlank(*text)) {
+        ++text;
+    }
+    const bool isNegative = *text == '-';
+    if (*text == '-' || *text == '+') {
+        ++text;
+    }
+    // One past what a negative number can hold is enough to know that it saturates.
+    constexpr std::int64_t LIMIT = std::int64_t{1} << 31;
+    std::int64_t number = 0;
+    for (; isDigit(*text); ++text) {
+        if (number <= LIMIT) {
+            number = number * 10 + (*text - '0');
+        }
+    }
+    if (isNegative) {
+        return static_cast<long>(number > LIMIT ? -LIMIT : -number);
+    }
+    return static_cast<long>(number >= LIMIT ? LIMIT - 1 : number);
+}
+
+StringBase UT_STR::Upper(const char* text) {
+    StringBase result(text);
+    result.MakeUpper();
+    return result;
+}

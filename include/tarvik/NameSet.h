@@ -1,0 +1,40 @@
+#pragma once
+
+#include <tarvik/ltptstr.h>
+
+#include <algorithm>
+#include <cstddef>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+/// An ordered set of names that is filled at once and then only read: a sorted vector, so that the position
+/// of a name, which numbers the blocks of the permission tables, is a subtraction.
+class NameSet {
+public:
+    NameSet() = default;
+
+    /// Takes the names in any order; a name given twice counts once.
+    explicit NameSet(std::vector<StringBase> names) : m_names(std::move(names)) {
+        std::sort(m_names.begin(), m_names.end(), ltptstr());
+        m_names.erase(std::unique(m_names.begin(), m_names.end()), m_names.end());
+    }
+
+    [[nodiscard]] std::size_t size() const noexcept { return m_names.size(); }
+    [[nodiscard]] const StringBase& operator[](std::size_t position) const noexcept {
+        return m_names[position];
+    }
+    [[nodiscard]] auto begin() const noexcept { return m_names.begin(); }
+    [[nodiscard]] auto end() const noexcept { return m_names.end(); }
+
+    /// The position of a name in byte order; `size()` when it is not a member.
+    [[nodiscard]] std::size_t position(std::string_view name) const noexcept {
+        const auto found = std::lower_bound(m_names.begin(), m_names.end(), name, ltptstr());
+        const bool member = found != m_names.end() && ltptstr::view(*found) == name;
+        return member ? static_cast<std::size_t>(found - m_names.begin()) : size();
+    }
+    [[nodiscard]] bool contains(std::string_view name) const noexcept { return position(name) != size(); }
+
+private:
+    std::vector<StringBase> m_names;
+};

@@ -1,0 +1,13 @@
+#pragma once
+
+// The two families that the manager itself knows by name.
+
+namespace familyNames {
+
+/// The family of every device that nobody knows.
+inline constexpr const char* BASE = "base";
+
+/// The family of every SPI flash, and the name that answers in SPI mode.
+inline constexpr const char* SPI = "spi";
+
+} // namespace familyNames

@@ -1,0 +1,22 @@
+#pragma once
+
+// The classes of configuration flash, and the one search that lists of flashes are read with.
+
+#include <tarvik/ConstraintsManager.h>
+
+#include <UT_STR.h>
+
+#include <algorithm>
+#include <vector>
+
+/// A class of flash, the key of its device list, and the member that holds the list.
+struct ConstraintsManager::SpiClass {
+    const char* name;
+    const char* key;
+    std::vector<StringBase> ConstraintsManager::*devices;
+};
+
+[[nodiscard]] inline bool holdsIgnoringCase(const std::vector<StringBase>& devices, const char* device) {
+    return std::any_of(devices.begin(), devices.end(),
+                       [&](const StringBase& entry) { return UT_STR::ICompare(entry.c_str(), device) == 0; });
+}

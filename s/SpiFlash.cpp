@@ -1,0 +1,140 @@
+#include "FamilyNames.h"
+#include "Lists.h"
+#include "Reporting.h"
+#include "SpiClasses.h"
+#include "Text.h"
+
+#include <tarvik/ConstraintsManager.h>
+
+#include <PM_DEVKEY.h>
+#include <PicConfig.h>
+#include <UT_STR.h>
+
+#include <memory>
+
+// The SPI flash database: how the start-up reads it, and the questions about the flashes themselves.
+
+namespace {
+
+/// The accessor of the SPI database. It and its configuration live as long as the process, not as long as the
+/// manager; the list keeps them reachable.
+PM_DEVKEY* openSpiDatabase() {
+    struct SpiDatabase {
+        PicConfig configuration{"base", 1, static_cast<PM_PARTNAME_BINDING>(1)};
+        PM_DEVKEY accessor{"spi.acd", configuration, 1, 1, 1};
+    };
+    static auto& opened = *new std::vector<std::unique_ptr<SpiDatabase>>;
+    return &opened.emplace_back(std::make_unique<SpiDatabase>())->accessor;
+}
+
+StringBase upperCased(std::string_view name, std::string_view property) {
+    StringBase key(name.data(), name.size());
+    key += StringBase(property.data(), property.size());
+    key.MakeUpper();
+    return key;
+}
+
+} // namespace
+
+/// The classes of flash, in the order in which they are tested.
+const std::array<ConstraintsManager::SpiClass, 6>& ConstraintsManager::spiClasses() {
+    using M = ConstraintsManager;
+    static constexpr std::array<SpiClass, 6> CLASSES{{
+        {"AT1", "AT1_DEVICES", &M::m_at1Devices},
+        {"ST1", "ST1_DEVICES", &M::m_st1Devices},
+        {"ST2", "ST2_DEVICES", &M::m_st2Devices},
+        {"BPI1", "BPI1_DEVICES", &M::m_bpi1Devices},
+        {"BPI2", "BPI2_DEVICES", &M::m_bpi2Devices},
+        {"BPI3", "BPI3_DEVICES", &M::m_bpi3Devices},
+    }};
+    return CLASSES;
+}
+
+void ConstraintsManager::loadSpiCatalogue() {
+    PM_DEVKEY* const accessor = openSpiDatabase();
+    readSpiNames(accessor);
+    readMultibootDeviceLists(accessor);
+    readSpiProperties(accessor);
+
+    // The names are noted behind the parsers here, before them when a family is loaded on demand.
+    const unsigned index = familyIndex(familyNames::SPI);
+    parseOperationEntries(accessor, index, familyNames::SPI);
+    m_operationsLoaded.emplace_back(familyNames::SPI);
+    parseBsdlOperationEntries(accessor, index, familyNames::SPI);
+    parseProgramOptionEntries(accessor, familyNames::SPI);
+    m_programOptionsLoaded.emplace_back(familyNames::SPI);
+
+    readMultibootTypes(accessor);
+}
+
+void ConstraintsManager::readSpiNames(PM_DEVKEY* accessor) {
+    for (const StringBase& family : readList(*accessor, "DEVICE_FAMILY")) {
+        m_spiNames.push_back(family);
+        m_spiFamilies.push_back(family);
+        StringBase key = family;
+        key += "_DEVICES";
+        const std::vector<StringBase> devices = readList(*accessor, key.c_str());
+        if (!devices.empty()) {
+            // Deliberate: the first device of every family stands twice.
+            m_spiNames.push_back(devices.front());
+        }
+        m_spiNames.insert(m_spiNames.end(), devices.begin(), devices.end());
+    }
+}
+
+void ConstraintsManager::readMultibootDeviceLists(PM_DEVKEY* accessor) {
+    for (const SpiClass& flash : spiClasses()) {
+        this->*flash.devices = readList(*accessor, flash.key);
+    }
+}
+
+/// Keeps properties under the name as written; they are looked for in upper case.
+void ConstraintsManager::readSpiProperties(PM_DEVKEY* accessor) {
+    for (const StringBase& name : m_spiNames) {
+        StringBase key = UT_STR::Upper(name.c_str());
+        key += "_PROPERTY";
+        forEachRecord(*accessor, key.c_str(), [&](const Record& record, const StringBase& property) {
+            const char* const value = record.field(1);
+            if (value == nullptr) {
+                reporting::raiseIf<DataMismatchException>(m_exceptions,
+                                                          reporting::location::SPI_PROPERTY_WITHOUT_VALUE);
+            }
+            StringBase joined = name;
+            joined += property;
+            m_spiProperties[joined] = value;
+        });
+    }
+}
+
+bool ConstraintsManager::isSpiDevice(StringBase device) const {
+    device.MakeUpper();
+    return std::find(m_spiNames.begin(), m_spiNames.end(), device) != m_spiNames.end();
+}
+
+/// The class of a flash; empty when it has none. Of several classes the last one counts.
+StringBase ConstraintsManager::spiDeviceClass(const char* device) const {
+    StringBase result;
+    for (const SpiClass& flash : spiClasses()) {
+        if (holdsIgnoringCase(this->*flash.devices, device)) {
+            result = flash.name;
+        }
+    }
+    return result;
+}
+
+const char* ConstraintsManager::getSpiDeviceStringProperty(const char* device, const char* property) const {
+    auto found = m_spiProperties.find(upperCased(view(device), view(property)));
+    if (found == m_spiProperties.end()) {
+        const StringBase flashClass = spiDeviceClass(device);
+        found = m_spiProperties.find(upperCased(view(flashClass), view(property)));
+    }
+    return found == m_spiProperties.end() ? "" : found->second.c_str();
+}
+
+bool ConstraintsManager::getSpiDeviceBoolProperty(const char* device, const char* property) const {
+    return UT_STR::ICompare(getSpiDeviceStringProperty(device, property), "true") == 0;
+}
+
+long ConstraintsManager::getSpiDeviceLongProperty(const char* device, const char* property) const {
+    return UT_STR::AToL(getSpiDeviceStringProperty(device, property));
+}

@@ -1,0 +1,26 @@
+#pragma once
+
+// Texts as views, so that look-ups need no copy; and the cut that takes the package off a device name.
+
+#include <StringBase.h>
+
+#include <string_view>
+
+/// A null text is the empty text.
+[[nodiscard]] inline std::string_view view(const char* text) noexcept {
+    return text == nullptr ? std::string_view() : std::string_view(text);
+}
+
+[[nodiscard]] inline std::string_view view(const StringBase& text) noexcept {
+    return {text.c_str(), text.GetLength()};
+}
+
+/// What stands before the first "_": the device without its package.
+[[nodiscard]] inline std::string_view baseName(std::string_view device) noexcept {
+    return device.substr(0, device.find('_'));
+}
+
+[[nodiscard]] inline StringBase baseNameOf(std::string_view device) {
+    const std::string_view base = baseName(device);
+    return {base.data(), base.size()};
+}

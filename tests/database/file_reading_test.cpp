@@ -1,0 +1,126 @@
+#include "DatabaseFixtures.h"
+
+#include "database/FileReading.h"
+
+#include <cerrno>
+#include <cstring>
+#include <deque>
+
+#include <unistd.h>
+
+// What the system may do while a file is read: interrupt, hand out little, fail, or show another size than before.
+
+namespace {
+
+/// What the next calls of the system's read do: give so many bytes, or fail with an error when negative.
+std::deque<ssize_t>& script() {
+    static std::deque<ssize_t> steps;
+    return steps;
+}
+
+/// Reads for real, but no more than the script says; all there is once the script is over.
+ssize_t scriptedRead(int descriptor, void* buffer, std::size_t size) {
+    if (script().empty()) {
+        return ::read(descriptor, buffer, size);
+    }
+    const ssize_t step = script().front();
+    script().pop_front();
+    if (step < 0) {
+        errno = static_cast<int>(-step);
+        return -1;
+    }
+    return ::read(descriptor, buffer, std::min(size, static_cast<std::size_t>(step)));
+}
+
+/// A file without end; nothing is written, as nobody looks.
+ssize_t endlessRead(int, void*, std::size_t size) { return static_cast<ssize_t>(size); }
+
+std::string reasonOf(const std::function<void()>& action) {
+    try {
+        action();
+    } catch (const acd::Unreadable& unreadable) {
+        return unreadable.what();
+    }
+    return "none";
+}
+
+} // namespace
+
+class FileReading : public testing::Test {
+protected:
+    FileReading() { directory.write("file", "0123456789"); }
+
+    [[nodiscard]] std::string readAll(std::deque<ssize_t> steps) {
+        script() = std::move(steps);
+        acd::FileSource source(path, scriptedRead);
+        const acd::Text text = acd::readWhole(source);
+        return {text.bytes.get(), text.size};
+    }
+
+    TemporaryDirectory directory;
+    std::string path = directory.path("file");
+};
+
+TEST_F(FileReading, TakesShortReads) { EXPECT_EQ(readAll({1, 2, 3}), "0123456789"); }
+
+TEST_F(FileReading, GoesOnAfterInterruptions) {
+    EXPECT_EQ(readAll({-EINTR, 4, -EINTR, -EINTR, 4, -EINTR}), "0123456789");
+}
+
+TEST_F(FileReading, FailsWhenTheSystemFails) {
+    EXPECT_EQ(reasonOf([&] { (void)readAll({4, -EIO}); }), "Input/output error");
+}
+
+TEST_F(FileReading, ReadsNoMoreThanIsThereWhenTheFileShrinks) {
+    acd::FileSource source(path);
+    EXPECT_EQ(source.expectedSize(), 10U);
+    std::filesystem::resize_file(path, 3);
+    const acd::Text text = acd::readWhole(source);
+    EXPECT_EQ(std::string(text.bytes.get(), text.size), "012");
+}
+
+TEST_F(FileReading, ReadsAllWhenTheFileGrows) {
+    acd::FileSource source(path);
+    const std::string larger(100000, 'x');
+    directory.write("file", larger);
+    const acd::Text text = acd::readWhole(source);
+    EXPECT_EQ(std::string(text.bytes.get(), text.size), larger);
+}
+
+TEST_F(FileReading, ReadsAnEmptyFile) {
+    directory.write("file", "");
+    EXPECT_EQ(readAll({}), "");
+}
+
+TEST_F(FileReading, StopsWhenTheFileGrowsOverAGibibyte) {
+    acd::FileSource source(path, endlessRead);
+    char byte = 0;
+    EXPECT_EQ(source.read(&byte, acd::LARGEST_FILE), acd::LARGEST_FILE);
+    EXPECT_EQ(reasonOf([&] { (void)source.read(&byte, 1); }), "larger than 1 GiB");
+}
+
+TEST_F(FileReading, AcceptsAFileOfAGibibyte) {
+    std::filesystem::resize_file(path, acd::LARGEST_FILE);
+    EXPECT_EQ(acd::FileSource(path).expectedSize(), acd::LARGEST_FILE);
+}
+
+TEST_F(FileReading, RefusesAMissingFile) {
+    EXPECT_EQ(reasonOf([&] { const acd::FileSource source(path + "s"); }), "No such file or directory");
+}
+
+TEST_F(FileReading, ReadsMemoryPortionByPortion) {
+    acd::MemorySource source("abcde");
+    char buffer[3];
+    EXPECT_EQ(source.read(buffer, 3), 3U);
+    EXPECT_EQ(source.read(buffer, 3), 2U);
+    EXPECT_EQ(buffer[1], 'e');
+    EXPECT_EQ(source.read(buffer, 3), 0U);
+}
+
+TEST_F(FileReading, RefusesATextOverAGibibyte) {
+    const char byte = 0;
+    EXPECT_EQ(reasonOf([&] {
+                  const acd::MemorySource source({&byte, acd::LARGEST_FILE + 1});
+              }),
+              "larger than 1 GiB");
+}

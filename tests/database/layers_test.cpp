@@ -1,0 +1,163 @@
+#include "DatabaseFixtures.h"
+
+#include "database/Database.h"
+
+// Directories as layers: what stands on top replaces or extends what lies below.
+
+using std::nullopt;
+using testing::ElementsAre;
+using testing::IsEmpty;
+using testing::Optional;
+using namespace std::string_view_literals;
+
+class Layers : public DatabaseTest {
+protected:
+    void write(const std::string& name, std::string_view text) { directory.write(name, text); }
+
+    /// Searches the layers in this order, the first one on top.
+    void search(std::vector<std::string> layers) {
+        for (std::string& layer : layers) {
+            std::filesystem::create_directories(directory.path(layer));
+            layer = directory.path(layer);
+        }
+        AcdStore::setSearchPath(std::move(layers));
+    }
+
+    TemporaryDirectory directory;
+};
+
+TEST_F(Layers, KeysOnTopReplace) {
+    write("low/kestrel.acd", "A = a\nB = b\n");
+    write("top/kestrel.acd", "B = c\n");
+    search({"top", "low"});
+    EXPECT_THAT(valueOf("kestrel", "A"), Optional("a"sv));
+    EXPECT_THAT(valueOf("kestrel", "B"), Optional("c"sv));
+}
+
+TEST_F(Layers, AppendsOnTopExtend) {
+    write("low/base.acd", "DEVICE_SUPPORTED = kestrel\n");
+    write("middle/base.acd", "DEVICE_SUPPORTED += ,merlin\n");
+    write("top/base.acd", "DEVICE_SUPPORTED += ,osprey\n");
+    search({"top", "middle", "low"});
+    EXPECT_THAT(valueOf("base", "DEVICE_SUPPORTED"), Optional("kestrel,merlin,osprey"sv));
+}
+
+TEST_F(Layers, AnAppendToNothingBelowAssigns) {
+    write("low/base.acd", "A = a\n");
+    write("top/base.acd", "B += b\n");
+    search({"top", "low"});
+    EXPECT_THAT(valueOf("base", "B"), Optional("b"sv));
+}
+
+TEST_F(Layers, AnAppendWithoutAFileBelowAssigns) {
+    write("top/base.acd", "B += b\n");
+    search({"top", "low"});
+    EXPECT_THAT(valueOf("base", "B"), Optional("b"sv));
+}
+
+TEST_F(Layers, AnAssignmentOnTopUndoesAppendsBelow) {
+    write("low/base.acd", "A = a\nA += b\n");
+    write("top/base.acd", "A = c\nA += d\n");
+    search({"top", "low"});
+    EXPECT_THAT(valueOf("base", "A"), Optional("cd"sv));
+}
+
+TEST_F(Layers, MergeSectionBySection) {
+    write("low/kestrel.acd", "KEY = f\n[A]\nKEY = a\nX = x\n[B]\nKEY = b\n");
+    write("top/kestrel.acd", "[b]\nKEY += 2\n[C]\nKEY = c\n[a]\nX += y\n");
+    search({"top", "low"});
+    EXPECT_THAT(valueOf("A", "KEY"), Optional("a"sv));
+    EXPECT_THAT(valueOf("A", "X"), Optional("xy"sv));
+    EXPECT_THAT(valueOf("B", "KEY"), Optional("b2"sv));
+    EXPECT_THAT(valueOf("C", "KEY"), Optional("c"sv));
+    EXPECT_THAT(valueOf("kestrel", "KEY"), Optional("f"sv));
+    EXPECT_THAT(AcdStore::devices("kestrel"), ElementsAre("A", "B", "C"));
+}
+
+TEST_F(Layers, KeysBeforeTheFirstSectionOnTopAreTheFamilys) {
+    write("low/kestrel.acd", "[A]\nKEY = a\n");
+    write("top/kestrel.acd", "KEY = f\n");
+    search({"top", "low"});
+    EXPECT_THAT(valueOf("A", "KEY"), Optional("a"sv));
+    EXPECT_THAT(valueOf("kestrel", "KEY"), Optional("f"sv));
+}
+
+TEST_F(Layers, AnOverlayAddsAFamily) {
+    write("low/base.acd", "DEVICE_SUPPORTED = kestrel\n");
+    write("top/base.acd", "DEVICE_SUPPORTED += ,mine\n");
+    write("top/mine.acd", "KEY = m\n[M1]\n");
+    search({"top", "low"});
+    EXPECT_THAT(valueOf("base", "DEVICE_SUPPORTED"), Optional("kestrel,mine"sv));
+    EXPECT_THAT(valueOf("M1", "KEY"), Optional("m"sv));
+}
+
+TEST_F(Layers, AnOverlayAddsADevice) {
+    write("low/kestrel.acd", "KEY = f\n[A]\n");
+    write("top/kestrel.acd", "[B]\n");
+    search({"top", "low"});
+    EXPECT_THAT(familyOf("B"), Optional("kestrel"sv));
+    EXPECT_THAT(valueOf("B", "KEY"), Optional("f"sv));
+}
+
+TEST_F(Layers, AnOverlayDoesNotRenameAFamily) {
+    write("low/Kestrel.acd", "A = a\n");
+    write("top/KESTREL.ACD", "B = b\n");
+    search({"top", "low"});
+    EXPECT_THAT(AcdStore::families(), ElementsAre("Kestrel"));
+    EXPECT_THAT(valueOf("kestrel", "A"), Optional("a"sv));
+    EXPECT_THAT(valueOf("kestrel", "B"), Optional("b"sv));
+}
+
+TEST_F(Layers, AnOverlayDoesNotRenameADevice) {
+    write("low/kestrel.acd", "[Ks50]\n");
+    write("top/kestrel.acd", "[KS50]\n");
+    search({"top", "low"});
+    EXPECT_THAT(AcdStore::devices("kestrel"), ElementsAre("Ks50"));
+}
+
+TEST_F(Layers, FamiliesStandInByteOrderWhateverLayerTheyComeFrom) {
+    write("low/b.acd", "");
+    write("low/d.acd", "");
+    write("top/a.acd", "");
+    write("top/C.acd", "");
+    search({"top", "low"});
+    EXPECT_THAT(AcdStore::families(), ElementsAre("C", "a", "b", "d"));
+}
+
+TEST_F(Layers, AFaultOnTopNamesTheFileOnTop) {
+    write("low/kestrel.acd", "A = a\n");
+    write("top/kestrel.acd", "\nbroken\n");
+    search({"top", "low"});
+    EXPECT_THAT(valueOf("kestrel", "A"), Optional("a"sv));
+    EXPECT_THAT(messages.take(),
+                ElementsAre(info(2, directory.path("top/kestrel.acd") + ":2:1: no '=' in 'broken'\n")));
+}
+
+TEST_F(Layers, ABrokenHeaderOnTopDropsKeysOnTopOnly) {
+    write("low/kestrel.acd", "[A]\nKEY = a\n[B\n");
+    write("top/kestrel.acd", "KEY = f\n");
+    search({"top", "low"});
+    EXPECT_THAT(valueOf("kestrel", "KEY"), Optional("f"sv));
+}
+
+// Sizes
+
+TEST(LongestValues, AnAppendThatGrowsOverThemIsLeftOut) {
+    const auto layer = [](const char* path, const std::string& text) {
+        acd::MemorySource source(text);
+        return acd::LayerText{path, acd::readWhole(source)};
+    };
+    std::vector<acd::LayerText> layers;
+    layers.push_back(layer("low", "KEY = 1234\nKEY += 5678\n"));
+    layers.push_back(layer("top", "KEY += 9ab\nKEY += 9a\nOTHER = 12345678901\n"));
+    std::vector<acd::LayerFault> faults;
+    const acd::Database database(std::move(layers), faults, 10);
+
+    EXPECT_EQ(database.find(nullptr, "KEY")->text(), "123456789a");
+    EXPECT_EQ(database.fragments(*database.find(nullptr, "KEY")).size(), 3U);
+    EXPECT_EQ(database.find(nullptr, "OTHER")->text(), "12345678901");
+    ASSERT_EQ(faults.size(), 1U);
+    EXPECT_EQ(database.path(faults[0].layer), "top");
+    EXPECT_EQ(faults[0].fault.place, (acd::Place{1, 8}));
+    EXPECT_EQ(acd::describe(faults[0].fault), "the value would grow over 1 GiB by '9ab'");
+}

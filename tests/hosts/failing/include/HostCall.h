@@ -1,0 +1,5 @@
+#pragma once
+
+/// Stands before the in-memory host's header of this name: counts each call of the host, and raises at the one
+/// that is to fail.
+void hostCall(const char* service, const char* database = "", const char* key = "");

@@ -1,0 +1,84 @@
+// The lines of a file as the host layer shows them to tools.
+#include <AcdLines.h>
+#include <AcdStore.h>
+
+#include <gtest/gtest.h>
+
+#include <utility>
+
+using Kind = AcdLines::Kind;
+
+TEST(AcdLines, GiveHeadersAssignmentsAppendsAndFaultsInOrder) {
+    const AcdLines lines("A = 1\n[KS50]\nB += 2\nno sense\n");
+    ASSERT_EQ(lines.lines().size(), 4U);
+    EXPECT_EQ(lines.lines()[0].kind, Kind::ASSIGNMENT);
+    EXPECT_EQ(lines.lines()[1].kind, Kind::HEADER);
+    EXPECT_EQ(lines.lines()[1].name, "KS50");
+    EXPECT_EQ(lines.lines()[2].kind, Kind::APPEND);
+    EXPECT_EQ(lines.lines()[2].value, "2");
+    EXPECT_EQ(lines.lines()[3].fault, AcdLines::Fault::NO_EQUALS_SIGN);
+    EXPECT_EQ(lines.lines()[3].line, 4U);
+    EXPECT_EQ(lines.lines()[3].text, "no '=' in 'no sense'");
+}
+
+TEST(AcdLines, KnowWhichLinesOfTheFileALineIs) {
+    const AcdLines lines("\n# comment\nA = a,\\\n  b\n\nB = 1\n");
+    ASSERT_EQ(lines.lines().size(), 2U);
+    EXPECT_EQ(lines.lines()[0].firstLine, 3U);
+    EXPECT_EQ(lines.lines()[0].lastLine, 4U);
+    ASSERT_EQ(lines.lines()[0].fragments.size(), 2U);
+    EXPECT_EQ(lines.lines()[0].fragments[1].offset, 2U);
+    EXPECT_EQ(lines.lines()[0].fragments[1].line, 4U);
+    EXPECT_EQ(lines.lines()[0].fragments[1].column, 3U);
+    EXPECT_EQ(lines.lines()[1].firstLine, 6U);
+}
+
+TEST(AcdLines, CountALineThatGoesOnBeforeItHoldsAnything) {
+    const AcdLines lines("\\\n# A = 1\nB = 2\n");
+    ASSERT_EQ(lines.lines().size(), 2U);
+    EXPECT_EQ(lines.lines()[0].firstLine, 1U);
+    EXPECT_EQ(lines.lines()[0].lastLine, 2U);
+    EXPECT_TRUE(lines.comments().empty());
+}
+
+TEST(AcdLines, KeepComments) {
+    const AcdLines lines("A = 1\n  # one\r\n# two");
+    ASSERT_EQ(lines.comments().size(), 2U);
+    EXPECT_EQ(lines.comments()[0].line, 2U);
+    EXPECT_EQ(lines.comments()[0].column, 3U);
+    EXPECT_EQ(lines.comments()[0].text, "# one");
+    EXPECT_EQ(lines.comments()[1].text, "# two");
+}
+
+TEST(AcdLines, ShowTheSourceAsItStands) {
+    const AcdLines lines("\xEF\xBB\xBF"
+                         "A = a, \\\r\n   b\n\n");
+    EXPECT_EQ(lines.source(1), "A = a, \\");
+    EXPECT_EQ(lines.source(2), "   b");
+    EXPECT_EQ(lines.source(3), "");
+    EXPECT_EQ(lines.source(0), "");
+    EXPECT_EQ(lines.source(4), "");
+}
+
+TEST(AcdLines, OfAnEmptyTextAreNone) {
+    const AcdLines lines("");
+    EXPECT_TRUE(lines.lines().empty());
+    EXPECT_TRUE(lines.comments().empty());
+}
+
+TEST(AcdLines, KeepTheirTextsWhenTheyAreMoved) {
+    AcdLines first("A = 1\n");
+    const AcdLines second(std::move(first));
+    EXPECT_EQ(second.lines()[0].name, "A");
+    EXPECT_EQ(second.source(1), "A = 1");
+}
+
+TEST(AcdLines, OfTheDatabaseComeByFamily) {
+    AcdStore::setMemoryFiles(
+        {{"kestrel.acd", "[KS50]\n"}, {"base.acd", "A = 1\n"}, {"readme.txt", "no sense"}});
+    const std::vector<AcdLines> files = AcdLines::ofDatabase();
+    ASSERT_EQ(files.size(), 2U);
+    EXPECT_EQ(files[0].family(), "base");
+    EXPECT_EQ(files[0].path(), "base.acd");
+    EXPECT_EQ(files[1].lines()[0].name, "KS50");
+}

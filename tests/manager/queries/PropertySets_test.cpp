@@ -1,0 +1,179 @@
+// The values of a device's properties: getDeviceStringProperties and getDeviceBoolProperty.
+#include "QueryFixture.h"
+
+#include <gmock/gmock.h>
+
+namespace {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+// A database in which nothing fails to load: "fam1" with this text, and "base" for unknown devices.
+Files family(const std::string& text) {
+    return {
+        {"base.acd", "DEVICE_SUPPORTED = base,fam1,fam2,spi\nPROGRAM_OPTION_PACKAGE = base,fam1,fam2,spi\n"},
+        {"fam1.acd", text},
+        {"fam2.acd", "PROPERTY = ONLY2,second\n"}};
+}
+
+} // namespace
+
+TEST(PropertySets, ADevicesOwnValueHidesItsFamilys) {
+    ManagerOver manager(family("PROPERTY = K,theirs\n[dev1]\nPROPERTY = K,mine\n"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "K")), ElementsAre("mine"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("fam1", "K")), ElementsAre("theirs"));
+}
+
+TEST(PropertySets, WithoutAValueOfItsOwnTheFamilysCounts) {
+    ManagerOver manager(family("PROPERTY = K,theirs\n[dev1]\nPROPERTY = L,mine\n"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "K")), ElementsAre("theirs"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("fam1", "L")), IsEmpty());
+}
+
+TEST(PropertySets, ValuesAreInByteOrder) {
+    ManagerOver manager(family("[dev1]\nPROPERTIES = K,5,b,\xff,B,ab,a\n"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "K")),
+                ElementsAre("B", "a", "ab", "b", "\xff"));
+}
+
+TEST(PropertySets, NothingFoundIsTheSharedEmptySetAndSilent) {
+    ManagerOver manager(family("[dev1]\n"));
+    EXPECT_EQ(&manager->getDeviceStringProperties("dev1", "K"), &manager.peer().operationOptions());
+    EXPECT_EQ(&manager->getDeviceStringProperties("fam1", "K"), &manager.peer().operationOptions());
+    EXPECT_EQ(&manager->getDeviceStringProperties("nobody", "K"), &manager.peer().operationOptions());
+    EXPECT_TRUE(manager.peer().operationOptions().empty());
+    EXPECT_THAT(manager.messages(), IsEmpty());
+}
+
+TEST(PropertySets, KeysAreCaseSensitive) {
+    ManagerOver manager(family("[dev1]\nPROPERTY = K,v\n"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "k")), IsEmpty());
+}
+
+TEST(PropertySets, TheNameIsNeitherCutNorTurnedToAnotherCase) {
+    ManagerOver manager(family("[dev1]\nPROPERTY = K,v\n"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1_p", "K")), ElementsAre("v"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("DEV1", "K")), ElementsAre("v"));
+    EXPECT_THAT(textsOf(manager.peer().loadedFamilies()), ElementsAre("DEV1", "dev1_p", "fam1"));
+}
+
+TEST(PropertySets, TheWholeNameFindsItsOwnDevice) {
+    ManagerOver manager(family("[dev1]\nPROPERTY = K,v\n[dev1_p]\nPROPERTY = K,packaged\n"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1_p", "K")), ElementsAre("packaged"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1_q", "K")), ElementsAre("v"));
+}
+
+TEST(PropertySets, AnEmptyValueOfItsOwnHidesTheFamilys) {
+    ManagerOver manager(family("PROPERTY = K,theirs\n[dev1]\nPROPERTIES = K,0\n"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "K")), IsEmpty());
+    EXPECT_NE(&manager->getDeviceStringProperties("dev1", "K"), &manager.peer().operationOptions());
+}
+
+TEST(PropertySets, NullTextsAreEmptyTexts) {
+    ManagerOver manager(family("[dev1]\nPROPERTY = ,unnamed\n"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", nullptr)), ElementsAre("unnamed"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "")), ElementsAre("unnamed"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties(nullptr, "K")), IsEmpty());
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties(nullptr, nullptr)), IsEmpty());
+}
+
+TEST(PropertySets, DeviceAndKeyAreJoinedByAnUnderscore) {
+    ManagerOver manager(family("[dev1]\nPROPERTY = A_B,v\n"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "A_B")), ElementsAre("v"));
+    EXPECT_TRUE(manager.peer().deviceProperties().contains(StringBase("dev1_A_B")));
+}
+
+TEST(PropertySets, AnUnknownDeviceIsAnsweredFromTheBaseDatabase) {
+    auto files = family("");
+    files["base.acd"] += "PROPERTY = K,base value\n";
+    ManagerOver manager(files);
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("nobody", "K")), ElementsAre("base value"));
+}
+
+TEST(PropertySets, OnlyOneStepUpIsTaken) {
+    ManagerOver manager(family("[dev1]\n"));
+    manager->addCachedDeviceFamily("fam1", "fam2");
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("fam1", "ONLY2")), ElementsAre("second"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "ONLY2")), IsEmpty());
+}
+
+TEST(PropertySets, AFamilyThatTheCacheNamesIsLoaded) {
+    ManagerOver manager(family(""));
+    manager->addCachedDeviceFamily("nobody", "fam2");
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("nobody", "ONLY2")), ElementsAre("second"));
+    EXPECT_TRUE(holds(manager.peer().loadedFamilies(), "fam2"));
+}
+
+TEST(PropertySets, LoadingIsDecidedByTheLoadedProperties) {
+    ManagerOver manager(family("PROPERTY = K,v\n[dev1]\nPROPERTY = K,w\n"));
+    manager.peer().loadedFamilies().insert(StringBase("dev1"));
+    manager.peer().loadedFamilies().insert(StringBase("fam1"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "K")), IsEmpty());
+    EXPECT_TRUE(manager.peer().deviceProperties().empty());
+}
+
+TEST(PropertySets, AFailureToLoadPassesThroughAndIsNotTriedAgain) {
+    ManagerOver manager(family("[dev1]\nPROPERTY = GOOD,v:BROKEN\n"));
+    expectRaises<DataMismatchException>(
+        1011, [&] { return manager->getDeviceStringProperties("dev1", "GOOD").size(); });
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "GOOD")), ElementsAre("v"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "BROKEN")), IsEmpty());
+}
+
+TEST(PropertySets, ASeveralValuedPropertyCutShortIsRaised) {
+    ManagerOver manager(family("[dev1]\nPROPERTIES = K,2,only\n"));
+    expectRaises<DataMismatchException>(
+        1051, [&] { return manager->getDeviceStringProperties("dev1", "K").size(); });
+}
+
+TEST(PropertySets, MissingValuesAreEmptyTextsWhileExceptionsAreOff) {
+    ManagerOver manager(family("[dev1]\nPROPERTY = BROKEN\nPROPERTIES = K,2,only\n"));
+    manager->setExceptions(false);
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "BROKEN")), ElementsAre(""));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "K")), ElementsAre("", "only"));
+}
+
+TEST(PropertySets, AnSpiFlashIsLookedUpLikeAnyOtherName) {
+    auto files = family("");
+    files["spi.acd"] =
+        "DEVICE_FAMILY = AT\nAT_DEVICES = FLASH1\nFLASH1_PROPERTY = K,catalogue\nPROPERTY = K,table\n";
+    ManagerOver manager(files);
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("FLASH1", "K")), ElementsAre("table"));
+}
+
+TEST(BoolProperty, OnlyTheExactTextIsTrue) {
+    ManagerOver manager(family("[dev1]\nPROPERTIES = A,1,TRUE:B,1,true:C,1,True:D,1,TRUE :E,1,1:F,0:G,1,\n"));
+    EXPECT_TRUE(manager->getDeviceBoolProperty("dev1", "A"));
+    for (const char* key : {"B", "C", "D", "E", "F", "G"}) {
+        EXPECT_FALSE(manager->getDeviceBoolProperty("dev1", key)) << key;
+    }
+    EXPECT_THAT(manager.messages(), IsEmpty());
+}
+
+TEST(BoolProperty, AnyOfSeveralValuesMayBeTrue) {
+    ManagerOver manager(family("[dev1]\nPROPERTIES = K,3,FALSE,TRUE,zzz\n"));
+    EXPECT_TRUE(manager->getDeviceBoolProperty("dev1", "K"));
+}
+
+TEST(BoolProperty, AMissingPropertyIsSilentlyFalse) {
+    ManagerOver manager(family("[dev1]\n"));
+    EXPECT_FALSE(manager->getDeviceBoolProperty("dev1", "K"));
+    EXPECT_FALSE(manager->getDeviceBoolProperty("nobody", "K"));
+    EXPECT_FALSE(manager->getDeviceBoolProperty(nullptr, nullptr));
+    EXPECT_THAT(manager.messages(), IsEmpty());
+}
+
+TEST(BoolProperty, TheFamilysValueCountsOnlyWithoutOneOfItsOwn) {
+    ManagerOver manager(family("PROPERTY = K,TRUE\n[dev1]\n[dev2]\nPROPERTY = K,FALSE\n"));
+    EXPECT_TRUE(manager->getDeviceBoolProperty("dev1", "K"));
+    EXPECT_FALSE(manager->getDeviceBoolProperty("dev2", "K"));
+}
+
+TEST(BoolProperty, AnSpiFlashIsLookedUpInTheOrdinaryTable) {
+    auto files = family("");
+    files["spi.acd"] = "DEVICE_FAMILY = AT\nAT_DEVICES = FLASH1\nFLASH1_PROPERTY = CATALOGUE,TRUE\n"
+                       "PROPERTY = TABLE,TRUE\n";
+    ManagerOver manager(files);
+    EXPECT_FALSE(manager->getDeviceBoolProperty("FLASH1", "CATALOGUE"));
+    EXPECT_TRUE(manager->getDeviceBoolProperty("FLASH1", "TABLE"));
+}

@@ -1,0 +1,10 @@
+#pragma once
+
+#include "reference/Call.h"
+#include "reference/Picker.h"
+
+namespace reference {
+
+[[nodiscard]] Call makeCall(Picker& pick);
+
+} // namespace reference

@@ -1,0 +1,16 @@
+#pragma once
+
+#include "reference/Call.h"
+#include "reference/Picker.h"
+
+namespace reference {
+
+/// How random databases look.
+enum class Health {
+    SOUND,   ///< as a careful author writes them
+    DAMAGED, ///< unknown words, missing fields, malformed lines, missing files
+};
+
+[[nodiscard]] Files makeDatabases(Picker& pick, Health health);
+
+} // namespace reference

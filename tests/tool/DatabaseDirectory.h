@@ -1,0 +1,34 @@
+#pragma once
+
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <map>
+#include <stdexcept>
+#include <string>
+
+/// A database directory that lives as long as this object.
+class DatabaseDirectory {
+public:
+    using Files = std::map<std::string, std::string>; ///< name to text
+
+    explicit DatabaseDirectory(const Files& files = {}) {
+        std::string pattern = (std::filesystem::temp_directory_path() / "tarvik-tool-XXXXXX").string();
+        if (::mkdtemp(pattern.data()) == nullptr) {
+            throw std::runtime_error("can't make a directory for a test database");
+        }
+        m_path = pattern;
+        for (const auto& [name, text] : files) {
+            std::ofstream(m_path / name, std::ios::binary) << text;
+        }
+    }
+    ~DatabaseDirectory() { std::filesystem::remove_all(m_path); }
+    DatabaseDirectory(const DatabaseDirectory&) = delete;
+    DatabaseDirectory& operator=(const DatabaseDirectory&) = delete;
+
+    [[nodiscard]] std::string path() const { return m_path.string(); }
+    [[nodiscard]] std::string path(const std::string& name) const { return (m_path / name).string(); }
+
+private:
+    std::filesystem::path m_path;
+};

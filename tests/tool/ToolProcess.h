@@ -1,0 +1,57 @@
+#pragma once
+
+#include <map>
+#include <ostream>
+#include <string>
+#include <sys/types.h>
+#include <vector>
+
+/// How the tool is started.
+struct Start {
+    std::vector<std::string> arguments;
+    std::string input;
+    std::map<std::string, std::string>
+        environment;        ///< the TARVIK_ variables of the tests' own are not handed on
+    std::string outputPath; ///< where standard output goes in place of a pipe
+};
+
+/// What a run of the tool left behind.
+struct Outcome {
+    int status; ///< the exit status; 128 and more: ended by a signal
+    std::string output;
+    std::string error;
+};
+
+std::ostream& operator<<(std::ostream& out, const Outcome& outcome);
+
+/// Runs the tool to its end.
+[[nodiscard]] Outcome runTool(const Start& start);
+
+/// Runs the tool with just these arguments.
+[[nodiscard]] Outcome runTool(const std::vector<std::string>& arguments);
+
+/// A running tool that is talked to line by line. Waits for it at the end.
+class Conversation {
+public:
+    explicit Conversation(const Start& start);
+    ~Conversation();
+    Conversation(const Conversation&) = delete;
+    Conversation& operator=(const Conversation&) = delete;
+
+    void write(const std::string& text);
+
+    /// The next line of the answer, without its end; waits for it.
+    [[nodiscard]] std::string readLine();
+
+    void closeInput();
+    void closeOutput();
+
+    /// Waits for the tool's end. @return its exit status
+    [[nodiscard]] int wait();
+
+private:
+    pid_t m_process;
+    int m_input;
+    int m_output;
+    std::string m_read;
+};

@@ -1,0 +1,292 @@
+// What the steps of an explanation say: the record that decides, and the oddities on the way.
+#include "WhyFixtures.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+namespace {
+
+using namespace TARVIKNS;
+using testing::HasSubstr;
+using why::Question;
+using why::Verdict;
+using Kind = Question::Kind;
+
+Question about(Kind kind, const std::string& device) {
+    Question question;
+    question.kind = kind;
+    question.device = device;
+    return question;
+}
+
+Question programming(const std::string& device, MODE_TYPE mode, OUTPUT_TYPE output) {
+    Question question = about(Kind::OPERATION, device);
+    question.mode = mode;
+    question.output = output;
+    return question;
+}
+
+Files family(const std::string& keys, const std::string& base = "") {
+    return {{"base.acd", "DEVICE_SUPPORTED = fam\nPROGRAM_OPTION_PACKAGE = fam\n" + base},
+            {"fam.acd", keys + "\n[D1]\n"}};
+}
+
+std::string place(const why::Step& step) {
+    return step.place ? catalogue::asText(step.place->origin) + ": " + step.place->text : "nowhere";
+}
+
+TEST(WhySteps, TheDecidingRecordIsNamedWithItsPlace) {
+    const Databases databases(family("# first\nOPERATION = ERASE,Bscan,SVF:PROGRAM,Bscan,SVF,USB2"));
+    const why::Explanation found = explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
+    EXPECT_EQ(found.verdict, Verdict::YES);
+    EXPECT_EQ(place(stepAbout(found.steps, "record")), "fam.acd:2:29: PROGRAM,Bscan,SVF,USB2");
+    EXPECT_EQ(place(stepAbout(found.steps, "table")), "base.acd:1:20: fam");
+    EXPECT_EQ(stepAbout(found.steps, "family").text, "fam: section [D1] of fam.acd");
+}
+
+TEST(WhySteps, APackageIsTakenOffTheName) {
+    const Databases databases(family("OPERATION = PROGRAM,Bscan,USB2"));
+    const why::Explanation found = explained(programming("D1_PQ", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
+    EXPECT_EQ(stepAbout(found.steps, "name").text, "\"D1_PQ\" counts as \"D1\", without its package");
+}
+
+TEST(WhySteps, AnUnknownModeTextCountsAsBoundaryScan) {
+    const Databases databases(family("OPERATION = PROGRAM,Parallel,USB2"));
+    const why::Explanation found = explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
+    EXPECT_EQ(found.verdict, Verdict::YES);
+    EXPECT_EQ(stepAbout(found.steps, "note").text, "\"Parallel\" is no mode, and counts as Boundary Scan");
+}
+
+TEST(WhySteps, BoundaryScanByItsKeyIsNoOddity) {
+    const Databases databases(family("OPERATION = PROGRAM,BS,USB2"));
+    const why::Explanation found = explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
+    EXPECT_EQ(stepAbout(found.steps, "note").text, "");
+}
+
+TEST(WhySteps, PromFileFormatterAcceptsEveryOutput) {
+    const Databases databases(family(""));
+    Question question = about(Kind::OUTPUT, "");
+    question.mode = MODE_TYPE::PFF;
+    question.output = OUTPUT_TYPE::NULLCABLE;
+    const why::Explanation found = explained(question);
+    EXPECT_EQ(found.verdict, Verdict::YES);
+    EXPECT_THAT(stepAbout(found.steps, "rule").text, HasSubstr("accepts every output"));
+}
+
+TEST(WhySteps, AnOutputWithoutACellAllowsNothing) {
+    const Databases databases(family("OPERATION = PROGRAM,Bscan,EXPRESSSVF"));
+    const why::Explanation found = explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::EXPRESSSVF));
+    EXPECT_EQ(found.verdict, Verdict::NO);
+    EXPECT_THAT(stepAbout(found.steps, "rule").text, HasSubstr("EXPRESSSVF has none"));
+}
+
+TEST(WhySteps, AWordWithoutACellIsNotedBesideANo) {
+    const Databases databases(family("OPERATION = PROGRAM,Bscan,EXPRESSSVF,usb2"));
+    const why::Explanation found = explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
+    ASSERT_EQ(found.steps.size(), 5U);
+    EXPECT_EQ(found.steps[2].text, "the one record for PROGRAM does not allow it in mode BS through USB2");
+    EXPECT_EQ(found.steps[3].text, "EXPRESSSVF has no cell in the tables, so its word allows nothing");
+    EXPECT_EQ(found.steps[4].text, "\"usb2\" is no output, and allows nothing");
+    EXPECT_EQ(place(found.steps[4]), "fam.acd:1:38: usb2");
+}
+
+TEST(WhySteps, AnUnknownOutputWordCountsAsNone) {
+    const Databases databases(family("", "BS = outs,usb2:fams,fam\n"));
+    Question question = about(Kind::OUTPUT, "");
+    question.output = OUTPUT_TYPE::NONE;
+    const why::Explanation found = explained(question);
+    EXPECT_EQ(found.verdict, Verdict::YES);
+    EXPECT_EQ(place(stepAbout(found.steps, "record")), "base.acd:3:11: usb2");
+    EXPECT_THAT(stepAbout(found.steps, "note").text, HasSubstr("\"usb2\" is no output"));
+}
+
+TEST(WhySteps, TheExcludedPartIsNamed) {
+    const Databases databases(
+        family("", "SS = outs:fams,fam\nNOT_SUPPORTED_PART_IN_MODE = SM_D1_PQ,SS_D1_PQ\n"));
+    Question question = about(Kind::DEVICE, "D1");
+    question.mode = MODE_TYPE::SS;
+    question.package = "PQ";
+    const why::Explanation found = explained(question);
+    EXPECT_EQ(found.verdict, Verdict::NO);
+    EXPECT_EQ(place(stepAbout(found.steps, "record")), "base.acd:4:39: SS_D1_PQ");
+}
+
+TEST(WhySteps, AFamilyThatTheModeLacksIsToldWithThoseItHas) {
+    const Databases databases(family("", "SS = outs:fams,one,two\n"));
+    Question question = about(Kind::DEVICE, "D1");
+    question.mode = MODE_TYPE::SS;
+    const why::Explanation found = explained(question);
+    EXPECT_EQ(stepAbout(found.steps, "absent").text, "mode SS takes the families one, two, not fam");
+    EXPECT_EQ(place(stepAbout(found.steps, "absent")), "base.acd:3:11: fams,one,two");
+}
+
+TEST(WhySteps, ATableOfItsOwnIsNotFoundByANameWithPackage) {
+    Files files = family("");
+    files["base.acd"] = "DEVICE_SUPPORTED = D1,fam\n";
+    files["fam.acd"] = "[D1]\nOPERATION = PROGRAM,Bscan,USB2\n";
+    const Databases databases(std::move(files));
+    EXPECT_EQ(explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)).verdict, Verdict::YES);
+    const why::Explanation found = explained(programming("D1_PQ", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
+    EXPECT_EQ(found.verdict, Verdict::NO);
+    EXPECT_THAT(stepAbout(found.steps, "absent").text, HasSubstr("the whole name \"D1_PQ\""));
+}
+
+TEST(WhySteps, AnUnknownOptionIsAFault) {
+    const Databases databases(family("PROGRAM_OPTION = OTP,Bscan,USB2"));
+    Question question = about(Kind::OPTION, "D1");
+    const why::Explanation found = explained(question);
+    EXPECT_EQ(found.verdict, Verdict::FAULT);
+    EXPECT_EQ(place(stepAbout(found.steps, "fault")), "fam.acd:1:18: OTP");
+    EXPECT_EQ(why::ask(Databases::freshManager(), question), Verdict::FAULT);
+}
+
+TEST(WhySteps, AFlashGoesBeforeItsSection) {
+    Files files = family("");
+    files["spi.acd"] = "DEVICE_FAMILY = AT1\nAT1_DEVICES = D1\nAT1_PROPERTY = VENDOR,Orveth\n";
+    const Databases databases(std::move(files));
+    Question question = about(Kind::PROPERTY, "D1");
+    question.property = "VENDOR";
+    const why::Explanation found = explained(question);
+    EXPECT_EQ(found.verdict, Verdict::YES);
+    EXPECT_EQ(stepAbout(found.steps, "family").text,
+              "\"D1\" is listed as a flash: family spi, before what fam.acd says");
+    EXPECT_EQ(place(stepAbout(found.steps, "table")), "spi.acd:2:15: D1");
+    EXPECT_EQ(place(stepAbout(found.steps, "record")), "spi.acd:3:16: VENDOR,Orveth");
+}
+
+TEST(WhySteps, APropertyOfTheFamilyIsToldAsSuch) {
+    const Databases databases(family("PROPERTIES = COLOURS,2,red,blue"));
+    Question question = about(Kind::PROPERTY, "D1");
+    question.property = "COLOURS";
+    question.value = "green";
+    const why::Explanation found = explained(question);
+    EXPECT_EQ(stepAbout(found.steps, "absent").text, "COLOURS of the family is blue, red, not green");
+}
+
+TEST(WhyAlternatives, TheRecordsThatAllowItElsewhere) {
+    const Databases databases(family("OPERATION = PROGRAM,Bscan,PARALLEL,USB2:PROGRAM,SS,SVF"));
+    const std::vector<why::Step> steps =
+        why::alternatives(why::readStartUp(), programming("D1", MODE_TYPE::SM, OUTPUT_TYPE::USB2));
+    ASSERT_EQ(steps.size(), 2U);
+    EXPECT_EQ(steps[0].text, "yes in mode BS through PARALLEL, USB2");
+    EXPECT_EQ(place(steps[0]), "fam.acd:1:13: PROGRAM,Bscan,PARALLEL,USB2");
+    EXPECT_EQ(steps[1].text, "yes in mode SS through SVF");
+}
+
+TEST(WhyAlternatives, WhatElseIsAllowedThere) {
+    const Databases databases(family("OPERATION = VERIFY,Bscan,USB2:ERASE,Bscan,USB2"));
+    const std::vector<why::Step> steps =
+        why::alternatives(why::readStartUp(), programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
+    ASSERT_EQ(steps.size(), 1U);
+    EXPECT_EQ(steps[0].text, "allowed there: VERIFY, ERASE");
+}
+
+TEST(WhyAlternatives, DevicesOfTheFamilyThatDiffer) {
+    Files files = family("PROPERTY = A,1\n[D2]\nPROPERTY = A,2");
+    const Databases databases(std::move(files));
+    Question question = about(Kind::PROPERTY, "D1");
+    question.property = "A";
+    question.value = "2";
+    EXPECT_EQ(stepAbout(why::alternatives(why::readStartUp(), question), "differs").text,
+              "in family fam, yes for D2");
+}
+
+TEST(WhyAlternatives, ADeviceWithATableOfItsOwnDiffers) {
+    Files files;
+    files["base.acd"] = "DEVICE_SUPPORTED = D2,fam\n";
+    files["fam.acd"] = "[D1]\n[D2]\nOPERATION = PROGRAM,Bscan,USB2\n";
+    const Databases databases(std::move(files));
+    EXPECT_EQ(
+        stepAbout(why::alternatives(why::readStartUp(), programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)),
+                  "differs")
+            .text,
+        "in family fam, yes for D2");
+}
+
+TEST(WhyAlternatives, ThePackageThatHasTheOption) {
+    Files files;
+    files["base.acd"] = "DEVICE_SUPPORTED = fam\nPROGRAM_OPTION_PACKAGE = D1PQ,fam\n";
+    files["fam.acd"] = "[D1]\nPROGRAM_OPTION = VERIFY,Bscan,PARALLEL\n";
+    const Databases databases(std::move(files));
+    Question question = about(Kind::OPTION, "D1");
+    question.option = PROGRAM_OPTION::VERIFY;
+    question.package = "VS20";
+    EXPECT_EQ(explained(question).verdict, Verdict::NO);
+    EXPECT_EQ(stepAbout(why::alternatives(why::readStartUp(), question), "differs").text,
+              "yes in package PQ");
+}
+
+TEST(WhyAlternatives, TheFamilyItselfMayDiffer) {
+    Files files;
+    files["base.acd"] = "DEVICE_SUPPORTED = D1,fam\n";
+    files["fam.acd"] = "OPERATION = PROGRAM,Bscan,USB2\n[D1]\nOPERATION = ERASE,Bscan,USB2\n";
+    const Databases databases(std::move(files));
+    EXPECT_EQ(
+        stepAbout(why::alternatives(why::readStartUp(), programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)),
+                  "differs")
+            .text,
+        "in family fam, yes for the family itself");
+}
+
+TEST(WhyAlternatives, SpiModeAnswersWhateverTheDevice) {
+    Files files = family("");
+    files["base.acd"] = "DEVICE_SUPPORTED = fam,spi\n";
+    files["spi.acd"] = "OPERATION = PROGRAM,SPI,USB2\n";
+    const Databases databases(std::move(files));
+    EXPECT_EQ(
+        stepAbout(why::alternatives(why::readStartUp(), programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)),
+                  "instead")
+            .text,
+        "yes in mode SPI through USB2, whatever the device");
+}
+
+TEST(WhyAlternatives, TheKeyThatWasMeant) {
+    const Databases databases(family("PROPERTY = VENDOR,Korvel"));
+    Question question = about(Kind::PROPERTY, "D1");
+    question.property = "VENDER";
+    EXPECT_EQ(stepAbout(why::alternatives(why::readStartUp(), question), "instead").text,
+              "there is a property VENDOR");
+}
+
+TEST(WhyPresentation, StepsReadAsATableWithPlaces) {
+    const Databases databases(family("OPERATION = PROGRAM,Bscan,USB2"));
+    const Question question = programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2);
+    EXPECT_EQ(why::asText({question, Verdict::YES, explained(question)}),
+              "yes: PROGRAM of D1 in mode BS through USB2\n"
+              "  family    fam: section [D1] of fam.acd\n"
+              "  table     OPERATION of fam\n"
+              "            base.acd:1:20: fam\n"
+              "  record    PROGRAM is allowed in mode BS through USB2\n"
+              "            fam.acd:1:13: PROGRAM,Bscan,USB2\n");
+}
+
+TEST(WhyPresentation, LongTextsAreBrokenAndLongFragmentsCut) {
+    const Question question = programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2);
+    std::string words;
+    for (int number = 0; number < 30; ++number) {
+        words += "word ";
+    }
+    const std::string fragment = std::string(66, 'x') + "\xC3\xBC" + std::string(9, 'y');
+    why::Explanation explanation{
+        Verdict::NO, {{"absent", words + "end", why::Piece{fragment, {std::string(60, 'f'), 12, 3}}}}};
+    const std::string text = why::asText({question, Verdict::NO, explanation});
+    EXPECT_THAT(text, HasSubstr("\n            " + std::string(60, 'f') + ":12:3:\n            "));
+    EXPECT_THAT(text, HasSubstr("xxx...\n"));
+    EXPECT_THAT(text, testing::Not(HasSubstr("\xC3")));
+}
+
+TEST(WhyPresentation, JsonTellsPlacesAndWhetherTheStepsAgree) {
+    const Databases databases(family("OPERATION = PROGRAM,Bscan,USB2"));
+    const Question question = programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2);
+    const Json object = why::asJson({question, Verdict::NO, explained(question)});
+    EXPECT_EQ(object["allowed"], false);
+    EXPECT_EQ(object["agrees"], false);
+    EXPECT_EQ(object["steps"][2], (Json{{"topic", "record"},
+                                        {"text", "PROGRAM is allowed in mode BS through USB2"},
+                                        {"file", "fam.acd"},
+                                        {"line", 1},
+                                        {"column", 13},
+                                        {"fragment", "PROGRAM,Bscan,USB2"}}));
+}
+
+} // namespace
