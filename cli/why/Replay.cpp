@@ -20,7 +20,7 @@ constexpr const char* SPI = "spi";
 constexpr const char* BASE = "base";
 
 /// What the manager takes for an unknown operation: a row that no table has.
-constexpr int NO_ROW = 32;
+constexpr int NO_ROW = static_cast<int>(TARVIKNS::NO_OPERATION);
 
 int operationRow(const std::string& word) {
     const std::vector<std::string>& keys = vocabulary::operations();
