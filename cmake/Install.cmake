@@ -1,4 +1,5 @@
-# What `cmake --install` puts where, by component: runtime, development, tool, data, documentation.
+# What `cmake --install` puts where, by component: runtime, development, tool, data, documentation; and, only when asked
+# for by name, database.
 include(CMakePackageConfigHelpers)
 
 set(package_directory ${CMAKE_INSTALL_LIBDIR}/cmake/TarvikConstraintsManager)
@@ -36,6 +37,12 @@ if(TARGET tarvik)
   install(TARGETS tarvik RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT tool)
 endif()
 install(DIRECTORY database/ DESTINATION ${CMAKE_INSTALL_DATADIR}/tarvik/demonstration COMPONENT data)
-install(FILES README.md CHANGELOG.md DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT documentation)
-install(DIRECTORY docs/ DESTINATION ${CMAKE_INSTALL_DOCDIR}/docs COMPONENT documentation)
+
+# Makes the demonstration the database of the installed library, which never falls back to it by itself.
+file(CREATE_LINK demonstration ${CMAKE_CURRENT_BINARY_DIR}/installed-database SYMBOLIC)
+install(FILES ${CMAKE_CURRENT_BINARY_DIR}/installed-database RENAME database
+  DESTINATION ${CMAKE_INSTALL_DATADIR}/tarvik COMPONENT database EXCLUDE_FROM_ALL)
+
+install(FILES README.md CONTRIBUTING.md CHANGELOG.md DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT documentation)
+install(DIRECTORY docs DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT documentation PATTERN Doxyfile EXCLUDE)
 install(DIRECTORY examples DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT documentation)
