@@ -66,14 +66,6 @@ Text files that describe a dozen families of invented devices, and show by
 example how a device database is written. While this package is installed
 they are the database that libtarvik-constraints-manager finds by itself.")
 
-# Notes that every package carries.
-set(notes ${CMAKE_CURRENT_BINARY_DIR}/debian-notes)
-file(MAKE_DIRECTORY ${notes})
-execute_process(COMMAND gzip --best --no-name --stdout ${PROJECT_SOURCE_DIR}/cmake/debian/changelog
-  OUTPUT_FILE ${notes}/changelog.Debian.gz COMMAND_ERROR_IS_FATAL ANY)
-execute_process(COMMAND gzip --best --no-name --stdout ${PROJECT_SOURCE_DIR}/CHANGELOG.md
-  OUTPUT_FILE ${notes}/changelog.gz COMMAND_ERROR_IS_FATAL ANY)
-
 include(CPackComponent)
 set(CPACK_COMPONENTS_ALL)
 foreach(group library development tools database)
@@ -81,8 +73,11 @@ foreach(group library development tools database)
   string(TOUPPER ${group} upper_group)
   set(CPACK_DEBIAN_${upper_group}_PACKAGE_NAME ${package})
 
-  install(FILES cmake/debian/copyright ${notes}/changelog.Debian.gz ${notes}/changelog.gz
-    DESTINATION ${CMAKE_INSTALL_DATADIR}/doc/${package} COMPONENT ${group}-notes EXCLUDE_FROM_ALL)
+  # Notes that every package carries.
+  set(notes DESTINATION ${CMAKE_INSTALL_DATADIR}/doc/${package} COMPONENT ${group}-notes EXCLUDE_FROM_ALL)
+  install(FILES cmake/debian/copyright ${notes})
+  install(FILES cmake/debian/changelog RENAME changelog.Debian ${notes})
+  install(FILES CHANGELOG.md RENAME changelog ${notes})
   install(FILES cmake/debian/${group}.lintian-overrides RENAME ${package}
     DESTINATION ${CMAKE_INSTALL_DATADIR}/lintian/overrides COMPONENT ${group}-notes EXCLUDE_FROM_ALL)
 
