@@ -57,31 +57,37 @@ class Checker:
         self.environment = dict(os.environ, HOME=str(home), CXX=arguments.compiler, CXXFLAGS=arguments.flags,
                                 PATH=f"{self.folder}/build/demo/cli:{os.environ['PATH']}")
 
-    def run(self, command, **options):
+    def run(self, command):
         return subprocess.run(command, cwd=self.folder, env=self.environment, stdout=subprocess.PIPE,
-                              stderr=subprocess.STDOUT, text=True, timeout=100, check=False, **options)
+                              stderr=subprocess.STDOUT, text=True, check=False)
 
-    def compile(self, line, body):
-        is_program = "int main(" in body
-        number = f'#line {line} "{self.document}"\n'
-        if not is_program:
-            body = f'#include "{self.fragment}"\nvoid fragment() {{\n{number}{body}}}\n'
-        else:
-            body = number + body
-        source = self.folder / f"block{line}.cpp"
-        source.write_text(body, encoding="utf-8")
+    def compile(self, name, text, arguments):
+        source = self.folder / f"{name}.cpp"
+        source.write_text(text, encoding="utf-8")
         include = self.tree / "include"
-        command = [*self.compiler, "-std=c++17", *WARNINGS, f"-I{include}", f"-I{include}/tarvik/host", str(source)]
-        program = self.folder / f"block{line}"
-        if is_program:
-            command += ["-o", str(program), f"-L{self.libraries}", "-lTarvikConstraintsManager", "-lTarvikHost",
-                        f"-Wl,-rpath,{self.libraries}"]
-        else:
-            command += ["-fsyntax-only"]
-        for step in [command, [str(program)]] if is_program else [command]:
-            result = self.run(step)
-            if result.returncode != 0:
-                raise Failure(f"{shlex.join(step)}\nends with {result.returncode}:\n{result.stdout}")
+        self.expect_success([*self.compiler, "-std=c++17", *WARNINGS, f"-I{include}", f"-I{include}/tarvik/host",
+                             str(source), *arguments])
+
+    def located(self, line, body):
+        """Code for which the compiler names the document."""
+        return f'#line {line} "{self.document}"\n{body}'
+
+    def run_program(self, line, body):
+        program = self.folder / f"program{line}"
+        self.compile(program.name, self.located(line, body),
+                     ["-o", str(program), f"-L{self.libraries}", "-lTarvikConstraintsManager", "-lTarvikHost",
+                      f"-Wl,-rpath,{self.libraries}"])
+        self.expect_success([str(program)])
+
+    def compile_fragments(self, fragments):
+        functions = [f"void fragment{line}();\nvoid fragment{line}() {{\n{self.located(line, body)}}}\n"
+                     for line, body in fragments]
+        self.compile("fragments", f'#include "{self.fragment}"\n' + "".join(functions), ["-fsyntax-only"])
+
+    def expect_success(self, command):
+        result = self.run(command)
+        if result.returncode != 0:
+            raise Failure(f"{shlex.join(command)}\nends with {result.returncode}:\n{result.stdout}")
 
     def converse(self, line, body):
         for offset, command, expected in commands(body):
@@ -95,17 +101,21 @@ class Checker:
 
     def check(self):
         counts = {"cpp": 0, "console": 0}
+        fragments = []
         for language, line, body in blocks(self.document.read_text(encoding="utf-8")):
             if name := named_file(body):
                 file = self.folder / name
                 file.parent.mkdir(parents=True, exist_ok=True)
                 file.write_text(body, encoding="utf-8")
-            if language == "cpp":
-                self.compile(line, body)
+            if language == "cpp" and "int main(" in body:
+                self.run_program(line, body)
+            elif language == "cpp":
+                fragments.append((line, body))
             elif language == "console":
                 self.converse(line, body)
             if language in counts:
                 counts[language] += 1
+        self.compile_fragments(fragments)
         return counts
 
 
