@@ -35,6 +35,15 @@ install(FILES ${CMAKE_CURRENT_BINARY_DIR}/tarvik-constraints-manager.pc
 if(TARGET tarvik)
   set_target_properties(tarvik PROPERTIES INSTALL_RPATH "$ORIGIN/${libraries_from_tool}")
   install(TARGETS tarvik RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT tool)
+  install(FILES docs/tarvik.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1 COMPONENT tool)
+  install(DIRECTORY cli/schema DESTINATION ${CMAKE_INSTALL_DATADIR}/tarvik COMPONENT tool)
+  # Where each shell looks for completions by itself.
+  install(FILES cli/completion/tarvik.bash RENAME tarvik
+    DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions COMPONENT tool)
+  install(FILES cli/completion/_tarvik
+    DESTINATION ${CMAKE_INSTALL_DATADIR}/zsh/site-functions COMPONENT tool)
+  install(FILES cli/completion/tarvik.fish
+    DESTINATION ${CMAKE_INSTALL_DATADIR}/fish/vendor_completions.d COMPONENT tool)
 endif()
 install(DIRECTORY database/ DESTINATION ${CMAKE_INSTALL_DATADIR}/tarvik/demonstration COMPONENT data)
 

@@ -7,6 +7,7 @@
 #include "Json.h"
 #include "Multiboot.h"
 #include "Nearest.h"
+#include "Progress.h"
 #include "Properties.h"
 #include "Status.h"
 #include "Vocabulary.h"
@@ -244,9 +245,11 @@ Json readFacts(const Names& names) {
     general["families"] = Texts(families.begin(), families.end());
 
     const IdcodeFinder idcodes(answering);
+    Progress progress("asking " + AcdStore::searchPath().front());
     Json devices = Json::object();
     for (const auto& [name, family] : names.devices) {
         devices[name] = Interview(answering, name, idcodes).answers(names.packages.at(name));
+        progress.reach(devices.size(), names.devices.size());
     }
     return {{"general", general}, {"devices", devices}};
 }

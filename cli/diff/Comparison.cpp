@@ -93,25 +93,27 @@ void addGroups(std::vector<Group>& groups, const std::string& family,
     groups.insert(groups.end(), added.begin(), added.end());
 }
 
-std::string asText(const Change& change) {
+std::string asText(const Change& change, const Terminal& terminal) {
     std::string text = "  " + change.question + ':';
     for (const std::string& lost : change.lost) {
-        text += " -" + lost;
+        text += ' ' + terminal.bad('-' + terminal.shown(lost));
     }
     for (const std::string& gained : change.gained) {
-        text += " +" + gained;
+        text += ' ' + terminal.good('+' + terminal.shown(gained));
     }
     return text + '\n';
 }
 
-std::string heading(const Group& group) {
+std::string heading(const Group& group, const Terminal& terminal) {
     if (group.isWhole) {
-        return fmt::format("{} (all {} devices)\n", group.family, group.devices.size());
+        return terminal.heading(fmt::format("{} (all {} devices)", group.family, group.devices.size())) +
+               '\n';
     }
     if (group.devices.size() == 1) {
-        return fmt::format("{} ({})\n", group.devices.front(), group.family);
+        return terminal.heading(fmt::format("{} ({})", group.devices.front(), group.family)) + '\n';
     }
-    return fmt::format("{} ({} devices)\n{}", group.family, group.devices.size(), wrapped(group.devices, 4));
+    return terminal.heading(fmt::format("{} ({} devices)", group.family, group.devices.size())) + '\n' +
+           wrapped(group.devices, 4, terminal.width());
 }
 
 Json asJson(const Change& change) {
@@ -171,25 +173,25 @@ Comparison compare(const Names& oldNames, const Names& newNames, const Facts& ol
     return comparison;
 }
 
-std::string asText(const Comparison& comparison) {
+std::string asText(const Comparison& comparison, const Terminal& terminal) {
     std::string text;
-    const auto addNames = [&text](const char* title, const std::vector<std::string>& names) {
+    const auto addNames = [&](const char* title, const std::vector<std::string>& names) {
         if (!names.empty()) {
-            text += fmt::format("{}\n{}", title, wrapped(names, 2));
+            text += terminal.heading(title) + '\n' + wrapped(names, 2, terminal.width());
         }
     };
     addNames("only in the old database", comparison.onlyInOld);
     addNames("only in the new database", comparison.onlyInNew);
     if (!comparison.general.empty()) {
-        text += "for all devices\n";
+        text += terminal.heading("for all devices") + '\n';
     }
     for (const Change& change : comparison.general) {
-        text += asText(change);
+        text += asText(change, terminal);
     }
     for (const Group& group : comparison.groups) {
-        text += heading(group);
+        text += heading(group, terminal);
         for (const Change& change : group.changes) {
-            text += asText(change);
+            text += asText(change, terminal);
         }
     }
     return text;

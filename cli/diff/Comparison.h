@@ -1,6 +1,7 @@
 #pragma once
 
 #include "Json.h"
+#include "Terminal.h"
 #include "diff/Answers.h"
 
 #include <cstddef>
@@ -43,7 +44,7 @@ struct Comparison {
 [[nodiscard]] Comparison compare(const Names& oldNames, const Names& newNames, const Facts& oldFacts,
                                  const Facts& newFacts);
 
-[[nodiscard]] std::string asText(const Comparison& comparison);
+[[nodiscard]] std::string asText(const Comparison& comparison, const Terminal& terminal);
 [[nodiscard]] Json asJson(const Comparison& comparison);
 
 } // namespace diff

@@ -39,8 +39,8 @@ bool hasUnknownOption(const std::string& name, bool sectionOnly) {
 
 class Census {
 public:
-    Census(ConstraintsManager& manager, Question question, const Asking& ask)
-        : m_manager(manager), m_question(std::move(question)), m_ask(ask),
+    Census(ConstraintsManager& manager, Question question, const Asking& ask, const Counting& count)
+        : m_manager(manager), m_question(std::move(question)), m_ask(ask), m_count(count),
           m_supported(set(catalogue::list("base.acd", "DEVICE_SUPPORTED"))),
           m_flashes(set(catalogue::list("spi.acd", "DEVICE_FAMILY"))) {
         for (const catalogue::Flash& flash : catalogue::flashes()) {
@@ -143,6 +143,9 @@ private:
     }
 
     void answer(const Member& member) {
+        if (m_count) {
+            m_count(m_answered++, m_members.size());
+        }
         Entry& entry = m_entries[member.position];
         if (!member.group.empty()) {
             const auto [known, isNew] = m_groups.emplace(member.group, member.position);
@@ -158,6 +161,8 @@ private:
     ConstraintsManager& m_manager;
     Question m_question;
     const Asking& m_ask;
+    const Counting& m_count;
+    std::size_t m_answered = 0;
     Set m_supported;
     Set m_flashes;   ///< as listed, families of flashes too
     Set m_entangled; ///< names of files, and of devices that stand in files without a family, in lower case
@@ -169,8 +174,9 @@ private:
 
 } // namespace
 
-std::vector<Entry> askForAll(ConstraintsManager& manager, Question question, const Asking& ask) {
-    return Census(manager, std::move(question), ask).take();
+std::vector<Entry> askForAll(ConstraintsManager& manager, Question question, const Asking& ask,
+                             const Counting& count) {
+    return Census(manager, std::move(question), ask, count).take();
 }
 
 } // namespace why
