@@ -44,10 +44,10 @@ std::string clipped(const std::string& text, std::size_t room) {
     return text.substr(0, end) + "...";
 }
 
-/// "file:line:column: fragment", the fragment on a line of its own where the path leaves no room.
-std::string placeText(const Piece& place) {
+/// "file:line:column: fragment" behind a lead, the fragment on a line of its own where the path leaves no room.
+std::string placeText(const char* lead, const Piece& place) {
     const std::string indent(INDENT, ' ');
-    const std::string origin = indent + catalogue::asText(place.origin) + ':';
+    const std::string origin = indent + lead + catalogue::asText(place.origin) + ':';
     const std::size_t needed = std::min(place.text.size(), LEAST_FRAGMENT);
     if (origin.size() + 1 + needed > LINE_WIDTH) {
         return origin + '\n' + indent + clipped(place.text, LINE_WIDTH - INDENT) + '\n';
@@ -74,7 +74,10 @@ std::string asText(const Answer& answer) {
     for (const Step& step : answer.explanation.steps) {
         text += wrappedText(fmt::format("  {:<10}", step.topic), step.text);
         if (step.place) {
-            text += placeText(*step.place);
+            text += placeText("", *step.place);
+            for (const catalogue::Shadow& shadow : step.place->shadows) {
+                text += placeText("shadows ", {shadow.text, shadow.origin});
+            }
         }
     }
     return text;
@@ -87,6 +90,9 @@ Json asJson(const Answer& answer) {
         if (step.place) {
             object.update(catalogue::asJson(step.place->origin));
             object["fragment"] = step.place->text;
+            if (!step.place->shadows.empty()) {
+                object["shadows"] = catalogue::asJson(step.place->shadows);
+            }
         }
         steps.push_back(std::move(object));
     }

@@ -78,6 +78,10 @@ public:
     [[nodiscard]] const std::string& path() const noexcept { return m_path; }
     [[nodiscard]] const std::string& family() const noexcept { return m_family; }
 
+    /// The paths of files of the same directory whose names differ from this one's in case alone: nothing is ever
+    /// read from them.
+    [[nodiscard]] const std::vector<std::string>& namesakes() const noexcept { return m_namesakes; }
+
     /// The lines, and the comments, in the order of the file. Their texts live as long as this object,
     /// wherever it is moved.
     [[nodiscard]] const std::vector<Line>& lines() const noexcept { return m_lines; }
@@ -93,6 +97,7 @@ private:
 
     std::string m_path;
     std::string m_family;
+    std::vector<std::string> m_namesakes;
     std::vector<char> m_source; ///< vectors, since their texts stay where they are when they are moved
     std::vector<char> m_joined; ///< the same bytes with continuations joined: what the lines' texts are
     std::vector<std::size_t> m_starts; ///< of the lines in the source
