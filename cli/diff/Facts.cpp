@@ -1,0 +1,82 @@
+// A manager can't be made twice, so each database is asked in a process of its own.
+#include "diff/Facts.h"
+
+#include "Database.h"
+#include "Status.h"
+#include "diff/Interview.h"
+#include "diff/Wire.h"
+#include "why/Apart.h"
+
+#include <Port_MsgManData.h>
+#include <TarvikException.h>
+#include <tarvik/ConstraintsManager.h>
+
+namespace diff {
+
+namespace {
+
+// What the bytes from the other process are.
+constexpr char FACTS = 'f';
+constexpr char FAULT = 'x';
+
+ConstraintsManager& manager() {
+    ConstraintsManager* const made = ConstraintsManager::getConstraintsManager();
+    if (made == nullptr) {
+        throw std::bad_alloc();
+    }
+    made->setExceptions(false);
+    return *made;
+}
+
+std::string work(const std::vector<std::string>& layers) {
+    std::string said;
+    Port_MsgManData::setSink([&said](const Port_MsgManData::Message& message) {
+        if (message.channel == Port_MsgManData::Channel::INFO) {
+            said += message.text;
+        }
+    });
+    try {
+        openDatabase(layers);
+        return FACTS + packed(Interview(manager()).facts());
+    } catch (const Failure& failure) {
+        return FAULT + said + failure.what();
+    } catch (const TarvikException& fault) {
+        return FAULT + said + "the database can't be read: " + fault.what();
+    }
+}
+
+Facts result(why::Apart& apart) {
+    const std::string bytes = apart.result();
+    const std::string_view rest = std::string_view(bytes).substr(1);
+    if (bytes.front() == FAULT) {
+        throw Failure(Status::FAULT, std::string(rest));
+    }
+    return unpackedFacts(rest);
+}
+
+} // namespace
+
+const Texts& Facts::answer(const Answers& own, const std::vector<std::size_t>& commonOnes,
+                           const Question& question) const {
+    static const Texts none;
+    if (const auto found = own.find(question); found != own.end()) {
+        return found->second;
+    }
+    for (const std::size_t index : commonOnes) {
+        const Answers& answers = shared[index];
+        if (const auto found = answers.find(question); found != answers.end()) {
+            return found->second;
+        }
+    }
+    return none;
+}
+
+std::pair<Facts, Facts> factsOf(const std::vector<std::string>& oldLayers,
+                                const std::vector<std::string>& newLayers) {
+    why::Apart oldWork([&] { return work(oldLayers); });
+    why::Apart newWork([&] { return work(newLayers); });
+    Facts oldFacts = result(oldWork);
+    return {std::move(oldFacts), result(newWork)};
+}
+
+} // namespace diff
