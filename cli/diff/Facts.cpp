@@ -15,7 +15,7 @@ namespace diff {
 
 namespace {
 
-// What the bytes from the other process are.
+// What the bytes from the other process are: the last one tells.
 constexpr char FACTS = 'f';
 constexpr char FAULT = 'x';
 
@@ -37,18 +37,18 @@ std::string work(const std::vector<std::string>& layers) {
     });
     try {
         openDatabase(layers);
-        return FACTS + packed(Interview(manager()).facts());
+        return packed(Interview(manager()).facts()) + FACTS;
     } catch (const Failure& failure) {
-        return FAULT + said + failure.what();
+        return said + failure.what() + FAULT;
     } catch (const TarvikException& fault) {
-        return FAULT + said + "the database can't be read: " + fault.what();
+        return said + "the database can't be read: " + fault.what() + FAULT;
     }
 }
 
 Facts result(why::Apart& apart) {
     const std::string bytes = apart.result();
-    const std::string_view rest = std::string_view(bytes).substr(1);
-    if (bytes.front() == FAULT) {
+    const std::string_view rest = std::string_view(bytes).substr(0, bytes.size() - 1);
+    if (bytes.back() == FAULT) {
         throw Failure(Status::FAULT, std::string(rest));
     }
     return unpackedFacts(rest);
