@@ -66,7 +66,7 @@ Properties deviceProperties(ConstraintsManager& manager, const std::string& devi
     all.merge(propertyEntries(plain(manager.getPartFamily(device.c_str()))));
     Properties properties;
     for (const auto& [key, entry] : all) {
-        Property property{key, {}, entry.ofDevice ? "device" : "family", entry.origin};
+        Property property{key, {}, entry.ofDevice ? "device" : "family", entry.origin, entry.shadows};
         for (const StringBase& value : manager.getDeviceStringProperties(device.c_str(), key.c_str())) {
             property.values.push_back(plain(value));
         }
@@ -78,8 +78,11 @@ Properties deviceProperties(ConstraintsManager& manager, const std::string& devi
 Properties flashProperties(const ConstraintsManager& manager, const std::string& device) {
     Properties properties;
     const auto add = [&](const std::string& key, const std::string& from, const catalogue::Entry& entry) {
-        properties.push_back(
-            {key, {manager.getSpiDeviceStringProperty(device.c_str(), key.c_str())}, from, entry.origin});
+        properties.push_back({key,
+                              {manager.getSpiDeviceStringProperty(device.c_str(), key.c_str())},
+                              from,
+                              entry.origin,
+                              entry.shadows});
     };
     const Entries own = flashEntries(device);
     for (const auto& [key, entry] : own) {
@@ -105,6 +108,9 @@ std::string asText(const Properties& properties, const Terminal& terminal, std::
         for (std::size_t i = 1; i < values.size(); ++i) {
             table.add({"", values[i]});
         }
+        for (const catalogue::Shadow& shadow : property.shadows) {
+            table.add({"", shadow.text, "shadowed", catalogue::asText(shadow.origin)});
+        }
     }
     return table.text(terminal, indent);
 }
@@ -114,6 +120,9 @@ Json asJson(const Properties& properties) {
     for (const Property& property : properties) {
         Json object{{"key", property.key}, {"values", property.values}, {"from", property.from}};
         object.update(catalogue::asJson(property.origin));
+        if (!property.shadows.empty()) {
+            object["shadows"] = catalogue::asJson(property.shadows);
+        }
         list.push_back(std::move(object));
     }
     return list;

@@ -15,6 +15,7 @@ struct Property {
     std::vector<std::string> values; ///< in byte order
     std::string from;                ///< "device", "family", or the class of an SPI flash
     catalogue::Origin origin;
+    catalogue::Shadows shadows;
 };
 
 using Properties = std::vector<Property>;

@@ -12,11 +12,17 @@ constexpr std::size_t GAP = 2;
 /// Narrower than this, broken words are harder to read than lines that are too long.
 constexpr std::size_t LEAST_WIDTH = 10;
 
-/// The number of characters, taking the text as UTF-8: bytes that continue a character are no column.
+/// The number of characters, taking the text as UTF-8: bytes that continue a character are no column, nor are the
+/// marks for colours.
 std::size_t width(std::string_view text) {
-    return static_cast<std::size_t>(std::count_if(text.begin(), text.end(), [](char byte) {
-        return (static_cast<unsigned char>(byte) & 0xC0U) != 0x80U;
-    }));
+    std::size_t columns = 0;
+    bool isMark = false;
+    for (const char byte : text) {
+        isMark = isMark || byte == '\033';
+        columns += !isMark && (static_cast<unsigned char>(byte) & 0xC0U) != 0x80U ? 1 : 0;
+        isMark = isMark && byte != 'm';
+    }
+    return columns;
 }
 
 void dropTrailingBlanks(std::string& text) { text.resize(text.find_last_not_of(' ') + 1); }

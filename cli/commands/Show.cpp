@@ -105,6 +105,9 @@ std::string heading(const DeviceSheet& sheet, const Terminal& terminal) {
     table.add({"Family", sheet.flash ? sheet.family + " (a flash)" : sheet.family});
     if (sheet.idcode) {
         table.add({"IDCODE", sheet.idcode->value + "  " + catalogue::asText(sheet.idcode->origin)});
+        for (const catalogue::Shadow& shadow : sheet.idcode->shadows) {
+            table.add({"", fmt::format("shadows {}: {}", catalogue::asText(shadow.origin), shadow.text)});
+        }
     }
     table.add({"Modes", fmt::format("{}", fmt::join(sheet.modes, " "))});
     return table.text(terminal);
@@ -158,6 +161,9 @@ Json bsdlJson(const std::vector<DeviceSheet::Row>& rows) {
 Json asJson(const DeviceSheet::Idcode& idcode) {
     Json object{{"value", idcode.value}};
     object.update(catalogue::asJson(idcode.origin));
+    if (!idcode.shadows.empty()) {
+        object["shadows"] = catalogue::asJson(idcode.shadows);
+    }
     return object;
 }
 

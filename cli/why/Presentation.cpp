@@ -37,11 +37,11 @@ std::string clipped(const std::string& text, std::size_t room) {
     return text.substr(0, end) + "...";
 }
 
-/// "file:line:column: fragment", the fragment on a line of its own where the path leaves no room.
-std::string placeText(const Piece& place, const Terminal& terminal) {
+/// "file:line:column: fragment" behind a lead, the fragment on a line of its own where the path leaves no room.
+std::string placeText(const char* lead, const Piece& place, const Terminal& terminal) {
     const std::size_t room = std::max(terminal.width(), LEAST_WIDTH) - INDENT;
     const std::string indent(INDENT, ' ');
-    const std::string origin = catalogue::asText(place.origin) + ':';
+    const std::string origin = lead + catalogue::asText(place.origin) + ':';
     const std::size_t needed = std::min(place.text.size(), LEAST_FRAGMENT);
     const bool fits = origin.size() + 1 + needed <= room;
     return indent + terminal.aside(origin) + (fits ? " " : '\n' + indent) +
@@ -68,7 +68,10 @@ std::string asText(const Answer& answer, const Terminal& terminal) {
     for (const Step& step : answer.explanation.steps) {
         text += stepText(step, terminal);
         if (step.place) {
-            text += placeText(*step.place, terminal);
+            text += placeText("", *step.place, terminal);
+            for (const catalogue::Shadow& shadow : step.place->shadows) {
+                text += placeText("shadows ", {shadow.text, shadow.origin}, terminal);
+            }
         }
     }
     return text;
@@ -81,6 +84,9 @@ Json asJson(const Answer& answer) {
         if (step.place) {
             object.update(catalogue::asJson(step.place->origin));
             object["fragment"] = step.place->text;
+            if (!step.place->shadows.empty()) {
+                object["shadows"] = catalogue::asJson(step.place->shadows);
+            }
         }
         steps.push_back(std::move(object));
     }

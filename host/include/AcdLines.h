@@ -88,6 +88,10 @@ public:
     /// @return the name of its family, as the readers spell it
     [[nodiscard]] const std::string& family() const noexcept { return m_family; }
 
+    /// Files that are never read.
+    /// @return the paths of files of the same directory whose names differ from this one's in case alone
+    [[nodiscard]] const std::vector<std::string>& namesakes() const noexcept { return m_namesakes; }
+
     /// @return the lines in the order of the file; their texts live as long as this object, wherever it is moved
     [[nodiscard]] const std::vector<Line>& lines() const noexcept { return m_lines; }
     /// @return the comments, likewise
@@ -105,6 +109,7 @@ private:
 
     std::string m_path;
     std::string m_family;
+    std::vector<std::string> m_namesakes;
     std::vector<char> m_source; ///< vectors, since their texts stay where they are when they are moved
     std::vector<char> m_joined; ///< the same bytes with continuations joined: what the lines' texts are
     std::vector<std::size_t> m_starts; ///< of the lines in the source

@@ -41,10 +41,11 @@ public:
     /// Where a piece of a value was written. A value is one fragment, or several where lines are continued or
     /// texts appended.
     struct Fragment {
-        std::size_t offset;    ///< of its first byte in the value
-        std::string_view file; ///< the path, or the name of a memory file
-        unsigned line;         ///< counted from 1
-        unsigned column;       ///< counted from 1, in bytes
+        std::size_t offset;     ///< of its first byte in the value
+        std::string_view file;  ///< the path, or the name of a memory file
+        std::string_view layer; ///< the directory of the search path; empty for a memory file
+        unsigned line;          ///< counted from 1
+        unsigned column;        ///< counted from 1, in bytes
     };
 
     /// A value with its origin.
@@ -52,6 +53,10 @@ public:
         std::string_view text;           ///< lives as long as the process
         std::vector<Fragment> fragments; ///< in order; never empty
         bool fromSection;                ///< false: one of the family's own keys
+
+        /// The values of layers below that `KEY = ...` on top replaced, the upper ones first. They have none
+        /// themselves.
+        std::vector<Value> replaced;
 
         /// Where one byte of the text was written.
         /// @param offset of the byte

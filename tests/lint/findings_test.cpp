@@ -160,7 +160,7 @@ TEST(LintComments, AreNotUnusedWhenTheCodeIsNotSelected) {
 TEST(LintComments, AreTextInsideAContinuation) {
     // " ignore T105" is a property of its own, without a value.
     EXPECT_THAT(codes(withFamily("PROPERTY = A,1:B,2\\\n# lint: ignore T105\n[KS50]\n")),
-                ElementsAre("F101", "P103"));
+                ElementsAre("L112", "F101", "P103"));
 }
 
 TEST(LintComments, MustBeReadable) {

@@ -2,6 +2,9 @@
 #include <AcdLines.h>
 #include <AcdStore.h>
 
+#include "tool/DatabaseDirectory.h"
+
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <utility>
@@ -81,4 +84,27 @@ TEST(AcdLines, OfTheDatabaseComeByFamily) {
     EXPECT_EQ(files[0].family(), "base");
     EXPECT_EQ(files[0].path(), "base.acd");
     EXPECT_EQ(files[1].lines()[0].name, "KS50");
+}
+
+TEST(AcdLines, AreFoundWhereTheSearchPathWasListed) {
+    const DatabaseDirectory directory(DatabaseDirectory::Files{{"kestrel.acd", "[KS50]\n"}});
+    const DatabaseDirectory elsewhere;
+    const std::filesystem::path path = directory.path();
+    std::filesystem::current_path(path.parent_path());
+    AcdStore::setSearchPath({path.filename().string()});
+    ASSERT_EQ(AcdStore::families().size(), 1U);
+    // Hosts change their directory as they like.
+    std::filesystem::current_path(elsewhere.path());
+    ASSERT_EQ(AcdLines::ofDatabase().size(), 1U);
+    EXPECT_EQ(AcdLines::ofDatabase().front().lines().size(), 1U);
+}
+
+TEST(AcdLines, KnowWhichFilesDoNotCount) {
+    const DatabaseDirectory directory(
+        DatabaseDirectory::Files{{"kestrel.ACD", "[KS50]\n"}, {"kestrel.acd", "[KS75]\n"}});
+    AcdStore::setSearchPath({directory.path()});
+    const std::vector<AcdLines> files = AcdLines::ofDatabase();
+    ASSERT_EQ(files.size(), 1U);
+    EXPECT_EQ(files.front().lines().front().name, "KS50");
+    EXPECT_THAT(files.front().namesakes(), testing::ElementsAre(directory.path("kestrel.acd")));
 }
