@@ -10,4 +10,16 @@ inline constexpr const char* TYPE_PREFIX = "TYPE_";
 inline const std::vector<std::string> TYPES{"TYPE_BPI", "TYPE_MB_SPI", "TYPE_MB_BPI", "TYPE_MB_QPRM"};
 inline const std::vector<std::string> WIDTHS{"SERIAL", "PARALLEL", "NONE"};
 
+/// Calls `use(type, width, lead)` for each arrangement that may be asked for, in the order in which they are shown.
+template <typename Use>
+void forEachArrangement(Use use) {
+    for (const std::string& type : TYPES) {
+        for (const std::string& width : WIDTHS) {
+            for (const bool lead : {true, false}) {
+                use(type, width, lead);
+            }
+        }
+    }
+}
+
 } // namespace multiboot

@@ -61,18 +61,38 @@ Entries flashEntries(const std::string& name) {
 
 } // namespace
 
-Properties deviceProperties(ConstraintsManager& manager, const std::string& device) {
+const PropertyReader::Entries& PropertyReader::entriesOfFamily(const std::string& family) {
+    const auto [known, isNew] = m_families.try_emplace(family);
+    if (isNew) {
+        known->second = propertyEntries(family);
+    }
+    return known->second;
+}
+
+Properties PropertyReader::read(const std::string& device) {
     const Entries own = propertyEntries(device);
-    Entries all = own;
-    all.merge(propertyEntries(plain(manager.getPartFamily(device.c_str()))));
+    const Entries& inherited = entriesOfFamily(plain(m_manager.getPartFamily(device.c_str())));
     Properties properties;
-    for (const auto& [key, entry] : all) {
+    properties.reserve(own.size() + inherited.size());
+    const auto add = [&](const Entries::value_type& one) {
+        const auto& [key, entry] = one;
         Property property{key, {}, entry.ofDevice ? "device" : "family", entry.origin};
-        for (const StringBase& value : manager.getDeviceStringProperties(device.c_str(), key.c_str())) {
+        for (const StringBase& value : m_manager.getDeviceStringProperties(device.c_str(), key.c_str())) {
             property.values.push_back(plain(value));
         }
         properties.push_back(std::move(property));
+    };
+    auto below = inherited.begin();
+    for (const Entries::value_type& one : own) {
+        for (; below != inherited.end() && below->first < one.first; ++below) {
+            add(*below);
+        }
+        if (below != inherited.end() && below->first == one.first) {
+            ++below;
+        }
+        add(one);
     }
+    std::for_each(below, inherited.end(), add);
     return properties;
 }
 
