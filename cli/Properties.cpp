@@ -70,29 +70,30 @@ const PropertyReader::Entries& PropertyReader::entriesOfFamily(const std::string
 }
 
 Properties PropertyReader::read(const std::string& device) {
-    const Entries own = propertyEntries(device);
+    Entries own = propertyEntries(device);
     const Entries& inherited = entriesOfFamily(plain(m_manager.getPartFamily(device.c_str())));
     Properties properties;
     properties.reserve(own.size() + inherited.size());
-    const auto add = [&](const Entries::value_type& one) {
-        const auto& [key, entry] = one;
-        Property property{key, {}, entry.ofDevice ? "device" : "family", entry.origin};
+    const auto add = [&](const std::string& key, catalogue::Entry entry) {
+        Property property{key, {}, entry.ofDevice ? "device" : "family", std::move(entry.origin)};
         for (const StringBase& value : m_manager.getDeviceStringProperties(device.c_str(), key.c_str())) {
             property.values.push_back(plain(value));
         }
         properties.push_back(std::move(property));
     };
     auto below = inherited.begin();
-    for (const Entries::value_type& one : own) {
-        for (; below != inherited.end() && below->first < one.first; ++below) {
-            add(*below);
+    for (auto& [key, entry] : own) {
+        for (; below != inherited.end() && below->first < key; ++below) {
+            add(below->first, below->second);
         }
-        if (below != inherited.end() && below->first == one.first) {
+        if (below != inherited.end() && below->first == key) {
             ++below;
         }
-        add(one);
+        add(key, std::move(entry));
     }
-    std::for_each(below, inherited.end(), add);
+    for (; below != inherited.end(); ++below) {
+        add(below->first, below->second);
+    }
     return properties;
 }
 

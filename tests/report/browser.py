@@ -151,6 +151,14 @@ class Page:
         if self._scripts:
             self.evaluate("new Promise((done) => setTimeout(done))")
 
+    def wait_until(self, expression):
+        """Waits for what the browser does in its own time, such as telling that the colour scheme has changed."""
+        deadline = time.monotonic() + TIMEOUT
+        while not self.evaluate(expression):
+            if time.monotonic() > deadline:
+                raise BrowserFault(f"this never came true: {expression}")
+            time.sleep(0.01)
+
     def close(self):
         self._browser.call("Target.closeTarget", targetId=self.target)
 

@@ -190,14 +190,14 @@ class Demonstration(PageTest):
         page = self.open()
         for _ in range(2):  # again from the same address
             page.click("#overview a[href='#in-kestrel']")
-            self.assertEqual(len(self.listed(page)), 10)
+            page.wait_until("document.querySelectorAll('#list h4').length === 10")
             page.click("#filters [type=reset]")
 
     def test_link_to_a_device(self):
         for fragment in ("#device-KS50", "#device-ks50"):
             page = self.open(fragment)
             part = "document.getElementById('device-KS50')"
-            self.assertTrue(page.evaluate(f"{part}.parentElement.open"))
+            page.wait_until(f"{part}.parentElement.open")
             self.assertTrue(self.is_seen(page, f"{part}.parentElement.firstElementChild"))
             self.assertIn("kestrel.acd:", page.evaluate(f"{part}.textContent"))
 
@@ -205,16 +205,15 @@ class Demonstration(PageTest):
         page = self.open()
         page.choose("#operation", "READUES")
         page.evaluate("location.hash = '#device-KS50'")
-        page.settle()
-        self.assertTrue(page.evaluate("document.getElementById('device-KS50').parentElement.open"))
+        page.wait_until("document.getElementById('device-KS50')?.parentElement.open")
         self.assertEqual(page.evaluate("document.getElementById('operation').value"), "")
 
     def test_links_of_flashes_and_multiboot(self):
         page = self.open()
         page.click("#flashes a[href='#device-OVD16']")
-        self.assertTrue(page.evaluate("document.getElementById('device-OVD16').parentElement.open"))
+        page.wait_until("document.getElementById('device-OVD16').parentElement.open")
         page.click("#multiboot a[href='#device-KS1500']")
-        self.assertTrue(page.evaluate("document.getElementById('device-KS1500').parentElement.open"))
+        page.wait_until("document.getElementById('device-KS1500').parentElement.open")
 
     def test_address_of_an_opened_device(self):
         page = self.open()
@@ -258,7 +257,7 @@ class Demonstration(PageTest):
     def test_link_to_a_device_without_scripts(self):
         page = self.open("#device-KS50", scripts=False)
         page.run_scripts()
-        self.assertTrue(page.evaluate("document.getElementById('device-KS50').parentElement.open"))
+        page.wait_until("document.getElementById('device-KS50').parentElement.open")
 
     def test_dark_and_light(self):
         background = "getComputedStyle(document.body).backgroundColor"
@@ -267,7 +266,7 @@ class Demonstration(PageTest):
         page.emulate("dark")
         dark = page.evaluate(background)
         self.assertNotEqual(light, dark)
-        self.assertEqual(page.evaluate("document.getElementById('theme').textContent"), "Light")
+        page.wait_until("document.getElementById('theme').textContent === 'Light'")
         page.click("#theme")
         self.assertEqual(page.evaluate(background), light)
         page.open(self.address)
@@ -425,8 +424,7 @@ class Hostile(PageTest):
         for name in ("<script>", "A'B", "100%", "</script>", "toString", "__proto__"):
             page = self.opened()
             page.evaluate(f"location.hash = '#device-' + encodeURIComponent({name!r})")
-            page.settle()
-            self.assertTrue(page.evaluate(f"document.getElementById('device-' + {name!r}).parentElement.open"), name)
+            page.wait_until(f"document.getElementById('device-' + {name!r}).parentElement.open")
         page = self.opened()
         page.click("#multiboot a")
         self.assertEqual(page.complaints(), [])
@@ -476,13 +474,13 @@ class ManyDevices(PageTest):
         page = self.open()
         self.assertEqual(page.evaluate("document.querySelector('.sheet').textContent"), "")
         page.evaluate("document.querySelector('.device summary').click()")
-        page.settle()
+        page.wait_until("document.querySelector('.sheet').textContent !== ''")
         self.assertIn("VENDOR", page.evaluate("document.querySelector('.sheet').textContent"))
 
     def test_multiboot_names_its_devices(self):
         page = self.open()
         page.evaluate("document.querySelector('#multiboot summary').click()")
-        page.settle()
+        page.wait_until("document.querySelector('#multiboot a') !== null")
         self.assertEqual(page.evaluate("[...document.querySelectorAll('#multiboot a')].map((one) => one.textContent)"),
                          ["A3", "B4"])
 
