@@ -48,6 +48,8 @@ const std::vector<Command>& commands() {
          "tarvik dump multiboot\n"
          "tarvik dump operations KS50",
          declareDump},
+        {"report", "Write a page about all devices, to look at in a browser", "tarvik report -o report.html",
+         declareReport},
         {"lint", "Tell what is wrong with a database",
          "tarvik lint database\n"
          "tarvik lint site company --strict --format sarif\n"

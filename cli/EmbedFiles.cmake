@@ -1,14 +1,16 @@
-# Writes a source file that holds the database files FILES as text constants, so that the tool carries them.
+# Writes a source file that holds FILES as text constants, so that the tool carries them: it defines the function
+# FUNCTION, declared in HEADER, which gives their texts by name.
 #
-#   cmake -DOUTPUT=Demonstration.cpp "-DFILES=a.acd;b.acd" -P EmbedFiles.cmake
+#   cmake -DOUTPUT=Demonstration.cpp -DHEADER=Demonstration.h -DFUNCTION=demonstrationFiles
+#         "-DFILES=a.acd;b.acd" -P EmbedFiles.cmake
 #
 # A file is cut into short constants, since compilers limit the length of one; every byte is written as an
 # escape, since a file may hold any.
 set(PIECE_DIGITS 8192)
 
-set(source "// Made by the build from the files of the demonstration database.\n")
-string(APPEND source "#include \"Demonstration.h\"\n\nusing namespace std::string_view_literals;\n\n")
-string(APPEND source "std::map<std::string, std::string> demonstrationFiles() {\n")
+set(source "// Made by the build.\n")
+string(APPEND source "#include \"${HEADER}\"\n\nusing namespace std::string_view_literals;\n\n")
+string(APPEND source "std::map<std::string, std::string> ${FUNCTION}() {\n")
 string(APPEND source "    std::map<std::string, std::string> files;\n")
 
 foreach(file IN LISTS FILES)

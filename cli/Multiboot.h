@@ -29,4 +29,16 @@ inline const std::vector<std::string> WIDTHS{"SERIAL", "PARALLEL", "NONE"};
     return all;
 }
 
+/// Calls `use(type, width, lead)` for each arrangement that may be asked for, in the order in which they are shown.
+template <typename Use>
+void forEachArrangement(Use use) {
+    for (const std::string& type : TYPES) {
+        for (const std::string& width : WIDTHS) {
+            for (const bool lead : {true, false}) {
+                use(type, width, lead);
+            }
+        }
+    }
+}
+
 } // namespace multiboot

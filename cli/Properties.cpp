@@ -60,17 +60,39 @@ Entries flashEntries(const std::string& name) {
 
 } // namespace
 
-Properties deviceProperties(ConstraintsManager& manager, const std::string& device) {
-    const Entries own = propertyEntries(device);
-    Entries all = own;
-    all.merge(propertyEntries(plain(manager.getPartFamily(device.c_str()))));
+const PropertyReader::Entries& PropertyReader::entriesOfFamily(const std::string& family) {
+    const auto [known, isNew] = m_families.try_emplace(family);
+    if (isNew) {
+        known->second = propertyEntries(family);
+    }
+    return known->second;
+}
+
+Properties PropertyReader::read(const std::string& device) {
+    Entries own = propertyEntries(device);
+    const Entries& inherited = entriesOfFamily(plain(m_manager.getPartFamily(device.c_str())));
     Properties properties;
-    for (const auto& [key, entry] : all) {
-        Property property{key, {}, entry.ofDevice ? "device" : "family", entry.origin, entry.shadows};
-        for (const StringBase& value : manager.getDeviceStringProperties(device.c_str(), key.c_str())) {
+    properties.reserve(own.size() + inherited.size());
+    const auto add = [&](const std::string& key, catalogue::Entry entry) {
+        Property property{
+            key, {}, entry.ofDevice ? "device" : "family", std::move(entry.origin), std::move(entry.shadows)};
+        for (const StringBase& value : m_manager.getDeviceStringProperties(device.c_str(), key.c_str())) {
             property.values.push_back(plain(value));
         }
         properties.push_back(std::move(property));
+    };
+    auto below = inherited.begin();
+    for (auto& [key, entry] : own) {
+        for (; below != inherited.end() && below->first < key; ++below) {
+            add(below->first, below->second);
+        }
+        if (below != inherited.end() && below->first == key) {
+            ++below;
+        }
+        add(key, std::move(entry));
+    }
+    for (; below != inherited.end(); ++below) {
+        add(below->first, below->second);
     }
     return properties;
 }

@@ -2,6 +2,7 @@
 
 #include "Catalogue.h"
 
+#include <map>
 #include <string>
 #include <vector>
 
@@ -20,8 +21,27 @@ struct Property {
 
 using Properties = std::vector<Property>;
 
+/// Reads the properties of devices; what devices of a family share is looked up once.
+class PropertyReader {
+public:
+    explicit PropertyReader(ConstraintsManager& manager) : m_manager(manager) {}
+
+    /// The properties of a device and of its family.
+    [[nodiscard]] Properties read(const std::string& device);
+
+private:
+    using Entries = std::map<std::string, catalogue::Entry>;
+
+    const Entries& entriesOfFamily(const std::string& family);
+
+    ConstraintsManager& m_manager;
+    std::map<std::string, Entries> m_families;
+};
+
 /// The properties of a device and of its family.
-[[nodiscard]] Properties deviceProperties(ConstraintsManager& manager, const std::string& device);
+[[nodiscard]] inline Properties deviceProperties(ConstraintsManager& manager, const std::string& device) {
+    return PropertyReader(manager).read(device);
+}
 
 /// The properties of an SPI flash and of its class.
 [[nodiscard]] Properties flashProperties(const ConstraintsManager& manager, const std::string& device);

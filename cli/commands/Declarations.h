@@ -16,6 +16,7 @@ Action declareOperationOptions(CLI::App& parser);
 Action declareOperations(CLI::App& parser);
 Action declareOptions(CLI::App& parser);
 Action declareProperty(CLI::App& parser);
+Action declareReport(CLI::App& parser);
 Action declareShow(CLI::App& parser);
 Action declareSpi(CLI::App& parser);
 Action declareVocabulary(CLI::App& parser);

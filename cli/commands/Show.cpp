@@ -19,16 +19,6 @@ struct Sheet {
     DeviceSheet facts;
 };
 
-/// A letter for each output of the tables: the first of its key that no earlier output has.
-std::string outputLetters() {
-    std::string letters;
-    for (std::size_t output = 0; output < DeviceSheet::OUTPUTS; ++output) {
-        const std::string& key = vocabulary::outputs().at(output);
-        letters += key.at(key.find_first_not_of(letters));
-    }
-    return letters;
-}
-
 /// "P-U--", or "-" for none.
 std::string cell(DeviceSheet::Outputs outputs, const std::string& letters) {
     if (outputs == 0) {

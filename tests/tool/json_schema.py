@@ -94,6 +94,12 @@ lint --explain all
 lint --explain ZZ
 lint nowhere
 diff nowhere nowhere
+report
+report -o page.html
+report -o -
+report -o nowhere/page.html
+--database site:database show KS50
+--database site:database why KS50 --property PINS
 families extra
 vocabulary extra
 show
@@ -168,7 +174,7 @@ def main():
         questions += [["show", device["name"]] for device in tool.answer(["devices"])[1]["devices"]]
         for words in questions:
             status, answer = tool.answer(words)
-            command = words[0]
+            command = words[2] if words[0] == "--database" else words[0]
             if "error" in answer:
                 assert status in (1, 2), (words, status)
                 validators["error"].validate(answer)

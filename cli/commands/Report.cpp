@@ -1,0 +1,64 @@
+// `report`: a page about all devices, to look at in a browser.
+#include "commands/Declarations.h"
+
+#include "Tool.h"
+#include "report/File.h"
+#include "report/Page.h"
+
+#include <CLI/CLI.hpp>
+
+#include <fmt/format.h>
+
+#include <memory>
+
+namespace {
+
+/// In place of a path: standard output.
+constexpr const char* STANDARD_OUTPUT = "-";
+
+struct Written {
+    std::string file;
+    std::size_t devices;
+    std::size_t families;
+};
+
+std::string asText(const Written& written, const Terminal& /*any*/) {
+    return fmt::format("{}: {} devices in {} families\n", written.file, written.devices, written.families);
+}
+
+Json asJson(const Written& written) {
+    return {{"file", written.file}, {"devices", written.devices}, {"families", written.families}};
+}
+
+/// The page itself as the answer.
+struct Shown {
+    const report::Page& page;
+};
+
+std::string asText(const Shown& shown, const Terminal& /*any*/) { return shown.page.html(); }
+
+Json asJson(const Shown& /*shown*/) {
+    throw Failure(Status::FAULT, "with --json, report takes a file: -o - and the JSON object both go to "
+                                 "standard output\nsee: tarvik report --help");
+}
+
+Status run(Tool& tool, const std::string& file) {
+    tool.openDatabase();
+    report::Page page;
+    report::survey(tool, [&](const report::Subject& subject) { page.add(subject); });
+    if (file == STANDARD_OUTPUT) {
+        return tool.answer(Shown{page});
+    }
+    report::writeFile(file, page.html());
+    return tool.answer(Written{file, page.devices(), page.families()});
+}
+
+} // namespace
+
+Action declareReport(CLI::App& parser) {
+    auto file = std::make_shared<std::string>();
+    parser.add_option("-o,--file", *file, "The HTML file to write; - is standard output")
+        ->type_name("FILE")
+        ->required();
+    return [file](Tool& tool) { return run(tool, *file); };
+}
