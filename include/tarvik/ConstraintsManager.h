@@ -13,6 +13,7 @@
 #include <cstddef>
 #include <map>
 #include <memory>
+#include <memory_resource>
 #include <set>
 #include <string_view>
 #include <unordered_map>
@@ -283,7 +284,7 @@ private:
             family; ///< what resolving leaves as the latest resolution; null when nothing is resolved
         std::size_t block;
     };
-    using Shortcuts = std::unordered_map<StringBase, Shortcut, TextHash, TextEqual>;
+    using Shortcuts = std::pmr::unordered_map<StringBase, Shortcut, TextHash, TextEqual>;
     const Shortcut* recall(const Shortcuts& shortcuts, const char* device);
     void keepOperationShortcut(const StringBase& device, const StringBase& owner, std::size_t block);
     void keepOptionShortcut(const StringBase& device, const StringBase& owner, std::size_t block);
@@ -352,8 +353,12 @@ private:
     NameSequence m_programOptionsLoaded; ///< owners whose program options are loaded
     Properties m_deviceProperties;       ///< "owner_property" to values
     Texts m_deviceFamilyCache;           ///< lower-cased base name to family
-    Shortcuts m_operationShortcuts;      ///< name as asked to its block of the operation tables
-    Shortcuts m_optionShortcuts;         ///< name as asked to its block of the option table
+
+    /// Apart from all else, so that the shortcuts stand close together however much is loaded between them.
+    std::pmr::unsynchronized_pool_resource m_shortcutMemory;
+    Shortcuts m_operationShortcuts{&m_shortcutMemory}; ///< name as asked to its block of the operation tables
+    Shortcuts m_optionShortcuts{&m_shortcutMemory};    ///< name as asked to its block of the option table
+
     std::map<StringBase, int, ltptstr> m_programOptionPackageIndex;
     TextSet m_operationOptions; ///< stays empty: what a look-up returns that finds nothing
     StringBase m_partFamily;    ///< the family resolved latest
