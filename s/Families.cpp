@@ -47,6 +47,8 @@ void ConstraintsManager::addCachedDeviceFamily(const char* device, const char* f
     const auto latest = m_deviceFamilyCache.find(view(m_partFamily));
     if (latest == m_deviceFamilyCache.end() || latest->second.GetLength() == 0) {
         m_deviceFamilyCache.insert_or_assign(baseNameOf(view(device)), family);
+        m_operationShortcuts.clear();
+        m_optionShortcuts.clear();
     }
 }
 

@@ -7,8 +7,6 @@
 #include <AcdReader.h>
 #include <UT_STR.h>
 
-#include <algorithm>
-
 // Loading on demand: what the first question about a device brings into memory. Each piece is loaded once;
 // its name is noted before it is read, so a load that fails is not tried again.
 
@@ -16,8 +14,8 @@ namespace {
 
 /// Notes a name as loaded.
 /// @return false when it was noted before
-bool note(std::vector<StringBase>& loaded, const StringBase& name) {
-    if (std::find(loaded.begin(), loaded.end(), name) != loaded.end()) {
+bool note(NameSequence& loaded, const StringBase& name) {
+    if (loaded.contains(view(name))) {
         return false;
     }
     loaded.push_back(name);
@@ -74,29 +72,43 @@ void ConstraintsManager::loadFamilyTables(PM_DEVKEY* accessor, const char* famil
     parseBsdlOperationEntries(accessor, index, family);
 }
 
+/// Makes room for the properties of one more owner. In steps of four: moving all entries to new buckets reaches all
+/// over memory, and steps of two do it twice as often.
+void ConstraintsManager::growProperties() {
+    constexpr std::size_t USUAL_PROPERTIES = 32;
+    if (m_deviceProperties.size() + USUAL_PROPERTIES > m_deviceProperties.bucket_count()) {
+        m_deviceProperties.rehash(4 * m_deviceProperties.bucket_count());
+    }
+}
+
 void ConstraintsManager::loadProperties(PM_DEVKEY* accessor, const StringBase& owner) {
     if (m_loadedFamilies.insert(owner).second) {
+        growProperties();
         loadSingleProperties(accessor, owner);
         loadMultipleProperties(accessor, owner);
     }
 }
 
+PropertyValues::Owner ConstraintsManager::propertyOwner(const StringBase& name) const {
+    return {static_cast<std::uint32_t>(name.GetLength()), isSpiDevice(name)};
+}
+
 /// "PROPERTY": records of a name and a value.
 void ConstraintsManager::loadSingleProperties(PM_DEVKEY* accessor, const StringBase& owner) {
+    const PropertyValues::Owner ownerEntry = propertyOwner(owner);
     forEachRecord(*accessor, "PROPERTY", [&](const Record& record, const StringBase& property) {
         const char* const value = record.field(1);
         if (value == nullptr) {
             reporting::raiseIf<DataMismatchException>(m_exceptions,
                                                       reporting::location::PROPERTY_WITHOUT_VALUE);
         }
-        TextSet values;
-        values.emplace(value);
-        m_deviceProperties[propertyKey(owner, property)] = std::move(values);
+        m_deviceProperties.insert_or_assign(propertyKey(owner, property), PropertyValues(value, ownerEntry));
     });
 }
 
 /// "PROPERTIES": records of a name, a count and as many values.
 void ConstraintsManager::loadMultipleProperties(PM_DEVKEY* accessor, const StringBase& owner) {
+    const PropertyValues::Owner ownerEntry = propertyOwner(owner);
     forEachRecord(*accessor, "PROPERTIES", [&](const Record& record, const StringBase& property) {
         const long count = UT_STR::AToL(record.field(1));
         TextSet values;
@@ -110,6 +122,7 @@ void ConstraintsManager::loadMultipleProperties(PM_DEVKEY* accessor, const Strin
                 break;
             }
         }
-        m_deviceProperties[propertyKey(owner, property)] = std::move(values);
+        m_deviceProperties.insert_or_assign(propertyKey(owner, property),
+                                            PropertyValues(std::move(values), ownerEntry));
     });
 }

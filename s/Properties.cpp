@@ -7,7 +7,7 @@
 
 // The named properties of a device: its own, or else its family's.
 
-std::size_t ConstraintsManager::PropertyKeyHash::operator()(const PropertyKey& key) const noexcept {
+std::size_t ConstraintsManager::PropertyKeyHash::operator()(const PropertyKey& key) const {
     const auto owner = StringBase::CRC32(key.owner.data(), key.owner.size());
     return StringBase::CRC32(key.property.data(), key.property.size(), StringBase::CRC32("_", 1, owner));
 }
@@ -21,48 +21,68 @@ bool ConstraintsManager::PropertyKeyEqual::operator()(const PropertyKey& left,
 }
 
 /// The values that are stored for an owner's property; null when there are none.
-const ConstraintsManager::TextSet* ConstraintsManager::findProperty(const StringBase& owner,
-                                                                    const char* property) const {
-    const auto found = m_deviceProperties.find(PropertyKey{view(owner), view(property)});
+const PropertyValues* ConstraintsManager::findStored(std::string_view owner,
+                                                     std::string_view property) const {
+    const auto found = m_deviceProperties.find(PropertyKey{owner, property});
     return found == m_deviceProperties.end() ? nullptr : &found->second;
 }
 
-const ConstraintsManager::TextSet& ConstraintsManager::getDeviceStringProperties(const char* device,
-                                                                                 const char* key) {
+/// As `findStored`, but only when they came with this owner's data, which then is loaded: "a" and "b_c" are stored
+/// where "a_b" and "c" would be.
+const PropertyValues* ConstraintsManager::findLoaded(std::string_view owner,
+                                                     std::string_view property) const {
+    const PropertyValues* const values = findStored(owner, property);
+    return values != nullptr && values->owner().length == owner.size() ? values : nullptr;
+}
+
+/// The values of a device's property, or else of its family's; null when neither has it.
+const PropertyValues* ConstraintsManager::findProperty(const char* device, const char* key) {
+    if (const PropertyValues* const values = findLoaded(view(device), view(key))) {
+        return values;
+    }
     const StringBase name(device);
     if (m_loadedFamilies.find(view(name)) == m_loadedFamilies.end()) {
         loadDeviceData(name.c_str(), nullptr);
     }
-    if (const TextSet* const values = findProperty(name, key)) {
-        return *values;
+    if (const PropertyValues* const values = findStored(view(name), view(key))) {
+        return values;
     }
     const StringBase family = getPartFamily(name.c_str());
     if (family == name) {
-        return m_operationOptions;
+        return nullptr;
     }
     if (m_loadedFamilies.find(view(family)) == m_loadedFamilies.end()) {
         loadDeviceData(family.c_str(), nullptr);
     }
-    const TextSet* const values = findProperty(family, key);
-    return values == nullptr ? m_operationOptions : *values;
+    return findStored(view(family), view(key));
+}
+
+const ConstraintsManager::TextSet& ConstraintsManager::getDeviceStringProperties(const char* device,
+                                                                                 const char* key) {
+    const PropertyValues* const values = findProperty(device, key);
+    return values == nullptr ? m_operationOptions : values->set();
 }
 
 const char* ConstraintsManager::getDeviceStringProperty(const char* device, const char* key) {
+    const PropertyValues* values = findLoaded(view(device), view(key));
+    if (values != nullptr && !values->owner().isFlash && !values->empty()) {
+        return values->first().c_str();
+    }
     if (isSpiDevice(device)) {
         return getSpiDeviceStringProperty(device, key);
     }
     const StringBase name(device);
-    const TextSet* values = &getDeviceStringProperties(name.c_str(), key);
-    if (values->empty()) {
+    values = findProperty(name.c_str(), key);
+    if (values == nullptr || values->empty()) {
         // The second pass also reaches the family's own family, if it has one.
         const StringBase family = getPartFamily(name.c_str());
         if (family != name) {
             m_partFamily = family;
-            values = &getDeviceStringProperties(family.c_str(), key);
+            values = findProperty(family.c_str(), key);
         }
     }
-    if (!values->empty()) {
-        return values->begin()->c_str();
+    if (values != nullptr && !values->empty()) {
+        return values->first().c_str();
     }
     reporting::message(reporting::location::PROPERTY_NOT_FOUND)
         .issueInfo("ACD entry  %s not found for device family %s.\n", key,
@@ -81,6 +101,6 @@ long ConstraintsManager::getDeviceLongProperty(const char* device, const char* k
 }
 
 bool ConstraintsManager::hasDevicePropertyValue(const char* device, const char* key, const char* value) {
-    const TextSet& values = getDeviceStringProperties(device, key);
-    return values.find(view(value)) != values.end();
+    const PropertyValues* const values = findProperty(device, key);
+    return values != nullptr && values->contains(view(value));
 }

@@ -59,10 +59,10 @@ void ConstraintsManager::loadSpiCatalogue() {
     // The names are noted behind the parsers here, before them when a family is loaded on demand.
     const unsigned index = familyIndex(familyNames::SPI);
     parseOperationEntries(accessor, index, familyNames::SPI);
-    m_operationsLoaded.emplace_back(familyNames::SPI);
+    m_operationsLoaded.push_back(familyNames::SPI);
     parseBsdlOperationEntries(accessor, index, familyNames::SPI);
     parseProgramOptionEntries(accessor, familyNames::SPI);
-    m_programOptionsLoaded.emplace_back(familyNames::SPI);
+    m_programOptionsLoaded.push_back(familyNames::SPI);
 
     readMultibootTypes(accessor);
 }
@@ -78,7 +78,9 @@ void ConstraintsManager::readSpiNames(PM_DEVKEY* accessor) {
             // Deliberate: the first device of every family stands twice.
             m_spiNames.push_back(devices.front());
         }
-        m_spiNames.insert(m_spiNames.end(), devices.begin(), devices.end());
+        for (const StringBase& device : devices) {
+            m_spiNames.push_back(device);
+        }
     }
 }
 
@@ -90,6 +92,7 @@ void ConstraintsManager::readMultibootDeviceLists(PM_DEVKEY* accessor) {
 
 /// Keeps properties under the name as written; they are looked for in upper case.
 void ConstraintsManager::readSpiProperties(PM_DEVKEY* accessor) {
+    auto latest = m_spiProperties.end();
     for (const StringBase& name : m_spiNames) {
         StringBase key = UT_STR::Upper(name.c_str());
         key += "_PROPERTY";
@@ -101,14 +104,14 @@ void ConstraintsManager::readSpiProperties(PM_DEVKEY* accessor) {
             }
             StringBase joined = name;
             joined += property;
-            m_spiProperties[joined] = value;
+            latest = m_spiProperties.insert_or_assign(latest, joined, value);
         });
     }
 }
 
 bool ConstraintsManager::isSpiDevice(StringBase device) const {
     device.MakeUpper();
-    return std::find(m_spiNames.begin(), m_spiNames.end(), device) != m_spiNames.end();
+    return m_spiNames.contains(view(device));
 }
 
 /// The class of a flash; empty when it has none. Of several classes the last one counts.

@@ -60,8 +60,10 @@ void ConstraintsManager::loadModeDeviceSets() {
 }
 
 void ConstraintsManager::loadDeviceIdcodes() {
+    // Lists keep devices of a kind together, so that most belong right beside the one before them.
+    auto latest = m_deviceIdcodes.end();
     forEachRecord(*m_devKey, "IDCODE", [&](const Record& record, const StringBase& device) {
-        m_deviceIdcodes[device] = record.field(1);
+        latest = m_deviceIdcodes.insert_or_assign(latest, device, record.field(1));
     });
 }
 

@@ -4,6 +4,7 @@
 #include "Catalogue.h"
 #include "Nearest.h"
 #include "why/Oddities.h"
+#include "why/StartUp.h"
 
 #include <AcdStore.h>
 

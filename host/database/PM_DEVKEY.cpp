@@ -14,6 +14,21 @@ namespace {
     return text == nullptr ? std::string_view() : std::string_view(text);
 }
 
+/// Whether a text that was kept is the one given, null being the empty one. Those are a few bytes: two calls into the
+/// C library would cost more than the comparison.
+[[nodiscard]] bool isSame(std::string_view kept, const char* text) noexcept {
+    if (text == nullptr) {
+        return kept.empty();
+    }
+    for (const char byte : kept) {
+        if (byte != *text) {
+            return false; // at the end of `text`, too: nothing that was kept holds a NUL
+        }
+        ++text;
+    }
+    return *text == '\0';
+}
+
 } // namespace
 
 void PM_DEVKEY::Cursor::start(std::string_view text, std::string_view separator) noexcept {
@@ -37,7 +52,11 @@ bool PM_DEVKEY::Cursor::moveTo(std::size_t wanted, std::string_view text,
 
 void PM_DEVKEY::Cursor::findEnd(std::string_view text, std::string_view separator) noexcept {
     // An empty separator would be found everywhere; it separates nothing.
-    end = separator.empty() ? text.size() : std::min(text.find(separator, position), text.size());
+    if (separator.size() == 1) {
+        end = std::min(text.find(separator.front(), position), text.size());
+    } else {
+        end = separator.empty() ? text.size() : std::min(text.find(separator, position), text.size());
+    }
 }
 
 PM_DEVKEY::PM_DEVKEY(const char* file, const PM_PIC&, unsigned char, unsigned char, unsigned char)
@@ -51,13 +70,15 @@ const char* PM_DEVKEY::getstringbykey(const char* key, const char* separator, sh
     if (key == nullptr || index < 0 || (subSeparator != nullptr && subIndex < 0)) {
         return nullptr;
     }
-    select(key, orEmpty(separator));
+    if (!isSame(m_key, key) || !isSame(m_separator, separator)) {
+        select(key, orEmpty(separator));
+    }
     if (m_value.empty() || !moveToItem(static_cast<std::size_t>(index))) {
         return nullptr;
     }
     std::string_view piece = m_item.piece(m_value);
     if (subSeparator != nullptr) {
-        if (m_subSeparator != subSeparator) {
+        if (!isSame(m_subSeparator, subSeparator)) {
             m_subSeparator = subSeparator;
             m_field.start(piece, m_subSeparator);
         }
@@ -72,9 +93,6 @@ const char* PM_DEVKEY::getstringbykey(const char* key, const char* separator, sh
 
 /// Makes the value of `key` the current one, split at `separator`.
 void PM_DEVKEY::select(std::string_view key, std::string_view separator) {
-    if (m_key == key && m_separator == separator) {
-        return;
-    }
     // Nothing is current while memory may run out: no key is empty.
     m_key.clear();
     m_value = {};

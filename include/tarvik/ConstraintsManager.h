@@ -1,7 +1,10 @@
 #pragma once
 
+#include <tarvik/NameSequence.h>
 #include <tarvik/NameSet.h>
+#include <tarvik/PropertyValues.h>
 #include <tarvik/TARVIKNS.h>
+#include <tarvik/TextHash.h>
 #include <tarvik/ltptstr.h>
 
 #include <StringBase.h>
@@ -10,6 +13,7 @@
 #include <cstddef>
 #include <map>
 #include <memory>
+#include <memory_resource>
 #include <set>
 #include <string_view>
 #include <unordered_map>
@@ -48,7 +52,7 @@ public:
     using Texts = std::map<StringBase, StringBase, ltptstr>;
 
     /// Texts, each once, in byte order.
-    using TextSet = std::set<StringBase, ltptstr>;
+    using TextSet = PropertyValues::TextSet;
 
     ConstraintsManager(const ConstraintsManager&) = delete;
     ConstraintsManager& operator=(const ConstraintsManager&) = delete;
@@ -382,7 +386,9 @@ private:
     StringBase loadDevice(const StringBase& device, const char* package);
     void loadFamily(const StringBase& family);
     void loadFamilyTables(PM_DEVKEY* accessor, const char* family);
+    void growProperties();
     void loadProperties(PM_DEVKEY* accessor, const StringBase& owner);
+    PropertyValues::Owner propertyOwner(const StringBase& name) const;
     void loadSingleProperties(PM_DEVKEY* accessor, const StringBase& owner);
     void loadMultipleProperties(PM_DEVKEY* accessor, const StringBase& owner);
 
@@ -395,11 +401,20 @@ private:
     bool hasDevicePropertyValue(const char* device, const char* key, const char* value);
 
     // Queries.
+    struct Shortcut {
+        const StringBase*
+            family; ///< what resolving leaves as the latest resolution; null when nothing is resolved
+        std::size_t block;
+    };
+    using Shortcuts = std::pmr::unordered_map<StringBase, Shortcut, TextHash, TextEqual>;
+    const Shortcut* recall(const Shortcuts& shortcuts, const char* device);
+    void keepOperationShortcut(const StringBase& device, const StringBase& owner, std::size_t block);
+    void keepOptionShortcut(const StringBase& device, const StringBase& owner, std::size_t block);
     StringBase operationOwner(const StringBase& device);
-    StringBase loadedOptionOwner(const char* device, const char* package);
-    bool isOperationTableLoaded(const StringBase& name) const;
-    bool isProgramOptionTableLoaded(const StringBase& name) const;
-    const TextSet* findProperty(const StringBase& owner, const char* property) const;
+    StringBase loadedOptionOwner(const StringBase& device, const char* package);
+    const PropertyValues* findStored(std::string_view owner, std::string_view property) const;
+    const PropertyValues* findLoaded(std::string_view owner, std::string_view property) const;
+    const PropertyValues* findProperty(const char* device, const char* key);
 
     // Dumps.
     StringBase supportedDeviceNameAt(int position) const;
@@ -411,11 +426,11 @@ private:
         std::string_view property;
     };
 
-    /// Hashes the keys of properties by their CRC-32.
+    /// Hashes the keys of properties by their CRC-32. Not `noexcept`, for the reason of `TextHash`.
     struct PropertyKeyHash {
         using is_transparent = void;
-        std::size_t operator()(const StringBase& key) const noexcept { return key.CRC32(); }
-        std::size_t operator()(const PropertyKey& key) const noexcept;
+        std::size_t operator()(const StringBase& key) const { return key.CRC32(); }
+        std::size_t operator()(const PropertyKey& key) const;
     };
     struct PropertyKeyEqual {
         using is_transparent = void;
@@ -424,7 +439,7 @@ private:
         }
         bool operator()(const PropertyKey& left, const StringBase& right) const noexcept;
     };
-    using Properties = std::unordered_map<StringBase, TextSet, PropertyKeyHash, PropertyKeyEqual>;
+    using Properties = std::unordered_map<StringBase, PropertyValues, PropertyKeyHash, PropertyKeyEqual>;
 
     bool m_exceptions = false;
     PM_DEVKEY* m_devKey = nullptr; ///< of the base database; lives as long as the process
@@ -455,11 +470,17 @@ private:
     NameSet m_notSupportedPartInMode;
     Texts m_deviceIdcodes;
 
-    TextSet m_loadedFamilies;                       ///< owners whose properties are loaded
-    std::vector<StringBase> m_operationsLoaded;     ///< families whose operations are loaded
-    std::vector<StringBase> m_programOptionsLoaded; ///< owners whose program options are loaded
-    Properties m_deviceProperties;                  ///< "owner_property" to values
-    Texts m_deviceFamilyCache;                      ///< lower-cased base name to family
+    TextSet m_loadedFamilies;            ///< owners whose properties are loaded
+    NameSequence m_operationsLoaded;     ///< families whose operations are loaded
+    NameSequence m_programOptionsLoaded; ///< owners whose program options are loaded
+    Properties m_deviceProperties;       ///< "owner_property" to values
+    Texts m_deviceFamilyCache;           ///< lower-cased base name to family
+
+    /// Apart from all else, so that the shortcuts stand close together however much is loaded between them.
+    std::pmr::unsynchronized_pool_resource m_shortcutMemory;
+    Shortcuts m_operationShortcuts{&m_shortcutMemory}; ///< name as asked to its block of the operation tables
+    Shortcuts m_optionShortcuts{&m_shortcutMemory};    ///< name as asked to its block of the option table
+
     std::map<StringBase, int, ltptstr> m_programOptionPackageIndex;
     TextSet m_operationOptions; ///< stays empty: what a look-up returns that finds nothing
     StringBase m_partFamily;    ///< the family resolved latest
@@ -471,7 +492,7 @@ private:
     std::vector<TARVIKNS::PROGRAM_OPTION> m_programOptionOrders;
 
     Texts m_spiProperties; ///< name and property written together, to value
-    std::vector<StringBase> m_spiNames;
+    NameSequence m_spiNames;
     std::vector<StringBase> m_spiFamilies;
     std::vector<StringBase> m_at1Devices;
     std::vector<StringBase> m_st1Devices;

@@ -123,7 +123,11 @@ namespace {
 /// A hash map's entries, in order.
 template <typename Entries>
 auto ordered(const Entries& entries) {
-    return std::map<StringBase, ConstraintsManager::TextSet, ltptstr>(entries.begin(), entries.end());
+    std::map<StringBase, ConstraintsManager::TextSet, ltptstr> result;
+    for (const auto& [key, values] : entries) {
+        result.emplace(key, values.set());
+    }
+    return result;
 }
 
 } // namespace

@@ -95,7 +95,7 @@ TEST(ProgramOptions, ADeviceWithoutOptionsOfItsOwnLoadsItsFamilyAlone) {
 
 TEST(ProgramOptions, LoadingIsDecidedByTheLoadedOptions) {
     ManagerOver manager(DATABASES);
-    manager.peer().programOptionsLoaded().emplace_back("fam1");
+    manager.peer().programOptionsLoaded().push_back("fam1");
     EXPECT_EQ(manager->getProgramOptions("dev3", BS, PARALLEL, nullptr), 0);
     EXPECT_TRUE(manager.peer().loadedFamilies().empty());
 }

@@ -1,0 +1,3 @@
+// A C++ program that does nothing: what every program costs.
+
+int main() {}

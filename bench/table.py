@@ -1,0 +1,89 @@
+#!/usr/bin/env python3
+"""Makes a table of results, and says which figures are reached."""
+
+import statistics
+import sys
+
+KINDS = ("operations", "options", "check", "property")
+MAP, HASH_MAP, LMDB, SQLITE = "std::map", "std::unordered_map", "LMDB", "SQLite"
+
+
+def read(path):
+    """The results by (measure, size) and contender; of repeated ones the median."""
+    found = {}
+    with open(path, encoding="ascii") as lines:
+        for line in lines:
+            measure, size, contender, _, value = line.rstrip("\n").split("\t")
+            found.setdefault((measure, size), {}).setdefault(contender, []).append(float(value))
+    return {key: {name: statistics.median(values) for name, values in row.items()} for key, row in found.items()}
+
+
+def shown(value):
+    return f"{value:,.0f}" if value >= 100 else f"{value:.3g}"
+
+
+def table(results):
+    contenders = []
+    for row in results.values():
+        contenders += [name for name in row if name not in contenders]
+    side_by_side = [name for name in contenders if any(len(row) > 1 and name in row for row in results.values())]
+    print("| measure | size | " + " | ".join(side_by_side) + " |")
+    print("|---" * (2 + len(side_by_side)) + "|")
+    for (measure, size), row in results.items():
+        if len(row) > 1 and measure != "batch":
+            cells = [shown(row[name]) if name in row else "" for name in side_by_side]
+            print(f"| {measure} | {size} | " + " | ".join(cells) + " |")
+    print("\n| measure | size | |\n|---|---|---|")
+    for (measure, size), row in results.items():
+        if len(row) == 1 or measure == "batch":
+            print(f"| {measure} | {size} | " + ", ".join(f"{name} {shown(value)}" for name, value in row.items()) + " |")
+
+
+def figures(results):
+    """Each figure as (what, where, value, limit); a value up to the limit reaches it."""
+    sizes = [size for measure, size in results if measure == "loading"]
+    for size in sizes:
+        for kind in ("operations", "options", "check"):
+            for wait in ("independent", "dependent"):
+                row = results[f"{kind}, {wait}", size]
+                mine = row["manager"]
+                yield f"{kind}, {wait}: part of a std::map", size, mine / row[MAP], 2
+                yield f"{kind}, {wait}: part of LMDB", size, mine / row[LMDB], 1 / 3
+                yield f"{kind}, {wait}: part of SQLite", size, mine / row[SQLITE], 1 / 5
+        for wait in ("independent", "dependent"):
+            row = results[f"property, {wait}", size]
+            mine = row["manager"]
+            yield f"property, {wait}: part of a flat unordered_map", size, mine / row[HASH_MAP], 1.5
+            yield f"property, {wait}: part of the faster of LMDB and SQLite", size, mine / min(row[LMDB], row[SQLITE]), 1
+        for kind in KINDS:
+            yield f"{kind}: allocations", size, results[f"{kind}, allocations", size]["manager"], 0
+        nothing = results["nothing", size]["process"]
+        if size in ("S", "L"):
+            first = results["first question", size]["process"] - nothing
+            yield "first question, ms", size, first, 1.5 if size == "S" else 12
+        batch = results["batch", size]["requests a second"]
+        yield "batch: 200,000 requests a second, part of what it does", size, 200_000 / batch, 1
+        if size == "L":
+            loading = results["loading", size]
+            memory = results["loading, peak memory", size]
+            yield "loading: part of a flat unordered_map", size, loading["manager"] / loading[HASH_MAP], 1.5
+            yield "memory: part of a flat unordered_map", size, memory["manager"] / memory[HASH_MAP], 2
+            yield "dump operations, ms", size, results["dump operations", size]["process"], 1000
+    if "S" in sizes and "L" in sizes:
+        measure = "operations, independent"
+        yield "operations: growth", "S to L", results[measure, "L"]["manager"] / results[measure, "S"]["manager"], 4
+    items = {size: row["manager"] for (measure, size), row in results.items() if measure == "item of a list"}
+    yield "item of a list: growth", "100 to 32767", items["32767"] / items["100"], 1.5
+
+
+def main():
+    results = read(sys.argv[1])
+    table(results)
+    print("\n| figure | size | measured | at most | |\n|---|---|---|---|---|")
+    for what, size, value, limit in figures(results):
+        verdict = "reached" if value <= limit else "not reached"
+        print(f"| {what} | {size} | {value:.2f} | {limit:.2f} | {verdict} |")
+
+
+if __name__ == "__main__":
+    main()

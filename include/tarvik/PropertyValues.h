@@ -1,0 +1,60 @@
+#pragma once
+
+#include <tarvik/ltptstr.h>
+
+#include <cstddef>
+#include <cstdint>
+#include <memory>
+#include <set>
+#include <string_view>
+#include <utility>
+
+/// The values of one property, and whose they are. Nearly all properties have one value, of which nearly always only
+/// the text is asked for: its set is not made before somebody wants the set itself.
+class PropertyValues {
+public:
+    using TextSet = std::set<StringBase, ltptstr>;
+
+    /// Who holds a property: the length of its name (the map has its text), and whether it is a flash.
+    struct Owner {
+        std::uint32_t length = 0;
+        bool isFlash = false;
+    };
+
+    /// Without a value.
+    PropertyValues() : m_set(std::make_unique<TextSet>()) {}
+
+    PropertyValues(StringBase value, Owner owner) : m_owner(owner), m_first(std::move(value)) {}
+
+    PropertyValues(TextSet values, Owner owner)
+        : m_owner(owner), m_set(std::make_unique<TextSet>(std::move(values))) {
+        if (!m_set->empty()) {
+            m_first = *m_set->begin();
+        }
+    }
+
+    [[nodiscard]] const Owner& owner() const noexcept { return m_owner; }
+    [[nodiscard]] bool empty() const noexcept { return m_set != nullptr && m_set->empty(); }
+
+    /// The first value in byte order, of one at least.
+    [[nodiscard]] const StringBase& first() const noexcept { return m_first; }
+
+    [[nodiscard]] bool contains(std::string_view value) const noexcept {
+        return m_set != nullptr ? m_set->find(value) != m_set->end() : ltptstr::view(m_first) == value;
+    }
+
+    /// All of them; valid as long as this object.
+    [[nodiscard]] const TextSet& set() const {
+        if (m_set == nullptr) {
+            m_set = std::make_unique<TextSet>(TextSet{m_first});
+        }
+        return *m_set;
+    }
+    [[nodiscard]] auto begin() const { return set().begin(); }
+    [[nodiscard]] auto end() const { return set().end(); }
+
+private:
+    Owner m_owner;
+    StringBase m_first;
+    mutable std::unique_ptr<TextSet> m_set; ///< null until it is wanted
+};

@@ -1,0 +1,28 @@
+#pragma once
+
+#include <tarvik/ltptstr.h>
+
+#include <cstddef>
+#include <functional>
+#include <string_view>
+
+/// Hashes texts for containers whose look-ups take a `std::string_view` without copying it. Not `noexcept` on
+/// purpose: the standard library then keeps each entry's hash, and need not take it again while it searches.
+struct TextHash {
+    using is_transparent = void;
+
+    template <typename Text>
+    [[nodiscard]] std::size_t operator()(const Text& text) const {
+        return std::hash<std::string_view>()(ltptstr::view(text));
+    }
+};
+
+/// Same length and same bytes.
+struct TextEqual {
+    using is_transparent = void;
+
+    template <typename Left, typename Right>
+    [[nodiscard]] bool operator()(const Left& left, const Right& right) const noexcept {
+        return ltptstr::view(left) == ltptstr::view(right);
+    }
+};
