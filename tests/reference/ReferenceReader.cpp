@@ -26,13 +26,16 @@ std::vector<std::string> physicalLines(std::string text) {
         text = text.substr(3);
     }
     std::vector<std::string> lines = split(text, '\n');
-    if (lines.back().empty()) {
-        lines.pop_back();
-    }
+    // What stands behind the last line end has none of its own: a CR there is text.
+    const std::string rest = lines.back();
+    lines.pop_back();
     for (std::string& line : lines) {
         if (line.ends_with('\r')) {
             line.pop_back();
         }
+    }
+    if (!rest.empty()) {
+        lines.push_back(rest);
     }
     return lines;
 }
@@ -59,7 +62,7 @@ std::optional<std::string> headerName(const std::string& line) {
         return std::nullopt;
     }
     const std::string name = header.substr(1, header.size() - 2);
-    if (name.find_first_of("[] \t") != std::string::npos) {
+    if (name.find_first_of("] \t") != std::string::npos) {
         return std::nullopt;
     }
     return name;
