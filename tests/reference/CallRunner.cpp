@@ -174,17 +174,6 @@ std::string invoke(Target& target, const Call& call) {
     return "no such method";
 }
 
-Outcome ask(ConstraintsManager& manager, ManagerMessages& messages, const Call& call) {
-    Outcome outcome;
-    try {
-        outcome.result = invoke(manager, call);
-    } catch (const TarvikException& exception) {
-        outcome.result = showRaised(exception);
-    }
-    outcome.messages = messages.take();
-    return outcome;
-}
-
 /// Both, alive over the same databases.
 class Pair {
 public:
@@ -244,6 +233,17 @@ private:
 };
 
 } // namespace
+
+Outcome ask(ConstraintsManager& manager, ManagerMessages& messages, const Call& call) {
+    Outcome outcome;
+    try {
+        outcome.result = invoke(manager, call);
+    } catch (const TarvikException& exception) {
+        outcome.result = showRaised(exception);
+    }
+    outcome.messages = messages.take();
+    return outcome;
+}
 
 Outcome ask(Reference& reference, const Call& call) {
     Outcome outcome;

@@ -10,6 +10,9 @@ namespace reference {
 /// Puts a call to the reference alone.
 [[nodiscard]] Outcome ask(Reference& reference, const Call& call);
 
+/// Puts a call to the manager alone, whose messages `messages` listens to.
+[[nodiscard]] Outcome ask(ConstraintsManager& manager, ManagerMessages& messages, const Call& call);
+
 /// What is compared behind the last call.
 enum class Ending {
     MEMBERS,
