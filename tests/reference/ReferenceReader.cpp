@@ -217,16 +217,21 @@ Databases::Databases(const std::map<std::string, std::string>& files) {
     }
 }
 
+Databases::Parsed::const_iterator Databases::find(const std::string& file) const {
+    return std::find_if(m_files.begin(), m_files.end(),
+                        [&](const auto& entry) { return lower(entry.first) == lower(file); });
+}
+
 Accessor Databases::file(const std::string& name) const {
-    return has(name) ? Accessor(&m_files.at(name).own, nullptr) : Accessor();
+    const auto found = find(name);
+    return found == m_files.end() ? Accessor() : Accessor(&found->second.own, nullptr);
 }
 
 Opened Databases::openWhole(const std::string& name) const {
     for (const std::string& fileName : {name, name + EXTENSION}) {
-        for (const auto& [file, content] : m_files) {
-            if (lower(file) == lower(fileName)) {
-                return {file.substr(0, file.size() - EXTENSION.size()), Accessor(&content.own, nullptr)};
-            }
+        if (const auto found = find(fileName); found != m_files.end()) {
+            return {found->first.substr(0, found->first.size() - EXTENSION.size()),
+                    Accessor(&found->second.own, nullptr)};
         }
     }
     for (const auto& [file, content] : m_files) {

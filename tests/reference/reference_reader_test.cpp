@@ -163,4 +163,11 @@ TEST(ReferenceReader, ANameIsCutOnlyWhenItIsNothingAsAWhole) {
     EXPECT_EQ(databases.open("fam").module, std::nullopt);
 }
 
+TEST(ReferenceDatabases, FilesAreFoundInAnyCase) {
+    const Databases databases(std::map<std::string, std::string>{{"Spi.acd", "A = 1\n"}});
+    EXPECT_TRUE(databases.has("spi.acd"));
+    EXPECT_THAT(databases.file("spi.acd").items("A"), ElementsAre("1"));
+    EXPECT_FALSE(databases.has("spi"));
+}
+
 } // namespace

@@ -45,6 +45,26 @@ TEST(PropertySets, NothingFoundIsTheSharedEmptySetAndSilent) {
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
+// So many of one length that several share each place of the table.
+TEST(PropertySets, NamesThatMeetInTheTableStayApart) {
+    const auto property = [](int number) { return "0_P" + std::to_string(1000 + number); };
+    constexpr int COUNT = 400;
+    std::string text = "[dev1]\n[dev10]\nPROPERTY = P1000,0";
+    for (int number = 1; number < COUNT; ++number) {
+        text += ":P" + std::to_string(1000 + number) + ',' + std::to_string(number);
+    }
+    ManagerOver manager(family(text + '\n'));
+    for (int number = 0; number < COUNT; ++number) {
+        const std::string own = property(number).substr(2);
+        EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev10", own.c_str())),
+                    ElementsAre(std::to_string(number)));
+        // As long as the name above, but of the device whose name ends one byte earlier.
+        EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", property(number).c_str())), IsEmpty());
+        EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev10", ("Q" + own.substr(1)).c_str())),
+                    IsEmpty());
+    }
+}
+
 TEST(PropertySets, KeysAreCaseSensitive) {
     ManagerOver manager(family("[dev1]\nPROPERTY = K,v\n"));
     EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "k")), IsEmpty());
