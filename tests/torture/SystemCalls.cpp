@@ -8,6 +8,7 @@
 #include <utility>
 
 #include <dirent.h>
+#include <fcntl.h>
 #include <sys/stat.h>
 #include <sys/types.h>
 
@@ -23,8 +24,9 @@ struct Watch {
     std::map<DIR*, std::string> directories;
 };
 
+/// Never destroyed: files are read and written behind the end of main, too.
 Watch& watched() {
-    static Watch watch;
+    static Watch& watch = *new Watch;
     return watch;
 }
 
@@ -73,7 +75,14 @@ int __wrap_open(const char* path, int flags, ...) {
     if (fails(SystemCalls::Kind::OPEN, path)) {
         return -1;
     }
-    const int descriptor = __real_open(path, flags);
+    mode_t mode = 0;
+    if ((flags & O_CREAT) != 0) {
+        va_list arguments;
+        va_start(arguments, flags);
+        mode = va_arg(arguments, mode_t);
+        va_end(arguments);
+    }
+    const int descriptor = __real_open(path, flags, mode);
     watched().files[descriptor] = path;
     return descriptor;
 }

@@ -47,21 +47,21 @@ TEST(PropertySets, NothingFoundIsTheSharedEmptySetAndSilent) {
 
 // So many of one length that several share each place of the table.
 TEST(PropertySets, NamesThatMeetInTheTableStayApart) {
-    const auto property = [](int number) { return "0_P" + std::to_string(1000 + number); };
+    const auto number = [](int index) { return std::to_string(1000 + index); };
     constexpr int COUNT = 400;
-    std::string text = "[dev1]\n[dev10]\nPROPERTY = P1000,0";
-    for (int number = 1; number < COUNT; ++number) {
-        text += ":P" + std::to_string(1000 + number) + ',' + std::to_string(number);
+    std::string text = "[dev1]\n[dev10]\nPROPERTY = ";
+    for (int index = 0; index < COUNT; ++index) {
+        text += (index == 0 ? "P" : ":P") + number(index) + ',' + number(index);
     }
     ManagerOver manager(family(text + '\n'));
-    for (int number = 0; number < COUNT; ++number) {
-        const std::string own = property(number).substr(2);
-        EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev10", own.c_str())),
-                    ElementsAre(std::to_string(number)));
-        // As long as the name above, but of the device whose name ends one byte earlier.
-        EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", property(number).c_str())), IsEmpty());
-        EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev10", ("Q" + own.substr(1)).c_str())),
-                    IsEmpty());
+    const auto values = [&](const char* device, const std::string& key) {
+        return textsOf(manager->getDeviceStringProperties(device, key.c_str()));
+    };
+    for (int index = 0; index < COUNT; ++index) {
+        EXPECT_THAT(values("dev10", 'P' + number(index)), ElementsAre(number(index)));
+        EXPECT_THAT(values("dev10", 'Q' + number(index)), IsEmpty());
+        // As long as the first, and begun alike, but divided one byte earlier.
+        EXPECT_THAT(values("dev1", "0P" + number(index)), IsEmpty());
     }
 }
 
