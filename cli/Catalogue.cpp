@@ -7,6 +7,9 @@
 
 #include <fmt/format.h>
 
+#include <iterator>
+#include <utility>
+
 namespace catalogue {
 
 namespace {
@@ -28,6 +31,25 @@ void forEachPiece(std::string_view text, char separator, Use use) {
     }
 }
 
+/// The last entry of each name.
+std::map<std::string, Entry> lastEntries(const AcdStore::Value& value) {
+    std::map<std::string, Entry> found;
+    forEachPiece(value.text, ':', [&](std::string_view text, std::size_t offset) {
+        Entry entry{originOf(value.at(offset)), value.fromSection, std::string(text), {}};
+        const auto [known, isNew] = found.try_emplace(std::string(text.substr(0, text.find(','))));
+        if (!isNew) {
+            Entry& former = known->second;
+            entry.shadows = std::move(former.shadows);
+            // An entry that was appended on top.
+            if (former.origin.layer != entry.origin.layer) {
+                entry.shadows.insert(entry.shadows.begin(), {former.origin, former.text});
+            }
+        }
+        known->second = std::move(entry);
+    });
+    return found;
+}
+
 } // namespace
 
 std::string asText(const Origin& origin) {
@@ -35,19 +57,49 @@ std::string asText(const Origin& origin) {
 }
 
 Json asJson(const Origin& origin) {
-    return {{"file", origin.file}, {"line", origin.line}, {"column", origin.column}};
+    Json object{{"file", origin.file}, {"line", origin.line}, {"column", origin.column}};
+    if (AcdStore::searchPath().size() > 1) {
+        object["layer"] = origin.layer;
+    }
+    return object;
+}
+
+Origin originOf(const AcdStore::Fragment& place) {
+    return {std::string(place.file), place.line, place.column, std::string(place.layer)};
+}
+
+Shadows shadowsOf(const AcdStore::Value& value) {
+    Shadows shadows;
+    for (const AcdStore::Value& replaced : value.replaced) {
+        shadows.push_back({originOf(replaced.fragments.front()), std::string(replaced.text)});
+    }
+    return shadows;
+}
+
+Json asJson(const Shadows& shadows) {
+    Json list = Json::array();
+    for (const Shadow& shadow : shadows) {
+        Json object = asJson(shadow.origin);
+        object["text"] = shadow.text;
+        list.push_back(std::move(object));
+    }
+    return list;
 }
 
 std::map<std::string, Entry> entries(const std::string& database, const std::string& key) {
-    std::map<std::string, Entry> found;
     const std::optional<AcdStore::Value> value = AcdStore::value(database.c_str(), key.c_str());
-    if (value) {
-        forEachPiece(value->text, ':', [&](std::string_view entry, std::size_t offset) {
-            const AcdStore::Fragment place = value->at(offset);
-            found.insert_or_assign(
-                std::string(entry.substr(0, entry.find(','))),
-                Entry{{std::string(place.file), place.line, place.column}, value->fromSection});
-        });
+    if (!value) {
+        return {};
+    }
+    std::map<std::string, Entry> found = lastEntries(*value);
+    for (const AcdStore::Value& replaced : value->replaced) {
+        for (auto& [name, below] : lastEntries(replaced)) {
+            if (const auto entry = found.find(name); entry != found.end()) {
+                Shadows& shadows = entry->second.shadows;
+                shadows.push_back({below.origin, std::move(below.text)});
+                std::move(below.shadows.begin(), below.shadows.end(), std::back_inserter(shadows));
+            }
+        }
     }
     return found;
 }

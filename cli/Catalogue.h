@@ -18,16 +18,35 @@ struct Origin {
     std::string file;
     unsigned line;
     unsigned column;
+    std::string layer{}; ///< the directory of the search path
 };
 
 /// "file:line:column".
 [[nodiscard]] std::string asText(const Origin& origin);
+
+/// With its layer, where there are several.
 [[nodiscard]] Json asJson(const Origin& origin);
+
+[[nodiscard]] Origin originOf(const AcdStore::Fragment& place);
+
+/// A text of a layer below that another one on top stands for.
+struct Shadow {
+    Origin origin;
+    std::string text;
+};
+
+using Shadows = std::vector<Shadow>;
+
+/// The whole values that a value stands for, the upper ones first.
+[[nodiscard]] Shadows shadowsOf(const AcdStore::Value& value);
+[[nodiscard]] Json asJson(const Shadows& shadows);
 
 /// One entry of a list "name,...:name,...".
 struct Entry {
     Origin origin;
     bool ofDevice; ///< false: it stands among the family's own keys
+    std::string text;
+    Shadows shadows; ///< entries of this name in layers below, the upper ones first
 };
 
 /// The entries of a key by their names, the last of each name.

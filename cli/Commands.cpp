@@ -55,7 +55,8 @@ const std::vector<Command>& commands() {
          declareLint},
         {"diff", "Tell which answers two databases give differently",
          "tarvik diff database changed\n"
-         "tarvik diff company site:company --json",
+         "tarvik diff company site:company --json\n"
+         "tarvik diff released database --format markdown",
          declareDiff},
         {"batch", "Answer requests for the whole interface, JSON line by line",
          R"(echo '{"id": 1, "call": "getPartFamily", "args": ["KS50"]}' | tarvik batch)", declareBatch},

@@ -43,7 +43,8 @@ std::optional<DeviceSheet::Idcode> idcode(const ConstraintsManager& manager, con
     if (!found) {
         return std::nullopt;
     }
-    return DeviceSheet::Idcode{found->value, catalogue::entries("base.acd", "IDCODE").at(found->name).origin};
+    const catalogue::Entry entry = catalogue::entries("base.acd", "IDCODE").at(found->name);
+    return DeviceSheet::Idcode{found->value, entry.origin, entry.shadows};
 }
 
 std::vector<DeviceSheet::Arrangement> arrangements(const ConstraintsManager& manager,

@@ -19,6 +19,7 @@ struct DeviceSheet {
     struct Idcode {
         std::string value;
         catalogue::Origin origin;
+        catalogue::Shadows shadows;
     };
 
     struct Arrangement {

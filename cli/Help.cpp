@@ -6,6 +6,7 @@
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
+#include <algorithm>
 #include <sstream>
 
 namespace {
@@ -14,15 +15,12 @@ namespace {
 constexpr std::size_t OPTION_COLUMN = 28;
 constexpr std::size_t COMMAND_COLUMN = 21;
 
-std::string broken(const std::string& description, std::size_t column) {
-    std::istringstream words(description);
-    const std::vector<std::string> all{std::istream_iterator<std::string>(words), {}};
-    return fmt::format("{}", fmt::join(lines(all, LINE_WIDTH - column, ""), "\n"));
-}
+/// What the descriptions have at least.
+constexpr std::size_t LEAST_WIDTH = 20;
 
 } // namespace
 
-HelpFormatter::HelpFormatter() {
+HelpFormatter::HelpFormatter(std::size_t width) : m_width(width) {
     column_width(OPTION_COLUMN);
     label("SUBCOMMAND", "COMMAND");
     label("REQUIRED", "(required)");
@@ -37,4 +35,9 @@ std::string HelpFormatter::make_subcommand(const CLI::App* command) const {
     CLI::detail::format_help(text, command->get_display_name(true),
                              broken(command->get_description(), COMMAND_COLUMN), COMMAND_COLUMN);
     return text.str();
+}
+
+std::string HelpFormatter::broken(const std::string& description, std::size_t column) const {
+    const std::size_t room = std::max(m_width, column + LEAST_WIDTH) - column;
+    return fmt::format("{}", fmt::join(lines(wordsOf(description), room, ""), "\n"));
 }

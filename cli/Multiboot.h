@@ -10,4 +10,23 @@ inline constexpr const char* TYPE_PREFIX = "TYPE_";
 inline const std::vector<std::string> TYPES{"TYPE_BPI", "TYPE_MB_SPI", "TYPE_MB_BPI", "TYPE_MB_QPRM"};
 inline const std::vector<std::string> WIDTHS{"SERIAL", "PARALLEL", "NONE"};
 
+/// The keys of the lists that a database can have.
+[[nodiscard]] inline const std::vector<std::string>& keys() {
+    static const std::vector<std::string> all = [] {
+        std::vector<std::string> joined;
+        for (const std::string& type : TYPES) {
+            // A serial flash has no width to choose, a parallel one always has.
+            const bool isParallelBus = type.ends_with("BPI");
+            for (const std::string& width : WIDTHS) {
+                if ((width != "NONE") == isParallelBus) {
+                    joined.push_back(type + '_' + width + "_LEAD");
+                    joined.push_back(type + '_' + width + "_CHAIN");
+                }
+            }
+        }
+        return joined;
+    }();
+    return all;
+}
+
 } // namespace multiboot

@@ -67,6 +67,10 @@ void writeError(std::string_view line) {
     if (!text.ends_with('\n')) {
         text += '\n';
     }
+    writePiece(text);
+}
+
+void writePiece(std::string_view text) {
     // There is nowhere left to report a fault of standard error.
     static_cast<void>(writeAll(STDERR_FILENO, text));
 }

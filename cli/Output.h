@@ -26,3 +26,6 @@ private:
 
 /// Writes a text to standard error, and a line end where the text has none.
 void writeError(std::string_view line);
+
+/// Writes a text to standard error as it is.
+void writePiece(std::string_view text);

@@ -9,7 +9,6 @@
 #include <tarvik/ConstraintsManager.h>
 
 #include <fmt/format.h>
-#include <fmt/ranges.h>
 
 #include <algorithm>
 #include <map>
@@ -19,7 +18,7 @@ namespace {
 using Entries = std::map<std::string, catalogue::Entry>;
 
 /// What names and places leave of a line for the values.
-std::size_t valueWidth(const Properties& properties, std::size_t indent) {
+std::size_t valueWidth(const Properties& properties, std::size_t lineWidth, std::size_t indent) {
     // Two blanks behind each column but the last, and the comma at the end of a broken line.
     constexpr std::size_t GAPS = 3 * 2 + 1;
     constexpr std::size_t LEAST = 12;
@@ -32,7 +31,7 @@ std::size_t valueWidth(const Properties& properties, std::size_t indent) {
         where = std::max(where, catalogue::asText(property.origin).size());
     }
     const std::size_t taken = indent + key + from + where + GAPS;
-    return std::max(LEAST, LINE_WIDTH - std::min(LINE_WIDTH, taken));
+    return std::max(LEAST, lineWidth - std::min(lineWidth, taken));
 }
 
 /// The property entries of an owner, as the manager loads them: PROPERTIES behind PROPERTY, so it wins.
@@ -67,7 +66,7 @@ Properties deviceProperties(ConstraintsManager& manager, const std::string& devi
     all.merge(propertyEntries(plain(manager.getPartFamily(device.c_str()))));
     Properties properties;
     for (const auto& [key, entry] : all) {
-        Property property{key, {}, entry.ofDevice ? "device" : "family", entry.origin};
+        Property property{key, {}, entry.ofDevice ? "device" : "family", entry.origin, entry.shadows};
         for (const StringBase& value : manager.getDeviceStringProperties(device.c_str(), key.c_str())) {
             property.values.push_back(plain(value));
         }
@@ -79,8 +78,11 @@ Properties deviceProperties(ConstraintsManager& manager, const std::string& devi
 Properties flashProperties(const ConstraintsManager& manager, const std::string& device) {
     Properties properties;
     const auto add = [&](const std::string& key, const std::string& from, const catalogue::Entry& entry) {
-        properties.push_back(
-            {key, {manager.getSpiDeviceStringProperty(device.c_str(), key.c_str())}, from, entry.origin});
+        properties.push_back({key,
+                              {manager.getSpiDeviceStringProperty(device.c_str(), key.c_str())},
+                              from,
+                              entry.origin,
+                              entry.shadows});
     };
     const Entries own = flashEntries(device);
     for (const auto& [key, entry] : own) {
@@ -96,9 +98,9 @@ Properties flashProperties(const ConstraintsManager& manager, const std::string&
     return properties;
 }
 
-std::string asText(const Properties& properties, std::size_t indent) {
+std::string asText(const Properties& properties, const Terminal& terminal, std::size_t indent) {
     Table table({"PROPERTY", "VALUE", "FROM", "WHERE"});
-    const std::size_t width = valueWidth(properties, indent);
+    const std::size_t width = valueWidth(properties, terminal.width(), indent);
     for (const Property& property : properties) {
         const std::vector<std::string> values = lines(property.values, width);
         table.add({property.key, values.empty() ? "(none)" : values.front(), property.from,
@@ -106,8 +108,11 @@ std::string asText(const Properties& properties, std::size_t indent) {
         for (std::size_t i = 1; i < values.size(); ++i) {
             table.add({"", values[i]});
         }
+        for (const catalogue::Shadow& shadow : property.shadows) {
+            table.add({"", shadow.text, "shadowed", catalogue::asText(shadow.origin)});
+        }
     }
-    return table.text(indent);
+    return table.text(terminal, indent);
 }
 
 Json asJson(const Properties& properties) {
@@ -115,13 +120,20 @@ Json asJson(const Properties& properties) {
     for (const Property& property : properties) {
         Json object{{"key", property.key}, {"values", property.values}, {"from", property.from}};
         object.update(catalogue::asJson(property.origin));
+        if (!property.shadows.empty()) {
+            object["shadows"] = catalogue::asJson(property.shadows);
+        }
         list.push_back(std::move(object));
     }
     return list;
 }
 
-std::string asText(const PropertyAnswer& answer) {
-    return fmt::format("{}\n", fmt::join(answer.values, "\n"));
+std::string asText(const PropertyAnswer& answer, const Terminal& terminal) {
+    std::string text;
+    for (const std::string& value : answer.values) {
+        text += terminal.shown(value) + '\n';
+    }
+    return text;
 }
 
 Json asJson(const PropertyAnswer& answer) {

@@ -6,6 +6,7 @@
 #include <vector>
 
 class ConstraintsManager;
+class Terminal;
 class Tool;
 
 /// One property: its values as the manager gives them, and where the database has them from.
@@ -14,6 +15,7 @@ struct Property {
     std::vector<std::string> values; ///< in byte order
     std::string from;                ///< "device", "family", or the class of an SPI flash
     catalogue::Origin origin;
+    catalogue::Shadows shadows;
 };
 
 using Properties = std::vector<Property>;
@@ -25,7 +27,7 @@ using Properties = std::vector<Property>;
 [[nodiscard]] Properties flashProperties(const ConstraintsManager& manager, const std::string& device);
 
 /// A table of properties, behind `indent` blanks.
-[[nodiscard]] std::string asText(const Properties& properties, std::size_t indent);
+[[nodiscard]] std::string asText(const Properties& properties, const Terminal& terminal, std::size_t indent);
 [[nodiscard]] Json asJson(const Properties& properties);
 
 /// What was found for one key.
@@ -35,7 +37,7 @@ struct PropertyAnswer {
     std::vector<std::string> values;
 };
 
-[[nodiscard]] std::string asText(const PropertyAnswer& answer);
+[[nodiscard]] std::string asText(const PropertyAnswer& answer, const Terminal& terminal);
 [[nodiscard]] Json asJson(const PropertyAnswer& answer);
 
 /// Shows the values one a line. No values: the answer is no, with a suggestion from the properties there are.

@@ -5,11 +5,13 @@
 
 #include <tarvik/ConstraintsManager.h>
 
+#include <unistd.h>
 #include <utility>
 
 using Channel = Port_MsgManData::Channel;
 
-Tool::Tool(Settings settings) : m_settings(std::move(settings)) {}
+Tool::Tool(Settings settings)
+    : m_settings(std::move(settings)), m_terminal(STDOUT_FILENO, m_settings.colours) {}
 
 void Tool::openDatabase() {
     if (!m_opened) {

@@ -4,6 +4,7 @@
 #include "Messages.h"
 #include "Output.h"
 #include "Status.h"
+#include "Terminal.h"
 
 #include <string>
 #include <vector>
@@ -17,6 +18,7 @@ public:
         std::vector<std::string> databases;
         bool json = false;
         bool verbose = false;
+        Terminal::Colours colours = Terminal::Colours::AUTOMATIC;
     };
 
     explicit Tool(Settings settings);
@@ -33,14 +35,14 @@ public:
     [[nodiscard]] Output& output() noexcept { return m_output; }
 
     /// Shows what a command found, as text or as a JSON object, behind the messages that came with it.
-    /// @param facts anything with `std::string asText(facts)` and `Json asJson(facts)`
+    /// @param facts anything with `std::string asText(facts, const Terminal&)` and `Json asJson(facts)`
     /// @return the status
     template <typename Facts>
     [[nodiscard]] Status answer(const Facts& facts, Status status = Status::YES) {
         if (m_settings.json) {
             showJson(asJson(facts));
         } else {
-            showText(asText(facts));
+            showText(asText(facts, m_terminal));
         }
         return status;
     }
@@ -64,5 +66,6 @@ private:
     Settings m_settings;
     Messages m_messages;
     Output m_output;
+    Terminal m_terminal;
     bool m_opened = false;
 };

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "Json.h"
+#include "Terminal.h"
 
 #include <string>
 
@@ -11,8 +12,8 @@ struct Verdict {
     Json asked;           ///< the arguments, as the JSON object shows them
 };
 
-[[nodiscard]] inline std::string asText(const Verdict& verdict) {
-    return (verdict.allowed ? "yes: " : "no: ") + verdict.question + '\n';
+[[nodiscard]] inline std::string asText(const Verdict& verdict, const Terminal& terminal) {
+    return (verdict.allowed ? terminal.good("yes:") : terminal.bad("no:")) + ' ' + verdict.question + '\n';
 }
 
 [[nodiscard]] inline Json asJson(const Verdict& verdict) {

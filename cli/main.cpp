@@ -2,7 +2,9 @@
 #include "Command.h"
 #include "Help.h"
 #include "Nearest.h"
+#include "OptionNames.h"
 #include "Tool.h"
+#include "completion/Completion.h"
 
 #include <TarvikException.h>
 
@@ -10,15 +12,25 @@
 
 #include <fmt/format.h>
 
+#include <algorithm>
 #include <csignal>
 #include <sstream>
+#include <unistd.h>
 
 namespace {
 
 struct CommandLine {
     Tool::Settings settings;
+    std::string colours = "auto";
     Action action;
 };
+
+Terminal::Colours coloursOf(const std::string& when) {
+    if (when == "auto") {
+        return Terminal::Colours::AUTOMATIC;
+    }
+    return when == "always" ? Terminal::Colours::ALWAYS : Terminal::Colours::NEVER;
+}
 
 std::string examples(const Command& command) {
     std::string text = "Examples:\n";
@@ -31,7 +43,8 @@ std::string examples(const Command& command) {
 
 void declare(CLI::App& parser, CommandLine& line) {
     parser.require_subcommand(1);
-    parser.formatter(std::make_shared<HelpFormatter>());
+    parser.formatter(
+        std::make_shared<HelpFormatter>(Terminal(STDOUT_FILENO, Terminal::Colours::NEVER).width()));
     parser.set_version_flag("--version", "tarvik " TARVIK_VERSION);
     parser
         .add_option("--database", line.settings.databases,
@@ -41,6 +54,11 @@ void declare(CLI::App& parser, CommandLine& line) {
         ->allow_extra_args(false);
     parser.add_flag("--json", line.settings.json, "Answer with one JSON object");
     parser.add_flag("--verbose", line.settings.verbose, "Show the manager's debug messages");
+    parser
+        .add_option("--color", line.colours,
+                    "Whether to use colours: auto (on a terminal, unless NO_COLOR is set), always or never")
+        ->check(CLI::IsMember({"auto", "always", "never"}))
+        ->type_name("WHEN");
     for (const Command& command : commands()) {
         CLI::App* const subparser = parser.add_subcommand(command.name, command.summary);
         subparser->fallthrough();
@@ -58,23 +76,36 @@ std::vector<std::string> commandNames() {
     return names;
 }
 
+/// What was not understood.
+std::string unexpected(const CLI::App& parser, const CLI::App* command, const std::string& word) {
+    if (word.starts_with('-')) {
+        std::vector<std::string> names;
+        for (OptionName& option : optionNames(parser, command)) {
+            names.push_back(std::move(option.name));
+        }
+        return fmt::format("unknown option \"{}\"{}", word, didYouMean(word, names));
+    }
+    return command == nullptr
+               ? fmt::format("unknown command \"{}\"{}", word, didYouMean(word, commandNames()))
+               : fmt::format("\"{}\" is one argument too many", word);
+}
+
 /// What is wrong with the command line, and where to read on.
 std::string explained(const CLI::App& parser, const CLI::ParseError& fault) {
     const std::vector<const CLI::App*> chosen =
         parser.get_subcommands([](const CLI::App* command) { return command->parsed(); });
-    if (!chosen.empty()) {
-        return fmt::format("{}\nsee: tarvik {} --help", fault.what(), chosen.front()->get_name());
-    }
-    const std::vector<std::string> unexpected = parser.remaining();
+    const CLI::App* const command = chosen.empty() ? nullptr : chosen.front();
+    const std::vector<std::string> rest = parser.remaining(true);
     std::string explanation = fault.what();
-    if (!unexpected.empty()) {
-        const bool option = unexpected.front().starts_with('-');
-        explanation = fmt::format("unknown {} \"{}\"{}", option ? "option" : "command", unexpected.front(),
-                                  option ? "" : didYouMean(unexpected.front(), commandNames()));
-    } else if (dynamic_cast<const CLI::RequiredError*>(&fault) != nullptr) {
+    // A mistyped option is more likely at fault than what is missing instead.
+    if (!rest.empty() && (command == nullptr || rest.front().starts_with('-') ||
+                          dynamic_cast<const CLI::ExtrasError*>(&fault) != nullptr)) {
+        explanation = unexpected(parser, command, rest.front());
+    } else if (command == nullptr && dynamic_cast<const CLI::RequiredError*>(&fault) != nullptr) {
         explanation = "a command is required";
     }
-    return explanation + "\nsee: tarvik --help";
+    return fmt::format("{}\nsee: tarvik {}--help", explanation,
+                       command == nullptr ? "" : command->get_name() + ' ');
 }
 
 Status run(int argc, char** argv) {
@@ -82,12 +113,20 @@ Status run(int argc, char** argv) {
                     "tarvik");
     CommandLine line;
     declare(parser, line);
+    const std::vector<std::string> words(argv + std::min(argc, 1), argv + argc);
+    // Asked by the shells' completions. The words behind it are those of an unfinished command line, so they are
+    // not parsed with the rest.
+    if (!words.empty() && words.front() == "complete") {
+        return completion::complete(parser, {words.begin() + 1, words.end()});
+    }
     try {
         parser.parse(argc, argv);
     } catch (const CLI::ParseError& fault) {
         std::ostringstream text;
         if (fault.get_exit_code() != 0) {
-            throw Failure(Status::FAULT, explained(parser, fault));
+            // What stands behind the fault was not parsed.
+            line.settings.json = std::find(words.begin(), words.end(), "--json") != words.end();
+            return Tool(line.settings).fail({Status::FAULT, explained(parser, fault)});
         }
         parser.exit(fault, text, text);
         Output output;
@@ -95,6 +134,7 @@ Status run(int argc, char** argv) {
         output.flush();
         return Status::YES;
     }
+    line.settings.colours = coloursOf(line.colours);
     Tool tool(line.settings);
     try {
         return line.action(tool);

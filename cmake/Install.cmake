@@ -1,4 +1,5 @@
-# What `cmake --install` puts where, by component: runtime, development, tool, data, documentation.
+# What `cmake --install` puts where, by component: runtime, development, tool, data, documentation; and, only when asked
+# for by name, database.
 include(CMakePackageConfigHelpers)
 
 set(package_directory ${CMAKE_INSTALL_LIBDIR}/cmake/TarvikConstraintsManager)
@@ -34,8 +35,24 @@ install(FILES ${CMAKE_CURRENT_BINARY_DIR}/tarvik-constraints-manager.pc
 if(TARGET tarvik)
   set_target_properties(tarvik PROPERTIES INSTALL_RPATH "$ORIGIN/${libraries_from_tool}")
   install(TARGETS tarvik RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT tool)
+  install(FILES docs/tarvik.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1 COMPONENT tool)
+  install(DIRECTORY cli/schema DESTINATION ${CMAKE_INSTALL_DATADIR}/tarvik COMPONENT tool)
+  # Where each shell looks for completions by itself.
+  install(FILES cli/completion/tarvik.bash RENAME tarvik
+    DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions COMPONENT tool)
+  install(FILES cli/completion/_tarvik
+    DESTINATION ${CMAKE_INSTALL_DATADIR}/zsh/site-functions COMPONENT tool)
+  install(FILES cli/completion/tarvik.fish
+    DESTINATION ${CMAKE_INSTALL_DATADIR}/fish/vendor_completions.d COMPONENT tool)
 endif()
 install(DIRECTORY database/ DESTINATION ${CMAKE_INSTALL_DATADIR}/tarvik/demonstration COMPONENT data)
-install(FILES README.md CHANGELOG.md DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT documentation)
-install(DIRECTORY docs/ DESTINATION ${CMAKE_INSTALL_DOCDIR}/docs COMPONENT documentation)
+
+# Makes the demonstration the database of the installed library, which never falls back to it by itself.
+file(CREATE_LINK demonstration ${CMAKE_CURRENT_BINARY_DIR}/installed-database SYMBOLIC)
+install(FILES ${CMAKE_CURRENT_BINARY_DIR}/installed-database RENAME database
+  DESTINATION ${CMAKE_INSTALL_DATADIR}/tarvik COMPONENT database EXCLUDE_FROM_ALL)
+
+install(FILES README.md CONTRIBUTING.md CHANGELOG.md DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT documentation)
+install(DIRECTORY docs DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT documentation
+  PATTERN Doxyfile EXCLUDE PATTERN "*.1" EXCLUDE)
 install(DIRECTORY examples DESTINATION ${CMAKE_INSTALL_DOCDIR} COMPONENT documentation)

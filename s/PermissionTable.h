@@ -3,7 +3,6 @@
 // The permission table: which rows (operations, options) are allowed in which mode through which output, in a
 // block for each family or package.
 
-#include <algorithm>
 #include <cstddef>
 #include <cstdint>
 #include <vector>
@@ -51,7 +50,7 @@ private:
 
     [[nodiscard]] static bool isWithin(int value, int bound) noexcept { return value >= 0 && value < bound; }
 
-    [[nodiscard]] bool isRow(int row) const noexcept { return isWithin(row, std::min(m_rows, MOST_ROWS)); }
+    [[nodiscard]] bool isRow(int row) const noexcept { return isWithin(row, m_rows) && row < MOST_ROWS; }
 
     [[nodiscard]] bool isCell(std::size_t block, int mode, int output) const noexcept {
         return block < m_blocks && isWithin(mode, m_modes) && isWithin(output, m_outputs);

@@ -8,6 +8,7 @@
 #include <tarvik/ConstraintsManager.h>
 
 #include <array>
+#include <limits>
 
 // What the base database says once and for all: the mode tables, the lists of names, and the size of the
 // permission tables that follows from them.
@@ -67,6 +68,13 @@ void ConstraintsManager::loadDeviceIdcodes() {
 void ConstraintsManager::loadNotSupportedParts() {
     m_notSupportedPartInMode = NameSet(readList(*m_devKey, "NOT_SUPPORTED_PART_IN_MODE"));
 }
+
+// Each operation and option has a row in the tables, and a bit in the masks that questions are answered with.
+static_assert(extent::OPERATIONS == vocabulary::OPERATIONS.size());
+static_assert(extent::OPTIONS == vocabulary::OPTIONS.size());
+static_assert(extent::OPERATIONS <= std::numeric_limits<unsigned>::digits);
+static_assert(extent::OPTIONS <= std::numeric_limits<unsigned>::digits);
+static_assert(static_cast<int>(TARVIKNS::NO_OPERATION) == extent::OPERATIONS);
 
 void ConstraintsManager::allocateTables() {
     const std::size_t families = m_supportedDevices.size();

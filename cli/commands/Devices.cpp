@@ -33,12 +33,12 @@ struct Device {
 
 using Devices = std::vector<Device>;
 
-std::string asText(const Devices& devices) {
+std::string asText(const Devices& devices, const Terminal& terminal) {
     Table table({"DEVICE", "FAMILY", "IDCODE"});
     for (const Device& device : devices) {
         table.add({device.name, device.family, device.idcode ? device.idcode->value : "-"});
     }
-    return table.text();
+    return table.text(terminal);
 }
 
 Json asJson(const Devices& devices) {
@@ -90,7 +90,8 @@ Status run(Tool& tool, const Arguments& arguments) {
     if (devices.empty()) {
         throw Failure(Status::NO, arguments.glob.empty()
                                       ? "there is no such device"
-                                      : fmt::format("no device matches \"{}\"", arguments.glob));
+                                      : fmt::format("no device matches \"{}\"{}", arguments.glob,
+                                                    didYouMean(arguments.glob, catalogue::names())));
     }
     return tool.answer(devices);
 }

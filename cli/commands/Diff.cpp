@@ -2,7 +2,7 @@
 #include "commands/Declarations.h"
 
 #include "Tool.h"
-#include "diff/Comparison.h"
+#include "diff/Presentation.h"
 
 #include <CLI/CLI.hpp>
 
@@ -14,6 +14,7 @@ namespace {
 struct Arguments {
     std::string oldDatabase;
     std::string newDatabase;
+    std::string format = "text";
 };
 
 /// The directories of a database whose layers are separated by ":".
@@ -31,15 +32,23 @@ std::vector<std::string> layers(const std::string& text) {
     return directories;
 }
 
+/// A comparison as release notes show it.
+struct ReleaseNotes {
+    const diff::Comparison& comparison;
+};
+
+std::string asText(const ReleaseNotes& notes, const Terminal& /*any*/) {
+    return diff::asMarkdown(notes.comparison);
+}
+Json asJson(const ReleaseNotes& notes) { return diff::asJson(notes.comparison); }
+
 Status run(Tool& tool, const Arguments& arguments) {
-    const std::vector<std::string> oldLayers = layers(arguments.oldDatabase);
-    const std::vector<std::string> newLayers = layers(arguments.newDatabase);
-    const diff::Names oldNames = diff::namesOf(oldLayers);
-    const diff::Names newNames = diff::namesOf(newLayers);
-    const diff::Names common = diff::commonNames(oldNames, newNames);
-    const diff::Comparison comparison =
-        compare(oldNames, newNames, diff::factsOf(oldLayers, common), diff::factsOf(newLayers, common));
-    return tool.answer(comparison, comparison.isEmpty() ? Status::YES : Status::NO);
+    const auto [oldFacts, newFacts] =
+        diff::factsOf(layers(arguments.oldDatabase), layers(arguments.newDatabase));
+    const diff::Comparison comparison = diff::compare(oldFacts, newFacts);
+    const Status status = comparison.isEmpty() ? Status::YES : Status::NO;
+    return arguments.format == "markdown" ? tool.answer(ReleaseNotes{comparison}, status)
+                                          : tool.answer(comparison, status);
 }
 
 } // namespace
@@ -54,5 +63,8 @@ Action declareDiff(CLI::App& parser) {
     parser.add_option("NEW", arguments->newDatabase, "The database to hold against it")
         ->required()
         ->type_name("");
+    parser.add_option("--format", arguments->format, "How to tell it: text, or markdown for release notes")
+        ->check(CLI::IsMember({"text", "markdown"}))
+        ->type_name("FORMAT");
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }

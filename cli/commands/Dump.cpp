@@ -27,7 +27,7 @@ struct Dump {
     std::string text;
 };
 
-std::string asText(const Dump& dump) { return dump.text; }
+std::string asText(const Dump& dump, const Terminal&) { return dump.text; }
 
 Json asJson(const Dump& dump) { return {{"table", dump.table}, {"text", dump.text}}; }
 

@@ -20,13 +20,13 @@ struct Family {
 
 using Families = std::vector<Family>;
 
-std::string asText(const Families& families) {
+std::string asText(const Families& families, const Terminal& terminal) {
     Table table({"FAMILY", "DEVICES", "MODES"});
     for (const Family& family : families) {
         table.add(
             {family.name, std::to_string(family.devices), fmt::format("{}", fmt::join(family.modes, " "))});
     }
-    return table.text();
+    return table.text(terminal);
 }
 
 Json asJson(const Families& families) {

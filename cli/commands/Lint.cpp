@@ -2,6 +2,8 @@
 #include "commands/Declarations.h"
 
 #include "Database.h"
+#include "Progress.h"
+#include "Table.h"
 #include "Tool.h"
 #include "lint/Ignores.h"
 #include "lint/Report.h"
@@ -9,6 +11,7 @@
 #include <CLI/CLI.hpp>
 
 #include <fmt/format.h>
+#include <fmt/ranges.h>
 
 #include <algorithm>
 #include <memory>
@@ -55,27 +58,14 @@ std::string indented(std::string_view text) {
     return result + '\n';
 }
 
-/// The words of a text in lines of at most 80 bytes.
-std::string filled(std::string_view text) {
-    constexpr std::size_t LINE_WIDTH = 80;
-    std::string result;
-    std::size_t column = 0;
-    while (!text.empty()) {
-        const std::string_view word = text.substr(0, text.find(' '));
-        const bool fits = column + 1 + word.size() <= LINE_WIDTH;
-        result += column == 0 ? "" : fits ? " " : "\n";
-        column = column == 0 || !fits ? word.size() : column + 1 + word.size();
-        result += word;
-        text.remove_prefix(std::min(word.size() + 1, text.size()));
-    }
-    return result + '\n';
-}
-
-std::string asText(const Explanations& explanations) {
+std::string asText(const Explanations& explanations, const Terminal& terminal) {
     std::string text;
     for (const lint::Rule* rule : explanations.rules) {
-        text += fmt::format("{}{} ({}): {}\n\n{}", text.empty() ? "" : "\n", rule->code, nameOf(rule->level),
-                            rule->title, filled(rule->explanation));
+        const std::string title = fmt::format("{} ({}): {}", rule->code, nameOf(rule->level), rule->title);
+        const std::vector<std::string> explanation =
+            lines(wordsOf(std::string(rule->explanation)), terminal.width(), "");
+        text += fmt::format("{}{}\n\n{}\n", text.empty() ? "" : "\n", terminal.heading(title),
+                            fmt::join(explanation, "\n"));
         if (!rule->example.empty()) {
             text += "\nFound in:\n\n" + indented(rule->example);
         }
@@ -117,10 +107,13 @@ bool isWanted(std::string_view code, const Arguments& arguments) {
 
 lint::Report examine(const lint::Model& model, const Arguments& arguments) {
     lint::Findings findings;
+    Progress progress("looking for findings");
+    std::size_t done = 0;
     for (const lint::Group& group : lint::groups()) {
         if (group.check != nullptr) {
             group.check(model, findings);
         }
+        progress.reach(++done, lint::groups().size());
     }
     // Comments first: one that ignores a finding is used, whether or not that finding is wanted.
     std::vector<lint::Finding> all = lint::withoutIgnored(model, findings);
@@ -176,8 +169,7 @@ Action declareLint(CLI::App& parser) {
     parser
         .add_option("DIR", arguments->directories,
                     "The database's directories, layers with the first one on top; without them, the "
-                    "database that the "
-                    "other commands answer from")
+                    "database that the other commands answer from")
         ->type_name("");
     const auto addCodes = [&parser](const char* name, std::vector<std::string>& codes,
                                     const char* description) {

@@ -32,7 +32,7 @@ struct Members {
     std::vector<std::string> names; ///< display names, empty for options
 };
 
-std::string asText(const Members& members) {
+std::string asText(const Members& members, const Terminal& terminal) {
     Table table;
     for (std::size_t i = 0; i < members.keys.size(); ++i) {
         Table::Row row{members.keys[i]};
@@ -41,7 +41,7 @@ std::string asText(const Members& members) {
         }
         table.add(std::move(row));
     }
-    return table.text();
+    return table.text(terminal);
 }
 
 Json asJson(const Members& members) {

@@ -28,10 +28,10 @@ struct OperationOptions {
     std::vector<std::string> options;
 };
 
-std::string asText(const OperationOptions& answer) {
+std::string asText(const OperationOptions& answer, const Terminal& terminal) {
     std::string text;
     for (const std::string& option : answer.options) {
-        text += option + '\n';
+        text += terminal.shown(option) + '\n';
     }
     return text;
 }

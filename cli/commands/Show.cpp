@@ -52,7 +52,8 @@ std::string legend(const std::string& letters) {
 }
 
 /// Rows by modes; the cells tell the outputs.
-std::string matrix(const char* title, const std::vector<DeviceSheet::Row>& rows, bool withBsdl) {
+std::string matrix(const char* title, const std::vector<DeviceSheet::Row>& rows, bool withBsdl,
+                   const Terminal& terminal) {
     if (rows.empty()) {
         return {};
     }
@@ -75,14 +76,17 @@ std::string matrix(const char* title, const std::vector<DeviceSheet::Row>& rows,
         }
         table.add(std::move(cells));
     }
-    return fmt::format("\n{}\n{}{}", title, legend(letters), table.text(2));
+    return fmt::format("\n{}\n{}{}", terminal.heading(title), legend(letters), table.text(terminal, 2));
 }
 
-std::string section(const char* title, const Properties& properties) {
-    return properties.empty() ? std::string() : fmt::format("\n{}\n{}", title, asText(properties, 2));
+std::string section(const char* title, const Properties& properties, const Terminal& terminal) {
+    return properties.empty()
+               ? std::string()
+               : fmt::format("\n{}\n{}", terminal.heading(title), asText(properties, terminal, 2));
 }
 
-std::string multibootText(const std::vector<DeviceSheet::Arrangement>& arrangements) {
+std::string multibootText(const std::vector<DeviceSheet::Arrangement>& arrangements,
+                          const Terminal& terminal) {
     if (arrangements.empty()) {
         return {};
     }
@@ -90,10 +94,10 @@ std::string multibootText(const std::vector<DeviceSheet::Arrangement>& arrangeme
     for (const DeviceSheet::Arrangement& arrangement : arrangements) {
         table.add({arrangement.type, arrangement.width, arrangement.position});
     }
-    return "\nMultiboot\n" + table.text(2);
+    return fmt::format("\n{}\n{}", terminal.heading("Multiboot"), table.text(terminal, 2));
 }
 
-std::string heading(const DeviceSheet& sheet) {
+std::string heading(const DeviceSheet& sheet, const Terminal& terminal) {
     Table table;
     const bool asWritten = sheet.name == sheet.spelling;
     table.add({"Device",
@@ -101,16 +105,20 @@ std::string heading(const DeviceSheet& sheet) {
     table.add({"Family", sheet.flash ? sheet.family + " (a flash)" : sheet.family});
     if (sheet.idcode) {
         table.add({"IDCODE", sheet.idcode->value + "  " + catalogue::asText(sheet.idcode->origin)});
+        for (const catalogue::Shadow& shadow : sheet.idcode->shadows) {
+            table.add({"", fmt::format("shadows {}: {}", catalogue::asText(shadow.origin), shadow.text)});
+        }
     }
     table.add({"Modes", fmt::format("{}", fmt::join(sheet.modes, " "))});
-    return table.text();
+    return table.text(terminal);
 }
 
-std::string asText(const Sheet& sheet) {
+std::string asText(const Sheet& sheet, const Terminal& terminal) {
     const DeviceSheet& facts = sheet.facts;
-    return heading(facts) + section("Properties", facts.properties) +
-           section("Flash properties", facts.flashProperties) + multibootText(facts.multiboot) +
-           matrix("Operations", facts.operations, true) + matrix("Programming options", facts.options, false);
+    return heading(facts, terminal) + section("Properties", facts.properties, terminal) +
+           section("Flash properties", facts.flashProperties, terminal) +
+           multibootText(facts.multiboot, terminal) + matrix("Operations", facts.operations, true, terminal) +
+           matrix("Programming options", facts.options, false, terminal);
 }
 
 Json outputKeys(DeviceSheet::Outputs outputs) {
@@ -153,6 +161,9 @@ Json bsdlJson(const std::vector<DeviceSheet::Row>& rows) {
 Json asJson(const DeviceSheet::Idcode& idcode) {
     Json object{{"value", idcode.value}};
     object.update(catalogue::asJson(idcode.origin));
+    if (!idcode.shadows.empty()) {
+        object["shadows"] = catalogue::asJson(idcode.shadows);
+    }
     return object;
 }
 

@@ -26,12 +26,12 @@ struct Flashes {
     std::vector<catalogue::Flash> all;
 };
 
-std::string asText(const Flashes& flashes) {
+std::string asText(const Flashes& flashes, const Terminal& terminal) {
     Table table({"FLASH", "FAMILY"});
     for (const catalogue::Flash& flash : flashes.all) {
         table.add({flash.name, flash.family});
     }
-    return table.text();
+    return table.text(terminal);
 }
 
 Json asJson(const Flashes& flashes) {
@@ -47,7 +47,9 @@ struct Flash {
     Properties properties;
 };
 
-std::string asText(const Flash& flash) { return asText(flash.properties, 0); }
+std::string asText(const Flash& flash, const Terminal& terminal) {
+    return asText(flash.properties, terminal, 0);
+}
 
 Json asJson(const Flash& flash) { return {{"device", flash.name}, {"properties", asJson(flash.properties)}}; }
 

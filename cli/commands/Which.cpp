@@ -1,6 +1,7 @@
 // `which`: the inverse of `check` and `property`: the devices for which it holds.
 #include "commands/Declarations.h"
 
+#include "Progress.h"
 #include "Table.h"
 #include "Tool.h"
 #include "Vocabulary.h"
@@ -34,7 +35,7 @@ struct Holders {
     std::vector<std::string> faults; ///< devices at which the manager raises
 };
 
-std::string asText(const Holders& holders) {
+std::string asText(const Holders& holders, const Terminal& terminal) {
     if (holders.devices.empty()) {
         return {};
     }
@@ -42,7 +43,7 @@ std::string asText(const Holders& holders) {
     for (const why::Entry& device : holders.devices) {
         table.add({device.name, device.family});
     }
-    return table.text();
+    return table.text(terminal);
 }
 
 Json asJson(const Holders& holders) {
@@ -118,14 +119,20 @@ Verdict askForProperty(Tool& tool, ConstraintsManager& manager, const Question& 
     return verdict;
 }
 
-Status run(Tool& tool, const Arguments& arguments) {
-    const Question question = read(arguments);
-    Holders holders{asked(question), {}, {}};
-    const why::Asking ask = [&](ConstraintsManager& manager, const Question& one) {
+std::vector<why::Entry> askAll(Tool& tool, const Question& question) {
+    Progress progress("asking for each device");
+    const auto ask = [&tool](ConstraintsManager& manager, const Question& one) {
         return one.kind == Question::Kind::PROPERTY ? askForProperty(tool, manager, one)
                                                     : why::ask(manager, one);
     };
-    for (why::Entry& entry : why::askForAll(tool.manager(), question, ask)) {
+    return why::askForAll(tool.manager(), question, ask,
+                          [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
+}
+
+Status run(Tool& tool, const Arguments& arguments) {
+    const Question question = read(arguments);
+    Holders holders{asked(question), {}, {}};
+    for (why::Entry& entry : askAll(tool, question)) {
         if (entry.verdict == Verdict::YES) {
             holders.devices.push_back(std::move(entry));
         } else if (entry.verdict == Verdict::FAULT) {
@@ -147,9 +154,10 @@ Status run(Tool& tool, const Arguments& arguments) {
 
 Action declareWhich(CLI::App& parser) {
     auto arguments = std::make_shared<Arguments>();
-    parser.add_option("--operation", arguments->operation, "The operation that it allows");
-    parser.add_option("-m,--mode", arguments->mode, "The configuration mode");
-    parser.add_option("-o,--output", arguments->output, "The cable or output file type");
+    parser.add_option("--operation", arguments->operation, "The operation that it allows")
+        ->type_name("OPERATION");
+    parser.add_option("-m,--mode", arguments->mode, "The configuration mode")->type_name("MODE");
+    parser.add_option("-o,--output", arguments->output, "The cable or output file type")->type_name("OUTPUT");
     parser.add_option("--property", arguments->property, "The property that it has")->type_name("KEY=VALUE");
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }

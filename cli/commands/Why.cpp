@@ -169,14 +169,18 @@ Status run(Tool& tool, const Arguments& arguments) {
 
 Action declareWhy(CLI::App& parser) {
     auto arguments = std::make_shared<Arguments>();
-    parser.add_option("DEVICE", arguments->device, "The device, or a family");
-    parser.add_option("-m,--mode", arguments->mode, "The configuration mode");
-    parser.add_option("-o,--output", arguments->output, "The cable or output file type");
-    parser.add_option("-p,--package", arguments->package, "The package");
-    parser.add_option("--operation", arguments->operation, "The operation, as `check` takes it");
-    parser.add_option("--option", arguments->option, "The programming option, as `options` lists it");
-    parser.add_option("--bsdl", arguments->bsdl, "The boundary-scan operation, as `bsdl` lists it");
-    parser.add_option("--property", arguments->property, "The property, as `property` takes it");
-    parser.add_option("--value", arguments->value, "The property's value");
+    parser.add_option("DEVICE", arguments->device, "The device, or a family")->type_name("");
+    parser.add_option("-m,--mode", arguments->mode, "The configuration mode")->type_name("MODE");
+    parser.add_option("-o,--output", arguments->output, "The cable or output file type")->type_name("OUTPUT");
+    parser.add_option("-p,--package", arguments->package, "The package")->type_name("PACKAGE");
+    parser.add_option("--operation", arguments->operation, "The operation, as `check` takes it")
+        ->type_name("OPERATION");
+    parser.add_option("--option", arguments->option, "The programming option, as `options` lists it")
+        ->type_name("OPTION");
+    parser.add_option("--bsdl", arguments->bsdl, "The boundary-scan operation, as `bsdl` lists it")
+        ->type_name("OPERATION");
+    parser.add_option("--property", arguments->property, "The property, as `property` takes it")
+        ->type_name("KEY");
+    parser.add_option("--value", arguments->value, "The property's value")->type_name("VALUE");
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }

@@ -67,15 +67,15 @@ Words words() {
     return words;
 }
 
-std::string asText(const std::vector<Named>& all, const char* heading) {
+std::string asText(const std::vector<Named>& all, const char* heading, const Terminal& terminal) {
     Table table({"", heading, "IN DATABASES"});
     for (std::size_t value = 0; value < all.size(); ++value) {
         table.add({std::to_string(value), all[value].key, all[value].inDatabases ? "yes" : "no"});
     }
-    return table.text();
+    return table.text(terminal);
 }
 
-std::string asText(const Words& words) {
+std::string asText(const Words& words, const Terminal& terminal) {
     Table modes({"", "MODE", "ALSO"});
     for (std::size_t value = 0; value < words.modes.size(); ++value) {
         const Mode& mode = words.modes[value];
@@ -86,8 +86,8 @@ std::string asText(const Words& words) {
         const Operation& operation = words.operations[value];
         operations.add({std::to_string(value), operation.key, operation.name});
     }
-    return modes.text() + '\n' + asText(words.outputs, "OUTPUT") + '\n' + operations.text() + '\n' +
-           asText(words.options, "OPTION");
+    return modes.text(terminal) + '\n' + asText(words.outputs, "OUTPUT", terminal) + '\n' +
+           operations.text(terminal) + '\n' + asText(words.options, "OPTION", terminal);
 }
 
 Json asJson(const std::vector<Named>& all) {

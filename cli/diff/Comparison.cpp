@@ -1,13 +1,12 @@
 // Holds the answers of two databases against each other, and tells what devices have in common once.
 #include "diff/Comparison.h"
 
-#include "Table.h"
+#include "diff/Wire.h"
 
 #include <fmt/format.h>
 
 #include <algorithm>
 #include <iterator>
-#include <map>
 #include <utility>
 
 namespace diff {
@@ -21,110 +20,235 @@ Texts without(const Texts& left, const Texts& right) {
     return rest;
 }
 
-const Texts& answer(const Answers& answers, const std::string& question) {
-    static const Texts none;
-    const auto found = answers.find(question);
-    return found == answers.end() ? none : found->second;
-}
-
-/// What changed, by question.
-std::map<std::string, Change> changesOf(const Answers& before, const Answers& after) {
-    std::map<std::string, Change> changes;
-    for (const Answers* answers : {&before, &after}) {
-        for (const auto& [question, texts] : *answers) {
-            const Texts& left = answer(before, question);
-            const Texts& right = answer(after, question);
-            if (left != right) {
-                changes[question] = {question, without(left, right), without(right, left)};
-            }
-        }
+/// What changed for one question. Names come and go one by one, so that devices that share a part of a change stand
+/// together in that part.
+std::vector<Change> changesOf(const Question& question, const Texts& before, const Texts& after) {
+    std::vector<Change> changes;
+    if (before == after) {
+        return changes;
+    }
+    const Texts lost = without(before, after);
+    const Texts gained = without(after, before);
+    if (question.kind == Question::Kind::VALUE) {
+        changes.push_back({question, lost, gained});
+        return changes;
+    }
+    for (const std::string& name : lost) {
+        changes.push_back({question, {name}, {}});
+    }
+    for (const std::string& name : gained) {
+        changes.push_back({question, {}, {name}});
     }
     return changes;
 }
 
-/// Drops what changed for a package just as it did without one.
-void dropRepetitions(std::map<std::string, Change>& changes, const Texts& packages) {
-    for (const std::string& package : packages) {
-        const std::string prefix = ofPackage(package, "");
-        std::erase_if(changes, [&](const auto& entry) {
-            const auto& [question, change] = entry;
-            if (!question.starts_with(prefix)) {
-                return false;
-            }
-            const auto general = changes.find(question.substr(prefix.size()));
-            return general != changes.end() && general->second.lost == change.lost &&
-                   general->second.gained == change.gained;
-        });
-    }
-}
-
-std::vector<std::string> keysWithout(const std::map<std::string, std::string>& left,
-                                     const std::map<std::string, std::string>& right) {
-    std::vector<std::string> keys;
-    for (const auto& [key, value] : left) {
-        if (!right.contains(key)) {
-            keys.push_back(key);
-        }
-    }
-    return keys;
-}
-
-/// The changes of one family: devices that share a change stand together.
-void addGroups(std::vector<Group>& groups, const std::string& family,
-               const std::map<std::string, std::vector<Change>>& changesByDevice) {
-    std::map<Change, std::vector<std::string>> devicesByChange;
-    for (const auto& [device, changes] : changesByDevice) {
-        for (const Change& change : changes) {
-            devicesByChange[change].push_back(device);
-        }
-    }
-    std::map<std::vector<std::string>, std::vector<Change>> changesByDevices;
-    for (const auto& [change, devices] : devicesByChange) {
-        changesByDevices[devices].push_back(change);
-    }
-    std::vector<Group> added;
-    for (const auto& [devices, changes] : changesByDevices) {
-        const bool isWhole = devices.size() > 1 && devices.size() == changesByDevice.size();
-        added.push_back({family, devices, isWhole, changes});
-    }
-    std::stable_sort(added.begin(), added.end(), [](const Group& left, const Group& right) {
-        return left.devices.size() > right.devices.size();
-    });
-    groups.insert(groups.end(), added.begin(), added.end());
-}
-
-std::string asText(const Change& change) {
-    std::string text = "  " + change.question + ':';
-    for (const std::string& lost : change.lost) {
-        text += " -" + lost;
-    }
-    for (const std::string& gained : change.gained) {
-        text += " +" + gained;
-    }
-    return text + '\n';
-}
-
-std::string heading(const Group& group) {
-    if (group.isWhole) {
-        return fmt::format("{} (all {} devices)\n", group.family, group.devices.size());
-    }
-    if (group.devices.size() == 1) {
-        return fmt::format("{} ({})\n", group.devices.front(), group.family);
-    }
-    return fmt::format("{} ({} devices)\n{}", group.family, group.devices.size(), wrapped(group.devices, 4));
-}
-
-Json asJson(const Change& change) {
-    return {{"question", change.question}, {"lost", change.lost}, {"gained", change.gained}};
-}
-
-Json asJson(const std::vector<Change>& changes) {
-    Json list = Json::array();
+/// The changes with one for each question, in the order of the questions.
+std::vector<Change> joined(const std::vector<Change>& changes) {
+    std::map<Question, Change> byQuestion;
     for (const Change& change : changes) {
-        list.push_back(asJson(change));
+        Change& all = byQuestion[change.question];
+        all.question = change.question;
+        all.lost.insert(change.lost.begin(), change.lost.end());
+        all.gained.insert(change.gained.begin(), change.gained.end());
     }
-    return list;
+    std::vector<Change> sorted;
+    for (auto& [question, change] : byQuestion) {
+        sorted.push_back(std::move(change));
+    }
+    return sorted;
 }
+
+Question ofPackage(const std::string& package, Question question) {
+    question.topic = fmt::format("package {}: {}", package, question.topic);
+    return question;
+}
+
+/// Compares device by device. Changes are known by number: most devices share theirs.
+class Comparer {
+public:
+    Comparer(const Facts& before, const Facts& after) : m_before(before), m_after(after) {}
+
+    [[nodiscard]] Comparison compare() {
+        Comparison comparison{onlyIn(m_before, m_after), onlyIn(m_after, m_before), general(), {}};
+        std::map<std::string, Family> families;
+        for (const auto& [name, after] : m_after.devices) {
+            const auto before = m_before.devices.find(name);
+            if (before != m_before.devices.end()) {
+                families[after.family].push_back({name, changesOfDevice(before->second, after)});
+            }
+        }
+        for (const auto& [name, family] : families) {
+            addGroups(comparison.groups, name, family);
+        }
+        return comparison;
+    }
+
+private:
+    using Numbers = std::vector<std::size_t>;
+    using Family = std::vector<std::pair<std::string, Numbers>>; ///< devices with their changes
+
+    [[nodiscard]] static Devices onlyIn(const Facts& facts, const Facts& others) {
+        Devices devices;
+        for (const auto& [name, device] : facts.devices) {
+            // What stands for a family without devices is no device itself.
+            if (others.devices.count(name) == 0 && name != device.family) {
+                devices[device.family].push_back(name);
+            }
+        }
+        return devices;
+    }
+
+    [[nodiscard]] std::vector<Change> general() const {
+        std::vector<Change> all;
+        for (const Question& question : questions({&m_before.general, &m_after.general})) {
+            const std::vector<Change> changes =
+                diff::changesOf(question, m_before.answer(m_before.general, {}, question),
+                                m_after.answer(m_after.general, {}, question));
+            all.insert(all.end(), changes.begin(), changes.end());
+        }
+        return joined(all);
+    }
+
+    [[nodiscard]] static std::set<Question> questions(const std::vector<const Answers*>& all) {
+        std::set<Question> questions;
+        for (const Answers* const answers : all) {
+            for (const auto& [question, texts] : *answers) {
+                questions.insert(question);
+            }
+        }
+        return questions;
+    }
+
+    void add(Numbers& numbers, const Question& question, const Texts& before, const Texts& after) {
+        for (Change& change : diff::changesOf(question, before, after)) {
+            const auto [known, isNew] = m_numbers.try_emplace(std::move(change), m_changes.size());
+            if (isNew) {
+                m_changes.push_back(&known->first);
+            }
+            numbers.push_back(known->second);
+        }
+    }
+
+    /// What changed in answers that devices have in common.
+    const Numbers& sharedChanges(const DeviceFacts& before, const DeviceFacts& after) {
+        const auto [known, isNew] = m_shared.try_emplace({before.shared, after.shared});
+        if (!isNew) {
+            return known->second;
+        }
+        std::vector<const Answers*> all;
+        for (const std::size_t index : before.shared) {
+            all.push_back(&m_before.shared[index]);
+        }
+        for (const std::size_t index : after.shared) {
+            all.push_back(&m_after.shared[index]);
+        }
+        for (const Question& question : questions(all)) {
+            add(known->second, question, m_before.answer({}, before.shared, question),
+                m_after.answer({}, after.shared, question));
+        }
+        return known->second;
+    }
+
+    [[nodiscard]] Numbers changesOfDevice(const DeviceFacts& before, const DeviceFacts& after) {
+        Numbers numbers = sharedChanges(before, after);
+        if (!numbers.empty() || before.own != after.own) {
+            const Answers oldOwn = unpackedAnswers(before.own);
+            const Answers newOwn = unpackedAnswers(after.own);
+            const std::set<Question> own = questions({&oldOwn, &newOwn});
+            std::erase_if(numbers,
+                          [&](std::size_t number) { return own.count(m_changes[number]->question) != 0; });
+            for (const Question& question : own) {
+                add(numbers, question, m_before.answer(oldOwn, before.shared, question),
+                    m_after.answer(newOwn, after.shared, question));
+            }
+        }
+        addPackages(numbers, before, after);
+        return numbers;
+    }
+
+    void addPackages(Numbers& numbers, const DeviceFacts& before, const DeviceFacts& after) {
+        std::set<std::string> packages;
+        for (const DeviceFacts* const facts : {&before, &after}) {
+            for (const auto& [package, answers] : facts->packages) {
+                packages.insert(package);
+            }
+        }
+        const Numbers general = numbers;
+        for (const std::string& package : packages) {
+            const Answers oldPackage = inPackage(m_before, before, package);
+            const Answers newPackage = inPackage(m_after, after, package);
+            for (const Question& question : questions({&oldPackage, &newPackage})) {
+                const Texts& oldTexts = m_before.answer(oldPackage, before.shared, question);
+                const Texts& newTexts = m_after.answer(newPackage, after.shared, question);
+                for (const Change& change : diff::changesOf(question, oldTexts, newTexts)) {
+                    // What changed for the package just as it did without one is told already.
+                    const bool isTold = std::any_of(general.begin(), general.end(), [&](std::size_t number) {
+                        return *m_changes[number] == change;
+                    });
+                    if (!isTold) {
+                        // One name at a time, which either was there or is there.
+                        add(numbers, ofPackage(package, question), change.lost, change.gained);
+                    }
+                }
+            }
+        }
+    }
+
+    /// The answers that the package changes, and those that stand for it otherwise.
+    [[nodiscard]] static Answers inPackage(const Facts& facts, const DeviceFacts& device,
+                                           const std::string& package) {
+        Answers answers;
+        const auto found = device.packages.find(package);
+        if (found != device.packages.end()) {
+            if (found->second.options) {
+                answers = facts.shared[*found->second.options];
+            }
+            if (found->second.modes) {
+                answers[{MODES}] = *found->second.modes;
+            }
+        }
+        // Those of a device that was asked for apart.
+        for (const auto& [question, texts] : unpackedAnswers(device.own)) {
+            if (question.topic == MODES || question.topic == OPTIONS) {
+                answers.try_emplace(question, texts);
+            }
+        }
+        return answers;
+    }
+
+    /// The changes of one family: devices that share a change stand together.
+    void addGroups(std::vector<Group>& groups, const std::string& name, const Family& family) const {
+        std::map<std::size_t, Numbers> devicesByChange;
+        for (std::size_t device = 0; device < family.size(); ++device) {
+            for (const std::size_t number : family[device].second) {
+                devicesByChange[number].push_back(device);
+            }
+        }
+        std::map<Numbers, std::vector<Change>> changesByDevices;
+        for (const auto& [number, devices] : devicesByChange) {
+            changesByDevices[devices].push_back(*m_changes[number]);
+        }
+        std::vector<Group> added;
+        for (const auto& [devices, changes] : changesByDevices) {
+            Group& group = added.emplace_back(Group{name, {}, {}, joined(changes)});
+            for (std::size_t device = 0; device < family.size(); ++device) {
+                const bool isIn = std::binary_search(devices.begin(), devices.end(), device);
+                (isIn ? group.devices : group.others).push_back(family[device].first);
+            }
+        }
+        std::stable_sort(added.begin(), added.end(), [](const Group& left, const Group& right) {
+            return left.devices.size() > right.devices.size();
+        });
+        groups.insert(groups.end(), std::make_move_iterator(added.begin()),
+                      std::make_move_iterator(added.end()));
+    }
+
+    const Facts& m_before;
+    const Facts& m_after;
+    std::map<Change, std::size_t> m_numbers;
+    std::vector<const Change*> m_changes; ///< by number
+    std::map<std::pair<Numbers, Numbers>, Numbers> m_shared;
+};
 
 } // namespace
 
@@ -132,82 +256,8 @@ bool Comparison::isEmpty() const {
     return onlyInOld.empty() && onlyInNew.empty() && general.empty() && groups.empty();
 }
 
-Names commonNames(const Names& oldNames, const Names& newNames) {
-    Names common;
-    for (const auto& [device, family] : newNames.devices) {
-        if (oldNames.devices.contains(device)) {
-            common.devices[device] = family;
-            Texts& packages = common.packages[device];
-            packages = oldNames.packages.at(device);
-            packages.insert(newNames.packages.at(device).begin(), newNames.packages.at(device).end());
-        }
-    }
-    return common;
-}
-
-Comparison compare(const Names& oldNames, const Names& newNames, const Facts& oldFacts,
-                   const Facts& newFacts) {
-    Comparison comparison{keysWithout(oldNames.devices, newNames.devices),
-                          keysWithout(newNames.devices, oldNames.devices),
-                          {},
-                          {}};
-    for (auto& [question, change] : changesOf(oldFacts.general, newFacts.general)) {
-        comparison.general.push_back(change);
-    }
-    const Names common = commonNames(oldNames, newNames);
-    std::map<std::string, std::map<std::string, std::vector<Change>>> byFamily;
-    for (const auto& [device, family] : common.devices) {
-        std::map<std::string, Change> changes =
-            changesOf(oldFacts.ofDevices.at(device), newFacts.ofDevices.at(device));
-        dropRepetitions(changes, common.packages.at(device));
-        std::vector<Change>& kept = byFamily[family][device];
-        for (auto& [question, change] : changes) {
-            kept.push_back(std::move(change));
-        }
-    }
-    for (const auto& [family, changes] : byFamily) {
-        addGroups(comparison.groups, family, changes);
-    }
-    return comparison;
-}
-
-std::string asText(const Comparison& comparison) {
-    std::string text;
-    const auto addNames = [&text](const char* title, const std::vector<std::string>& names) {
-        if (!names.empty()) {
-            text += fmt::format("{}\n{}", title, wrapped(names, 2));
-        }
-    };
-    addNames("only in the old database", comparison.onlyInOld);
-    addNames("only in the new database", comparison.onlyInNew);
-    if (!comparison.general.empty()) {
-        text += "for all devices\n";
-    }
-    for (const Change& change : comparison.general) {
-        text += asText(change);
-    }
-    for (const Group& group : comparison.groups) {
-        text += heading(group);
-        for (const Change& change : group.changes) {
-            text += asText(change);
-        }
-    }
-    return text;
-}
-
-Json asJson(const Comparison& comparison) {
-    Json groups = Json::array();
-    for (const Group& group : comparison.groups) {
-        groups.push_back({{"family", group.family},
-                          {"devices", group.devices},
-                          {"whole", group.isWhole},
-                          {"changes", asJson(group.changes)}});
-    }
-    return {{"same", comparison.isEmpty()},
-            {"onlyInOld", comparison.onlyInOld},
-            {"onlyInNew", comparison.onlyInNew},
-            {"general", asJson(comparison.general)},
-            {"groups", groups}};
+Comparison compare(const Facts& oldFacts, const Facts& newFacts) {
+    return Comparer(oldFacts, newFacts).compare();
 }
 
 } // namespace diff

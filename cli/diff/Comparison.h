@@ -1,9 +1,9 @@
 #pragma once
 
-#include "Json.h"
-#include "diff/Answers.h"
+#include "diff/Facts.h"
 
 #include <cstddef>
+#include <map>
 #include <string>
 #include <vector>
 
@@ -11,39 +11,37 @@ namespace diff {
 
 /// A question that two databases answer differently.
 struct Change {
-    std::string question;
+    Question question;
     Texts lost;
     Texts gained;
 
     friend auto operator<=>(const Change&, const Change&) = default;
 };
 
-/// Devices that change alike.
+/// Devices of a family that change alike.
 struct Group {
     std::string family; ///< in the new database
     std::vector<std::string> devices;
-    bool isWhole; ///< all devices that the family has in both databases, and several of them
+    std::vector<std::string> others; ///< that the family has in both databases and that don't change so
     std::vector<Change> changes;
+
+    /// Does the whole family change so, and does it have several devices?
+    [[nodiscard]] bool isWhole() const { return devices.size() > 1 && others.empty(); }
 };
+
+/// Devices by their families.
+using Devices = std::map<std::string, std::vector<std::string>>;
 
 /// How two databases differ.
 struct Comparison {
-    std::vector<std::string> onlyInOld; ///< devices
-    std::vector<std::string> onlyInNew;
+    Devices onlyInOld;
+    Devices onlyInNew;
     std::vector<Change> general;
-    std::vector<Group> groups;
+    std::vector<Group> groups; ///< by family; in it the largest ones first
 
     [[nodiscard]] bool isEmpty() const;
 };
 
-/// The names that both databases know, with the packages that either speaks of.
-[[nodiscard]] Names commonNames(const Names& oldNames, const Names& newNames);
-
-/// @param oldFacts,newFacts the answers about the names that both know
-[[nodiscard]] Comparison compare(const Names& oldNames, const Names& newNames, const Facts& oldFacts,
-                                 const Facts& newFacts);
-
-[[nodiscard]] std::string asText(const Comparison& comparison);
-[[nodiscard]] Json asJson(const Comparison& comparison);
+[[nodiscard]] Comparison compare(const Facts& oldFacts, const Facts& newFacts);
 
 } // namespace diff

@@ -34,24 +34,6 @@ std::string upperCase(std::string text) {
 
 } // namespace
 
-const std::vector<std::string>& multibootKeys() {
-    static const std::vector<std::string> keys = [] {
-        std::vector<std::string> all;
-        for (const std::string& type : multiboot::TYPES) {
-            // A serial flash has no width to choose, a parallel one always has.
-            const bool isParallelBus = type.ends_with("BPI");
-            for (const std::string& width : multiboot::WIDTHS) {
-                if ((width != "NONE") == isParallelBus) {
-                    all.push_back(type + '_' + width + "_LEAD");
-                    all.push_back(type + '_' + width + "_CHAIN");
-                }
-            }
-        }
-        return all;
-    }();
-    return keys;
-}
-
 bool isClass(std::string_view name) { return holds(CLASSES, name); }
 
 Shape shapeInSection(std::string_view key) { return holds(FAMILY_KEYS, key) ? Shape::RECORDS : Shape::NONE; }
@@ -67,7 +49,7 @@ Shape shapeOf(Family::Kind kind, std::string_view key) {
         return key == "IDCODE" || holds(vocabulary::modes(), key) ? Shape::RECORDS : Shape::NONE;
     }
     if (kind == Family::Kind::SPI) {
-        if (key == "DEVICE_FAMILY" || key.ends_with(DEVICES_ENDING) || holds(multibootKeys(), key)) {
+        if (key == "DEVICE_FAMILY" || key.ends_with(DEVICES_ENDING) || holds(multiboot::keys(), key)) {
             return Shape::LIST;
         }
         return key.ends_with(PROPERTY_ENDING) ? Shape::RECORDS : Shape::NONE;
@@ -84,7 +66,7 @@ std::vector<std::string> knownKeys(const Model& model, Family::Kind kind) {
         all.emplace_back("IDCODE");
     } else if (kind == Family::Kind::SPI) {
         all.emplace_back("DEVICE_FAMILY");
-        add(all, multibootKeys());
+        add(all, multiboot::keys());
         for (const std::string_view name : CLASSES) {
             all.push_back(std::string(name).append(DEVICES_ENDING));
             all.push_back(std::string(name).append(PROPERTY_ENDING));

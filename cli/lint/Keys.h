@@ -19,9 +19,6 @@ inline constexpr std::array<std::string_view, 6> CLASSES{"AT1", "ST1", "ST2", "B
 inline constexpr std::string_view DEVICES_ENDING = "_DEVICES";
 inline constexpr std::string_view PROPERTY_ENDING = "_PROPERTY";
 
-/// The keys of the multiboot lists.
-[[nodiscard]] const std::vector<std::string>& multibootKeys();
-
 [[nodiscard]] bool isClass(std::string_view name);
 
 /// The shape of a family's own key: `NONE` for a key that nobody reads.

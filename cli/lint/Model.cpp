@@ -49,6 +49,12 @@ void Entry::assign(const AcdLines& file, const AcdLines::Line& line) {
     if (line.kind == AcdLines::Kind::ASSIGNMENT) {
         m_text.clear();
         m_fragments.clear();
+        tooLong.clear();
+    }
+    if (line.value.size() > LONGEST - m_text.size()) {
+        const AcdLines::Fragment& first = line.fragments.front();
+        tooLong.push_back({line.value, {&file, first.line, first.column}});
+        return;
     }
     key = {line.name, {&file, line.line, line.column}};
     for (const AcdLines::Fragment& fragment : line.fragments) {
@@ -66,7 +72,9 @@ void Entry::split(Shape wanted) {
         records.push_back({token(0, m_text.size()), pieces(0, m_text.size(), ',')});
         return;
     }
-    for (const Token& item : pieces(0, m_text.size(), ':')) {
+    const std::vector<Token> items = pieces(0, m_text.size(), ':');
+    records.reserve(items.size());
+    for (const Token& item : items) {
         const auto begin = static_cast<std::size_t>(item.text.data() - m_text.data());
         records.push_back({item, pieces(begin, begin + item.text.size(), ',')});
     }
@@ -83,7 +91,11 @@ Token Entry::token(std::size_t offset, std::size_t length) const {
 }
 
 std::vector<Token> Entry::pieces(std::size_t begin, std::size_t end, char separator) {
+    const std::string_view text = std::string_view(m_text).substr(begin, end - begin);
     std::vector<Token> all;
+    // Databases are mostly pieces: growing step by step would take twice the memory.
+    all.reserve(
+        std::min(MOST, static_cast<std::size_t>(std::count(text.begin(), text.end(), separator)) + 1));
     for (std::size_t start = begin; start <= end;) {
         const std::size_t next = std::min(m_text.find(separator, start), end);
         if (all.size() == MOST) {
@@ -101,8 +113,9 @@ const Entry* Section::find(std::string_view key) const {
     return found == entries.end() ? nullptr : &found->second;
 }
 
-Token Family::place() const {
-    const AcdLines& file = *files.front();
+Token Family::place() const { return startOf(*files.front()); }
+
+Token startOf(const AcdLines& file) {
     if (file.lines().empty()) {
         return {{}, {&file, 1, 1}};
     }

@@ -43,10 +43,14 @@ public:
     /// How many items, or fields of an item, are ever read.
     static constexpr std::size_t MOST = 32768;
 
+    /// How long a value may grow by appending.
+    static constexpr std::size_t LONGEST = std::size_t{1} << 30;
+
     Token key; ///< where it was set last
     Shape shape = Shape::NONE;
     std::vector<Record> records;
-    std::vector<Token> unseen; ///< the first item, or field, of each list that is too long
+    std::vector<Token> tooLong; ///< what was appended in vain, since the value would grow too long
+    std::vector<Token> unseen;  ///< the first item, or field, of each list that is too long
 
     /// The items of a flat list.
     [[nodiscard]] const std::vector<Token>& list() const;
@@ -88,6 +92,9 @@ struct Family {
     /// Where something is told that the family's files lack.
     [[nodiscard]] Token place() const;
 };
+
+/// Where something is told that no line of a file says.
+[[nodiscard]] Token startOf(const AcdLines& file);
 
 /// A device of a part family.
 struct Device {

@@ -9,31 +9,11 @@ namespace lint {
 
 namespace {
 
-constexpr std::size_t LINE_WIDTH = 100;
+/// What stands beside the line of the file: the indentation, and what tells that the line goes on.
+constexpr std::size_t BESIDE_EXCERPT = 10;
+constexpr std::size_t LEAST_EXCERPT = 20;
 
 bool continuesCharacter(char byte) { return (static_cast<unsigned char>(byte) & 0xC0U) == 0x80U; }
-
-bool isControl(std::string_view text, std::size_t index) {
-    const auto byte = static_cast<unsigned char>(text[index]);
-    const auto next = index + 1 < text.size() ? static_cast<unsigned char>(text[index + 1]) : 0U;
-    return byte < 0x20 || byte == 0x7F || (byte == 0xC2 && next >= 0x80 && next <= 0x9F);
-}
-
-/// The text with its control bytes as `?`, each as one column, so that it does no harm on a terminal.
-std::string printable(std::string_view text) {
-    std::string shown;
-    for (std::size_t i = 0; i < text.size(); ++i) {
-        if (text[i] == '\t') {
-            shown += ' ';
-        } else if (isControl(text, i)) {
-            shown += '?';
-            i += text[i] == '\xC2' ? 1U : 0U;
-        } else {
-            shown += text[i];
-        }
-    }
-    return shown;
-}
 
 /// The number of columns, taking the text as UTF-8.
 std::size_t width(std::string_view text) {
@@ -43,20 +23,22 @@ std::size_t width(std::string_view text) {
 }
 
 /// The line of the file, of a long one what is around the finding, and a caret below.
-std::string excerpt(const Finding& finding) {
+std::string excerpt(const Finding& finding, const Terminal& terminal) {
+    const std::size_t room = std::max(terminal.width(), BESIDE_EXCERPT + LEAST_EXCERPT) - BESIDE_EXCERPT;
     const std::string_view line = finding.place.file->source(finding.place.line);
     const std::size_t at = std::min<std::size_t>(finding.place.column - 1, line.size());
-    std::size_t begin = line.size() <= LINE_WIDTH ? 0 : at - std::min(at, LINE_WIDTH / 2);
+    std::size_t begin = line.size() <= room ? 0 : at - std::min(at, room / 2);
     while (begin > 0 && continuesCharacter(line[begin])) {
         --begin;
     }
-    const std::string_view shown = line.substr(begin, LINE_WIDTH);
+    const std::string_view shown = line.substr(begin, room);
     const std::string_view marked = shown.substr(at - begin, finding.length);
     const std::string_view before = begin == 0 ? "" : "...";
     const std::size_t indent = before.size() + width(shown.substr(0, at - begin));
     const std::size_t tildes = std::max<std::size_t>(width(marked), 1) - 1;
-    return fmt::format("    {}{}{}\n    {:{}}^{:~<{}}\n", before, printable(shown),
-                       begin + shown.size() < line.size() ? "..." : "", "", indent, "", tildes);
+    return fmt::format("    {}{}{}\n    {:{}}{}\n", before, printable(shown),
+                       begin + shown.size() < line.size() ? "..." : "", "", indent,
+                       terminal.good('^' + std::string(tildes, '~')));
 }
 
 std::string counted(std::size_t count, const char* noun) {
@@ -76,13 +58,17 @@ std::string summary(const Report& report) {
            counted(report.count(Level::WARNING), "warning");
 }
 
-std::string asText(const Report& report) {
+std::string asText(const Report& report, const Terminal& terminal) {
     std::string text;
     for (const Finding& finding : report.findings) {
-        text += fmt::format("{}:{}:{}: {}: {} [{}]\n", printable(finding.place.file->path()),
-                            finding.place.line, finding.place.column, nameOf(finding.rule->level),
+        const std::string place = fmt::format("{}:{}:{}:", printable(finding.place.file->path()),
+                                              finding.place.line, finding.place.column);
+        const Level level = finding.rule->level;
+        const std::string levelText = fmt::format("{}:", nameOf(level));
+        text += fmt::format("{} {} {} [{}]\n", terminal.heading(place),
+                            level == Level::ERROR ? terminal.bad(levelText) : terminal.doubtful(levelText),
                             printable(finding.text), finding.rule->code);
-        text += excerpt(finding);
+        text += excerpt(finding, terminal);
     }
     return text;
 }

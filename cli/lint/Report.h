@@ -1,6 +1,7 @@
 #pragma once
 
 #include "Json.h"
+#include "Terminal.h"
 #include "lint/Findings.h"
 
 #include <cstddef>
@@ -20,7 +21,7 @@ struct Report {
 [[nodiscard]] std::string summary(const Report& report);
 
 /// For each finding `file:line:column: error: text [CODE]`, the line of the file, and a caret below.
-[[nodiscard]] std::string asText(const Report& report);
+[[nodiscard]] std::string asText(const Report& report, const Terminal& terminal);
 
 /// An object of all findings.
 [[nodiscard]] Json asJson(const Report& report);

@@ -6,6 +6,7 @@
 #include <array>
 #include <cerrno>
 #include <cstring>
+#include <fcntl.h>
 #include <string_view>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -17,25 +18,6 @@ namespace {
 [[noreturn]] void fail(const char* what) {
     throw Failure(Status::FAULT, std::string(what) + ": " + std::strerror(errno));
 }
-
-class Descriptor {
-public:
-    explicit Descriptor(int number) : m_number(number) {}
-    ~Descriptor() { close(); }
-    Descriptor(const Descriptor&) = delete;
-    Descriptor& operator=(const Descriptor&) = delete;
-
-    void close() {
-        if (m_number >= 0) {
-            ::close(m_number);
-            m_number = -1;
-        }
-    }
-    [[nodiscard]] int number() const { return m_number; }
-
-private:
-    int m_number;
-};
 
 [[noreturn]] void workAndExit(int output, const std::function<std::string()>& work) {
     int status = EXIT_FAILURE;
@@ -59,7 +41,7 @@ private:
 
 std::string readAll(int input) {
     std::string text;
-    std::array<char, 4096> buffer{};
+    std::array<char, 65536> buffer{};
     for (;;) {
         const ssize_t got = ::read(input, buffer.data(), buffer.size());
         if (got == 0) {
@@ -75,32 +57,48 @@ std::string readAll(int input) {
 
 } // namespace
 
-std::string apart(const std::function<std::string()>& work) {
+Apart::Apart(const std::function<std::string()>& work) {
     std::array<int, 2> ends{};
-    if (::pipe(ends.data()) != 0) {
+    if (::pipe2(ends.data(), O_CLOEXEC) != 0) {
         fail("can't make a pipe");
     }
-    const Descriptor input(ends[0]);
-    Descriptor output(ends[1]);
-    const pid_t child = ::fork();
-    if (child < 0) {
+    m_input = ends[0];
+    m_child = ::fork();
+    if (m_child == 0) {
+        workAndExit(ends[1], work);
+    }
+    ::close(ends[1]);
+    if (m_child < 0) {
+        ::close(m_input);
         fail("can't start a process");
     }
-    if (child == 0) {
-        workAndExit(output.number(), work);
+}
+
+Apart::~Apart() {
+    if (m_child > 0) {
+        static_cast<void>(end());
     }
-    output.close();
-    std::string result = readAll(input.number());
-    int status = 0;
-    while (::waitpid(child, &status, 0) < 0) {
-        if (errno != EINTR) {
-            fail("can't wait for a process");
-        }
-    }
+}
+
+std::string Apart::result() {
+    std::string text = readAll(m_input);
+    const int status = end();
     if (!WIFEXITED(status) || WEXITSTATUS(status) != EXIT_SUCCESS) {
         throw Failure(Status::FAULT, "the database can't be read");
     }
-    return result;
+    return text;
 }
+
+/// Stops listening and waits. @return the status that the copy ended with
+int Apart::end() noexcept {
+    ::close(m_input);
+    int status = -1;
+    while (::waitpid(m_child, &status, 0) < 0 && errno == EINTR) {
+    }
+    m_child = -1;
+    return status;
+}
+
+std::string apart(const std::function<std::string()>& work) { return Apart(work).result(); }
 
 } // namespace why

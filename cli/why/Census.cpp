@@ -4,10 +4,10 @@
 #include "Catalogue.h"
 #include "Nearest.h"
 #include "why/Apart.h"
+#include "why/Oddities.h"
 #include "why/StartUp.h"
 
 #include <AcdStore.h>
-#include <TarvikException.h>
 #include <tarvik/ConstraintsManager.h>
 
 #include <map>
@@ -20,40 +20,14 @@ namespace {
 
 using Kind = Question::Kind;
 
-/// Does a record name an option that the manager can't read? It raises then, but only when it reads the record
-/// first.
-bool hasUnknownOption(const std::string& name, bool sectionOnly) {
-    const std::optional<AcdStore::Value> value = AcdStore::value(name.c_str(), "PROGRAM_OPTION");
-    if (!value || (sectionOnly && !value->fromSection)) {
-        return false;
-    }
-    for (const Record& record : readRecords(name, "PROGRAM_OPTION").all) {
-        try {
-            static_cast<void>(ConstraintsManager::optionString2Type(record.fields.front().text.c_str()));
-        } catch (const DataMismatchException&) {
-            return true;
-        }
-    }
-    return false;
-}
-
 class Census {
 public:
-    Census(ConstraintsManager& manager, Question question, const Asking& ask)
-        : m_manager(manager), m_question(std::move(question)), m_ask(ask),
+    Census(ConstraintsManager& manager, Question question, const Asking& ask, const Counting& count)
+        : m_manager(manager), m_question(std::move(question)), m_ask(ask), m_count(count),
           m_supported(set(catalogue::list("base.acd", "DEVICE_SUPPORTED"))),
           m_flashes(set(catalogue::list("spi.acd", "DEVICE_FAMILY"))) {
         for (const catalogue::Flash& flash : catalogue::flashes()) {
             m_flashes.insert(flash.name);
-        }
-        for (const std::string& family : AcdStore::families()) {
-            m_entangled.insert(lowerCase(family));
-            m_entangled.insert(lowerCase(family) + ".acd");
-            if (sameWithoutCase(family, "base") || sameWithoutCase(family, "spi")) {
-                for (const std::string& name : AcdStore::devices(family)) {
-                    m_entangled.insert(lowerCase(name));
-                }
-            }
         }
     }
 
@@ -106,7 +80,7 @@ private:
     /// @param isOdd a question about the name may meet what another question left behind
     /// @param isFaulty the manager may raise when it reads the options that belong to the name
     void add(const std::string& name, const std::string& family, bool isOdd, bool isFaulty) {
-        Member member{m_entries.size(), "", isOdd || isEntangled(name)};
+        Member member{m_entries.size(), "", isOdd || m_oddities.isEntangled(name)};
         m_entries.push_back({name, "", Verdict::NO});
         if (m_question.kind != Kind::OPERATION) {
             member.isApart = member.isApart || isFaulty || hasUnknownOption(name, true);
@@ -116,12 +90,6 @@ private:
             member.isApart = m_supported.count(member.group) == 0;
         }
         m_members.push_back(std::move(member));
-    }
-
-    /// A name that others resolve to, or that resolves like others: asking for one tells the manager about the
-    /// other.
-    [[nodiscard]] bool isEntangled(const std::string& name) const {
-        return name.find('_') != std::string::npos || m_entangled.count(lowerCase(name)) != 0;
     }
 
     [[nodiscard]] bool isFlash(const std::string& name) const {
@@ -143,6 +111,9 @@ private:
     }
 
     void answer(const Member& member) {
+        if (m_count) {
+            m_count(m_answered++, m_members.size());
+        }
         Entry& entry = m_entries[member.position];
         if (!member.group.empty()) {
             const auto [known, isNew] = m_groups.emplace(member.group, member.position);
@@ -158,9 +129,11 @@ private:
     ConstraintsManager& m_manager;
     Question m_question;
     const Asking& m_ask;
+    const Counting& m_count;
+    std::size_t m_answered = 0;
     Set m_supported;
-    Set m_flashes;   ///< as listed, families of flashes too
-    Set m_entangled; ///< names of files, and of devices that stand in files without a family, in lower case
+    Set m_flashes; ///< as listed, families of flashes too
+    Oddities m_oddities;
     std::vector<Entry> m_entries;
     std::vector<Member> m_members;
     std::unordered_map<std::string, std::size_t>
@@ -169,8 +142,9 @@ private:
 
 } // namespace
 
-std::vector<Entry> askForAll(ConstraintsManager& manager, Question question, const Asking& ask) {
-    return Census(manager, std::move(question), ask).take();
+std::vector<Entry> askForAll(ConstraintsManager& manager, Question question, const Asking& ask,
+                             const Counting& count) {
+    return Census(manager, std::move(question), ask, count).take();
 }
 
 } // namespace why

@@ -36,6 +36,7 @@ private:
     [[nodiscard]] bool tableExists(const std::string& owner, const TableName& table, const Names& listed);
     [[nodiscard]] bool allows(const Replay::Permissions& permissions, const std::string& table, int row);
     void noteOddities(const Permission& permission);
+    void noteShadowed(const std::string& database, const std::string& key, const std::string& word);
 
     // Properties.
     [[nodiscard]] bool operationInMode();

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Terminal.h"
 #include "why/Question.h"
 #include "why/StartUp.h"
 
@@ -41,7 +42,7 @@ struct Answer {
     [[nodiscard]] bool agrees() const { return verdict == explanation.verdict; }
 };
 
-[[nodiscard]] std::string asText(const Answer& answer);
+[[nodiscard]] std::string asText(const Answer& answer, const Terminal& terminal);
 [[nodiscard]] Json asJson(const Answer& answer);
 
 } // namespace why

@@ -1,7 +1,10 @@
-// How an explanation reads: one line a step, the place under it, in 80 columns.
+// How an explanation reads: one line a step, the place under it, as wide as what shows it.
 #include "why/Explanation.h"
 
+#include "Table.h"
+
 #include <fmt/format.h>
+#include <fmt/ranges.h>
 
 #include <algorithm>
 
@@ -9,27 +12,17 @@ namespace why {
 
 namespace {
 
-constexpr std::size_t LINE_WIDTH = 80;
 constexpr std::size_t INDENT = 12;
+constexpr std::size_t LEAST_WIDTH = 40;
 constexpr std::size_t LEAST_FRAGMENT = 24;
 
-/// The text broken at blanks, its lines behind the first one indented.
-std::string wrappedText(const std::string& first, const std::string& text) {
-    std::string result;
-    std::string line = first;
-    for (std::size_t start = 0; start <= text.size();) {
-        const std::size_t end = std::min(text.find(' ', start), text.size());
-        const std::string word = text.substr(start, end - start);
-        if (line.size() > INDENT && line.size() + 1 + word.size() > LINE_WIDTH) {
-            result += line + '\n';
-            line.assign(INDENT, ' ');
-        } else if (line.size() > INDENT) {
-            line += ' ';
-        }
-        line += word;
-        start = end + 1;
-    }
-    return result + line + '\n';
+/// "  topic     text", the text broken between its words.
+std::string stepText(const Step& step, const Terminal& terminal) {
+    const std::size_t room = std::max(terminal.width(), LEAST_WIDTH) - INDENT;
+    const std::string separator = '\n' + std::string(INDENT, ' ');
+    return "  " + terminal.heading(step.topic) +
+           std::string(INDENT - std::min(INDENT, 2 + step.topic.size()), ' ') +
+           fmt::format("{}\n", fmt::join(lines(wordsOf(terminal.shown(step.text)), room, ""), separator));
 }
 
 /// The text, or as much of it as fits; no character is cut in two.
@@ -44,37 +37,41 @@ std::string clipped(const std::string& text, std::size_t room) {
     return text.substr(0, end) + "...";
 }
 
-/// "file:line:column: fragment", the fragment on a line of its own where the path leaves no room.
-std::string placeText(const Piece& place) {
+/// "file:line:column: fragment" behind a lead, the fragment on a line of its own where the path leaves no room.
+std::string placeText(const char* lead, const Piece& place, const Terminal& terminal) {
+    const std::size_t room = std::max(terminal.width(), LEAST_WIDTH) - INDENT;
     const std::string indent(INDENT, ' ');
-    const std::string origin = indent + catalogue::asText(place.origin) + ':';
+    const std::string origin = lead + catalogue::asText(place.origin) + ':';
     const std::size_t needed = std::min(place.text.size(), LEAST_FRAGMENT);
-    if (origin.size() + 1 + needed > LINE_WIDTH) {
-        return origin + '\n' + indent + clipped(place.text, LINE_WIDTH - INDENT) + '\n';
-    }
-    return origin + ' ' + clipped(place.text, LINE_WIDTH - origin.size() - 1) + '\n';
+    const bool fits = origin.size() + 1 + needed <= room;
+    return indent + terminal.aside(origin) + (fits ? " " : '\n' + indent) +
+           terminal.shown(clipped(place.text, fits ? room - origin.size() - 1 : room)) + '\n';
 }
 
-const char* verdictText(Verdict verdict) {
+std::string verdictText(Verdict verdict, const Terminal& terminal) {
     switch (verdict) {
     case Verdict::YES:
-        return "yes";
+        return terminal.good("yes:");
     case Verdict::NO:
-        return "no";
+        return terminal.bad("no:");
     case Verdict::FAULT:
         break;
     }
-    return "no answer";
+    return terminal.bad("no answer:");
 }
 
 } // namespace
 
-std::string asText(const Answer& answer) {
-    std::string text = fmt::format("{}: {}\n", verdictText(answer.verdict), inWords(answer.question));
+std::string asText(const Answer& answer, const Terminal& terminal) {
+    std::string text =
+        fmt::format("{} {}\n", verdictText(answer.verdict, terminal), inWords(answer.question));
     for (const Step& step : answer.explanation.steps) {
-        text += wrappedText(fmt::format("  {:<10}", step.topic), step.text);
+        text += stepText(step, terminal);
         if (step.place) {
-            text += placeText(*step.place);
+            text += placeText("", *step.place, terminal);
+            for (const catalogue::Shadow& shadow : step.place->shadows) {
+                text += placeText("shadows ", {shadow.text, shadow.origin}, terminal);
+            }
         }
     }
     return text;
@@ -87,6 +84,9 @@ Json asJson(const Answer& answer) {
         if (step.place) {
             object.update(catalogue::asJson(step.place->origin));
             object["fragment"] = step.place->text;
+            if (!step.place->shadows.empty()) {
+                object["shadows"] = catalogue::asJson(step.place->shadows);
+            }
         }
         steps.push_back(std::move(object));
     }

@@ -41,6 +41,9 @@ bool Chain::property() {
         }
     }
     add("absent", fmt::format("neither \"{}\" nor its family has a value for {}", device, key));
+    for (const char* const records : {"PROPERTY", "PROPERTIES"}) {
+        noteShadowed(device, records, key);
+    }
     return false;
 }
 

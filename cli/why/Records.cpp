@@ -6,6 +6,7 @@
 #include <AcdStore.h>
 
 #include <algorithm>
+#include <iterator>
 #include <string_view>
 
 namespace why {
@@ -17,7 +18,8 @@ constexpr std::size_t MOST_PIECES = 32768;
 
 class Splitter {
 public:
-    explicit Splitter(const AcdStore::Value& value) : m_value(value) {}
+    explicit Splitter(const AcdStore::Value& value)
+        : m_value(value), m_shadows(catalogue::shadowsOf(value)) {}
 
     /// The pieces of the text that starts at `offset`.
     [[nodiscard]] std::vector<Piece> pieces(std::string_view text, std::size_t offset, char separator) const {
@@ -44,11 +46,11 @@ public:
 
 private:
     [[nodiscard]] Piece piece(std::string_view text, std::size_t offset) const {
-        const AcdStore::Fragment place = m_value.at(offset);
-        return {std::string(text), {std::string(place.file), place.line, place.column}};
+        return {std::string(text), catalogue::originOf(m_value.at(offset)), m_shadows};
     }
 
     const AcdStore::Value& m_value;
+    catalogue::Shadows m_shadows;
 };
 
 /// A value that holds something: an empty one has no items at all.
@@ -62,6 +64,17 @@ std::optional<AcdStore::Value> valueWithItems(const std::string& database, const
 Records readRecords(const std::string& database, const std::string& key) {
     const std::optional<AcdStore::Value> value = valueWithItems(database, key);
     return value ? Records{value->fromSection, Splitter(*value).records()} : Records{};
+}
+
+std::vector<Record> readShadowedRecords(const std::string& database, const std::string& key) {
+    std::vector<Record> all;
+    if (const std::optional<AcdStore::Value> value = AcdStore::value(database.c_str(), key.c_str())) {
+        for (const AcdStore::Value& replaced : value->replaced) {
+            std::vector<Record> records = Splitter(replaced).records();
+            std::move(records.begin(), records.end(), std::back_inserter(all));
+        }
+    }
+    return all;
 }
 
 std::vector<Piece> readList(const std::string& database, const std::string& key) {

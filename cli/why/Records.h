@@ -14,6 +14,8 @@ using catalogue::Origin;
 struct Piece {
     std::string text;
     Origin origin;
+    catalogue::Shadows
+        shadows{}; ///< what layers below say in its place: whole values, or a property of its name
 };
 
 /// One record of a value whose records end at ":" and whose fields end at ",".
@@ -35,6 +37,9 @@ struct Records {
 
 /// The records of the key that the accessor called `database` gives; none when it has no such key.
 [[nodiscard]] Records readRecords(const std::string& database, const std::string& key);
+
+/// The records of the values that this key has in layers below and that are replaced on top.
+[[nodiscard]] std::vector<Record> readShadowedRecords(const std::string& database, const std::string& key);
 
 /// The items of a list whose items end at ",".
 [[nodiscard]] std::vector<Piece> readList(const std::string& database, const std::string& key);

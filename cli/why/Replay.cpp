@@ -20,7 +20,7 @@ constexpr const char* SPI = "spi";
 constexpr const char* BASE = "base";
 
 /// What the manager takes for an unknown operation: a row that no table has.
-constexpr int NO_ROW = 32;
+constexpr int NO_ROW = static_cast<int>(TARVIKNS::NO_OPERATION);
 
 int operationRow(const std::string& word) {
     const std::vector<std::string>& keys = vocabulary::operations();
@@ -202,9 +202,8 @@ void Replay::readProperties(const std::string& owner) {
     const Records single = readRecords(owner, "PROPERTY");
     for (const Record& record : single.all) {
         const Piece* const value = record.field(1);
-        m_properties.insert_or_assign(
-            owner + "_" + record.fields.front().text,
-            PropertyValues{{value == nullptr ? "" : value->text}, record.whole, single.ofDevice});
+        keep(owner, record.fields.front().text,
+             {{value == nullptr ? "" : value->text}, record.whole, single.ofDevice});
     }
     const Records multiple = readRecords(owner, "PROPERTIES");
     for (const Record& record : multiple.all) {
@@ -218,8 +217,18 @@ void Replay::readProperties(const std::string& owner) {
                 break;
             }
         }
-        m_properties.insert_or_assign(owner + "_" + record.fields.front().text, std::move(found));
+        keep(owner, record.fields.front().text, std::move(found));
     }
+}
+
+void Replay::keep(const std::string& owner, const std::string& key, PropertyValues found) {
+    const auto [known, isNew] = m_properties.try_emplace(owner + "_" + key);
+    const Piece& former = known->second.record;
+    // One that a layer on top appends stands for the one below.
+    if (!isNew && former.origin.layer != found.record.origin.layer) {
+        found.record.shadows.insert(found.record.shadows.begin(), {former.origin, former.text});
+    }
+    known->second = std::move(found);
 }
 
 const PropertyValues* Replay::property(const std::string& owner, const std::string& key) const {

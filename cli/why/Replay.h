@@ -86,6 +86,7 @@ private:
     [[nodiscard]] std::string loadDevice(const std::string& device, const std::string& package);
     void loadFamily(const std::string& family);
     void readProperties(const std::string& owner);
+    void keep(const std::string& owner, const std::string& key, PropertyValues found);
     void readOperations(const std::string& owner, const std::string& database);
     void readBsdlOperations(const std::string& owner, const std::string& database);
     void readOptions(const std::string& owner, const std::string& database);

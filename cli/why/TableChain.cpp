@@ -189,6 +189,7 @@ bool Chain::allows(const Replay::Permissions& permissions, const std::string& ta
                               vocabulary::key(m_question.output);
     if (others.empty()) {
         add("absent", fmt::format("no record of {} names {}", table, word));
+        noteShadowed(table == "spi" ? "spi.acd" : table, entryKey(m_question.kind), word);
     } else if (others.size() == 1) {
         add("absent", fmt::format("the one record for {} does not allow it{}", word, where),
             others.front()->record);
@@ -203,6 +204,15 @@ bool Chain::allows(const Replay::Permissions& permissions, const std::string& ta
         noteOddities(*permission);
     }
     return false;
+}
+
+/// Tells records that a layer on top took away by setting their key anew.
+void Chain::noteShadowed(const std::string& database, const std::string& key, const std::string& word) {
+    for (const Record& record : readShadowedRecords(database, key)) {
+        if (sameWithoutCase(record.fields.front().text, word)) {
+            add("note", fmt::format("a layer on top sets {} anew, without this record", key), record.whole);
+        }
+    }
 }
 
 /// Tells words of a record that allow nothing, or something else than they seem to.

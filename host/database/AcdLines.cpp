@@ -1,9 +1,6 @@
 #include <AcdLines.h>
 
-#include <TarvikException.h>
-
 #include "database/LineReader.h"
-#include "database/Reports.h"
 #include "database/Store.h"
 
 #include <algorithm>
@@ -70,31 +67,16 @@ constexpr std::array KINDS{AcdLines::Kind::HEADER, AcdLines::Kind::ASSIGNMENT, A
     return result;
 }
 
-[[nodiscard]] acd::Text readFile(const acd::SourceFile& file) {
-    if (file.text != nullptr) {
-        acd::MemorySource source(*file.text);
-        return acd::readWhole(source);
-    }
-    acd::FileSource source(file.path);
-    return acd::readWhole(source);
-}
-
 } // namespace
 
 std::vector<AcdLines> AcdLines::ofDatabase() {
+    acd::Store& store = acd::Store::instance();
     std::vector<AcdLines> all;
-    for (const auto& family : acd::Store::instance().families()) {
+    for (const auto& family : store.families()) {
         for (const acd::SourceFile& file : family->files) {
-            try {
-                const acd::Text text = readFile(file);
-                all.emplace_back(std::string_view(text.bytes.get(), text.size), file.path, family->name);
-            } catch (const acd::Unreadable& unreadable) {
-                acd::Reports reports;
-                reports.add(file.path, acd::location::FILE_UNREADABLE, unreadable.what());
-                reports.issue();
-                throw DataNotFoundException(acd::PRODUCT, acd::SOURCE, acd::REVISION,
-                                            acd::location::FILE_UNREADABLE);
-            }
+            const acd::Text text = store.read(file);
+            all.emplace_back(std::string_view(text.bytes.get(), text.size), file.path, family->name);
+            all.back().m_namesakes = file.namesakes;
         }
     }
     return all;

@@ -40,17 +40,37 @@ std::vector<std::string> AcdStore::devices(const std::string& family) {
     return names;
 }
 
+namespace {
+
+/// The directory that a path leads through; empty for the name of a memory file.
+[[nodiscard]] std::string_view directoryOf(std::string_view path) {
+    const std::size_t slash = path.rfind('/');
+    return slash == path.npos ? std::string_view() : path.substr(0, slash == 0 ? 1 : slash);
+}
+
+[[nodiscard]] AcdStore::Value publicValue(const acd::Opened& opened, const acd::Value& value,
+                                          bool fromSection) {
+    AcdStore::Value result{value.text(), {}, fromSection, {}};
+    for (const acd::Fragment& fragment : opened.database->fragments(value)) {
+        const std::string_view path = opened.database->path(fragment.layer);
+        result.fragments.push_back(
+            {fragment.offset, path, directoryOf(path), fragment.place.line, fragment.place.column});
+    }
+    return result;
+}
+
+} // namespace
+
 std::optional<AcdStore::Value> AcdStore::value(const char* name, const char* key) {
     const acd::Opened opened = Store::instance().open(name == nullptr ? "" : name);
     const acd::Value* const found = opened.database->find(opened.section, key == nullptr ? "" : key);
     if (found == nullptr) {
         return std::nullopt;
     }
-    Value value{
-        found->text(), {}, opened.section != nullptr && opened.database->holds(*opened.section, *found)};
-    for (const acd::Fragment& fragment : opened.database->fragments(*found)) {
-        value.fragments.push_back({fragment.offset, opened.database->path(fragment.layer),
-                                   fragment.place.line, fragment.place.column});
+    const bool fromSection = opened.section != nullptr && opened.database->holds(*opened.section, *found);
+    Value value = publicValue(opened, *found, fromSection);
+    for (const acd::Value& replaced : opened.database->replaced(*found)) {
+        value.replaced.push_back(publicValue(opened, replaced, fromSection));
     }
     return value;
 }

@@ -85,6 +85,7 @@ void Catalogue::addFile(std::string_view fileName, SourceFile file) {
         known->name = name;
         m_names.add(known->name);
     } else if (known->files.back().layer == file.layer) {
+        known->files.back().namesakes.push_back(std::move(file.path));
         return;
     }
     known->files.push_back(std::move(file));

@@ -26,6 +26,8 @@ struct SourceFile {
     std::uint32_t layer;     ///< counted from the bottom
     const std::string* text; ///< of a file in memory; null for one on disk
     bool isUnreadable = false;
+    std::vector<std::string>
+        namesakes{}; ///< paths in the same layer that differ in case alone, and don't count
 };
 
 /// A family and what is known of it so far.
@@ -63,11 +65,14 @@ public:
     /// wrong with the files is reported once.
     [[nodiscard]] const Database* database(Family& family, Reports& reports) const;
 
+    /// Opens one of the files that were found.
+    /// @throw Unreadable
+    [[nodiscard]] std::unique_ptr<ByteSource> open(const SourceFile& file) const;
+
 private:
     void addFile(std::string_view fileName, SourceFile file);
     void sort();
     [[nodiscard]] DeviceIndex makeIndex(Reports& reports) const;
-    [[nodiscard]] std::unique_ptr<ByteSource> open(const SourceFile& file) const;
 
     std::string m_workingDirectory; ///< of the process when it listed the directories; hosts change it
     std::shared_ptr<const MemoryFiles> m_memoryFiles;

@@ -32,10 +32,20 @@ private:
     };
     using Assignments = std::vector<Assignment>;
 
+    /// Each assignment replaces all that came before it; an append without one is the first text itself.
+    [[nodiscard]] static Assignments::iterator lastAssignment(Assignments::iterator first,
+                                                              Assignments::iterator last) {
+        const auto behind = std::find_if(std::reverse_iterator(last), std::reverse_iterator(first),
+                                         [](const Assignment& candidate) { return !candidate.appends; })
+                                .base();
+        return behind == first ? first : std::prev(behind);
+    }
+
     [[nodiscard]] std::uint32_t openSection(std::string_view name);
     void add(const Line& line, std::uint32_t section, std::uint32_t layer);
+    void keepReplaced(Assignments::iterator first, Assignments::iterator last);
     [[nodiscard]] Value join(Assignments::iterator first, Assignments::iterator last);
-    void dropWhatIsTooLong(Assignments::iterator first, Assignments::iterator last);
+    void dropWhatIsTooLong(Assignments::iterator first, Assignments::iterator last, bool isTold);
 
     Database& m_database;
     std::vector<LayerFault>& m_faults;
@@ -108,20 +118,39 @@ void DatabaseBuilder::merge() {
         if (section.m_count++ == 0) {
             section.m_first = static_cast<std::uint32_t>(m_database.m_values.size());
         }
-        // Each assignment replaces all that came before it; an append without one is the first text itself.
-        const auto assignment = std::find_if(std::reverse_iterator(last), std::reverse_iterator(first),
-                                             [](const Assignment& candidate) { return !candidate.appends; })
-                                    .base();
-        first = assignment == first ? first : std::prev(assignment);
-        m_database.m_values.push_back(std::distance(first, last) == 1 ? first->value : join(first, last));
+        const auto standing = lastAssignment(first, last);
+        dropWhatIsTooLong(standing, last, true);
+        keepReplaced(first, standing);
+        m_database.m_values.push_back(join(standing, last));
         first = last;
     }
     m_database.m_fragments.shrink_to_fit();
 }
 
+/// Keeps what a layer hides of the layers below it.
+/// @param last the assignment that stands
+void DatabaseBuilder::keepReplaced(Assignments::iterator first, Assignments::iterator last) {
+    const auto owner = static_cast<std::uint32_t>(m_database.m_values.size());
+    const auto layerOf = [this](const Assignment& assignment) {
+        return m_database.m_fragments[assignment.value.m_firstFragment].layer;
+    };
+    for (std::uint32_t layer = layerOf(*last); first != last;) {
+        const auto standing = lastAssignment(first, last);
+        if (layerOf(*standing) != layer) {
+            layer = layerOf(*standing);
+            dropWhatIsTooLong(standing, last, false);
+            m_database.m_replaced.push_back(join(standing, last));
+            m_database.m_replacedOwners.push_back(owner);
+        }
+        last = standing;
+    }
+}
+
 /// Joins what stands for one key in a text and fragments of its own.
 Value DatabaseBuilder::join(Assignments::iterator first, Assignments::iterator last) {
-    dropWhatIsTooLong(first, last);
+    if (std::distance(first, last) == 1) {
+        return first->value;
+    }
     std::size_t length = 0;
     for (auto part = first; part != last; ++part) {
         length += part->value.m_textLength;
@@ -147,16 +176,20 @@ Value DatabaseBuilder::join(Assignments::iterator first, Assignments::iterator l
 }
 
 /// Empties the appended texts that would make the value too long.
-void DatabaseBuilder::dropWhatIsTooLong(Assignments::iterator first, Assignments::iterator last) {
+void DatabaseBuilder::dropWhatIsTooLong(Assignments::iterator first, Assignments::iterator last,
+                                        bool isTold) {
     std::size_t length = first->value.m_textLength;
     for (auto part = std::next(first); part != last; ++part) {
         if (length + part->value.m_textLength <= m_longestValue) {
             length += part->value.m_textLength;
             continue;
         }
-        const Fragment& origin = m_database.m_fragments[part->value.m_firstFragment];
-        m_faults.push_back(
-            {origin.layer, {FaultKind::VALUE_TOO_LONG, false, origin.place, excerpt(part->value.text())}});
+        if (isTold) {
+            const Fragment& origin = m_database.m_fragments[part->value.m_firstFragment];
+            m_faults.push_back(
+                {origin.layer,
+                 {FaultKind::VALUE_TOO_LONG, false, origin.place, excerpt(part->value.text())}});
+        }
         part->value.m_textLength = 0;
         part->value.m_fragmentCount = 0;
     }
@@ -202,6 +235,12 @@ bool Database::holds(const Section& section, const Value& value) const noexcept 
 
 std::span<const Fragment> Database::fragments(const Value& value) const noexcept {
     return {m_fragments.data() + value.m_firstFragment, value.m_fragmentCount};
+}
+
+std::span<const Value> Database::replaced(const Value& value) const noexcept {
+    const auto owner = static_cast<std::uint32_t>(&value - m_values.data());
+    const auto [first, last] = std::equal_range(m_replacedOwners.begin(), m_replacedOwners.end(), owner);
+    return {m_replaced.data() + (first - m_replacedOwners.begin()), static_cast<std::size_t>(last - first)};
 }
 
 } // namespace acd

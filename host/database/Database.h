@@ -95,6 +95,9 @@ public:
     /// The origin of a value, in order; one fragment at least.
     [[nodiscard]] std::span<const Fragment> fragments(const Value& value) const noexcept;
 
+    /// The values of layers below that `KEY = ...` on top replaced, the upper ones first.
+    [[nodiscard]] std::span<const Value> replaced(const Value& value) const noexcept;
+
     [[nodiscard]] std::string_view path(std::uint32_t layer) const noexcept { return m_layers[layer].path; }
 
 private:
@@ -106,6 +109,8 @@ private:
     NameTable m_sectionNames;
     std::vector<Section> m_sections{1}; ///< the family's own first
     std::vector<Value> m_values;
+    std::vector<Value> m_replaced;               ///< those of one value stand together
+    std::vector<std::uint32_t> m_replacedOwners; ///< of each, the place of the value that stands for it
     std::vector<Fragment> m_fragments;
     std::vector<std::unique_ptr<char[]>> m_joinedTexts; ///< of values that were appended to
 };

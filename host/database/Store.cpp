@@ -131,6 +131,16 @@ const Database& Store::databaseOfFile(std::string_view fileName) {
     return family == nullptr ? m_nothing : database(*family);
 }
 
+Text Store::read(const SourceFile& file) {
+    try {
+        return readWhole(*catalogue().open(file));
+    } catch (const Unreadable& unreadable) {
+        m_reports.add(file.path, location::FILE_UNREADABLE, unreadable.what());
+    }
+    m_reports.issue();
+    throw DataNotFoundException(PRODUCT, SOURCE, REVISION, location::FILE_UNREADABLE);
+}
+
 PM_DEVKEY& Store::accessor(const Opened& opened) {
     if (opened.family == nullptr) {
         return m_nothingAccessor;

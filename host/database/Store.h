@@ -65,6 +65,10 @@ public:
     /// @throw DataNotFoundException when it can't be read
     [[nodiscard]] const Database& databaseOfFile(std::string_view fileName);
 
+    /// Reads a file of a family, whole.
+    /// @throw DataNotFoundException when it can't be read
+    [[nodiscard]] Text read(const SourceFile& file);
+
     /// The one accessor of what was opened, however often that is.
     [[nodiscard]] PM_DEVKEY& accessor(const Opened& opened);
 

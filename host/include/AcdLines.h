@@ -10,6 +10,7 @@
 /// For tools that tell what a file says and what is wrong with it. Whoever wants answers asks `AcdReader`.
 class __attribute__((visibility("default"))) AcdLines {
 public:
+    /// What a line is.
     enum class Kind {
         HEADER,     ///< `[name]`
         ASSIGNMENT, ///< `name = value`
@@ -19,71 +20,86 @@ public:
 
     /// What can be wrong with a line.
     enum class Fault {
-        NONE,
-        NO_EQUALS_SIGN,
-        EMPTY_KEY,
-        BLANK_IN_KEY,
-        NUL_BYTE,
-        LINE_TOO_LONG,
-        CONTINUED_AT_END, ///< `\` at the end of the file
-        UNCLOSED_HEADER,
-        EMPTY_NAME,
-        BLANK_IN_NAME,
-        TEXT_BEHIND_HEADER,
+        NONE,               ///< nothing
+        NO_EQUALS_SIGN,     ///< neither a header nor an assignment
+        EMPTY_KEY,          ///< nothing before the `=`
+        BLANK_IN_KEY,       ///< a blank inside what stands before the `=`
+        NUL_BYTE,           ///< a byte 0 anywhere
+        LINE_TOO_LONG,      ///< over 16 MiB, its continuations joined
+        CONTINUED_AT_END,   ///< `\` at the end of the file
+        UNCLOSED_HEADER,    ///< `[` without `]`
+        EMPTY_NAME,         ///< `[]`
+        BLANK_IN_NAME,      ///< a blank inside a header's name
+        TEXT_BEHIND_HEADER, ///< something behind the `]`
     };
 
     /// Where a piece of a value was written; lines and columns are counted from 1, columns in bytes.
     struct Fragment {
         std::size_t offset; ///< of its first byte in the value
-        unsigned line;
-        unsigned column;
+        unsigned line;      ///< of the file
+        unsigned column;    ///< of its first byte in that line
     };
 
+    /// A line, its continuations joined.
     struct Line {
-        Kind kind;
-        unsigned firstLine; ///< the lines of the file that it consists of
-        unsigned lastLine;
+        Kind kind;                       ///< what it is
+        unsigned firstLine;              ///< the first line of the file that it consists of
+        unsigned lastLine;               ///< and the last one
         std::string_view name;           ///< of a section, or the key; empty for a fault
         std::string_view value;          ///< empty for headers and faults
         std::vector<Fragment> fragments; ///< of the value, in order; one at least, even of an empty value
-        unsigned line;                   ///< of the name, or of the fault
-        unsigned column;
-        Fault fault;        ///< `NONE` for all other kinds
+        unsigned line;                   ///< of the file, where the name or the fault stands
+        unsigned column;                 ///< of the same
+        Fault fault;                     ///< `NONE` for all other kinds
         bool closesSection; ///< a header's fault: the keys up to the next header belong to nothing
         std::string text;   ///< what the fault is, in words
     };
 
     /// A comment, from its `#` on.
     struct Comment {
-        unsigned line;
-        unsigned column;
-        std::string_view text;
+        unsigned line;         ///< of the file
+        unsigned column;       ///< of the `#`
+        std::string_view text; ///< up to the end of the line
     };
 
-    /// All files of the search path, or all memory files: by family in byte order of the file names, and of a
-    /// family the bottom layer first.
+    /// All files of the search path, or all memory files.
+    /// @return by family in byte order of the file names, and of a family the bottom layer first
     /// @throw DataNotFoundException when a file can't be read; an info message that names it goes before
     [[nodiscard]] static std::vector<AcdLines> ofDatabase();
 
     /// Takes a text apart.
+    /// @param text the whole file
     /// @param path how the file is shown
     /// @param family the name of its family, as the readers spell it
     explicit AcdLines(std::string_view text, std::string path = {}, std::string family = {});
 
     AcdLines(const AcdLines&) = delete;
     AcdLines& operator=(const AcdLines&) = delete;
+
+    /// Takes over what was read, with its texts.
     AcdLines(AcdLines&&) noexcept = default;
+
+    /// Takes over what was read, with its texts.
+    /// @return this object
     AcdLines& operator=(AcdLines&&) noexcept = default;
 
+    /// @return how the file is shown
     [[nodiscard]] const std::string& path() const noexcept { return m_path; }
+    /// @return the name of its family, as the readers spell it
     [[nodiscard]] const std::string& family() const noexcept { return m_family; }
 
-    /// The lines, and the comments, in the order of the file. Their texts live as long as this object,
-    /// wherever it is moved.
+    /// Files that are never read.
+    /// @return the paths of files of the same directory whose names differ from this one's in case alone
+    [[nodiscard]] const std::vector<std::string>& namesakes() const noexcept { return m_namesakes; }
+
+    /// @return the lines in the order of the file; their texts live as long as this object, wherever it is moved
     [[nodiscard]] const std::vector<Line>& lines() const noexcept { return m_lines; }
+    /// @return the comments, likewise
     [[nodiscard]] const std::vector<Comment>& comments() const noexcept { return m_comments; }
 
-    /// A line of the file as it stands there, without its end; empty where there is none.
+    /// A line of the file as it stands there.
+    /// @param line counted from 1
+    /// @return its text without the line end; empty where there is none; lives as long as this object
     [[nodiscard]] std::string_view source(unsigned line) const noexcept;
 
 private:
@@ -93,6 +109,7 @@ private:
 
     std::string m_path;
     std::string m_family;
+    std::vector<std::string> m_namesakes;
     std::vector<char> m_source; ///< vectors, since their texts stay where they are when they are moved
     std::vector<char> m_joined; ///< the same bytes with continuations joined: what the lines' texts are
     std::vector<std::size_t> m_starts; ///< of the lines in the source

@@ -13,18 +13,21 @@ public:
     ///        the paths tried, or the fault, goes before
     AcdReader();
 
-    /// Opens the database that holds `name`. A name that resolves to nothing gives an empty database and the
-    /// module "base". Null is the empty name.
+    /// Opens the database that holds a name. One that resolves to nothing gives an empty database and the
+    /// module "base".
+    /// @param name of a file, a family or a device; null is the empty name
     /// @throw DataNotFoundException when the family's file is there but can't be read
     explicit AcdReader(const char* name);
 
     AcdReader(const AcdReader&) = delete;
     AcdReader& operator=(const AcdReader&) = delete;
 
-    /// The accessor of the keys; it outlives the reader: databases live as long as the process.
+    /// The accessor of the keys.
+    /// @return never null; it outlives the reader: databases live as long as the process
     [[nodiscard]] PM_DEVKEY* getDevkey() const noexcept { return m_accessor; }
 
-    /// The family's name as its file spells it; lives as long as the process.
+    /// The family that the name resolved to.
+    /// @return its name as its file spells it; lives as long as the process
     [[nodiscard]] const char* getPM() const noexcept { return m_module; }
 
 private:

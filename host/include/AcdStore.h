@@ -15,46 +15,59 @@
 /// What has been read lives as long as the process.
 class __attribute__((visibility("default"))) AcdStore {
 public:
-    /// Looks in these directories, the first one on top: where several hold a file, its keys replace or, with
-    /// `+=`, extend those of the layers below. Call it before the first reader.
+    /// Looks in these directories. Call it before the first reader.
+    /// @param directories the first one on top: where several hold a file, its keys replace or, with `+=`,
+    ///        extend those of the layers below
     static void setSearchPath(std::vector<std::string> directories);
 
-    /// Holds these files, name ("kestrel.acd") to text, in place of any directory. Call it before the first
-    /// reader.
+    /// Holds these files in place of any directory. Call it before the first reader.
+    /// @param files name ("kestrel.acd") to text
     static void setMemoryFiles(std::map<std::string, std::string> files);
 
-    /// The directories that are looked in, top first; empty for memory files.
+    /// The directories that are looked in.
+    /// @return their paths, top first; empty for memory files
     [[nodiscard]] static std::vector<std::string> searchPath();
 
-    /// The family names, as their files spell them, in byte order of the file names; "base" and "spi" are
-    /// among them when they have a file.
+    /// The families that have a file, "base" and "spi" among them.
+    /// @return their names, as their files spell them, in byte order of the file names
     [[nodiscard]] static std::vector<std::string> families();
 
-    /// The device names of a family, as its file spells them, in the order in which their sections open.
+    /// The devices of a family.
+    /// @param family its name, in any case
+    /// @return their names, as its file spells them, in the order in which their sections open
     /// @throw DataNotFoundException when the family's file can't be read
     [[nodiscard]] static std::vector<std::string> devices(const std::string& family);
 
     /// Where a piece of a value was written. A value is one fragment, or several where lines are continued or
     /// texts appended.
     struct Fragment {
-        std::size_t offset;    ///< of its first byte in the value
-        std::string_view file; ///< the path, or the name of a memory file
-        unsigned line;         ///< counted from 1
-        unsigned column;       ///< counted from 1, in bytes
+        std::size_t offset;     ///< of its first byte in the value
+        std::string_view file;  ///< the path, or the name of a memory file
+        std::string_view layer; ///< the directory of the search path; empty for a memory file
+        unsigned line;          ///< counted from 1
+        unsigned column;        ///< counted from 1, in bytes
     };
 
     /// A value with its origin.
     struct Value {
-        std::string_view text;
+        std::string_view text;           ///< lives as long as the process
         std::vector<Fragment> fragments; ///< in order; never empty
         bool fromSection;                ///< false: one of the family's own keys
 
-        /// The fragment that byte `offset` of the text stands in, its column moved to that byte.
+        /// The values of layers below that `KEY = ...` on top replaced, the upper ones first. They have none
+        /// themselves.
+        std::vector<Value> replaced;
+
+        /// Where one byte of the text was written.
+        /// @param offset of the byte
+        /// @return the fragment that it stands in, its column moved to that byte
         [[nodiscard]] Fragment at(std::size_t offset) const;
     };
 
-    /// The value that an accessor opened by `name` gives for `key`; nothing when there is none. The texts
-    /// live as long as the process.
+    /// A value and where it comes from.
+    /// @param name as an `AcdReader` is opened by
+    /// @param key case included
+    /// @return what that reader's accessor gives for the key; nothing when there is none
     /// @throw DataNotFoundException when the family's file can't be read
     [[nodiscard]] static std::optional<Value> value(const char* name, const char* key);
 

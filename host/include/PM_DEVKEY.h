@@ -14,14 +14,19 @@ class Section;
 /// Reads keyed values of one database: a device's accessor sees its family's keys behind its own.
 class __attribute__((visibility("default"))) PM_DEVKEY {
 public:
-    /// Opens the file called `file` (for example "spi.acd") on a configuration. The flags are passed through
-    /// unchanged and have no meaning to this library. No such file gives an empty database.
+    /// Opens a file on a configuration. No such file gives an empty database.
+    /// @param file its name, for example "spi.acd"
+    /// @param configuration which one does not matter to this library
+    /// @param flag1 has no meaning to this library, as the others
+    /// @param flag2 likewise
+    /// @param flag3 likewise
     /// @throw DataNotFoundException when the file is there but can't be read
     PM_DEVKEY(const char* file, const PM_PIC& configuration, unsigned char flag1, unsigned char flag2,
               unsigned char flag3);
 
-    /// The accessor of one section of a database, or of the family's own keys when `section` is null. Both
-    /// must outlive the accessor.
+    /// The accessor of one section of a database.
+    /// @param database must outlive the accessor
+    /// @param section must outlive it, too; null: the family's own keys
     PM_DEVKEY(const acd::Database& database, const acd::Section* section) noexcept;
 
     PM_DEVKEY(const PM_DEVKEY&) = delete;

@@ -2,18 +2,20 @@
 
 /// How a part name is bound to its personality module. Passed through unchanged.
 enum class PM_PARTNAME_BINDING : int {
-    UNBOUND = 0,
-    BY_NAME = 1,
+    UNBOUND = 0, ///< not at all
+    BY_NAME = 1, ///< by its name
 };
 
 /// What is known of a part: the personality module that describes it.
 class __attribute__((visibility("default"))) PM_SPEC {
 public:
-    /// The part's family, spelt as its file spells it; null when the database has no such part. The text
-    /// lives as long as the process.
+    /// The part's family.
+    /// @return its name as its file spells it, which lives as long as the process; null when the database has
+    ///         no such part
     [[nodiscard]] const char* get_pm() const noexcept { return m_module; }
 
 protected:
+    /// @param module the family's name, or null; must outlive the object
     explicit PM_SPEC(const char* module) noexcept : m_module(module) {}
 
 private:

@@ -11,6 +11,7 @@
 /// are no further arguments.
 class __attribute__((visibility("default"))) Port_MsgManData {
 public:
+    /// Whom a message is for.
     enum class Channel : int {
         INFO,   ///< notices to the user
         STATUS, ///< status and dump lines
@@ -19,35 +20,57 @@ public:
 
     /// One message on its way to the sink. The texts are valid during the sink's call only.
     struct Message {
-        Channel channel;
-        std::string_view product; ///< empty for debug messages, as source and revision are
-        std::string_view source;
-        int line; ///< the issuing site; 0 for debug messages
-        std::string_view revision;
-        std::string_view text; ///< finished, line end included where there is one
+        Channel channel;           ///< whom it is for
+        std::string_view product;  ///< that issues it; empty for debug messages, as source and revision are
+        std::string_view source;   ///< of the issuing site
+        int line;                  ///< the location of the issuing site; 0 for debug messages
+        std::string_view revision; ///< of the source
+        std::string_view text;     ///< finished, line end included where there is one
     };
 
+    /// What takes the messages.
     using Sink = std::function<void(const Message&)>;
 
-    /// Sends all messages to `sink` from now on. An empty sink restores the default: info to standard error,
-    /// status to standard output, debug dropped unless the environment variable TARVIK_DEBUG is set (then to
-    /// standard error). What a sink throws passes through to the caller that issued the message.
-    /// @return the former sink; empty when that was the default.
+    /// Sends all messages to a sink from now on. What it throws passes through to the caller that issued the
+    /// message.
+    /// @param sink an empty one restores the default: info to standard error, status to standard output, debug
+    ///        dropped unless the environment variable TARVIK_DEBUG is set (then to standard error)
+    /// @return the former sink; empty when that was the default
     static Sink setSink(Sink sink);
 
     /// The message object of one issuing site. The texts must outlive it: pass constants.
+    /// @param product that speaks
+    /// @param source of the site
+    /// @param line its location
+    /// @param revision of the source
+    /// @return the object
     [[nodiscard]] static Port_MsgManData createObject(const char* product, const char* source, int line,
                                                       const char* revision) noexcept;
 
+    /// Issues a notice to the user.
+    /// @param text finished
     void issueInfo(const char* text) const;
+
+    /// Issues a notice to the user.
+    /// @param format as of printf, and so are the arguments behind it
     template <typename Formatted = void>
     [[gnu::format(printf, 2, 3)]] void issueInfo(const char* format, ...) const;
 
+    /// Issues a status or dump line, or a piece of one.
+    /// @param text finished
     void issueStatus(const char* text) const;
+
+    /// Issues a status or dump line, or a piece of one.
+    /// @param format as of printf, and so are the arguments behind it
     template <typename Formatted = void>
     [[gnu::format(printf, 2, 3)]] void issueStatus(const char* format, ...) const;
 
+    /// Issues trace output for developers.
+    /// @param text finished
     static void debugStub(const char* text);
+
+    /// Issues trace output for developers.
+    /// @param format as of printf, and so are the arguments behind it
     template <typename Formatted = void>
     [[gnu::format(printf, 1, 2)]] static void debugStub(const char* format, ...);
 

@@ -14,63 +14,92 @@ public:
     /// What `GetIndexOfFirstChar` answers for an absent character: all bits set.
     static constexpr std::size_t NOT_FOUND = static_cast<std::size_t>(-1);
 
+    /// The empty text.
     StringBase() noexcept = default;
 
-    /// Copies a NUL-terminated text; null gives the empty text.
+    /// Copies a NUL-terminated text.
+    /// @param text null gives the empty text
     StringBase(const char* text) : m_text(text == nullptr ? "" : text) {}
 
-    /// Copies `length` bytes, NULs included. `bytes` may be null when `length` is 0.
+    /// Copies bytes, NULs included.
+    /// @param bytes may be null when `length` is 0
+    /// @param length how many
     StringBase(const char* bytes, std::size_t length) : m_text(std::string_view(bytes, length)) {}
 
+    /// Becomes a copy.
+    /// @param text NUL-terminated; null is the empty text
+    /// @return this text
     StringBase& operator=(const char* text) {
         m_text = text == nullptr ? "" : text;
         return *this;
     }
+    /// Appends a text.
+    /// @param text NUL-terminated; null is the empty text
+    /// @return this text
     StringBase& operator+=(const char* text) {
         m_text += text == nullptr ? "" : text;
         return *this;
     }
+    /// Appends a text.
+    /// @param text any text, this one too
+    /// @return this text
     StringBase& operator+=(const StringBase& text) {
         m_text += text.m_text;
         return *this;
     }
 
-    /// The bytes, NUL-terminated; valid until this object is changed or destroyed.
+    /// @return the bytes, NUL-terminated; valid until this object is changed or destroyed
     [[nodiscard]] const char* c_str() const noexcept { return m_text.c_str(); }
 
-    /// The number of bytes, without the terminator.
+    /// @return the number of bytes, without the terminator
     [[nodiscard]] std::size_t GetLength() const noexcept { return m_text.size(); }
 
-    /// Becomes a finished text: `%%` gives `%`, any other `%` stands as it is.
+    /// Becomes a finished text.
+    /// @param text `%%` in it gives `%`, any other `%` stands as it is
     void Format(const char* text);
 
     /// Becomes what printf would print. A null text formats as `(null)`. A template only so that overload
     /// resolution prefers the finished text where there are no further arguments.
+    /// @param format as of printf, and so are the arguments behind it
     template <typename Formatted = void>
     [[gnu::format(printf, 2, 3)]] void Format(const char* format, ...);
 
+    /// Turns a to z into A to Z.
     void MakeUpper() noexcept;
+
+    /// Turns A to Z into a to z.
     void MakeLower() noexcept;
 
-    /// The index of the first `wanted` at or behind `from`; `NOT_FOUND` when there is none.
+    /// Looks for a character.
+    /// @param wanted the character
+    /// @param from the index to start at
+    /// @return the index of the first one at or behind `from`; `NOT_FOUND` when there is none
     [[nodiscard]] std::size_t GetIndexOfFirstChar(char wanted, std::size_t from = 0) const noexcept {
         return m_text.find(wanted, from);
     }
 
-    /// Keeps the first `length` bytes; a text that is no longer than that stays as it is.
+    /// Keeps the first bytes.
+    /// @param length how many; a text that is no longer than that stays as it is
     void Truncate(std::size_t length) noexcept;
 
-    /// Byte order, as unsigned bytes, the shorter first on a tie: negative, 0 or positive.
+    /// Compares in byte order, as unsigned bytes, the shorter first on a tie.
+    /// @param other any text
+    /// @return negative, 0 or positive
     [[nodiscard]] int Compare(const StringBase& other) const noexcept { return m_text.compare(other.m_text); }
 
-    /// As `Compare`, without regard to ASCII case.
+    /// Compares likewise, without regard to ASCII case.
+    /// @param other any text
+    /// @return negative, 0 or positive
     [[nodiscard]] int ICompare(const StringBase& other) const noexcept;
 
-    /// The CRC-32 (the one of Ethernet and zip) of the bytes.
+    /// @return the CRC-32 (the one of Ethernet and zip) of the bytes
     [[nodiscard]] std::uint32_t CRC32() const noexcept { return CRC32(m_text.data(), m_text.size()); }
 
-    /// The CRC-32 of `length` bytes, going on from `former`: the checksum of a text can be taken piece by
-    /// piece, without joining the pieces.
+    /// The CRC-32 of a text taken piece by piece, without joining the pieces.
+    /// @param bytes of the piece
+    /// @param length of the piece
+    /// @param former the checksum of the pieces before it
+    /// @return the checksum of all by now
     [[nodiscard]] static std::uint32_t CRC32(const char* bytes, std::size_t length,
                                              std::uint32_t former = 0) noexcept;
 
@@ -78,10 +107,18 @@ private:
     std::string m_text;
 };
 
-/// Same length and same bytes.
+/// Are two texts the same?
+/// @param left any text
+/// @param right any text
+/// @return whether they have the same length and the same bytes
 [[nodiscard]] inline bool operator==(const StringBase& left, const StringBase& right) noexcept {
     return left.GetLength() == right.GetLength() && left.Compare(right) == 0;
 }
+
+/// Do two texts differ?
+/// @param left any text
+/// @param right any text
+/// @return whether they do
 [[nodiscard]] inline bool operator!=(const StringBase& left, const StringBase& right) noexcept {
     return !(left == right);
 }

@@ -7,15 +7,17 @@
 /// Pieces are joined as they come, nothing is put between them.
 class __attribute__((visibility("default"))) TarvikSmokeMgr {
 public:
-    /// Records a finished piece, safe whatever it holds: `%%` gives `%`, any other `%` stands as it is.
+    /// Records a finished piece.
+    /// @param piece safe whatever it holds: `%%` gives `%`, any other `%` stands as it is
     void smokeStatus(const char* piece);
 
     /// Records what printf would print. A null text formats as `(null)`. A template only so that overload
     /// resolution prefers the finished piece where there are no further arguments.
+    /// @param format as of printf, and so are the arguments behind it
     template <typename Formatted = void>
     [[gnu::format(printf, 2, 3)]] void smokeStatus(const char* format, ...);
 
-    /// All that was recorded so far; valid until the next piece.
+    /// @return all that was recorded so far; valid until the next piece
     [[nodiscard]] const StringBase& text() const noexcept { return m_text; }
 
 private:

@@ -22,19 +22,32 @@ class TarvikSmokeMgr;
 /// Tells a device-programming application what it may offer its user for a device.
 ///
 /// One manager exists per process. It answers from the device database, which it reads as it goes: its
-/// start-up reads the base database and the SPI flash database, the first question about a device reads that
-/// device's family. It takes no lock: call it from one thread.
+/// start-up reads the base database and the SPI flash database, the first question about a device loads that
+/// device's records and its family's. It takes no lock: call it from one thread.
 ///
-/// For all methods: a null text is the empty text, but a null package is no package. A device name may carry
-/// a package behind its first "_". Texts and sets that are returned by pointer or reference belong to the
-/// manager and live until it is removed. While exceptions are on, bad records of the database raise
-/// `DataMismatchException` and names that no list holds raise `OutOfRangeException`, as each method says;
-/// while they are off the same faults give a neutral value. Failures to read a database file raise
-/// `DataNotFoundException` in either case.
+/// **Arguments.** A null text is the empty text, but a null package is no package. A device name may carry a
+/// package behind its first "_"; the name before it is what families are found by. An enumeration may hold
+/// any integer; each method says what one outside its list gives.
+///
+/// **Results.** Texts, sets and maps that are returned by pointer or reference belong to the manager and live
+/// until it is removed; all others are the caller's. Bit i of a mask stands for the enumeration's value i.
+///
+/// **Errors.** A refusal is the answer no and a message, never an exception. While exceptions are on, as they
+/// are after the start-up, faults of the database raise; while they are off the same faults give a neutral
+/// value: false, 0, null or the empty set. A method that *loads* a device raises, the first time, for
+/// - a malformed record, `DataMismatchException` with the location of the fault (1011 to 1760), after a debug
+///   message. Cells that were filled before it stay filled, and the load is not tried again;
+/// - an operation that nobody knows (1631, 1688), a family that is not supported (1999) or no option package
+///   (2024), `OutOfRangeException`.
+///
+/// Two faults raise in either case: a record of an option that nobody knows, `DataMismatchException` (1500),
+/// and a database file that is there but can't be read, `DataNotFoundException`.
 class __attribute__((visibility("default"))) ConstraintsManager {
 public:
-    /// Texts by name, and sets of texts, in byte order.
+    /// Texts by name, in byte order of the names.
     using Texts = std::map<StringBase, StringBase, ltptstr>;
+
+    /// Texts, each once, in byte order.
     using TextSet = std::set<StringBase, ltptstr>;
 
     ConstraintsManager(const ConstraintsManager&) = delete;
@@ -54,164 +67,273 @@ public:
     /// can't be made twice in a process.
     static void RemoveConstraintsManager();
 
-    /// Turns exceptions on (as they are after the start-up) or off.
+    /// Turns exceptions on (as they are after the start-up) or off, from the next call on.
+    /// @param exceptions true: faults raise; false: they give a neutral value
     void setExceptions(bool exceptions) noexcept;
 
-    /// The operations, or options, in the order in which they are presented: 0 to 31, and 0 to 23. Empty when
-    /// a fault ended the start-up before they were set.
+    /// The operations in the order in which they are presented.
+    /// @return the values 0 to 31; empty when a fault ended the start-up before they were set
     [[nodiscard]] const std::vector<TARVIKNS::OP_TYPE>& getOperationOrders() const noexcept;
+
+    /// The programming options in the order in which they are presented.
+    /// @return the values 0 to 23; empty when a fault ended the start-up before they were set
     [[nodiscard]] const std::vector<TARVIKNS::PROGRAM_OPTION>& getProgramOptionOrders() const noexcept;
 
     // ---- The vocabulary: conversions that need no manager and raise whatever `setExceptions` says ---------
 
-    /// The mode that a text names, without regard to case; `BS` for every text that names none.
+    /// The mode that a text names.
+    /// @param text a key name, or a name that databases write, in any case
+    /// @return the mode; `BS` for every text that names none
     [[nodiscard]] static TARVIKNS::MODE_TYPE modeString2Type(const char* text) noexcept;
 
-    /// The key name of a mode; "BS" for every value that is none.
+    /// The key name of a mode.
+    /// @param mode any value
+    /// @return the name; "BS" for every value that is none
     [[nodiscard]] static StringBase modeType2String(TARVIKNS::MODE_TYPE mode);
 
-    /// The output that a text names, case included; `NONE` for every other text, "QSVF" and "NULLCABLE" too.
+    /// The output that a text names.
+    /// @param text a key name, case included
+    /// @return the output; `NONE` for every other text, "QSVF" and "NULLCABLE" too
     [[nodiscard]] static TARVIKNS::OUTPUT_TYPE cableString2Type(const char* text) noexcept;
 
-    /// The key name of an output; empty for every value that is none.
+    /// The key name of an output.
+    /// @param output any value
+    /// @return the name; empty for every value that is none
     [[nodiscard]] static StringBase cableType2String(TARVIKNS::OUTPUT_TYPE output);
 
-    /// The operation that a key name, or a display name, stands for, without regard to case; for every other
-    /// text `NO_OPERATION`, and the info message "Operation %s is not defined.\n".
+    /// The operation that a key name stands for.
+    /// @param text a key name in any case
+    /// @return the operation; for every other text `NO_OPERATION`, after the info message
+    ///         "Operation %s is not defined.\n"
     [[nodiscard]] static TARVIKNS::OP_TYPE operationString2Type(const char* text);
+
+    /// The operation that a display name stands for.
+    /// @param text a display name in any case
+    /// @return as `operationString2Type`
     [[nodiscard]] static TARVIKNS::OP_TYPE operationDisplayString2Type(const char* text);
 
-    /// The key name, or display name, of an operation; empty for every value that is none, and the info
-    /// message "Operation %d is not defined.\n".
+    /// The key name of an operation.
+    /// @param operation any value
+    /// @return the name; empty for every value that is none, after the info message
+    ///         "Operation %d is not defined.\n"
     [[nodiscard]] static StringBase operationType2String(TARVIKNS::OP_TYPE operation);
+
+    /// The name by which an operation is shown to users.
+    /// @param operation any value
+    /// @return as `operationType2String`
     [[nodiscard]] static StringBase operationType2DisplayString(TARVIKNS::OP_TYPE operation);
 
-    /// The option that a text names, case included. Only the options up to `SECTOR_LOCKDOWN` can be read.
+    /// The option that a text names.
+    /// @param text a key name, case included, of an option up to `SECTOR_LOCKDOWN`
+    /// @return the option
     /// @throw DataMismatchException (1500) for every other text
     [[nodiscard]] static TARVIKNS::PROGRAM_OPTION optionString2Type(const char* text);
 
     /// The key name of an option.
+    /// @param option 0 to 23
+    /// @return the name
     /// @throw DataMismatchException (1413) for every value that is none
     [[nodiscard]] static StringBase optionType2String(TARVIKNS::PROGRAM_OPTION option);
 
     /// Cuts a device name before its first "_"; a name without one stays as it is.
+    /// @param device the name, changed in place
     static void removePackageName(StringBase& device);
 
     // ---- Checks -------------------------------------------------------------------------------------------
 
-    /// May the mode use the output? A refusal issues the info message "%s is not supported in %s\n".
+    /// May the mode use the output? Loads nothing.
+    /// @param mode a value that is none may use nothing
+    /// @param output any value; `PFF` may use each
+    /// @return whether it may; a refusal issues the info message "%s is not supported in %s\n"
     [[nodiscard]] bool checkConstraints(TARVIKNS::MODE_TYPE mode, TARVIKNS::OUTPUT_TYPE output);
 
-    /// May the device, in a package or (null) in any, be configured in the mode? Refusals as above. `SPI` and
-    /// `PFF` accept every device.
+    /// May the device be configured in the mode? Loads nothing.
+    /// @param mode `SPI` and `PFF` accept every device
+    /// @param device the device, whose family the mode must list
+    /// @param package in which the mode must not exclude the device; null asks for no package
+    /// @return whether it may; a refusal issues the info message "%s is not supported in %s\n"
     /// @throw OutOfRangeException (644) while exceptions are on, for a value that is no mode
     [[nodiscard]] bool checkConstraints(TARVIKNS::MODE_TYPE mode, const char* device, const char* package);
 
-    /// Both at once; here `SPI` and `PFF` do check the device. When both refuse, the message names the
-    /// output.
+    /// May the mode use the output, and the device be configured in it? Loads nothing.
+    /// @param mode unlike above, `SPI` and `PFF` do check the device
+    /// @param output as above
+    /// @param device as above
+    /// @param package as above
+    /// @return whether both may; a refusal issues the info message as above, which names the output when
+    ///         both are refused
     /// @throw OutOfRangeException (644) while exceptions are on, for a value that is no mode
     [[nodiscard]] bool checkConstraints(TARVIKNS::MODE_TYPE mode, TARVIKNS::OUTPUT_TYPE output,
                                         const char* device, const char* package);
 
-    /// May the operation run on the device, in the mode, through the output? A value that is out of the
-    /// table's range gives a debug message and false. `family` is not read: the device's own family counts.
-    /// @throw OutOfRangeException (1999) while exceptions are on, for a device whose family is not supported
+    /// May the operation run on the device, in the mode, through the output? Loads the device.
+    /// @param mode in `SPI` the answer is that of "spi", whatever the device; else 0 to 8
+    /// @param output 0 to 9
+    /// @param device the device
+    /// @param operation 0 to 31
+    /// @param family is not read: the device's own family counts
+    /// @return whether it may, without a message; for a value out of range false, after a debug message
+    /// @throw OutOfRangeException (1999) while exceptions are on, for a device whose family is not supported,
+    ///        and what loading raises
     [[nodiscard]] bool checkConstraints(TARVIKNS::MODE_TYPE mode, TARVIKNS::OUTPUT_TYPE output,
                                         const char* device, TARVIKNS::OP_TYPE operation, const char* family);
 
-    /// Does the device's property named as the operation list the mode? `family` is not read.
+    /// Does the device's property that is named as the operation list the mode? Loads the device.
+    /// @param device the device
+    /// @param mode a value that is none counts as `BS`
+    /// @param operation a value that is none gives false, after the info message
+    ///        "Operation %d is not defined.\n"
+    /// @param family is not read
+    /// @return whether it does, without a message
+    /// @throw LogicException as loading raises it
     [[nodiscard]] bool checkConstraints(const char* device, TARVIKNS::MODE_TYPE mode,
                                         TARVIKNS::OP_TYPE operation, const char* family);
 
     // ---- What a device offers -----------------------------------------------------------------------------
 
-    /// The operations that the device offers in the mode through the output: bit i stands for operation i. In
-    /// `SPI` mode it answers for "spi". Values out of the table's range give 0, silently.
-    /// @throw OutOfRangeException (1999) while exceptions are on, for a device whose family is not supported
+    /// The operations that the device offers in the mode through the output. Loads the device.
+    /// @param device the device
+    /// @param mode in `SPI` the answer is that of "spi", whatever the device
+    /// @param output any value; it, or a mode, out of range gives 0 without a message
+    /// @return a mask of operations
+    /// @throw OutOfRangeException (1999) while exceptions are on, for a device whose family is not supported,
+    ///        and what loading raises
     [[nodiscard]] int getDeviceOperations(const char* device, TARVIKNS::MODE_TYPE mode,
                                           TARVIKNS::OUTPUT_TYPE output);
 
-    /// The programming options: bit i stands for option i. A device and package that are listed together have
-    /// options of their own, others have their family's. Values out of range give 0 and a debug message.
-    /// @throw OutOfRangeException (2024) while exceptions are on, for a name that is no option package
+    /// The programming options that the device has in the mode through the output. Loads the device.
+    /// @param device the device; it has options of its own when a list holds it, else those of its family
+    /// @param mode in `SPI` the answer is that of "spi", whatever the device; else 0 to 8
+    /// @param output 0 to 9; it, or a mode, out of range gives 0, after a debug message
+    /// @param package in which the device has options of its own when they are listed together; may be null
+    /// @return a mask of options
+    /// @throw OutOfRangeException (2024) while exceptions are on, for a name that is no option package, and
+    ///        what loading raises
     [[nodiscard]] int getProgramOptions(const char* device, TARVIKNS::MODE_TYPE mode,
                                         TARVIKNS::OUTPUT_TYPE output, const char* package);
 
-    /// The boundary-scan operations: bit i stands for operation i. An output out of range gives 0 and a debug
-    /// message.
-    /// @throw OutOfRangeException (1999) while exceptions are on, for a device whose family is not supported
+    /// The operations that the device offers by boundary scan alone. Loads the device.
+    /// @param device the device
+    /// @param output 0 to 9; more gives 0, after a debug message, and less gives 0 without one
+    /// @return a mask of operations
+    /// @throw OutOfRangeException (1999) while exceptions are on, for a device whose family is not supported,
+    ///        and what loading raises
     [[nodiscard]] int getBsdlOperations(const char* device, TARVIKNS::OUTPUT_TYPE output);
 
-    /// The options that an operation of the device carries in the mode; empty when the device's property
-    /// named as the operation does not list the mode.
+    /// The options that an operation of the device carries in the mode. Loads the device.
+    /// @param device the device
+    /// @param operation the key name, as properties spell it
+    /// @param mode a value that is none counts as `BS`
+    /// @return their names; empty when the device's property named as the operation does not list the mode
+    /// @throw LogicException as loading raises it
     [[nodiscard]] const TextSet& getDeviceOperationOptions(const char* device, const char* operation,
                                                            TARVIKNS::MODE_TYPE mode);
 
     // ---- Properties of devices ----------------------------------------------------------------------------
 
-    /// The values of a property, of the device itself or else of its family; empty when there is none.
+    /// The values of a property. Loads the device.
+    /// @param device the device, or else its family, has it
+    /// @param key its name, case included
+    /// @return the values; empty, without a message, when there is none
+    /// @throw LogicException as loading raises it
     [[nodiscard]] const TextSet& getDeviceStringProperties(const char* device, const char* key);
 
-    /// The value of a property, of several the smallest in byte order. An SPI flash answers as
-    /// `getSpiDeviceStringProperty`.
-    /// @return null when there is none, after the info message
+    /// The value of a property, of several the smallest in byte order. Loads the device.
+    /// @param device as above; an SPI flash answers as `getSpiDeviceStringProperty`
+    /// @param key its name, case included
+    /// @return the value; null when there is none, after the info message
     ///         "ACD entry  %s not found for device family %s.\n"
-    /// @throw DataNotFoundException (437) in place of null while exceptions are on
+    /// @throw DataNotFoundException (437) in place of null while exceptions are on, and what loading raises
     [[nodiscard]] const char* getDeviceStringProperty(const char* device, const char* key);
 
-    /// Is "TRUE" among the values? No message and no exception; SPI flashes have a getter of their own.
+    /// Is "TRUE" among the values of a property? Loads the device.
+    /// @param device as above, but SPI flashes have a getter of their own
+    /// @param key its name, case included
+    /// @return whether it is; false, without a message, when there is no such property
+    /// @throw LogicException as loading raises it
     [[nodiscard]] bool getDeviceBoolProperty(const char* device, const char* key);
 
-    /// The value of `getDeviceStringProperty` as a decimal number of 32 bits; -1 in place of null.
+    /// The value of `getDeviceStringProperty` as a decimal number.
+    /// @param device as there
+    /// @param key as there
+    /// @return -2147483648 to 2147483647, 0 for a text that is no number; -1 in place of null
     /// @throw DataNotFoundException (437) as there
     [[nodiscard]] long getDeviceLongProperty(const char* device, const char* key);
 
     // ---- Families -----------------------------------------------------------------------------------------
 
-    /// The family of a device: "spi" for an SPI flash, "base" for a device that nobody knows.
+    /// The family of a device. Loads nothing.
+    /// @param device the device
+    /// @return its name; "spi" for an SPI flash, "base" for a device that nobody knows
     [[nodiscard]] StringBase getPartFamily(const char* device);
 
     /// Tells the manager a device's family, unless the latest family that it resolved is itself cached as a
-    /// device. The name is kept in the case given, and is looked up in lower case.
+    /// device.
+    /// @param device its name, kept in the case given; names are looked up in lower case
+    /// @param family the family's name
     void addCachedDeviceFamily(const char* device, const char* family);
 
-    /// Is the device known at all? (Is its family anything but "base"?)
+    /// Is the device known at all?
+    /// @param device the device
+    /// @return whether `getPartFamily` answers anything but "base"
     [[nodiscard]] bool isKorvelDevice(const char* device);
 
-    /// The IDCODE of each device, by the name as the database writes it.
+    /// The IDCODE of each device.
+    /// @return IDCODEs by the names of the devices, both as the database writes them
     [[nodiscard]] const Texts& getAllDeviceIdcodes() const noexcept;
 
-    // ---- SPI flash ----------------------------------------------------------------------------------------
+    // ---- SPI flash: known from the start-up on, so that nothing is loaded and nothing raised ---------------
 
-    /// Is the name, in any case, an SPI flash or an SPI flash family?
+    /// Is the name an SPI flash or an SPI flash family?
+    /// @param device the whole name, in any case
+    /// @return whether it is
     [[nodiscard]] bool isSpiDevice(StringBase device) const;
 
     /// A property of an SPI flash, or else of its class.
-    /// @return never null: empty when there is none
+    /// @param device its name, in any case
+    /// @param property the property's name, in any case
+    /// @return the value; empty when there is none, and never null
     [[nodiscard]] const char* getSpiDeviceStringProperty(const char* device, const char* property) const;
 
-    /// Is the property "true", in any case?
+    /// Is a property of an SPI flash "true"?
+    /// @param device its name, in any case
+    /// @param property the property's name, in any case
+    /// @return whether it is, in any case; false when there is none
     [[nodiscard]] bool getSpiDeviceBoolProperty(const char* device, const char* property) const;
 
-    /// The property as a decimal number of 32 bits; 0 when there is none.
+    /// A property of an SPI flash as a decimal number.
+    /// @param device its name, in any case
+    /// @param property the property's name, in any case
+    /// @return -2147483648 to 2147483647; 0 when there is none
     [[nodiscard]] long getSpiDeviceLongProperty(const char* device, const char* property) const;
 
     // ---- Multiboot ----------------------------------------------------------------------------------------
 
     /// Does the device support a multiboot arrangement? No argument's case matters.
+    /// @param device the device
     /// @param typePrefix "TYPE_BPI", "TYPE_MB_SPI", "TYPE_MB_BPI" or "TYPE_MB_QPRM"
     /// @param width "SERIAL", "PARALLEL" or "NONE"
     /// @param lead true for the lead device of the chain, false for a device further down
+    /// @return whether it does; false for texts that are none of these
     [[nodiscard]] bool isMbBpiSpiSupport(const char* device, const char* typePrefix, const char* width,
                                          bool lead) const;
 
-    // ---- Dumps for smoke tests ----------------------------------------------------------------------------
+    // ---- Dumps for smoke tests: what the tables hold by now, in fixed columns. Nothing is loaded -----------
 
-    /// Write a table, as it stands, to the recorder, or (null) piece by piece to the status channel. Nothing
-    /// is loaded.
+    /// Writes the operations of all families.
+    /// @param recorder what takes the text; null: the status channel, piece by piece
     void dumpOperationsTable(TarvikSmokeMgr* recorder);
+
+    /// Writes the boundary-scan operations of all families.
+    /// @param recorder as above
     void dumpBsdlOperationsTable(TarvikSmokeMgr* recorder);
+
+    /// Writes the programming options of all option packages.
+    /// @param recorder as above
     void dumpProgramOptionsTable(TarvikSmokeMgr* recorder);
+
+    /// Writes the family of each device that was resolved or seeded.
+    /// @param recorder as above
     void dumpCachedDeviceFamilies(TarvikSmokeMgr* recorder);
 
     /// Writes the devices of each multiboot type to the status channel.

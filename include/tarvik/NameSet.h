@@ -12,27 +12,43 @@
 /// of a name, which numbers the blocks of the permission tables, is a subtraction.
 class NameSet {
 public:
+    /// No names.
     NameSet() = default;
 
-    /// Takes the names in any order; a name given twice counts once.
+    /// Takes names.
+    /// @param names in any order; a name given twice counts once
     explicit NameSet(std::vector<StringBase> names) : m_names(std::move(names)) {
         std::sort(m_names.begin(), m_names.end(), ltptstr());
         m_names.erase(std::unique(m_names.begin(), m_names.end()), m_names.end());
     }
 
+    /// @return how many names there are
     [[nodiscard]] std::size_t size() const noexcept { return m_names.size(); }
+
+    /// The name at a position.
+    /// @param position 0 to `size()` - 1
+    /// @return the name; lives as long as this set
     [[nodiscard]] const StringBase& operator[](std::size_t position) const noexcept {
         return m_names[position];
     }
+
+    /// @return where the names start, in byte order
     [[nodiscard]] auto begin() const noexcept { return m_names.begin(); }
+    /// @return where they end
     [[nodiscard]] auto end() const noexcept { return m_names.end(); }
 
-    /// The position of a name in byte order; `size()` when it is not a member.
+    /// The position of a name in byte order.
+    /// @param name any text
+    /// @return 0 to `size()` - 1; `size()` when it is not a member
     [[nodiscard]] std::size_t position(std::string_view name) const noexcept {
         const auto found = std::lower_bound(m_names.begin(), m_names.end(), name, ltptstr());
         const bool member = found != m_names.end() && ltptstr::view(*found) == name;
         return member ? static_cast<std::size_t>(found - m_names.begin()) : size();
     }
+
+    /// Is a name a member?
+    /// @param name any text
+    /// @return whether it is
     [[nodiscard]] bool contains(std::string_view name) const noexcept { return position(name) != size(); }
 
 private:

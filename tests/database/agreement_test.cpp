@@ -96,9 +96,9 @@ void expectSameValue(const acd::Database& database, const acd::Section* section,
         return;
     }
     ASSERT_EQ(value->text().size(), expected->value.size());
-    AcdStore::Value placed{value->text(), {}, false};
+    AcdStore::Value placed{value->text(), {}, false, {}};
     for (const acd::Fragment& fragment : database.fragments(*value)) {
-        placed.fragments.push_back({fragment.offset, "", fragment.place.line, fragment.place.column});
+        placed.fragments.push_back({fragment.offset, "", "", fragment.place.line, fragment.place.column});
     }
     ASSERT_FALSE(placed.fragments.empty());
     for (std::size_t offset = 0; offset != expected->value.size(); ++offset) {

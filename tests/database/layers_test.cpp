@@ -162,3 +162,52 @@ TEST(LongestValues, AnAppendThatGrowsOverThemIsLeftOut) {
     EXPECT_EQ(faults[0].fault.place.column, 8U);
     EXPECT_EQ(acd::describe(faults[0].fault), "the value would grow over 1 GiB by '9ab'");
 }
+
+namespace {
+
+/// The texts that a value hides in the layers below, with the ends of their directories.
+std::vector<std::string> hiddenBy(const char* name, const char* key) {
+    std::vector<std::string> texts;
+    const std::optional<AcdStore::Value> value = AcdStore::value(name, key);
+    for (std::size_t i = 0; value && i < value->replaced.size(); ++i) {
+        const AcdStore::Value& hidden = value->replaced[i];
+        const AcdStore::Fragment& place = hidden.fragments.front();
+        texts.push_back(std::filesystem::path(place.layer).filename().string() + ':' +
+                        std::to_string(place.line) + ':' + std::to_string(place.column) + ' ' +
+                        std::string(hidden.text));
+    }
+    return texts;
+}
+
+} // namespace
+
+TEST_F(Layers, KnowWhatTheyHide) {
+    write("low/kestrel.acd", "A = a\nB = b\n[KS50]\nA = s\n");
+    write("middle/kestrel.acd", "A = m\nA += n\n");
+    write("top/kestrel.acd", "\nA = t\nB += c\n[ks50]\nA = u\n");
+    search({"top", "middle", "low"});
+    EXPECT_THAT(hiddenBy("kestrel", "A"), ElementsAre("middle:1:5 mn", "low:1:5 a"));
+    EXPECT_THAT(hiddenBy("kestrel", "B"), IsEmpty());
+    EXPECT_THAT(hiddenBy("KS50", "A"), ElementsAre("low:4:5 s"));
+}
+
+TEST_F(Layers, HideWholeValuesThatLinesOfTheirOwnAddedTo) {
+    write("low/kestrel.acd", "A = a\n");
+    write("top/kestrel.acd", "A += b\nA = c\nA = d\n");
+    search({"top", "low"});
+    EXPECT_THAT(hiddenBy("kestrel", "A"), ElementsAre("low:1:5 ab"));
+}
+
+TEST_F(Layers, HideNothingOfTheirOwn) {
+    write("top/kestrel.acd", "A = a\nA = b\nA = c\n");
+    search({"top", "low"});
+    EXPECT_THAT(hiddenBy("kestrel", "A"), IsEmpty());
+}
+
+TEST_F(Layers, AreNamedByTheirDirectories) {
+    write("top/kestrel.acd", "A = a\n");
+    search({"top"});
+    EXPECT_EQ(AcdStore::value("kestrel", "A")->fragments.front().layer, directory.path("top"));
+    AcdStore::setMemoryFiles({{"kestrel.acd", "A = a\n"}});
+    EXPECT_EQ(AcdStore::value("kestrel", "A")->fragments.front().layer, "");
+}

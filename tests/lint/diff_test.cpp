@@ -73,13 +73,77 @@ TEST(Diff, DoesNotTellWhatIsWrittenInAnotherWay) {
 }
 
 TEST(Diff, TellsDevicesOfOneDatabaseOnly) {
-    EXPECT_EQ(difference("osprey.acd", "OS150", "OS250"), "only in the old database\n  OS150\n"
-                                                          "only in the new database\n  OS250\n");
+    EXPECT_EQ(difference("osprey.acd", "OS150", "OS250"), "only in the old database\n  osprey\n    OS150\n"
+                                                          "only in the new database\n  osprey\n    OS250\n");
+}
+
+TEST(Diff, TellsFlashesOfOneDatabaseOnly) {
+    EXPECT_EQ(difference("spi.acd", ",TMF2M", ",TMF4M"),
+              "only in the old database\n  spi (flashes)\n    TMF2M\n"
+              "only in the new database\n  spi (flashes)\n    TMF4M\n");
+}
+
+TEST(Diff, TellsFamiliesOfOneDatabaseOnly) {
+    Files after = database();
+    after["sparrow.acd"] = "[SW10]\n";
+    EXPECT_EQ(diff(database(), after).output, "only in the new database\n  sparrow\n    SW10\n"
+                                              "for all devices\n  families: +sparrow\n");
+    after["sparrow.acd"] = "PROPERTY = KIND,FPGA\n";
+    EXPECT_EQ(diff(database(), after).output, "for all devices\n  families: +sparrow\n");
+}
+
+TEST(Diff, TellsFamiliesOfFlashesOfOneDatabaseOnly) {
+    EXPECT_EQ(difference("spi.acd", "DEVICE_FAMILY = ST1", "DEVICE_FAMILY = ST1,NV1"),
+              "for all devices\n  families of flashes: +NV1\n");
+}
+
+TEST(Diff, TellsDevicesThatMovedToAnotherFamily) {
+    Files after = changed("kestrel.acd", "[KS150]\n", "");
+    after["osprey.acd"] += "[KS150]\n";
+    EXPECT_EQ(diff(database(), after).output, "KS150 (osprey)\n"
+                                              "  boundary-scan operations through USB2: -BYPASS\n"
+                                              "  family: -kestrel +osprey\n"
+                                              "  operations in BS through USB2: -PROGRAM -VERIFY\n"
+                                              "  options in BS through USB2: -VERIFY\n"
+                                              "  property VENDOR: -Korvel\n");
+}
+
+TEST(Diff, TellsADeviceThatBecomesAFlash) {
+    const std::string told = difference("spi.acd", "TMF2M\n", "TMF2M,OS150\n");
+    EXPECT_THAT(told, HasSubstr("OS150 (spi)\n"));
+    EXPECT_THAT(told, HasSubstr("  family: -osprey +spi\n"));
+    EXPECT_THAT(told, HasSubstr("  flash property VENDOR: +Tamsel\n"));
 }
 
 TEST(Diff, TellsAChangeOfAFamilyOnceForTheFamily) {
     EXPECT_EQ(difference("kestrel.acd", ":VERIFY,Bscan,USB2\nBSDL", "\nBSDL"),
               "kestrel (all 3 devices)\n  operations in BS through USB2: -VERIFY\n");
+}
+
+TEST(Diff, TellsAChangeInSeveralCellsInOneLine) {
+    EXPECT_EQ(difference("kestrel.acd", "OPERATION = PROGRAM",
+                         "OPERATION = ERASE,Bscan,SVF,USB2:ERASE,SSerial,USB2,SVF:ERASE,Smap,ZORVA:PROGRAM"),
+              "kestrel (all 3 devices)\n"
+              "  operations in BS, SS through USB2, SVF; in SM through ZORVA: +ERASE\n");
+}
+
+TEST(Diff, TellsTheExceptionsOfAFamily) {
+    const Files before = changed("kestrel.acd", "[KS100]\n", "[KS100]\nPROPERTY = VENDOR,Other\n");
+    Files after = before;
+    replace(after.at("kestrel.acd"), "VENDOR,Korvel", "VENDOR,Orveth");
+    EXPECT_EQ(diff(before, after).output, "kestrel (all but KS100)\n  property VENDOR: -Korvel +Orveth\n");
+}
+
+TEST(Diff, TellsWhatOneDeviceLosesBesideItsFamilyByItself) {
+    Files before = changed("base.acd", "DEVICE_SUPPORTED = ", "DEVICE_SUPPORTED = KS50,");
+    replace(before.at("kestrel.acd"), "[KS50]\n",
+            "[KS50]\nOPERATION = PROGRAM,Bscan,USB2:VERIFY,Bscan,USB2:ERASE,Bscan,USB2\n");
+    Files after = before;
+    replace(after.at("kestrel.acd"), ":VERIFY,Bscan,USB2\nBSDL", "\nBSDL");
+    replace(after.at("kestrel.acd"), ":VERIFY,Bscan,USB2:ERASE,Bscan,USB2", "");
+    EXPECT_EQ(diff(before, after).output,
+              "kestrel (all 3 devices)\n  operations in BS through USB2: -VERIFY\n"
+              "KS50 (kestrel)\n  operations in BS through USB2: -ERASE\n");
 }
 
 TEST(Diff, TellsAChangeOfOneDeviceForTheDevice) {
@@ -135,6 +199,68 @@ TEST(Diff, TellsExcludedParts) {
               "KS50 (kestrel)\n  package TQ100: modes: -BS\n  package TQ144: modes: +BS\n");
 }
 
+TEST(Diff, TellsPropertiesOfASectionThatHideThoseOfTheFamily) {
+    EXPECT_EQ(difference("kestrel.acd", "[KS100]\n", "[KS100]\nPROPERTIES = VENDOR,0\n"),
+              "KS100 (kestrel)\n  property VENDOR: -Korvel\n");
+}
+
+TEST(Diff, TellsPropertiesOfAFamilyOfFlashesThatIsNoClass) {
+    Files before = database();
+    before["spi.acd"] += "DEVICE_FAMILY += ,NV1\nNV1_DEVICES = MRS1M\nNV1_PROPERTY = VENDOR,Marso\n";
+    Files after = before;
+    replace(after.at("spi.acd"), "Marso", "Merso");
+    EXPECT_EQ(diff(before, after).output,
+              "for all devices\n  flash family NV1: property VENDOR: -Marso +Merso\n");
+}
+
+TEST(Diff, TellsWhatUnknownDevicesAreOffered) {
+    EXPECT_EQ(difference("base.acd", "IDCODE", "OPERATION = ERASE,Bscan,USB2\nIDCODE"),
+              "base\n  operations in BS through USB2: +ERASE\n");
+}
+
+TEST(Diff, IsNotMisledByOptionsThatLeakWhenADeviceIsAskedForFirst) {
+    Files before = changed("base.acd", "PROGRAM_OPTION_PACKAGE = KS50,", "PROGRAM_OPTION_PACKAGE = ");
+    Files after = before;
+    replace(after.at("kestrel.acd"), "[KS50]\nPROGRAM_OPTION = VERIFY", "[KS50]\nPROGRAM_OPTION = ERASE");
+    EXPECT_EQ(diff(before, after).output, "");
+}
+
+TEST(Diff, TellsFaultsForAnswers) {
+    EXPECT_THAT(difference("kestrel.acd", "[KS100]\n", "[KS100]\nPROGRAM_OPTION = NONSENSE,Bscan,USB2\n"),
+                HasSubstr("KS100 (kestrel)\n  faults: +"));
+}
+
+TEST(Diff, KeepsBytesApartThatAreNoText) {
+    EXPECT_EQ(diff(changed("kestrel.acd", "Korvel", "\xFE"), changed("kestrel.acd", "Korvel", "\xFF")).status,
+              1);
+}
+
+TEST(Diff, WritesReleaseNotesInMarkdown) {
+    Files after = changed("kestrel.acd", "[KS50]\nPROGRAM_OPTION = VERIFY", "[KS50]\nPROGRAM_OPTION = ERASE");
+    replace(after.at("kestrel.acd"), "BYPASS,USB2", "BYPASS,USB2,SVF");
+    replace(after.at("osprey.acd"), "OS150", "OS`250");
+    replace(after.at("base.acd"), "KS100,0xX4108FB7", "KS100,0xX4148FB7");
+    replace(after.at("base.acd"), "outputs,PARALLEL", "outputs,ZORVA");
+    replace(after.at("spi.acd"), ",TMF2M", "");
+    const Outcome outcome = diff(database(), after, {"--format", "markdown"});
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_EQ(outcome.output, "### New devices\n\n"
+                              "- osprey: `` OS`250 ``\n\n"
+                              "### Devices no longer supported\n\n"
+                              "- osprey: `OS150`\n"
+                              "- flashes: `TMF2M`\n\n"
+                              "### For all devices\n\n"
+                              "- outputs of mode BS: lost `PARALLEL`; gained `ZORVA`\n\n"
+                              "### kestrel\n\n"
+                              "All 3 devices:\n\n"
+                              "- boundary-scan operations through SVF: gained `BYPASS`\n\n"
+                              "`KS100`:\n\n"
+                              "- IDCODE: `0xX4108FB7` becomes `0xX4148FB7`\n\n"
+                              "`KS50`:\n\n"
+                              "- options in BS through USB2: lost `VERIFY`; gained `ERASE`\n");
+    EXPECT_EQ(diff(database(), database(), {"--format", "markdown"}).output, "");
+}
+
 TEST(Diff, TakesLayersWithColonsBetween) {
     const DatabaseDirectory below(database());
     const DatabaseDirectory above(Files{{"kestrel.acd", "PROPERTY += :KIND,FPGA\n"}});
@@ -149,6 +275,7 @@ TEST(Diff, TellsTheSameInJson) {
     const nlohmann::json answer = nlohmann::json::parse(outcome.output);
     EXPECT_EQ(answer.at("version"), 1);
     EXPECT_EQ(answer.at("same"), false);
+    EXPECT_EQ(answer.at("lost"), nlohmann::json::array());
     const nlohmann::json& group = answer.at("groups").at(0);
     EXPECT_EQ(group.at("family"), "kestrel");
     EXPECT_EQ(group.at("devices"), nlohmann::json({"KS100", "KS150", "KS50"}));

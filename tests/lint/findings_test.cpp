@@ -44,8 +44,8 @@ TEST(Lint, ShowsPlaceLevelTextCodeAndTheLineWithACaret) {
 TEST(Lint, ShowsOfALongLineWhatIsAroundTheFinding) {
     const std::string many(500, 'A');
     const Outcome outcome = lint(withFamily("PROPERTY = LONG," + many + ":LONG,1\n[KS50]\n"));
-    EXPECT_THAT(outcome.output, HasSubstr("    ..." + std::string(49, 'A') + ":LONG,1\n"));
-    EXPECT_THAT(outcome.output, HasSubstr("\n    " + std::string(53, ' ') + "^~~~\n"));
+    EXPECT_THAT(outcome.output, HasSubstr("    ..." + std::string(34, 'A') + ":LONG,1\n"));
+    EXPECT_THAT(outcome.output, HasSubstr("\n    " + std::string(38, ' ') + "^~~~\n"));
 }
 
 TEST(Lint, KeepsTheCaretBelowTheColumnBehindTabsAndWideBytes) {
@@ -160,7 +160,7 @@ TEST(LintComments, AreNotUnusedWhenTheCodeIsNotSelected) {
 TEST(LintComments, AreTextInsideAContinuation) {
     // " ignore T105" is a property of its own, without a value.
     EXPECT_THAT(codes(withFamily("PROPERTY = A,1:B,2\\\n# lint: ignore T105\n[KS50]\n")),
-                ElementsAre("F101", "P103"));
+                ElementsAre("L112", "F101", "P103"));
 }
 
 TEST(LintComments, MustBeReadable) {

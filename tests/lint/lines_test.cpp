@@ -7,6 +7,7 @@
 
 #include <TarvikException.h>
 
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <string>
@@ -136,4 +137,27 @@ TEST(AcdLines, OfADatabaseThatCantBeReadRaise) {
     const std::vector<IssuedMessage> issued = messages.take();
     ASSERT_EQ(issued.size(), 1U);
     EXPECT_EQ(issued[0].text, directory.path("kestrel.acd") + ": can't be read: No such file or directory\n");
+}
+
+TEST(AcdLines, AreFoundWhereTheSearchPathWasListed) {
+    const DatabaseDirectory directory(DatabaseDirectory::Files{{"kestrel.acd", "[KS50]\n"}});
+    const DatabaseDirectory elsewhere;
+    const std::filesystem::path path = directory.path();
+    std::filesystem::current_path(path.parent_path());
+    AcdStore::setSearchPath({path.filename().string()});
+    ASSERT_EQ(AcdStore::families().size(), 1U);
+    // Hosts change their directory as they like.
+    std::filesystem::current_path(elsewhere.path());
+    ASSERT_EQ(AcdLines::ofDatabase().size(), 1U);
+    EXPECT_EQ(AcdLines::ofDatabase().front().lines().size(), 1U);
+}
+
+TEST(AcdLines, KnowWhichFilesDoNotCount) {
+    const DatabaseDirectory directory(
+        DatabaseDirectory::Files{{"kestrel.ACD", "[KS50]\n"}, {"kestrel.acd", "[KS75]\n"}});
+    AcdStore::setSearchPath({directory.path()});
+    const std::vector<AcdLines> files = AcdLines::ofDatabase();
+    ASSERT_EQ(files.size(), 1U);
+    EXPECT_EQ(files.front().lines().front().name, "KS50");
+    EXPECT_THAT(files.front().namesakes(), testing::ElementsAre(directory.path("kestrel.acd")));
 }

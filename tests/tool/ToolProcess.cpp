@@ -9,9 +9,12 @@
 #include <cstring>
 #include <fcntl.h>
 #include <poll.h>
+#include <pty.h>
 #include <stdexcept>
 #include <string_view>
+#include <sys/ioctl.h>
 #include <sys/wait.h>
+#include <termios.h>
 #include <unistd.h>
 #include <utility>
 
@@ -44,11 +47,31 @@ struct Pipe {
     }
 };
 
+/// A terminal: what is written to one end comes out of the other as it is.
+Pipe terminal(unsigned short columns) {
+    Pipe ends;
+    closeOnce(ends.reading);
+    closeOnce(ends.writing);
+    winsize size{};
+    size.ws_col = columns;
+    size.ws_row = 24;
+    check(::openpty(&ends.reading, &ends.writing, nullptr, nullptr, &size));
+    check(::fcntl(ends.reading, F_SETFD, FD_CLOEXEC));
+    check(::fcntl(ends.writing, F_SETFD, FD_CLOEXEC));
+    termios settings{};
+    check(::tcgetattr(ends.writing, &settings));
+    settings.c_oflag &= ~static_cast<tcflag_t>(OPOST);
+    check(::tcsetattr(ends.writing, TCSANOW, &settings));
+    return ends;
+}
+
 std::vector<std::string> environmentOf(const Start& start) {
     std::vector<std::string> variables;
     for (char** variable = environ; *variable != nullptr; ++variable) {
-        if (!std::string_view(*variable).starts_with("TARVIK_")) {
-            variables.emplace_back(*variable);
+        const std::string_view text(*variable);
+        const std::string_view name = text.substr(0, text.find('='));
+        if (!name.starts_with("TARVIK_") && name != "COLUMNS" && name != "NO_COLOR" && name != "TERM") {
+            variables.emplace_back(text);
         }
     }
     for (const auto& [name, value] : start.environment) {
@@ -93,7 +116,9 @@ int waitFor(pid_t process) {
 /// Appends what there is to read; closes the descriptor at the end.
 void drain(int& descriptor, std::string& text) {
     std::array<char, 65536> bytes{};
-    const ssize_t count = check(static_cast<int>(::read(descriptor, bytes.data(), bytes.size())));
+    ssize_t count = ::read(descriptor, bytes.data(), bytes.size());
+    // That is how a terminal says that nobody writes to it any more.
+    count = count < 0 && errno == EIO ? 0 : check(static_cast<int>(count));
     text.append(bytes.data(), static_cast<std::size_t>(count));
     if (count == 0) {
         closeOnce(descriptor);
@@ -126,7 +151,13 @@ Outcome runTool(const Start& start) {
         closeOnce(output.writing);
         output.writing = check(::open(start.outputPath.c_str(), O_WRONLY | O_CLOEXEC));
     }
-    const pid_t process = spawn(start, input.reading, output.writing, error.writing);
+    if (start.terminalColumns != 0) {
+        closeOnce(output.reading);
+        closeOnce(output.writing);
+        output = terminal(start.terminalColumns);
+    }
+    const pid_t process = spawn(start, input.reading, output.writing,
+                                start.terminalColumns != 0 ? output.writing : error.writing);
     closeOnce(input.reading);
     closeOnce(output.writing);
     closeOnce(error.writing);
@@ -154,7 +185,9 @@ Outcome runTool(const Start& start) {
     return outcome;
 }
 
-Outcome runTool(const std::vector<std::string>& arguments) { return runTool(Start{arguments, {}, {}, {}}); }
+Outcome runTool(const std::vector<std::string>& arguments) {
+    return runTool(Start{arguments, {}, {}, {}, 0});
+}
 
 Conversation::Conversation(const Start& start) {
     ::signal(SIGPIPE, SIG_IGN);

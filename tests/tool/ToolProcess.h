@@ -10,9 +10,12 @@
 struct Start {
     std::vector<std::string> arguments;
     std::string input;
-    std::map<std::string, std::string>
-        environment;        ///< the TARVIK_ variables of the tests' own are not handed on
+    /// Variables of the tests' own that the tool heeds are not handed on.
+    std::map<std::string, std::string> environment;
     std::string outputPath; ///< where standard output goes in place of a pipe
+    /// Standard output and standard error lead to one terminal of that many columns; what it gets is the outcome's
+    /// output. 0: they are pipes.
+    unsigned short terminalColumns = 0;
 };
 
 /// What a run of the tool left behind.

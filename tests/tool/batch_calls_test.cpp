@@ -39,7 +39,9 @@ std::set<std::string> exportedMethods() {
     std::ifstream header(TARVIK_SOURCE_DIRECTORY "/include/tarvik/ConstraintsManager.h");
     std::string code;
     for (std::string line; std::getline(header, line) && line != "private:";) {
-        code = line == "public:" ? "" : code + line.substr(0, line.find("//")) + '\n';
+        if (line.find("= delete") == std::string::npos) {
+            code = line == "public:" ? "" : code + line.substr(0, line.find("//")) + '\n';
+        }
     }
     std::set<std::string> names;
     for (std::size_t open = code.find('('); open != std::string::npos; open = code.find('(', open + 1)) {

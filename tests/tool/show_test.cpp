@@ -179,4 +179,43 @@ TEST(Show, BadRecordsRaiseNothing) {
     EXPECT_EQ(outcome.error, "Operation NOTHING is not defined.\n");
 }
 
+TEST(Show, NamesWhatLayersShadow) {
+    const SmallDatabase below;
+    const DatabaseDirectory above(DatabaseDirectory::Files{{"base.acd", "IDCODE += :FN10,0x0030\n"},
+                                                           {"finch.acd", "[FN10]\nPROPERTY = PINS,48\n"}});
+    const Outcome outcome =
+        runTool({{"--database", above.path(), "--database", below.path(), "show", "FN10"}, {}, {}, {}});
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_THAT(outcome.output,
+                HasSubstr("IDCODE  0x0030  " + above.path("base.acd") + ":1:12\n        shadows " +
+                          below.path("base.acd") + ":7:10: FN10,0x0010\n"));
+    EXPECT_THAT(outcome.output,
+                testing::ContainsRegex("PINS +48 +device +" + above.path("finch.acd") + ":2:12\n +" +
+                                       "PINS,44 +shadowed +" + below.path("finch.acd") + ":9:12\n"));
+}
+
+TEST(Show, NamesLayersInJson) {
+    const SmallDatabase below;
+    const DatabaseDirectory above(
+        DatabaseDirectory::Files{{"finch.acd", "[FN10]\nPROPERTY = PINS,48\nPROPERTY += :PINS,52\n"}});
+    const json sheet = json::parse(
+        runTool(
+            {{"--database", above.path(), "--database", below.path(), "show", "FN10", "--json"}, {}, {}, {}})
+            .output);
+    EXPECT_EQ(sheet.at("idcode").at("layer"), below.path());
+    EXPECT_FALSE(sheet.at("idcode").contains("shadows"));
+    for (const json& property : sheet.at("properties")) {
+        EXPECT_EQ(property.contains("shadows"), property.at("key") == "PINS");
+        if (property.at("key") == "PINS") {
+            EXPECT_EQ(property.at("layer"), above.path());
+            EXPECT_EQ(property.at("shadows"), json::array({{{"file", below.path("finch.acd")},
+                                                            {"line", 9},
+                                                            {"column", 12},
+                                                            {"layer", below.path()},
+                                                            {"text", "PINS,44"}}}));
+        }
+    }
+    EXPECT_FALSE(below.json({"show", "FN10"}).at("idcode").contains("layer"));
+}
+
 } // namespace

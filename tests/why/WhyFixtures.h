@@ -54,6 +54,11 @@ private:
     return why::explain(why::readStartUp(), question);
 }
 
+/// The answer as a pipe would get it.
+[[nodiscard]] inline std::string asPlainText(const why::Answer& answer) {
+    return why::asText(answer, Terminal(-1, Terminal::Colours::NEVER));
+}
+
 /// The first step about a topic; an empty one when there is none.
 [[nodiscard]] inline why::Step stepAbout(const std::vector<why::Step>& steps, const std::string& topic) {
     for (const why::Step& step : steps) {

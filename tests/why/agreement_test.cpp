@@ -92,7 +92,7 @@ Tally compareOverRandomDatabases(Health health, int seed) {
             const why::Explanation explanation = why::explain(facts, question);
             tally.count(verdict);
             if (verdict != explanation.verdict || explanation.steps.empty()) {
-                ADD_FAILURE() << why::asText({question, verdict, explanation}) << shown(files);
+                ADD_FAILURE() << asPlainText({question, verdict, explanation}) << shown(files);
                 return tally;
             }
         }

@@ -29,7 +29,7 @@ protected:
     void expectAgreement(const Question& question) {
         const why::Explanation explanation = why::explain(m_facts, question);
         ASSERT_EQ(explanation.verdict, why::ask(m_manager, question))
-            << why::asText({question, explanation.verdict, explanation});
+            << asPlainText({question, explanation.verdict, explanation});
         ++m_compared;
     }
 
@@ -200,7 +200,7 @@ TEST_F(WhyDemonstration, LinesAreAtMost80BytesButForPaths) {
         }
         explanation.steps.push_back(step);
     }
-    std::istringstream lines(why::asText({question, Verdict::NO, explanation}));
+    std::istringstream lines(asPlainText({question, Verdict::NO, explanation}));
     for (std::string line; std::getline(lines, line);) {
         if (line.find("/database/") == std::string::npos) {
             EXPECT_LE(line.size(), 80U) << line;

@@ -251,7 +251,7 @@ TEST(WhyAlternatives, TheKeyThatWasMeant) {
 TEST(WhyPresentation, StepsReadAsATableWithPlaces) {
     const Databases databases(family("OPERATION = PROGRAM,Bscan,USB2"));
     const Question question = programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2);
-    EXPECT_EQ(why::asText({question, Verdict::YES, explained(question)}),
+    EXPECT_EQ(asPlainText({question, Verdict::YES, explained(question)}),
               "yes: PROGRAM of D1 in mode BS through USB2\n"
               "  family    fam: section [D1] of fam.acd\n"
               "  table     OPERATION of fam\n"
@@ -269,7 +269,7 @@ TEST(WhyPresentation, LongTextsAreBrokenAndLongFragmentsCut) {
     const std::string fragment = std::string(66, 'x') + "\xC3\xBC" + std::string(9, 'y');
     why::Explanation explanation{
         Verdict::NO, {{"absent", words + "end", why::Piece{fragment, {std::string(60, 'f'), 12, 3}}}}};
-    const std::string text = why::asText({question, Verdict::NO, explanation});
+    const std::string text = asPlainText({question, Verdict::NO, explanation});
     EXPECT_THAT(text, HasSubstr("\n            " + std::string(60, 'f') + ":12:3:\n            "));
     EXPECT_THAT(text, HasSubstr("xxx...\n"));
     EXPECT_THAT(text, testing::Not(HasSubstr("\xC3")));

@@ -3,6 +3,7 @@
 #include "lint/Keys.h"
 #include "lint/rules/Groups.h"
 
+#include "Multiboot.h"
 #include "Nearest.h"
 
 #include <fmt/format.h>
@@ -137,7 +138,7 @@ void checkClasses(const Model& model, Findings& findings) {
 void checkMultiboot(const Model& model, Findings& findings) {
     std::vector<std::string> candidates = model.flashNames();
     candidates.insert(candidates.end(), model.deviceNames().begin(), model.deviceNames().end());
-    for (const std::string& key : multibootKeys()) {
+    for (const std::string& key : multiboot::keys()) {
         const Entry* const entry = model.spiEntry(key);
         for (std::size_t i = 0; entry != nullptr && i < entry->list().size(); ++i) {
             const Token& token = entry->list()[i];

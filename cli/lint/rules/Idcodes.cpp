@@ -158,7 +158,7 @@ void checkDevice(const Model& model, const Token& device, Findings& findings) {
 }
 
 void check(const Model& model, Findings& findings) {
-    std::set<std::string_view> withCode;
+    std::map<std::string_view, const AcdLines*> withCode;
     if (const Entry* const entry = model.baseEntry("IDCODE")) {
         Codes codes;
         for (const Record& record : entry->records) {
@@ -167,7 +167,9 @@ void check(const Model& model, Findings& findings) {
                 continue;
             }
             checkDevice(model, device, findings);
-            if (!withCode.insert(device.text).second) {
+            // A layer on top may well append another code.
+            const AcdLines*& file = withCode[device.text];
+            if (std::exchange(file, device.place.file) == device.place.file) {
                 findings.add(DEVICE_TWICE, device,
                              fmt::format("the former IDCODE of {} is lost", quoted(device.text)));
             }

@@ -3,6 +3,10 @@
 
 #include "lint/Findings.h"
 
+#include <fmt/format.h>
+
+#include <algorithm>
+
 namespace lint {
 
 namespace {
@@ -56,6 +60,17 @@ constexpr Rule TEXT_BEHIND_HEADER{
     "and so are the keys up to the next one.",
     "[KS50] # the smallest one"};
 
+constexpr Rule VALUE_TOO_LONG{
+    "L111", Level::ERROR, "value that would grow over 1 GiB",
+    "A value may grow up to 1 GiB by \"+=\", over all layers. A text that would make it longer is dropped.",
+    ""};
+
+constexpr Rule SWALLOWED_LINE{"L112", Level::ERROR, "line that goes on into a header, a key or a comment",
+                              "Behind a \"\\\" at the end of a line the next line is part of the value, "
+                              "whatever it looks like: a header opens no section, a key sets nothing, and a "
+                              "comment is no comment. Drop the \"\\\", or move the comment above the key.",
+                              "PROPERTY = PINS,140: \\\n[KS100]"};
+
 const Rule* ruleFor(AcdLines::Fault fault) {
     switch (fault) {
     case AcdLines::Fault::NO_EQUALS_SIGN:
@@ -84,12 +99,66 @@ const Rule* ruleFor(AcdLines::Fault fault) {
     return nullptr;
 }
 
+/// Is this the beginning of `KEY =`?
+bool looksLikeKey(std::string_view text) {
+    const std::size_t end = text.find_first_not_of("ABCDEFGHIJKLMNOPQRSTUVWXYZ0123456789_");
+    if (end == 0 || end == text.npos) {
+        return false;
+    }
+    text.remove_prefix(std::min(text.find_first_not_of(" \t", end), text.size()));
+    return text.starts_with('=') || text.starts_with("+=");
+}
+
+/// What a line looks like that is none of its own; null when it looks like a part of a value.
+const char* disguise(std::string_view text) {
+    if (text.starts_with('#')) {
+        return "a comment";
+    }
+    if (text.starts_with('[') && text.find(']') != text.npos) {
+        return "a header";
+    }
+    return looksLikeKey(text) ? "a key" : nullptr;
+}
+
+void checkSwallowed(const AcdLines& file, const AcdLines::Line& line, Findings& findings) {
+    for (const AcdLines::Fragment& fragment : line.fragments) {
+        if (fragment.line == line.line) {
+            continue;
+        }
+        const std::string_view text =
+            file.source(fragment.line)
+                .substr(std::min<std::size_t>(fragment.column - 1, file.source(fragment.line).size()));
+        if (const char* const what = disguise(text)) {
+            findings.add(
+                SWALLOWED_LINE, {text, {&file, fragment.line, fragment.column}},
+                fmt::format("this is no line of its own but part of the value of {}, though it looks like {}",
+                            quoted(line.name), what));
+        }
+    }
+}
+
+void checkLengths(const Section& section, Findings& findings) {
+    for (const auto& [key, entry] : section.entries) {
+        for (const Token& text : entry.tooLong) {
+            findings.add(VALUE_TOO_LONG, text,
+                         fmt::format("the value of {} would grow over 1 GiB by this", quoted(key)));
+        }
+    }
+}
+
 void check(const Model& model, Findings& findings) {
     for (const AcdLines& file : model.files()) {
         for (const AcdLines::Line& line : file.lines()) {
             if (const Rule* const rule = ruleFor(line.fault)) {
                 findings.add(*rule, {{}, {&file, line.line, line.column}}, line.text);
             }
+            checkSwallowed(file, line, findings);
+        }
+    }
+    for (const Family& family : model.families()) {
+        checkLengths(family.own, findings);
+        for (const Section& device : family.devices) {
+            checkLengths(device, findings);
         }
     }
 }
@@ -98,7 +167,8 @@ void check(const Model& model, Findings& findings) {
 
 Group lineRules() {
     return {{&NO_EQUALS_SIGN, &EMPTY_KEY, &BLANK_IN_KEY, &NUL_BYTE, &LINE_TOO_LONG, &CONTINUED_AT_END,
-             &UNCLOSED_HEADER, &EMPTY_NAME, &BLANK_IN_NAME, &TEXT_BEHIND_HEADER},
+             &UNCLOSED_HEADER, &EMPTY_NAME, &BLANK_IN_NAME, &TEXT_BEHIND_HEADER, &VALUE_TOO_LONG,
+             &SWALLOWED_LINE},
             check};
 }
 

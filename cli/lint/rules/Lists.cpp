@@ -37,6 +37,11 @@ constexpr Rule LIST_TOO_LONG{
     "behind is never read.",
     ""};
 
+constexpr Rule COMMENT_BEHIND_VALUE{
+    "F106", Level::WARNING, "comment behind a value",
+    "Comments stand on lines of their own: what looks like one behind a value is part of the value.",
+    "PROPERTY = PINS,140 # in the largest package"};
+
 bool isBlank(char byte) { return byte == ' ' || byte == '\t'; }
 
 void checkPieces(const std::vector<Token>& pieces, Findings& findings) {
@@ -48,6 +53,10 @@ void checkPieces(const std::vector<Token>& pieces, Findings& findings) {
         } else if (!piece.text.empty() && (isBlank(piece.text.front()) || isBlank(piece.text.back()))) {
             findings.add(BLANK_AROUND_SEPARATOR, piece,
                          fmt::format("the blanks of {} are part of the text", quoted(piece.text)));
+        }
+        if (piece.text.find(" # ") != piece.text.npos) {
+            findings.add(COMMENT_BEHIND_VALUE, piece,
+                         fmt::format("the comment is part of the text {}", quoted(piece.text)));
         }
     }
 }
@@ -119,7 +128,8 @@ void check(const Model& model, Findings& findings) {
 } // namespace
 
 Group listRules() {
-    return {{&BLANK_AROUND_SEPARATOR, &TRAILING_SEPARATOR, &EMPTY_ITEM, &DUPLICATE_ITEM, &LIST_TOO_LONG},
+    return {{&BLANK_AROUND_SEPARATOR, &TRAILING_SEPARATOR, &EMPTY_ITEM, &DUPLICATE_ITEM, &LIST_TOO_LONG,
+             &COMMENT_BEHIND_VALUE},
             check};
 }
 

@@ -56,6 +56,12 @@ constexpr Rule SECTION_IN_CATALOGUE{
     "flashes only what their lists say. Devices belong in the file of their family.",
     "# in base.acd\n[KS50]"};
 
+constexpr Rule SAME_FILE_NAME{"N110", Level::ERROR, "two files whose names differ in case alone",
+                              "Families are found without regard to case, so of two such files in one "
+                              "directory only the first one in byte "
+                              "order counts; nothing is read from the other.",
+                              "# files Kestrel.acd and kestrel.acd in one directory"};
+
 void checkName(std::string_view kind, const Token& name, Findings& findings) {
     if (name.text.find('%') != name.text.npos) {
         findings.add(PERCENT_IN_NAME, name, fmt::format("the {} {} holds \"%\"", kind, quoted(name.text)));
@@ -160,6 +166,11 @@ void checkOptionPackages(const Model& model, Findings& findings) {
 void check(const Model& model, Findings& findings) {
     for (const AcdLines& file : model.files()) {
         checkReopened(file, findings);
+        for (const std::string& other : file.namesakes()) {
+            findings.add(SAME_FILE_NAME, startOf(file),
+                         fmt::format("nothing is read from {}: this file is called alike and comes first",
+                                     quoted(other.substr(other.rfind('/') + 1))));
+        }
     }
     for (const Family& family : model.families()) {
         checkFamily(family, findings);
@@ -183,7 +194,7 @@ void check(const Model& model, Findings& findings) {
 Group nameRules() {
     return {{&DEVICE_REOPENED, &DEVICE_IN_TWO_FAMILIES, &DEVICE_NAMED_AS_FAMILY, &UNDERSCORE_IN_DEVICE,
              &SEPARATOR_IN_NAME, &PERCENT_IN_NAME, &NAME_TOO_LONG, &FAMILY_NOT_LOWER_CASE,
-             &SECTION_IN_CATALOGUE},
+             &SECTION_IN_CATALOGUE, &SAME_FILE_NAME},
             check};
 }
 

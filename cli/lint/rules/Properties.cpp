@@ -13,6 +13,7 @@
 #include <map>
 #include <optional>
 #include <set>
+#include <utility>
 
 namespace lint {
 
@@ -62,6 +63,16 @@ constexpr Rule UNKNOWN_OPERATION_NAME{
     "mode key, in upper case. Any other name is never asked for.",
     "PROPERTIES = OP_PROGRM,1,VERIFY"};
 
+constexpr Rule FLAG_NOT_UPPER_CASE{"P107", Level::WARNING, "flag not in upper case",
+                                   "A flag is TRUE, exactly so: \"true\" counts as no. Only the properties "
+                                   "of flashes in spi.acd are compared without regard to case.",
+                                   "PROPERTY = FLASH,true"};
+
+constexpr Rule HIDDEN_OPTIONS{"P204", Level::WARNING, "options for one mode that are never looked at",
+                              "Where an operation has options for all modes, in OP_ and the operation, those "
+                              "for a single mode are never looked at. Keep one or the other.",
+                              "PROPERTIES = OP_PROGRAM,1,VERIFY:OP_PROGRAM_BS,1,ERASE"};
+
 bool holds(const std::vector<std::string>& all, std::string_view text) {
     return std::find(all.begin(), all.end(), text) != all.end();
 }
@@ -74,10 +85,12 @@ std::optional<std::size_t> number(std::string_view text) {
 }
 
 void checkTwice(const Entry& entry, Findings& findings) {
-    std::set<std::string_view> names;
+    std::map<std::string_view, const AcdLines*> files;
     for (const Record& record : entry.records) {
         const Token& name = record.fields.front();
-        if (!name.text.empty() && !names.insert(name.text).second) {
+        const AcdLines*& file = files[name.text];
+        // A layer on top may well append another value.
+        if (std::exchange(file, name.place.file) == name.place.file && !name.text.empty()) {
             findings.add(NAME_TWICE, name,
                          fmt::format("what {} was given before is lost", quoted(name.text)));
         }
@@ -185,16 +198,68 @@ void checkBoth(const Entry& single, const Entry& counted, Findings& findings) {
     }
 }
 
-void checkSection(const Section& section, Findings& findings) {
+void checkFlags(const Entry& entry, std::size_t firstValue, Findings& findings) {
+    for (const Record& record : entry.records) {
+        for (std::size_t i = firstValue; i < record.fields.size(); ++i) {
+            const Token& value = record.fields[i];
+            for (const char* const flag : {"TRUE", "FALSE"}) {
+                if (sameWithoutCase(value.text, flag) && value.text != flag) {
+                    findings.add(
+                        FLAG_NOT_UPPER_CASE, value,
+                        fmt::format("{} is not {}: flags are compared with case", quoted(value.text), flag));
+                }
+            }
+        }
+    }
+}
+
+/// Has a property of these keys a value?
+std::optional<bool> hasValue(const Section& section, std::string_view name) {
+    std::optional<bool> found;
+    for (const auto& [key, firstValue] : {std::pair("PROPERTY", 1U), std::pair("PROPERTIES", 2U)}) {
+        const Entry* const entry = section.find(key);
+        for (std::size_t i = 0; entry != nullptr && i < entry->records.size(); ++i) {
+            const std::vector<Token>& fields = entry->records[i].fields;
+            if (fields.front().text == name) {
+                found = fields.size() > firstValue;
+            }
+        }
+    }
+    return found;
+}
+
+void checkHiddenOptions(const Entry& entry, const Section& section, const Section& family,
+                        Findings& findings) {
+    for (const Record& record : entry.records) {
+        const Token& name = record.fields.front();
+        const std::size_t cut = name.text.rfind('_');
+        if (!name.text.starts_with("OP_") || cut < 3 || !namesOperation(name.text.substr(3)) ||
+            holds(vocabulary::operations(), name.text.substr(3))) {
+            continue;
+        }
+        const std::string_view forAllModes = name.text.substr(0, cut);
+        if (hasValue(section, forAllModes).value_or(hasValue(family, forAllModes).value_or(false))) {
+            findings.add(
+                HIDDEN_OPTIONS, name,
+                fmt::format("{} is never looked at: there is {}", quoted(name.text), quoted(forAllModes)));
+        }
+    }
+}
+
+void checkSection(const Section& section, const Section& family, Findings& findings) {
     const Entry* const single = section.find("PROPERTY");
     const Entry* const counted = section.find("PROPERTIES");
     if (single != nullptr) {
         checkSingle(*single, findings);
         checkMeaning(*single, 1, findings);
+        checkFlags(*single, 1, findings);
+        checkHiddenOptions(*single, section, family, findings);
     }
     if (counted != nullptr) {
         checkCounted(*counted, findings);
         checkMeaning(*counted, 2, findings);
+        checkFlags(*counted, 2, findings);
+        checkHiddenOptions(*counted, section, family, findings);
     }
     if (single != nullptr && counted != nullptr) {
         checkBoth(*single, *counted, findings);
@@ -203,9 +268,9 @@ void checkSection(const Section& section, Findings& findings) {
 
 void check(const Model& model, Findings& findings) {
     for (const Family& family : model.families()) {
-        checkSection(family.own, findings);
+        checkSection(family.own, family.own, findings);
         for (const Section& device : family.devices) {
-            checkSection(device, findings);
+            checkSection(device, family.own, findings);
         }
     }
     if (model.spi() != nullptr) {
@@ -221,7 +286,8 @@ void check(const Model& model, Findings& findings) {
 
 Group propertyRules() {
     return {{&WRONG_COUNT, &NO_COUNT, &NO_VALUE, &SEVERAL_VALUES, &IN_BOTH_KEYS, &NAME_TWICE,
-             &UNKNOWN_MODE_KEY, &UNKNOWN_OPTION_VALUE, &UNKNOWN_OPERATION_NAME},
+             &FLAG_NOT_UPPER_CASE, &UNKNOWN_MODE_KEY, &UNKNOWN_OPTION_VALUE, &UNKNOWN_OPERATION_NAME,
+             &HIDDEN_OPTIONS},
             check};
 }
 

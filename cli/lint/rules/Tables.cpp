@@ -79,6 +79,19 @@ constexpr Rule SPI_MODE_ELSEWHERE{
     "that mode says something in spi.acd only.",
     "# in kestrel.acd\nOPERATION = PROGRAM,SPI,USB2"};
 
+constexpr Rule MODE_WITHOUT_FAMILY{
+    "T112", Level::WARNING, "mode that does not list the family",
+    "The tables allow something in a mode that base.acd does not list the family under: an application that "
+    "asks whether the device can be configured in the mode is told no, and one that asks for the operation, "
+    "yes.",
+    "# in kestrel.acd, while base.acd has no kestrel under SM\nOPERATION = PROGRAM,Smap,USB2"};
+
+constexpr Rule MODE_WITHOUT_OUTPUT{
+    "T113", Level::WARNING, "output that the mode can't use",
+    "The tables allow something through an output that base.acd does not list under the mode: an application "
+    "that asks for the mode and the output is told no, and one that asks for the operation, yes.",
+    "# while base.acd has no PARALLEL under SM\nOPERATION = PROGRAM,Smap,PARALLEL"};
+
 /// What stands before the outputs of a record, by key.
 struct Table {
     const char* key;
@@ -114,11 +127,42 @@ std::optional<std::size_t> position(const std::vector<std::string>& all, std::st
     return found == all.end() ? std::nullopt : std::optional(static_cast<std::size_t>(found - all.begin()));
 }
 
+/// What base.acd says of a mode. A list that is missing says nothing.
+struct ModeLists {
+    std::optional<std::set<std::string_view>> outputs;
+    std::optional<std::set<std::string_view>> families;
+};
+
+/// By mode.
+using AllModeLists = std::vector<ModeLists>;
+
+/// Behind the label.
+std::set<std::string_view> listed(const Record& record) {
+    std::set<std::string_view> names;
+    for (std::size_t i = 1; i < record.fields.size(); ++i) {
+        names.insert(record.fields[i].text);
+    }
+    return names;
+}
+
+AllModeLists modeLists(const Model& model) {
+    AllModeLists all;
+    for (const std::string& mode : vocabulary::modes()) {
+        ModeLists& lists = all.emplace_back();
+        const Entry* const entry = model.baseEntry(mode);
+        if (entry != nullptr && entry->records.size() > 1) {
+            lists.outputs = listed(entry->records[0]);
+            lists.families = listed(entry->records[1]);
+        }
+    }
+    return all;
+}
+
 /// Looks at the records of one key.
 class TableCheck {
 public:
-    TableCheck(const Table& table, Family::Kind kind, Findings& findings)
-        : m_table(table), m_kind(kind), m_findings(findings) {}
+    TableCheck(const Table& table, const Family& family, const AllModeLists& modes, Findings& findings)
+        : m_table(table), m_family(family), m_modes(modes), m_findings(findings) {}
 
     void check(const Record& record) {
         const std::vector<Token>& fields = record.fields;
@@ -128,8 +172,11 @@ public:
         const std::optional<std::size_t> row = m_table.hasOptions ? option(fields[0]) : operation(fields[0]);
         std::size_t next = 1;
         std::optional<std::size_t> mode = 0;
+        bool isInMode = false;
         if (m_table.hasMode && fields.size() > 1) {
-            mode = readMode(fields[next++]);
+            mode = readMode(fields[next]);
+            isInMode = mode && modeTakesFamily(*mode, fields[next]);
+            ++next;
         }
         if (fields.size() <= (m_table.hasMode ? 2U : 1U)) {
             m_findings.add(NO_OUTPUT, record.whole,
@@ -137,6 +184,9 @@ public:
         }
         for (; next < fields.size(); ++next) {
             const std::optional<std::size_t> output = readOutput(fields[next]);
+            if (isInMode && output) {
+                checkModeOutput(*mode, fields[next]);
+            }
             if (row && mode && output && !m_cells.insert({*row, *mode, *output}).second) {
                 m_findings.add(CELL_TWICE, fields[next],
                                fmt::format("{} of {} is given already", quoted(fields[next].text),
@@ -188,10 +238,33 @@ private:
             m_findings.add(MODE_WITHOUT_CELL, token,
                            fmt::format("the table has no cells for mode {}", quoted(text)));
             return std::nullopt;
-        } else if (mode == MODE_TYPE::SPI && m_kind == Family::Kind::PARTS) {
+        } else if (mode == MODE_TYPE::SPI && m_family.kind == Family::Kind::PARTS) {
             m_findings.add(SPI_MODE_ELSEWHERE, token, "in SPI mode only the tables of spi.acd are asked");
+            return std::nullopt;
         }
         return static_cast<std::size_t>(mode);
+    }
+
+    /// Can the family be configured in the mode? Unknown devices, which are of family "base", can't in any.
+    bool modeTakesFamily(std::size_t mode, const Token& token) {
+        const auto& families = m_modes[mode].families;
+        const bool isMissing =
+            families && m_family.kind != Family::Kind::BASE && !families->contains(m_family.name);
+        if (isMissing) {
+            m_findings.add(MODE_WITHOUT_FAMILY, token,
+                           fmt::format("{} of base.acd does not list the family {}",
+                                       vocabulary::modes()[mode], quoted(m_family.name)));
+        }
+        return !isMissing;
+    }
+
+    void checkModeOutput(std::size_t mode, const Token& token) {
+        const auto& outputs = m_modes[mode].outputs;
+        if (outputs && !outputs->contains(token.text)) {
+            m_findings.add(MODE_WITHOUT_OUTPUT, token,
+                           fmt::format("{} of base.acd does not list the output {}",
+                                       vocabulary::modes()[mode], quoted(token.text)));
+        }
     }
 
     /// @return an output with a cell; nothing for any other
@@ -215,15 +288,17 @@ private:
     }
 
     const Table& m_table;
-    Family::Kind m_kind;
+    const Family& m_family;
+    const AllModeLists& m_modes;
     Findings& m_findings;
     std::set<std::tuple<std::size_t, std::size_t, std::size_t>> m_cells;
 };
 
-void checkSection(const Section& section, Family::Kind kind, Findings& findings) {
+void checkSection(const Section& section, const Family& family, const AllModeLists& modes,
+                  Findings& findings) {
     for (const Table& table : TABLES) {
         if (const Entry* const entry = section.find(table.key)) {
-            TableCheck check(table, kind, findings);
+            TableCheck check(table, family, modes, findings);
             for (const Record& record : entry->records) {
                 check.check(record);
             }
@@ -232,10 +307,11 @@ void checkSection(const Section& section, Family::Kind kind, Findings& findings)
 }
 
 void check(const Model& model, Findings& findings) {
+    const AllModeLists modes = modeLists(model);
     for (const Family& family : model.families()) {
-        checkSection(family.own, family.kind, findings);
+        checkSection(family.own, family, modes, findings);
         for (const Section& device : family.devices) {
-            checkSection(device, family.kind, findings);
+            checkSection(device, family, modes, findings);
         }
     }
 }
@@ -245,7 +321,7 @@ void check(const Model& model, Findings& findings) {
 Group tableRules() {
     return {{&UNKNOWN_OPERATION, &UNKNOWN_OPTION, &UNREADABLE_OPTION, &UNKNOWN_MODE, &ACCIDENTAL_MODE,
              &UNKNOWN_OUTPUT, &OUTPUT_WITHOUT_CELL, &MODE_WITHOUT_CELL, &NO_OUTPUT, &CELL_TWICE,
-             &SPI_MODE_ELSEWHERE},
+             &SPI_MODE_ELSEWHERE, &MODE_WITHOUT_FAMILY, &MODE_WITHOUT_OUTPUT},
             check};
 }
 

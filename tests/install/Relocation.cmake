@@ -1,0 +1,17 @@
+# No file by which consumers find the library names the place where it was built or first installed.
+include(${CMAKE_CURRENT_LIST_DIR}/Context.cmake)
+
+file(GLOB_RECURSE files ${TREE}/${LIBRARIES}/*.cmake ${TREE}/${LIBRARIES}/*.pc)
+list(LENGTH files count)
+if(count LESS 5)
+  message(FATAL_ERROR "only ${files} are installed")
+endif()
+foreach(file ${files})
+  file(READ ${file} text)
+  foreach(place ${SOURCE_TREE} ${BUILD_TREE} ${SCRATCH})
+    string(FIND "${text}" "${place}" position)
+    if(NOT position EQUAL -1)
+      message(FATAL_ERROR "${file} names ${place}")
+    endif()
+  endforeach()
+endforeach()
