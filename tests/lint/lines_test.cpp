@@ -119,7 +119,7 @@ TEST(AcdLines, TellOfALineThatIsTooLong) {
 }
 
 TEST(AcdLines, OfTheDatabaseAreReadFromDisk) {
-    const DatabaseDirectory directory({{"kestrel.acd", "[KS50]\n"}});
+    const DatabaseDirectory directory(DatabaseDirectory::Files{{"kestrel.acd", "[KS50]\n"}});
     AcdStore::setSearchPath({directory.path()});
     const std::vector<AcdLines> all = AcdLines::ofDatabase();
     ASSERT_EQ(all.size(), 1U);
@@ -128,7 +128,7 @@ TEST(AcdLines, OfTheDatabaseAreReadFromDisk) {
 }
 
 TEST(AcdLines, OfADatabaseThatCantBeReadRaise) {
-    const DatabaseDirectory directory({{"kestrel.acd", ""}});
+    const DatabaseDirectory directory(DatabaseDirectory::Files{{"kestrel.acd", ""}});
     AcdStore::setSearchPath({directory.path()});
     EXPECT_EQ(AcdStore::families().size(), 1U);
     std::filesystem::remove(directory.path("kestrel.acd"));
