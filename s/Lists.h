@@ -16,7 +16,7 @@ public:
 
     /// A field, valid until the next read; null when it, or the whole record, does not exist.
     [[nodiscard]] const char* field(long index) const {
-        return isIndex(m_index) && isIndex(index)
+        return isWithinReach(m_index) && isWithinReach(index)
                    ? m_accessor.getstringbykey(m_key, ":", static_cast<short>(m_index), ",",
                                                static_cast<short>(index))
                    : nullptr;
@@ -31,8 +31,8 @@ public:
     }
 
 private:
-    [[nodiscard]] static bool isIndex(long index) noexcept {
-        return index >= 0 && index <= std::numeric_limits<short>::max();
+    [[nodiscard]] static bool isWithinReach(long index) noexcept {
+        return index <= std::numeric_limits<short>::max();
     }
 
     PM_DEVKEY& m_accessor;

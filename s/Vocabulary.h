@@ -127,7 +127,7 @@ inline constexpr std::array<Option, 24> OPTIONS{{
 
 /// A table is indexed by value, so row i must hold value i.
 template <typename Table>
-[[nodiscard]] constexpr bool isInValueOrder(const Table& table) {
+[[nodiscard]] consteval bool isInValueOrder(const Table& table) {
     for (std::size_t row = 0; row < table.size(); ++row) {
         if (static_cast<std::size_t>(table[row].value) != row) {
             return false;

@@ -27,9 +27,6 @@ constexpr std::array KINDS{AcdLines::Kind::HEADER, AcdLines::Kind::ASSIGNMENT, A
         return Fault::BLANK_IN_KEY;
     case FaultKind::NUL_BYTE:
         return Fault::NUL_BYTE;
-    case FaultKind::LINE_TOO_LONG:
-    case FaultKind::VALUE_TOO_LONG: // never of a single line
-        return Fault::LINE_TOO_LONG;
     case FaultKind::CONTINUED_AT_END:
         return Fault::CONTINUED_AT_END;
     case FaultKind::UNCLOSED_HEADER:
@@ -40,8 +37,11 @@ constexpr std::array KINDS{AcdLines::Kind::HEADER, AcdLines::Kind::ASSIGNMENT, A
         return Fault::BLANK_IN_NAME;
     case FaultKind::TEXT_BEHIND_HEADER:
         return Fault::TEXT_BEHIND_HEADER;
+    case FaultKind::LINE_TOO_LONG:
+    case FaultKind::VALUE_TOO_LONG: // never of a single line
+        break;
     }
-    return Fault::NONE;
+    return Fault::LINE_TOO_LONG;
 }
 
 [[nodiscard]] AcdLines::Line publicLine(const acd::Line& line) {

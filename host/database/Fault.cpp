@@ -53,9 +53,9 @@ void appendEscaped(std::string& text, char byte) {
     case FaultKind::TEXT_BEHIND_HEADER:
         return "text behind a header: " + quoted;
     case FaultKind::VALUE_TOO_LONG:
-        return "the value would grow over 1 GiB by " + quoted;
+        break;
     }
-    return quoted;
+    return "the value would grow over 1 GiB by " + quoted;
 }
 
 } // namespace

@@ -10,8 +10,6 @@ namespace acd {
 struct Place {
     std::uint32_t line;
     std::uint32_t column;
-
-    friend bool operator==(const Place&, const Place&) = default;
 };
 
 /// What can be wrong with a line.

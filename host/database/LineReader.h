@@ -87,7 +87,8 @@ private:
         char* end;
         Place place; ///< of `begin`
 
-        [[nodiscard]] bool goesOn() const noexcept { return begin != end && end[-1] == '\\'; }
+        /// Of a line that holds anything.
+        [[nodiscard]] bool goesOn() const noexcept { return end[-1] == '\\'; }
     };
 
     [[nodiscard]] PhysicalLine takePhysicalLine() noexcept;

@@ -19,7 +19,7 @@ namespace {
 /// taken at once.
 using ChecksumTables = std::array<std::array<std::uint32_t, 256>, 8>;
 
-constexpr ChecksumTables makeChecksumTables() {
+consteval ChecksumTables makeChecksumTables() {
     constexpr std::uint32_t POLYNOMIAL = 0xEDB88320;
     ChecksumTables tables{};
     for (std::uint32_t byte = 0; byte < 256; ++byte) {

@@ -158,7 +158,8 @@ TEST(LongestValues, AnAppendThatGrowsOverThemIsLeftOut) {
     EXPECT_EQ(database.find(nullptr, "OTHER")->text(), "12345678901");
     ASSERT_EQ(faults.size(), 1U);
     EXPECT_EQ(database.path(faults[0].layer), "top");
-    EXPECT_EQ(faults[0].fault.place, (acd::Place{1, 8}));
+    EXPECT_EQ(faults[0].fault.place.line, 1U);
+    EXPECT_EQ(faults[0].fault.place.column, 8U);
     EXPECT_EQ(acd::describe(faults[0].fault), "the value would grow over 1 GiB by '9ab'");
 }
 

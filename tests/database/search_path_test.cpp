@@ -47,6 +47,13 @@ TEST_F(SearchPaths, OfTheEnvironmentLeaveOutEmptyParts) {
     EXPECT_THAT(AcdStore::searchPath(), ElementsAre(a, b));
 }
 
+TEST_F(SearchPaths, OfTheEnvironmentWithoutAnyPartDoNotCount) {
+    const acd::SearchPath unset = acd::defaultSearchPath();
+    setenv("TARVIK_DATABASE", "::", 1);
+    EXPECT_EQ(acd::defaultSearchPath().directories, unset.directories);
+    EXPECT_EQ(acd::defaultSearchPath().tried, unset.tried);
+}
+
 TEST_F(SearchPaths, ThatWereSetGoBeforeTheEnvironment) {
     setenv("TARVIK_DATABASE", a.c_str(), 1);
     AcdStore::setSearchPath({b});

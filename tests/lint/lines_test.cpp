@@ -2,11 +2,15 @@
 #include <AcdLines.h>
 #include <AcdStore.h>
 
+#include "support/Fixtures.h"
 #include "tool/DatabaseDirectory.h"
+
+#include <TarvikException.h>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include <string>
 #include <utility>
 
 using Kind = AcdLines::Kind;
@@ -84,6 +88,55 @@ TEST(AcdLines, OfTheDatabaseComeByFamily) {
     EXPECT_EQ(files[0].family(), "base");
     EXPECT_EQ(files[0].path(), "base.acd");
     EXPECT_EQ(files[1].lines()[0].name, "KS50");
+}
+
+TEST(AcdLines, TellWhatIsWrongWithALine) {
+    using Fault = AcdLines::Fault;
+    using namespace std::string_literals;
+    const std::pair<std::string, Fault> faults[] = {{"no sense"s, Fault::NO_EQUALS_SIGN},
+                                                    {" = 1"s, Fault::EMPTY_KEY},
+                                                    {"A B = 1"s, Fault::BLANK_IN_KEY},
+                                                    {"A = \0"s, Fault::NUL_BYTE},
+                                                    {"A = 1\\"s, Fault::CONTINUED_AT_END},
+                                                    {"[KS50"s, Fault::UNCLOSED_HEADER},
+                                                    {"[]"s, Fault::EMPTY_NAME},
+                                                    {"[KS 50]"s, Fault::BLANK_IN_NAME},
+                                                    {"[KS50] FPGA"s, Fault::TEXT_BEHIND_HEADER}};
+    for (const auto& [text, fault] : faults) {
+        const AcdLines lines(text);
+        ASSERT_EQ(lines.lines().size(), 1U) << text;
+        EXPECT_EQ(lines.lines()[0].kind, Kind::FAULT) << text;
+        EXPECT_EQ(lines.lines()[0].fault, fault) << text;
+        EXPECT_EQ(lines.lines()[0].closesSection, text.starts_with('[')) << text;
+    }
+}
+
+TEST(AcdLines, TellOfALineThatIsTooLong) {
+    const AcdLines lines("A = " + std::string(std::size_t{16} << 20, 'x') + "\nB = 1\n");
+    ASSERT_EQ(lines.lines().size(), 2U);
+    EXPECT_EQ(lines.lines()[0].fault, AcdLines::Fault::LINE_TOO_LONG);
+    EXPECT_EQ(lines.lines()[1].name, "B");
+}
+
+TEST(AcdLines, OfTheDatabaseAreReadFromDisk) {
+    const DatabaseDirectory directory(DatabaseDirectory::Files{{"kestrel.acd", "[KS50]\n"}});
+    AcdStore::setSearchPath({directory.path()});
+    const std::vector<AcdLines> all = AcdLines::ofDatabase();
+    ASSERT_EQ(all.size(), 1U);
+    EXPECT_EQ(all[0].path(), directory.path("kestrel.acd"));
+    EXPECT_EQ(all[0].family(), "kestrel");
+}
+
+TEST(AcdLines, OfADatabaseThatCantBeReadRaise) {
+    const DatabaseDirectory directory(DatabaseDirectory::Files{{"kestrel.acd", ""}});
+    AcdStore::setSearchPath({directory.path()});
+    EXPECT_EQ(AcdStore::families().size(), 1U);
+    std::filesystem::remove(directory.path("kestrel.acd"));
+    MessageRecorder messages;
+    EXPECT_THROW(static_cast<void>(AcdLines::ofDatabase()), DataNotFoundException);
+    const std::vector<IssuedMessage> issued = messages.take();
+    ASSERT_EQ(issued.size(), 1U);
+    EXPECT_EQ(issued[0].text, directory.path("kestrel.acd") + ": can't be read: No such file or directory\n");
 }
 
 TEST(AcdLines, AreFoundWhereTheSearchPathWasListed) {

@@ -26,13 +26,16 @@ std::vector<std::string> physicalLines(std::string text) {
         text = text.substr(3);
     }
     std::vector<std::string> lines = split(text, '\n');
-    if (lines.back().empty()) {
-        lines.pop_back();
-    }
+    // What stands behind the last line end has none of its own: a CR there is text.
+    const std::string rest = lines.back();
+    lines.pop_back();
     for (std::string& line : lines) {
         if (line.ends_with('\r')) {
             line.pop_back();
         }
+    }
+    if (!rest.empty()) {
+        lines.push_back(rest);
     }
     return lines;
 }
@@ -59,7 +62,7 @@ std::optional<std::string> headerName(const std::string& line) {
         return std::nullopt;
     }
     const std::string name = header.substr(1, header.size() - 2);
-    if (name.find_first_of("[] \t") != std::string::npos) {
+    if (name.find_first_of("] \t") != std::string::npos) {
         return std::nullopt;
     }
     return name;
@@ -214,16 +217,21 @@ Databases::Databases(const std::map<std::string, std::string>& files) {
     }
 }
 
+Databases::Parsed::const_iterator Databases::find(const std::string& file) const {
+    return std::find_if(m_files.begin(), m_files.end(),
+                        [&](const auto& entry) { return lower(entry.first) == lower(file); });
+}
+
 Accessor Databases::file(const std::string& name) const {
-    return has(name) ? Accessor(&m_files.at(name).own, nullptr) : Accessor();
+    const auto found = find(name);
+    return found == m_files.end() ? Accessor() : Accessor(&found->second.own, nullptr);
 }
 
 Opened Databases::openWhole(const std::string& name) const {
     for (const std::string& fileName : {name, name + EXTENSION}) {
-        for (const auto& [file, content] : m_files) {
-            if (lower(file) == lower(fileName)) {
-                return {file.substr(0, file.size() - EXTENSION.size()), Accessor(&content.own, nullptr)};
-            }
+        if (const auto found = find(fileName); found != m_files.end()) {
+            return {found->first.substr(0, found->first.size() - EXTENSION.size()),
+                    Accessor(&found->second.own, nullptr)};
         }
     }
     for (const auto& [file, content] : m_files) {

@@ -73,8 +73,8 @@ class Databases {
 public:
     explicit Databases(const std::map<std::string, std::string>& files);
 
-    /// By the exact name of a file.
-    [[nodiscard]] bool has(const std::string& file) const { return m_files.contains(file); }
+    /// By the name of a file, in any case.
+    [[nodiscard]] bool has(const std::string& file) const { return find(file) != m_files.end(); }
     [[nodiscard]] Accessor file(const std::string& name) const;
 
     /// By the name of a file, a family or a device.
@@ -84,9 +84,12 @@ public:
     [[nodiscard]] std::size_t faults() const;
 
 private:
+    using Parsed = std::map<std::string, ParsedFile>;
+
+    [[nodiscard]] Parsed::const_iterator find(const std::string& file) const;
     [[nodiscard]] Opened openWhole(const std::string& name) const;
 
-    std::map<std::string, ParsedFile> m_files;
+    Parsed m_files;
 };
 
 } // namespace reference

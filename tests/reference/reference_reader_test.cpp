@@ -24,6 +24,10 @@ TEST(ReferenceReader, TakesEitherLineEndAndALastLineWithoutOne) {
                 ElementsAre(Pair("A", "1"), Pair("B", "2"), Pair("C", "3")));
 }
 
+TEST(ReferenceReader, ACarriageReturnThatEndsNoLineIsText) {
+    EXPECT_THAT(parse("A = 1\r2\r\r\nB = 3\r").own, ElementsAre(Pair("A", "1\r2\r"), Pair("B", "3\r")));
+}
+
 TEST(ReferenceReader, SkipsAByteOrderMark) {
     EXPECT_THAT(parse("\xEF\xBB\xBF"
                       "A = 1\n")
@@ -74,6 +78,13 @@ TEST(ReferenceReader, SectionsAreOneWhateverTheirCase) {
     EXPECT_EQ(file.sections[0].name, "Dev");
     EXPECT_THAT(file.sections[0].keys, ElementsAre(Pair("A", "1"), Pair("B", "3")));
     EXPECT_THAT(file.sections[1].keys, ElementsAre(Pair("A", "2")));
+}
+
+TEST(ReferenceReader, ANameMayHoldAnOpeningBracket) {
+    const ParsedFile file = parse("[a[b]\nA = 1\n");
+    EXPECT_EQ(file.faults, 0U);
+    ASSERT_EQ(file.sections.size(), 1U);
+    EXPECT_EQ(file.sections[0].name, "a[b");
 }
 
 TEST(ReferenceReader, AMalformedHeaderDropsTheKeysUpToTheNextOne) {
@@ -150,6 +161,13 @@ TEST(ReferenceReader, ANameIsCutOnlyWhenItIsNothingAsAWhole) {
     EXPECT_EQ(databases.open("dev_y").module, "a");
     EXPECT_EQ(databases.open("fam_x").module, "fam_x");
     EXPECT_EQ(databases.open("fam").module, std::nullopt);
+}
+
+TEST(ReferenceDatabases, FilesAreFoundInAnyCase) {
+    const Databases databases(std::map<std::string, std::string>{{"Spi.acd", "A = 1\n"}});
+    EXPECT_TRUE(databases.has("spi.acd"));
+    EXPECT_THAT(databases.file("spi.acd").items("A"), ElementsAre("1"));
+    EXPECT_FALSE(databases.has("spi"));
 }
 
 } // namespace

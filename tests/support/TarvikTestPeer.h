@@ -12,9 +12,12 @@ public:
     static void removeManager() {
         if (ConstraintsManager::s_instance != nullptr) {
             ConstraintsManager::RemoveConstraintsManager();
-            ConstraintsManager::s_instance = nullptr;
+            forgetManager();
         }
     }
+
+    /// The same for a manager that is removed already.
+    static void forgetManager() { ConstraintsManager::s_instance = nullptr; }
 
     static void reset() {
         removeManager();

@@ -1,5 +1,7 @@
 #include "CoreFixtures.h"
 
+#include "EntryReader.h"
+
 #include <climits>
 
 // "OPERATION" entries: which cells they set, what they say, and where they raise.
@@ -255,6 +257,18 @@ TEST(OperationEntries, FieldsBehindIndex32767DoNotExist) {
     OperationSession session(item + ",SVF,STAPL");
     session.parse();
     EXPECT_THAT(operationCells(session.peer), ElementsAre(Cell{1, 0, 0, 2}, Cell{1, 0, 0, 3}));
+}
+
+// No text reads as this value; hosts know the location all the same.
+TEST(OperationEntries, TheValueThatIsNoModeRaises) {
+    const EntryLocations locations{1, 2, 3, 4, 5};
+    EXPECT_EQ(raisedLine<DataMismatchException>([&] {
+                  static_cast<void>(
+                      EntryReader(locations, "kestrel", true).known(static_cast<TARVIKNS::MODE_TYPE>(9)));
+              }),
+              3);
+    EXPECT_EQ(EntryReader(locations, "kestrel", false).known(static_cast<TARVIKNS::MODE_TYPE>(9)),
+              static_cast<TARVIKNS::MODE_TYPE>(9));
 }
 
 } // namespace

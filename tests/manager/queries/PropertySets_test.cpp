@@ -45,6 +45,26 @@ TEST(PropertySets, NothingFoundIsTheSharedEmptySetAndSilent) {
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
+// So many of one length that several share each place of the table.
+TEST(PropertySets, NamesThatMeetInTheTableStayApart) {
+    const auto number = [](int index) { return std::to_string(1000 + index); };
+    constexpr int COUNT = 400;
+    std::string text = "[dev1]\n[dev10]\nPROPERTY = ";
+    for (int index = 0; index < COUNT; ++index) {
+        text += (index == 0 ? "P" : ":P") + number(index) + ',' + number(index);
+    }
+    ManagerOver manager(family(text + '\n'));
+    const auto values = [&](const char* device, const std::string& key) {
+        return textsOf(manager->getDeviceStringProperties(device, key.c_str()));
+    };
+    for (int index = 0; index < COUNT; ++index) {
+        EXPECT_THAT(values("dev10", 'P' + number(index)), ElementsAre(number(index)));
+        EXPECT_THAT(values("dev10", 'Q' + number(index)), IsEmpty());
+        // As long as the first, and begun alike, but divided one byte earlier.
+        EXPECT_THAT(values("dev1", "0P" + number(index)), IsEmpty());
+    }
+}
+
 TEST(PropertySets, KeysAreCaseSensitive) {
     ManagerOver manager(family("[dev1]\nPROPERTY = K,v\n"));
     EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "k")), IsEmpty());
