@@ -5,6 +5,7 @@
 #include "Tool.h"
 #include "why/Apart.h"
 #include "why/Members.h"
+#include "why/Oddities.h"
 
 #include <TarvikException.h>
 #include <tarvik/ConstraintsManager.h>
