@@ -12,7 +12,8 @@
 /// whether a name is among them.
 class NameSequence {
 public:
-    /// Changes nothing when memory runs out.
+    /// Adds a name behind all others. Changes nothing when memory runs out.
+    /// @param name to be added, whether it is among them or not
     void push_back(StringBase name) {
         m_names.push_back(std::move(name));
         try {
@@ -23,12 +24,19 @@ public:
         }
     }
 
-    [[nodiscard]] bool contains(std::string_view name) const { return m_index.find(name) != m_index.end(); }
+    /// @param name compared byte by byte
+    /// @return whether it is among them; takes the same time however many there are
+    [[nodiscard]] bool contains(std::string_view name) const;
 
+    /// @return whether there are none
     [[nodiscard]] bool empty() const noexcept { return m_names.empty(); }
+    /// @return how many there are, repeated ones included
     [[nodiscard]] std::size_t size() const noexcept { return m_names.size(); }
+    /// @return the name added latest, of one at least
     [[nodiscard]] const StringBase& back() const noexcept { return m_names.back(); }
+    /// @return the name added first
     [[nodiscard]] auto begin() const noexcept { return m_names.begin(); }
+    /// @return the end behind the name added latest
     [[nodiscard]] auto end() const noexcept { return m_names.end(); }
 
 private:

@@ -13,19 +13,26 @@
 /// the text is asked for: its set is not made before somebody wants the set itself.
 class PropertyValues {
 public:
+    /// Texts, each once, in byte order.
     using TextSet = std::set<StringBase, ltptstr>;
 
     /// Who holds a property: the length of its name (the map has its text), and whether it is a flash.
     struct Owner {
-        std::uint32_t length = 0;
-        bool isFlash = false;
+        std::uint32_t length = 0; ///< of the owner's name, in bytes
+        bool isFlash = false;     ///< is the owner an SPI flash?
     };
 
     /// Without a value.
     PropertyValues() : m_set(std::make_unique<TextSet>()) {}
 
+    /// With one value.
+    /// @param value the value
+    /// @param owner whose it is
     PropertyValues(StringBase value, Owner owner) : m_owner(owner), m_first(std::move(value)) {}
 
+    /// With any number of values.
+    /// @param values the values
+    /// @param owner whose they are
     PropertyValues(TextSet values, Owner owner)
         : m_owner(owner), m_set(std::make_unique<TextSet>(std::move(values))) {
         if (!m_set->empty()) {
@@ -33,24 +40,30 @@ public:
         }
     }
 
+    /// @return whose the values are
     [[nodiscard]] const Owner& owner() const noexcept { return m_owner; }
+    /// @return whether there is no value
     [[nodiscard]] bool empty() const noexcept { return m_set != nullptr && m_set->empty(); }
 
-    /// The first value in byte order, of one at least.
+    /// @return the first value in byte order, of one at least
     [[nodiscard]] const StringBase& first() const noexcept { return m_first; }
 
+    /// @param value compared byte by byte
+    /// @return whether it is among the values
     [[nodiscard]] bool contains(std::string_view value) const noexcept {
         return m_set != nullptr ? m_set->find(value) != m_set->end() : ltptstr::view(m_first) == value;
     }
 
-    /// All of them; valid as long as this object.
+    /// @return all of them; valid as long as this object
     [[nodiscard]] const TextSet& set() const {
         if (m_set == nullptr) {
             m_set = std::make_unique<TextSet>(TextSet{m_first});
         }
         return *m_set;
     }
+    /// @return the first value in byte order
     [[nodiscard]] auto begin() const { return set().begin(); }
+    /// @return the end behind the last one
     [[nodiscard]] auto end() const { return set().end(); }
 
 private:

@@ -9,8 +9,10 @@
 /// Hashes texts for containers whose look-ups take a `std::string_view` without copying it. Not `noexcept` on
 /// purpose: the standard library then keeps each entry's hash, and need not take it again while it searches.
 struct TextHash {
-    using is_transparent = void;
+    using is_transparent = void; ///< takes any kind of text
 
+    /// @param text of any kind that `ltptstr` compares
+    /// @return its hash
     template <typename Text>
     [[nodiscard]] std::size_t operator()(const Text& text) const {
         return std::hash<std::string_view>()(ltptstr::view(text));
@@ -19,8 +21,11 @@ struct TextHash {
 
 /// Same length and same bytes.
 struct TextEqual {
-    using is_transparent = void;
+    using is_transparent = void; ///< takes any kind of text
 
+    /// @param left of any kind that `ltptstr` compares
+    /// @param right likewise
+    /// @return whether they are equal
     template <typename Left, typename Right>
     [[nodiscard]] bool operator()(const Left& left, const Right& right) const noexcept {
         return ltptstr::view(left) == ltptstr::view(right);

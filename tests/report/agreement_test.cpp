@@ -47,6 +47,9 @@ std::size_t expectAgreement(const std::vector<std::string>& database) {
     EXPECT_EQ(outcome.status, 0) << outcome;
     const PageData page(outcome.output);
     for (std::size_t device = 0; device < page.size(); ++device) {
+        if (page.name(device).find("\uFFFD") != std::string::npos) {
+            continue; // its bytes are no UTF-8, so what the page shows can't be asked for
+        }
         arguments = database;
         arguments.insert(arguments.end(), {"show", page.name(device), "--json"});
         const json answer = json::parse(runTool(arguments).output);
