@@ -52,6 +52,7 @@ std::vector<Change> joined(const std::vector<Change>& changes) {
         all.gained.insert(change.gained.begin(), change.gained.end());
     }
     std::vector<Change> sorted;
+    sorted.reserve(byQuestion.size());
     for (auto& [question, change] : byQuestion) {
         sorted.push_back(std::move(change));
     }
