@@ -36,7 +36,7 @@ std::string legend() {
     return fmt::format("{}", fmt::join(words, ", "));
 }
 
-std::string orNone(std::string html) { return html.empty() ? "<p>There are none.</p>\n" : html; }
+std::string orNone(const std::string& html) { return html.empty() ? "<p>There are none.</p>\n" : html; }
 
 } // namespace
 
