@@ -76,7 +76,7 @@ void ConstraintsManager::keepOptionShortcut(const StringBase& device, const Stri
     StringBase key = baseNameOf(view(device));
     key.MakeLower();
     const auto cached = m_deviceFamilyCache.find(view(key));
-    if (block >= m_programOptionPackages.size() || !m_programOptionsLoaded.contains(view(owner)) ||
+    if (block >= m_programOptionPackages.size() || !isProgramOptionTableLoaded(owner.c_str()) ||
         cached == m_deviceFamilyCache.end() || cached->second.GetLength() == 0) {
         return;
     }
@@ -132,6 +132,10 @@ int ConstraintsManager::getProgramOptions(const char* device, MODE_TYPE mode, OU
         m_programOptionTable->mask(block, static_cast<int>(mode), static_cast<int>(output)));
 }
 
+bool ConstraintsManager::isProgramOptionTableLoaded(const char* name) const {
+    return m_programOptionsLoaded.contains(view(name));
+}
+
 /// The name whose program options answer for a device in a package, its options loaded: the two joined when
 /// they are listed together, else the device when it is listed or a family, else its family.
 StringBase ConstraintsManager::loadedOptionOwner(const StringBase& device, const char* package) {
@@ -141,7 +145,7 @@ StringBase ConstraintsManager::loadedOptionOwner(const StringBase& device, const
     const StringBase family = getPartFamily(name.c_str());
     if (family != name) {
         if (m_programOptionPackages.contains(view(joined))) {
-            if (!m_programOptionsLoaded.contains(view(joined))) {
+            if (!isProgramOptionTableLoaded(joined.c_str())) {
                 loadDeviceData(name.c_str(), package);
             }
             return joined;
@@ -150,7 +154,7 @@ StringBase ConstraintsManager::loadedOptionOwner(const StringBase& device, const
             name = family;
         }
     }
-    if (!m_programOptionsLoaded.contains(view(name))) {
+    if (!isProgramOptionTableLoaded(name.c_str())) {
         loadDeviceData(name.c_str(), nullptr);
     }
     return name;

@@ -65,6 +65,8 @@ Apart::Apart(const std::function<std::string()>& work) {
     m_input = ends[0];
     m_child = ::fork();
     if (m_child == 0) {
+        // Else the copy would wait for itself to listen once nobody else does.
+        ::close(ends[0]);
         workAndExit(ends[1], work);
     }
     ::close(ends[1]);

@@ -411,6 +411,7 @@ private:
     void keepOperationShortcut(const StringBase& device, const StringBase& owner, std::size_t block);
     void keepOptionShortcut(const StringBase& device, const StringBase& owner, std::size_t block);
     StringBase operationOwner(const StringBase& device);
+    bool isProgramOptionTableLoaded(const char* name) const;
     StringBase loadedOptionOwner(const StringBase& device, const char* package);
     const PropertyValues* findStored(std::string_view owner, std::string_view property) const;
     const PropertyValues* findLoaded(std::string_view owner, std::string_view property) const;

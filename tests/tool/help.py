@@ -42,7 +42,7 @@ def examples_of(text):
 
 def prepare(folder, database):
     """What the examples speak of."""
-    for name in ("database", "company", "changed"):
+    for name in ("database", "company", "changed", "released"):
         shutil.copytree(database, Path(folder, name))
     Path(folder, "site").mkdir()
     overlay = "PROPERTY = VENDOR,Someone\n"
