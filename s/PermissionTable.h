@@ -3,6 +3,7 @@
 // The permission table: which rows (operations, options) are allowed in which mode through which output, in a
 // block for each family or package.
 
+#include <algorithm>
 #include <cstddef>
 #include <cstdint>
 #include <vector>
@@ -24,17 +25,17 @@ public:
     PermissionTable() = default;
 
     PermissionTable(std::size_t blocks, int rows, int modes, int outputs)
-        : m_blocks(blocks), m_rows(rows), m_modes(modes), m_outputs(outputs),
+        : m_blocks(blocks), m_rows(std::min(rows, MOST_ROWS)), m_modes(modes), m_outputs(outputs),
           m_masks(blocks * static_cast<std::size_t>(modes) * static_cast<std::size_t>(outputs)) {}
 
     void allow(std::size_t block, int row, int mode, int output) {
         if (isCell(block, mode, output) && isRow(row)) {
-            m_masks[position(block, mode, output)] |= std::uint32_t{1} << row;
+            m_masks[position(block, mode, output)] |= bit(row);
         }
     }
 
     [[nodiscard]] bool allows(std::size_t block, int row, int mode, int output) const noexcept {
-        return isRow(row) && (mask(block, mode, output) >> row & 1U) != 0;
+        return isRow(row) && (mask(block, mode, output) & bit(row)) != 0;
     }
 
     /// Bit i stands for row i.
@@ -50,7 +51,12 @@ private:
 
     [[nodiscard]] static bool isWithin(int value, int bound) noexcept { return value >= 0 && value < bound; }
 
-    [[nodiscard]] bool isRow(int row) const noexcept { return isWithin(row, m_rows) && row < MOST_ROWS; }
+    /// Defined for any number, so that nobody has to prove that the row was tested.
+    [[nodiscard]] static std::uint32_t bit(int row) noexcept {
+        return std::uint32_t{1} << (static_cast<unsigned>(row) % unsigned{MOST_ROWS});
+    }
+
+    [[nodiscard]] bool isRow(int row) const noexcept { return isWithin(row, m_rows); }
 
     [[nodiscard]] bool isCell(std::size_t block, int mode, int output) const noexcept {
         return block < m_blocks && isWithin(mode, m_modes) && isWithin(output, m_outputs);
