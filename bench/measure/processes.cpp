@@ -44,6 +44,7 @@ Cost run(const Program& program) {
     posix_spawn_file_actions_t actions;
     posix_spawn_file_actions_init(&actions);
     posix_spawn_file_actions_addopen(&actions, STDOUT_FILENO, "/dev/null", O_WRONLY, 0);
+    posix_spawn_file_actions_addopen(&actions, STDERR_FILENO, "/dev/null", O_WRONLY, 0);
     pid_t process = 0;
     const auto start = std::chrono::steady_clock::now();
     const int fault = posix_spawn(&process, arguments.front(), &actions, nullptr, arguments.data(), environ);
