@@ -47,8 +47,9 @@ def prepare(folder, database):
     Path(folder, "site").mkdir()
     overlay = "PROPERTY = VENDOR,Someone\n"
     Path(folder, "site", "kestrel.acd").write_text(overlay)
-    with Path(folder, "changed", "kestrel.acd").open("a") as family:
-        family.write("[KS50]\n" + overlay)
+    for name in ("changed", "released"):
+        with Path(folder, name, "kestrel.acd").open("a") as family:
+            family.write("[KS50]\n" + overlay)
 
 
 def check_manual(manual, names):
