@@ -1,7 +1,11 @@
 // Work in a copy of the process.
+#include "Status.h"
 #include "why/Apart.h"
 
 #include <gtest/gtest.h>
+
+#include <stdexcept>
+#include <string>
 
 namespace {
 
@@ -9,6 +13,17 @@ namespace {
 std::string muchText() { return std::string(std::size_t{1} << 20U, 'x'); }
 
 TEST(Apart, GivesAllOfALongResult) { EXPECT_EQ(why::apart(muchText), muchText()); }
+
+TEST(Apart, LeavesNoTrace) {
+    int number = 1;
+    EXPECT_EQ(why::apart([&] { return std::to_string(++number); }), "2");
+    EXPECT_EQ(number, 1);
+}
+
+TEST(Apart, DoesNotTakeAFailureForAnAnswer) {
+    EXPECT_THROW(static_cast<void>(why::apart([]() -> std::string { throw std::runtime_error("no"); })),
+                 Failure);
+}
 
 TEST(Apart, EndsWhenNobodyAsksForTheResult) {
     // To come to the end is all: the copy had much to say, and was waited for.

@@ -1,9 +1,6 @@
 // The census asks for all devices; each answer is that of a manager that was asked for this device alone.
 #include "WhyFixtures.h"
-#include "why/Apart.h"
 #include "why/Census.h"
-
-#include "Status.h"
 
 #include "reference/DatabaseGenerator.h"
 #include "reference/Words.h"
@@ -115,22 +112,6 @@ TEST(WhichCensus, AnUnknownOptionIsAFaultForEachDeviceThatReadsIt) {
     EXPECT_EQ(entries[0].verdict, Verdict::YES);
     EXPECT_EQ(entries[1].verdict, Verdict::FAULT);
     EXPECT_EQ(entries[2].verdict, Verdict::YES);
-}
-
-TEST(WhyApart, BringsBackWhatTheWorkReturned) {
-    const std::string large(100'000, 'x');
-    EXPECT_EQ(why::apart([&] { return large; }), large);
-}
-
-TEST(WhyApart, LeavesNoTrace) {
-    int number = 1;
-    EXPECT_EQ(why::apart([&] { return std::to_string(++number); }), "2");
-    EXPECT_EQ(number, 1);
-}
-
-TEST(WhyApart, AFailureIsNotTakenForAnAnswer) {
-    EXPECT_THROW(static_cast<void>(why::apart([]() -> std::string { throw std::runtime_error("no"); })),
-                 Failure);
 }
 
 } // namespace
