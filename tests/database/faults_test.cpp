@@ -1,7 +1,5 @@
 #include "DatabaseFixtures.h"
 
-#include "database/LineReader.h"
-
 // What is wrong with a line costs that line and gives one message with its place; reading goes on behind it.
 
 using std::nullopt;
@@ -227,12 +225,6 @@ TEST_F(Faults, TheFragmentOfANulIsWhatStandsAroundIt) {
 TEST_F(Faults, ControlBytesAreShownHarmlessly) {
     expectFault("AFTER = ok\n\x1B[2J\x07\x7F\xC2\x9B\xC3\xA4\r\xFF\n", 2,
                 "2:1: no '=' in '\\x1b[2J\\x07\\x7f\\xc2\\x9b\xC3\xA4\\x0d\xFF'");
-}
-
-TEST_F(Faults, ALineThatIsTooLongIsOneHoweverItGoesOn) {
-    const std::string piece(acd::LineReader::LONGEST_LINE / 2, 'x');
-    expectFault("KEY = " + piece + "\\\n" + piece + "\\\nmore\\\nand more\nAFTER = ok\n", 1,
-                "1:1: line of more than 16 MiB: 'KEY = " + std::string(54, 'x') + "...'");
 }
 
 TEST_F(Faults, OfAMessageThatRaisesAreNotRepeated) {
