@@ -22,9 +22,6 @@ public:
         bool isFlash = false;     ///< is the owner an SPI flash?
     };
 
-    /// Without a value.
-    PropertyValues() : m_set(std::make_unique<TextSet>()) {}
-
     /// With one value.
     /// @param value the value
     /// @param owner whose it is

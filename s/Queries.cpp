@@ -70,18 +70,16 @@ void ConstraintsManager::keepOperationShortcut(const StringBase& device, const S
                                           Shortcut{isResolved ? &m_supportedDevices[block] : nullptr, block});
 }
 
-/// Keeps the way to a device's options, if the owner's are loaded. The family is always resolved.
-void ConstraintsManager::keepOptionShortcut(const StringBase& device, const StringBase& owner,
-                                            std::size_t block) {
-    StringBase key = baseNameOf(view(device));
-    key.MakeLower();
-    const auto cached = m_deviceFamilyCache.find(view(key));
-    if (block >= m_programOptionPackages.size() || !isProgramOptionTableLoaded(owner.c_str()) ||
-        cached == m_deviceFamilyCache.end() || cached->second.GetLength() == 0) {
+/// Keeps the way to a device's options. The owner's are loaded if they have a block at all, and the family is always
+/// resolved.
+void ConstraintsManager::keepOptionShortcut(const StringBase& device, std::size_t block) {
+    if (block >= m_programOptionPackages.size()) {
         return;
     }
+    StringBase key = baseNameOf(view(device));
+    key.MakeLower();
     // Families are few: their names in the list of supported ones stay near, those in the cache lie apart.
-    const std::size_t family = m_supportedDevices.position(view(cached->second));
+    const std::size_t family = m_supportedDevices.position(view(m_deviceFamilyCache.find(view(key))->second));
     if (family != m_supportedDevices.size()) {
         m_optionShortcuts.insert_or_assign(device, Shortcut{&m_supportedDevices[family], block});
     }
@@ -126,7 +124,7 @@ int ConstraintsManager::getProgramOptions(const char* device, MODE_TYPE mode, OU
     const std::size_t block =
         known != nullptr ? known->block : static_cast<std::size_t>(programOptionTableIndex(owner.c_str()));
     if (isPlain && known == nullptr) {
-        keepOptionShortcut(name, owner, block);
+        keepOptionShortcut(name, block);
     }
     return static_cast<int>(
         m_programOptionTable->mask(block, static_cast<int>(mode), static_cast<int>(output)));

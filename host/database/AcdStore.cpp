@@ -45,7 +45,8 @@ namespace {
 /// The directory that a path leads through; empty for the name of a memory file.
 [[nodiscard]] std::string_view directoryOf(std::string_view path) {
     const std::size_t slash = path.rfind('/');
-    return slash == path.npos ? std::string_view() : path.substr(0, slash == 0 ? 1 : slash);
+    // The slash of the root is its name.
+    return slash == path.npos ? std::string_view() : path.substr(0, std::max<std::size_t>(slash, 1));
 }
 
 [[nodiscard]] AcdStore::Value publicValue(const acd::Opened& opened, const acd::Value& value,

@@ -406,7 +406,7 @@ private:
     using Shortcuts = std::pmr::unordered_map<StringBase, Shortcut, TextHash, TextEqual>;
     const Shortcut* recall(const Shortcuts& shortcuts, const char* device);
     void keepOperationShortcut(const StringBase& device, const StringBase& owner, std::size_t block);
-    void keepOptionShortcut(const StringBase& device, const StringBase& owner, std::size_t block);
+    void keepOptionShortcut(const StringBase& device, std::size_t block);
     StringBase operationOwner(const StringBase& device);
     bool isProgramOptionTableLoaded(const char* name) const;
     StringBase loadedOptionOwner(const StringBase& device, const char* package);

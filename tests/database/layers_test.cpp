@@ -142,14 +142,22 @@ TEST_F(Layers, ABrokenHeaderOnTopDropsKeysOnTopOnly) {
 
 // Sizes
 
-TEST(LongestValues, AnAppendThatGrowsOverThemIsLeftOut) {
-    const auto layer = [](const char* path, const std::string& text) {
-        acd::MemorySource source(text);
-        return acd::LayerText{path, acd::readWhole(source)};
-    };
+namespace {
+
+std::vector<acd::LayerText> lowAndTop(const std::string& low, const std::string& top) {
     std::vector<acd::LayerText> layers;
-    layers.push_back(layer("low", "KEY = 1234\nKEY += 5678\n"));
-    layers.push_back(layer("top", "KEY += 9ab\nKEY += 9a\nOTHER = 12345678901\n"));
+    for (const auto& [path, text] : {std::pair("low", low), std::pair("top", top)}) {
+        acd::MemorySource source(text);
+        layers.push_back({path, acd::readWhole(source)});
+    }
+    return layers;
+}
+
+} // namespace
+
+TEST(LongestValues, AnAppendThatGrowsOverThemIsLeftOut) {
+    std::vector<acd::LayerText> layers =
+        lowAndTop("KEY = 1234\nKEY += 5678\n", "KEY += 9ab\nKEY += 9a\nOTHER = 12345678901\n");
     std::vector<acd::LayerFault> faults;
     const acd::Database database(std::move(layers), faults, 10);
 
@@ -161,6 +169,18 @@ TEST(LongestValues, AnAppendThatGrowsOverThemIsLeftOut) {
     EXPECT_EQ(faults[0].fault.place.line, 1U);
     EXPECT_EQ(faults[0].fault.place.column, 8U);
     EXPECT_EQ(acd::describe(faults[0].fault), "the value would grow over 1 GiB by '9ab'");
+}
+
+TEST(LongestValues, WhatALayerHidesIsLeftOutInSilence) {
+    std::vector<acd::LayerText> layers = lowAndTop("KEY = 1234\nKEY += 5678\nKEY += 9a\n", "KEY = a\n");
+    std::vector<acd::LayerFault> faults;
+    const acd::Database database(std::move(layers), faults, 8);
+
+    const acd::Value& value = *database.find(nullptr, "KEY");
+    EXPECT_EQ(value.text(), "a");
+    ASSERT_EQ(database.replaced(value).size(), 1U);
+    EXPECT_EQ(database.replaced(value).front().text(), "12345678");
+    EXPECT_THAT(faults, IsEmpty());
 }
 
 namespace {

@@ -5,6 +5,7 @@
 #include <array>
 #include <cstdio>
 
+#include <dlfcn.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -177,6 +178,50 @@ TEST_F(InstalledDatabases, AreNotLookedForBesideABareName) {
 }
 
 // The library itself, from another process: it must look around its own file, not around the program's.
+
+namespace {
+
+enum class Loader { AS_IT_IS, UNKNOWING, NAMELESS };
+
+/// What the loader makes of the question which file this code is from.
+Loader& loader() {
+    static Loader loader = Loader::AS_IT_IS;
+    return loader;
+}
+
+} // namespace
+
+extern "C" {
+
+// The names that the linker gives (--wrap).
+// NOLINTBEGIN(bugprone-reserved-identifier)
+
+int __real_dladdr(const void* address, Dl_info* information);
+
+int __wrap_dladdr(const void* address, Dl_info* information) {
+    if (loader() == Loader::UNKNOWING) {
+        return 0;
+    }
+    const int result = __real_dladdr(address, information);
+    if (loader() == Loader::NAMELESS) {
+        information->dli_fname = nullptr;
+    }
+    return result;
+}
+
+// NOLINTEND(bugprone-reserved-identifier)
+
+} // extern "C"
+
+TEST_F(SearchPaths, AreEmptyWhereTheLoaderCannotTellTheLibrarysPlace) {
+    for (const Loader answer : {Loader::UNKNOWING, Loader::NAMELESS}) {
+        loader() = answer;
+        EXPECT_THAT(acd::defaultSearchPath().directories, IsEmpty());
+        EXPECT_THAT(acd::defaultSearchPath().tried, IsEmpty());
+    }
+    loader() = Loader::AS_IT_IS;
+    EXPECT_NE(acd::defaultSearchPath().directories.size() + acd::defaultSearchPath().tried.size(), 0U);
+}
 
 class Processes : public InstalledDatabases {
 protected:

@@ -65,6 +65,28 @@ TEST(PropertySets, NamesThatMeetInTheTableStayApart) {
     }
 }
 
+// Device, underscore and key of each have the same checksum, by which they are looked up.
+TEST(PropertySets, NamesOfTheSameChecksumStayApart) {
+    ManagerOver manager(family("[dev1]\n[dev10]\nPROPERTY = PROPERTY1,stored\n[dev20]\n"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev10", "PROPERTY1")), ElementsAre("stored"));
+    const std::pair<const char*, const char*> others[] = {
+        {"dev10", "UIHZAFBK"},   // shorter
+        {"dev10", "PNPTQAIZB"},  // of the same device
+        {"dev20", "PBGVSAGRC"},  // of another, just as long
+        {"dev1", "PRVQHVAINX"}}; // just as long too, but divided one byte earlier
+    for (const auto& [device, key] : others) {
+        const std::string joined = std::string(device) + '_' + key;
+        ASSERT_EQ(StringBase(joined.c_str()).CRC32(), StringBase("dev10_PROPERTY1").CRC32());
+        EXPECT_THAT(textsOf(manager->getDeviceStringProperties(device, key)), IsEmpty());
+    }
+}
+
+TEST(PropertySets, PropertiesOfTheSameChecksumAreBothKept) {
+    ManagerOver manager(family("[dev10]\nPROPERTY = PROPERTY1,first:PNPTQAIZB,second\n"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev10", "PROPERTY1")), ElementsAre("first"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev10", "PNPTQAIZB")), ElementsAre("second"));
+}
+
 TEST(PropertySets, KeysAreCaseSensitive) {
     ManagerOver manager(family("[dev1]\nPROPERTY = K,v\n"));
     EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "k")), IsEmpty());

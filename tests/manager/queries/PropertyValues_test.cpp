@@ -104,6 +104,15 @@ TEST(PropertyValues, TheSecondLookAtTheFamilySeesBehindAnEmptyValue) {
     EXPECT_STREQ(manager->getDeviceStringProperty("dev1", "K"), "theirs");
 }
 
+TEST(PropertyValues, NoValuesAtAllAreMissing) {
+    ManagerOver manager(family("PROPERTIES = K,0\n[dev1]\nPROPERTIES = K,0\n"));
+    manager->setExceptions(false);
+    for (const char* const name : {"fam1", "dev1", "fam1", "dev1"}) {
+        EXPECT_EQ(manager->getDeviceStringProperty(name, "K"), nullptr);
+        EXPECT_THAT(manager.messages(), ElementsAre(notFound("K", name)));
+    }
+}
+
 TEST(PropertyValues, TheFamilyIsLeftAsTheOneResolvedLatest) {
     ManagerOver manager(family("PROPERTY = K,theirs\n[dev1]\nPROPERTIES = K,0\n"));
     EXPECT_STREQ(manager->getDeviceStringProperty("dev1", "K"), "theirs");
@@ -118,6 +127,12 @@ TEST(PropertyValues, AnSpiFlashAnswersFromItsCatalogue) {
     EXPECT_STREQ(manager->getDeviceStringProperty("flash1", "name"), "flash");
     EXPECT_EQ(manager->getDeviceStringProperty("FLASH1", "NAME"),
               manager->getSpiDeviceStringProperty("FLASH1", "NAME"));
+}
+
+TEST(PropertyValues, AnSpiFlashAnswersFromItsCatalogueWhateverElseIsLoaded) {
+    ManagerOver manager(family("[FLASH1]\nPROPERTY = NAME,ordinary\n"));
+    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("FLASH1", "NAME")), ElementsAre("ordinary"));
+    EXPECT_STREQ(manager->getDeviceStringProperty("FLASH1", "NAME"), "flash");
 }
 
 TEST(PropertyValues, AnSpiFlashWithoutThePropertyIsEmptyAndSilent) {

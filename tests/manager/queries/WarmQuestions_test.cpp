@@ -117,6 +117,44 @@ TEST(WarmQuestions, FollowAFamilyThatIsSeededLater) {
     EXPECT_FALSE(mayProgram(manager, "dev1"));
 }
 
+TEST(WarmQuestions, OfAFamilyThatIsSeededWithAnotherAnswerAlike) {
+    // "fam3" is no supported family, but counts as "fam2": what is asked about "dev4" is answered for that.
+    Files databases = DATABASES;
+    databases["fam3.acd"] = "OPERATION = ERASE,Bscan,USB2\n[dev4]\n";
+    const ManagerOver manager(std::move(databases));
+    manager->setExceptions(false);
+    manager->addCachedDeviceFamily("fam3", "fam2");
+    EXPECT_EQ(operations(manager, "dev3"), VERIFY);
+    const int first = operations(manager, "dev4");
+    manager.peer().partFamily() = "something else";
+    EXPECT_EQ(operations(manager, "dev4"), first);
+    EXPECT_STREQ(manager.peer().partFamily().c_str(), "fam2");
+}
+
+TEST(WarmQuestions, AboutADeviceOfAFamilyWithoutADatabaseAnswerAlike) {
+    const ManagerOver manager(DATABASES);
+    manager->setExceptions(false);
+    manager->addCachedDeviceFamily("dev1", "nowhere");
+    for (int time = 0; time != 3; ++time) {
+        EXPECT_EQ(operations(manager, "dev1"), 0);
+        EXPECT_EQ(options(manager, "dev1"), 0);
+        EXPECT_FALSE(mayProgram(manager, "dev1"));
+    }
+}
+
+TEST(WarmQuestions, AboutTheEmptyNameAreAnsweredForTheFamilyOfThatName) {
+    // An empty item is a name like any other.
+    const ManagerOver manager(
+        Files{{"base.acd",
+               "DEVICE_SUPPORTED = ,fam1\nPROGRAM_OPTION_PACKAGE = ,fam1\nOPERATION = VERIFY,Bscan,USB2\n"},
+              {"fam1.acd", "OPERATION = PROGRAM,Bscan,USB2\n[dev1]\n"}});
+    manager->setExceptions(false);
+    for (const char* const name : {"", "", "_p", "_p"}) {
+        EXPECT_EQ(operations(manager, name), 0) << name;
+    }
+    EXPECT_EQ(operations(manager, "dev1"), PROGRAM);
+}
+
 TEST(WarmQuestions, FindTheOwnPropertyWhereNamesRunTogether) {
     // "a" with "b_c" and "a_b" with "c" are stored in the same place: the one that is loaded last stands there.
     const ManagerOver manager(
