@@ -57,6 +57,16 @@ TEST(AcdLines, KeepComments) {
     EXPECT_EQ(lines.comments()[1].text, "# two");
 }
 
+TEST(AcdLines, TakeNothingButBlanksBeforeAComment) {
+    using namespace std::string_view_literals;
+    for (int byte = 0; byte < 256; ++byte) {
+        const std::string text = static_cast<char>(byte) + std::string("# one");
+        EXPECT_EQ(AcdLines(text).comments().size(),
+                  " \t\n#"sv.find(text[0]) == std::string_view::npos ? 0U : 1U)
+            << byte;
+    }
+}
+
 TEST(AcdLines, ShowTheSourceAsItStands) {
     const AcdLines lines("\xEF\xBB\xBF"
                          "A = a, \\\r\n   b\n\n");
