@@ -15,6 +15,7 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::Optional;
+using testing::SizeIs;
 using namespace std::string_view_literals;
 
 class SearchPaths : public DatabaseTest {
@@ -52,6 +53,14 @@ TEST_F(SearchPaths, OfTheEnvironmentWithoutAnyPartDoNotCount) {
     setenv("TARVIK_DATABASE", "::", 1);
     EXPECT_EQ(acd::defaultSearchPath().directories, unset.directories);
     EXPECT_EQ(acd::defaultSearchPath().tried, unset.tried);
+}
+
+TEST_F(SearchPaths, OtherwiseComeFromWhereTheCodeStands) {
+    // Here the code is part of the test program.
+    const acd::SearchPath beside = acd::installedSearchPath(std::filesystem::read_symlink("/proc/self/exe"));
+    EXPECT_THAT(beside.tried, SizeIs(2));
+    EXPECT_EQ(acd::defaultSearchPath().directories, beside.directories);
+    EXPECT_EQ(acd::defaultSearchPath().tried, beside.tried);
 }
 
 TEST_F(SearchPaths, ThatWereSetGoBeforeTheEnvironment) {
