@@ -71,6 +71,12 @@ TEST_F(Faults, ANulInAKey) { expectFault("K\0Y = a\nAFTER = ok\n"sv, 1, "1:2: NU
 
 TEST_F(Faults, ANulWithoutEqualsSign) { expectFault("\0\nAFTER = ok\n"sv, 1, "1:1: NUL byte in '\\x00'"); }
 
+TEST_F(Faults, ANulThatIsAllOfAFile) {
+    EXPECT_THAT(devicesIn("\0"sv), IsEmpty());
+    EXPECT_EQ(valueOf("kestrel", "KEY"), nullopt);
+    EXPECT_THAT(messages.take(), ElementsAre(info(1, "kestrel.acd:1:1: NUL byte in '\\x00'\n")));
+}
+
 TEST_F(Faults, ANulOnAContinuedLine) {
     expectFault("KEY = a\\\n b\0\nAFTER = ok\n"sv, 2, "2:3: NUL byte in 'KEY = ab\\x00'");
 }

@@ -63,6 +63,15 @@ TEST_F(SearchPaths, OtherwiseComeFromWhereTheCodeStands) {
     EXPECT_EQ(acd::defaultSearchPath().tried, beside.tried);
 }
 
+TEST_F(SearchPaths, ThatLeadNowhereAreNamed) {
+    const std::vector<std::string> tried = acd::defaultSearchPath().tried;
+    ASSERT_THAT(tried, SizeIs(2));
+    EXPECT_THROW(AcdReader(), DataNotFoundException);
+    EXPECT_THAT(messages.take(),
+                ElementsAre(info(acd::location::BASE_MISSING, "no base.acd in " + tried[0] + ", " + tried[1] +
+                                                                  ", and TARVIK_DATABASE is not set\n")));
+}
+
 TEST_F(SearchPaths, ThatWereSetGoBeforeTheEnvironment) {
     setenv("TARVIK_DATABASE", a.c_str(), 1);
     AcdStore::setSearchPath({b});

@@ -12,6 +12,7 @@
 
 #include <string>
 #include <utility>
+#include <vector>
 
 using Kind = AcdLines::Kind;
 
@@ -46,6 +47,25 @@ TEST(AcdLines, CountALineThatGoesOnBeforeItHoldsAnything) {
     EXPECT_EQ(lines.lines()[0].firstLine, 1U);
     EXPECT_EQ(lines.lines()[0].lastLine, 2U);
     EXPECT_TRUE(lines.comments().empty());
+}
+
+TEST(AcdLines, KnowWhereTheirNamesStand) {
+    const AcdLines lines("  A = 1\n [KS50]\nB\\\n  = 2\n[\\\n   KS75]\n\tC\\\n D = 3\n");
+    std::vector<std::pair<unsigned, unsigned>> places;
+    for (const AcdLines::Line& line : lines.lines()) {
+        places.emplace_back(line.line, line.column);
+    }
+    using testing::Pair;
+    EXPECT_THAT(places, testing::ElementsAre(Pair(1, 3), Pair(2, 3), Pair(3, 1), Pair(6, 4), Pair(7, 2)));
+}
+
+TEST(AcdLines, HaveNoFragmentsWithoutText) {
+    const AcdLines lines("A = 1\\\n  \\\n\\\n\nB = \\\n\\\n  2\n");
+    ASSERT_EQ(lines.lines().size(), 2U);
+    ASSERT_EQ(lines.lines()[0].fragments.size(), 1U);
+    EXPECT_EQ(lines.lines()[0].fragments[0].line, 1U);
+    ASSERT_EQ(lines.lines()[1].fragments.size(), 1U);
+    EXPECT_EQ(lines.lines()[1].fragments[0].line, 7U);
 }
 
 TEST(AcdLines, KeepComments) {
