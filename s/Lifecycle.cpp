@@ -1,5 +1,6 @@
 #include "Lists.h"
 #include "PermissionTable.h"
+#include "PropertyTable.h"
 #include "Reporting.h"
 #include "Vocabulary.h"
 
@@ -10,13 +11,6 @@
 #include <new>
 
 // How the one manager comes and goes, and the order in which its start-up fills it.
-
-namespace {
-
-/// The property map starts large enough for the usual session.
-constexpr std::size_t PROPERTY_BUCKETS = 193;
-
-} // namespace
 
 ConstraintsManager* ConstraintsManager::s_instance = nullptr;
 
@@ -34,7 +28,8 @@ void ConstraintsManager::RemoveConstraintsManager() {
 }
 
 ConstraintsManager::ConstraintsManager()
-    : m_deviceProperties(PROPERTY_BUCKETS), m_operationTable(std::make_unique<PermissionTable>()),
+    : m_deviceProperties(std::make_unique<PropertyTable>()),
+      m_operationTable(std::make_unique<PermissionTable>()),
       m_programOptionTable(std::make_unique<PermissionTable>()),
       m_bsdlOperationTable(std::make_unique<PermissionTable>()) {
     initialise();

@@ -5,7 +5,10 @@
 #include <PM_DEVKEY.h>
 #include <StringBase.h>
 
+#include <cstddef>
+#include <iterator>
 #include <limits>
+#include <utility>
 #include <vector>
 
 /// One record of a value whose records end at ":" and whose fields end at ",".
@@ -64,4 +67,18 @@ void forEachRecord(PM_DEVKEY& accessor, const char* key, Action action) {
         items.emplace_back(item);
     }
     return items;
+}
+
+/// Sets the value of a key in a map. Lists keep what is alike together, so most keys belong right behind the one that
+/// was set before, `latest`, which makes the search for their place short.
+/// @return the entry
+template <typename Map>
+typename Map::iterator setBehind(Map& map, typename Map::iterator latest, StringBase key, const char* value) {
+    const std::size_t former = map.size();
+    const auto place = latest == map.end() ? latest : std::next(latest);
+    const auto entry = map.emplace_hint(place, std::move(key), value);
+    if (map.size() == former) {
+        entry->second = value;
+    }
+    return entry;
 }

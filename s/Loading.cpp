@@ -1,4 +1,5 @@
 #include "Lists.h"
+#include "PropertyTable.h"
 #include "Reporting.h"
 #include "Text.h"
 
@@ -22,11 +23,37 @@ bool note(NameSequence& loaded, const StringBase& name) {
     return true;
 }
 
-StringBase propertyKey(const StringBase& owner, const StringBase& property) {
-    StringBase key = owner;
-    key += "_";
-    key += property;
-    return key;
+/// "PROPERTY": records of a name and a value.
+void readSingleProperties(PM_DEVKEY& accessor, const PropertyValues::Owner& owner, bool exceptions,
+                          std::vector<PropertyTable::Found>& found) {
+    forEachRecord(accessor, "PROPERTY", [&](const Record& record, StringBase property) {
+        const char* const value = record.field(1);
+        if (value == nullptr) {
+            reporting::raiseIf<DataMismatchException>(exceptions,
+                                                      reporting::location::PROPERTY_WITHOUT_VALUE);
+        }
+        found.push_back({std::move(property), PropertyValues(value, owner)});
+    });
+}
+
+/// "PROPERTIES": records of a name, a count and as many values.
+void readMultipleProperties(PM_DEVKEY& accessor, const PropertyValues::Owner& owner, bool exceptions,
+                            std::vector<PropertyTable::Found>& found) {
+    forEachRecord(accessor, "PROPERTIES", [&](const Record& record, StringBase property) {
+        const long count = UT_STR::AToL(record.field(1));
+        PropertyValues::TextSet values;
+        for (long index = 0; index < count; ++index) {
+            const char* const value = record.field(index + 2);
+            values.emplace_hint(values.end(), value);
+            if (value == nullptr) {
+                reporting::raiseIf<DataMismatchException>(exceptions,
+                                                          reporting::location::PROPERTIES_WITHOUT_VALUE);
+                // All fields behind the first gap are missing too, and a set holds the empty text once.
+                break;
+            }
+        }
+        found.push_back({std::move(property), PropertyValues(std::move(values), owner)});
+    });
 }
 
 } // namespace
@@ -72,57 +99,21 @@ void ConstraintsManager::loadFamilyTables(PM_DEVKEY* accessor, const char* famil
     parseBsdlOperationEntries(accessor, index, family);
 }
 
-/// Makes room for the properties of one more owner. In steps of four: moving all entries to new buckets reaches all
-/// over memory, and steps of two do it twice as often.
-void ConstraintsManager::growProperties() {
-    constexpr std::size_t USUAL_PROPERTIES = 32;
-    if (m_deviceProperties.size() + USUAL_PROPERTIES > m_deviceProperties.bucket_count()) {
-        m_deviceProperties.rehash(4 * m_deviceProperties.bucket_count());
-    }
-}
-
 void ConstraintsManager::loadProperties(PM_DEVKEY* accessor, const StringBase& owner) {
-    if (m_loadedFamilies.insert(owner).second) {
-        growProperties();
-        loadSingleProperties(accessor, owner);
-        loadMultipleProperties(accessor, owner);
+    if (!m_loadedFamilies.insert(owner).second) {
+        return;
     }
-}
-
-PropertyValues::Owner ConstraintsManager::propertyOwner(const StringBase& name) const {
-    return {static_cast<std::uint32_t>(name.GetLength()), isSpiDevice(name)};
-}
-
-/// "PROPERTY": records of a name and a value.
-void ConstraintsManager::loadSingleProperties(PM_DEVKEY* accessor, const StringBase& owner) {
-    const PropertyValues::Owner ownerEntry = propertyOwner(owner);
-    forEachRecord(*accessor, "PROPERTY", [&](const Record& record, const StringBase& property) {
-        const char* const value = record.field(1);
-        if (value == nullptr) {
-            reporting::raiseIf<DataMismatchException>(m_exceptions,
-                                                      reporting::location::PROPERTY_WITHOUT_VALUE);
-        }
-        m_deviceProperties.insert_or_assign(propertyKey(owner, property), PropertyValues(value, ownerEntry));
-    });
-}
-
-/// "PROPERTIES": records of a name, a count and as many values.
-void ConstraintsManager::loadMultipleProperties(PM_DEVKEY* accessor, const StringBase& owner) {
-    const PropertyValues::Owner ownerEntry = propertyOwner(owner);
-    forEachRecord(*accessor, "PROPERTIES", [&](const Record& record, const StringBase& property) {
-        const long count = UT_STR::AToL(record.field(1));
-        TextSet values;
-        for (long index = 0; index < count; ++index) {
-            const char* const value = record.field(index + 2);
-            values.emplace_hint(values.end(), value);
-            if (value == nullptr) {
-                reporting::raiseIf<DataMismatchException>(m_exceptions,
-                                                          reporting::location::PROPERTIES_WITHOUT_VALUE);
-                // All fields behind the first gap are missing too, and a set holds the empty text once.
-                break;
-            }
-        }
-        m_deviceProperties.insert_or_assign(propertyKey(owner, property),
-                                            PropertyValues(std::move(values), ownerEntry));
-    });
+    constexpr std::size_t USUAL_COUNT = 32;
+    std::vector<PropertyTable::Found> found;
+    found.reserve(USUAL_COUNT);
+    const PropertyValues::Owner holder{static_cast<std::uint32_t>(owner.GetLength()), isSpiDevice(owner)};
+    try {
+        readSingleProperties(*accessor, holder, m_exceptions, found);
+        readMultipleProperties(*accessor, holder, m_exceptions, found);
+    } catch (const TarvikException&) {
+        // What stands before the fault counts.
+        m_deviceProperties->assign(view(owner), std::move(found));
+        throw;
+    }
+    m_deviceProperties->assign(view(owner), std::move(found));
 }

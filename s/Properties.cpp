@@ -1,3 +1,4 @@
+#include "PropertyTable.h"
 #include "Reporting.h"
 #include "Text.h"
 
@@ -7,31 +8,11 @@
 
 // The named properties of a device: its own, or else its family's.
 
-std::size_t ConstraintsManager::PropertyKeyHash::operator()(const PropertyKey& key) const {
-    const auto owner = StringBase::CRC32(key.owner.data(), key.owner.size());
-    return StringBase::CRC32(key.property.data(), key.property.size(), StringBase::CRC32("_", 1, owner));
-}
-
-bool ConstraintsManager::PropertyKeyEqual::operator()(const PropertyKey& left,
-                                                      const StringBase& right) const noexcept {
-    const std::string_view joined = view(right);
-    const std::size_t split = left.owner.size();
-    return joined.size() == split + 1 + left.property.size() && joined.substr(0, split) == left.owner &&
-           joined[split] == '_' && joined.substr(split + 1) == left.property;
-}
-
-/// The values that are stored for an owner's property; null when there are none.
-const PropertyValues* ConstraintsManager::findStored(std::string_view owner,
-                                                     std::string_view property) const {
-    const auto found = m_deviceProperties.find(PropertyKey{owner, property});
-    return found == m_deviceProperties.end() ? nullptr : &found->second;
-}
-
-/// As `findStored`, but only when they came with this owner's data, which then is loaded: "a" and "b_c" are stored
-/// where "a_b" and "c" would be.
+/// The values that are stored for an owner's property, if they came with this owner's data, which then is loaded: "a" and
+/// "b_c" are stored where "a_b" and "c" would be.
 const PropertyValues* ConstraintsManager::findLoaded(std::string_view owner,
                                                      std::string_view property) const {
-    const PropertyValues* const values = findStored(owner, property);
+    const PropertyValues* const values = m_deviceProperties->find(owner, property);
     return values != nullptr && values->owner().length == owner.size() ? values : nullptr;
 }
 
@@ -44,7 +25,7 @@ const PropertyValues* ConstraintsManager::findProperty(const char* device, const
     if (m_loadedFamilies.find(view(name)) == m_loadedFamilies.end()) {
         loadDeviceData(name.c_str(), nullptr);
     }
-    if (const PropertyValues* const values = findStored(view(name), view(key))) {
+    if (const PropertyValues* const values = m_deviceProperties->find(view(name), view(key))) {
         return values;
     }
     const StringBase family = getPartFamily(name.c_str());
@@ -54,7 +35,7 @@ const PropertyValues* ConstraintsManager::findProperty(const char* device, const
     if (m_loadedFamilies.find(view(family)) == m_loadedFamilies.end()) {
         loadDeviceData(family.c_str(), nullptr);
     }
-    return findStored(view(family), view(key));
+    return m_deviceProperties->find(view(family), view(key));
 }
 
 const ConstraintsManager::TextSet& ConstraintsManager::getDeviceStringProperties(const char* device,

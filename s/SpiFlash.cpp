@@ -11,6 +11,7 @@
 #include <UT_STR.h>
 
 #include <memory>
+#include <utility>
 
 // The SPI flash database: how the start-up reads it, and the questions about the flashes themselves.
 
@@ -104,7 +105,7 @@ void ConstraintsManager::readSpiProperties(PM_DEVKEY* accessor) {
             }
             StringBase joined = name;
             joined += property;
-            latest = m_spiProperties.insert_or_assign(latest, joined, value);
+            latest = setBehind(m_spiProperties, latest, std::move(joined), value);
         });
     }
 }

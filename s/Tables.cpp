@@ -9,6 +9,7 @@
 
 #include <array>
 #include <limits>
+#include <utility>
 
 // What the base database says once and for all: the mode tables, the lists of names, and the size of the
 // permission tables that follows from them.
@@ -60,10 +61,9 @@ void ConstraintsManager::loadModeDeviceSets() {
 }
 
 void ConstraintsManager::loadDeviceIdcodes() {
-    // Lists keep devices of a kind together, so that most belong right beside the one before them.
     auto latest = m_deviceIdcodes.end();
-    forEachRecord(*m_devKey, "IDCODE", [&](const Record& record, const StringBase& device) {
-        latest = m_deviceIdcodes.insert_or_assign(latest, device, record.field(1));
+    forEachRecord(*m_devKey, "IDCODE", [&](const Record& record, StringBase device) {
+        latest = setBehind(m_deviceIdcodes, latest, std::move(device), record.field(1));
     });
 }
 

@@ -4,15 +4,13 @@
 
 #include <algorithm>
 #include <cstdint>
-#include <string_view>
+#include <cstring>
 
 // Operations on NUL-terminated texts.
 
 namespace {
 
-std::string_view view(const char* text) noexcept {
-    return text == nullptr ? std::string_view() : std::string_view(text);
-}
+const char* orEmpty(const char* text) noexcept { return text == nullptr ? "" : text; }
 
 bool isBlank(char byte) noexcept { return byte == ' ' || (byte >= '\t' && byte <= '\r'); }
 
@@ -20,10 +18,20 @@ bool isDigit(char byte) noexcept { return byte >= '0' && byte <= '9'; }
 
 } // namespace
 
-int UT_STR::Compare(const char* left, const char* right) noexcept { return view(left).compare(view(right)); }
+int UT_STR::Compare(const char* left, const char* right) noexcept {
+    return std::strcmp(orEmpty(left), orEmpty(right));
+}
 
 int UT_STR::ICompare(const char* left, const char* right) noexcept {
-    return ascii::compareIgnoringCase(view(left), view(right));
+    // Vocabularies are searched with it: most texts differ at once, long before their ends would be found.
+    left = orEmpty(left);
+    right = orEmpty(right);
+    while (*left != '\0' && ascii::toLower(*left) == ascii::toLower(*right)) {
+        ++left;
+        ++right;
+    }
+    return static_cast<unsigned char>(ascii::toLower(*left)) -
+           static_cast<unsigned char>(ascii::toLower(*right));
 }
 
 long UT_STR::AToL(const char* text) noexcept {

@@ -2,7 +2,6 @@
 
 #include <tarvik/NameSequence.h>
 #include <tarvik/NameSet.h>
-#include <tarvik/PropertyValues.h>
 #include <tarvik/TARVIKNS.h>
 #include <tarvik/TextHash.h>
 #include <tarvik/ltptstr.h>
@@ -21,6 +20,8 @@
 
 class PermissionTable;
 class PM_DEVKEY;
+class PropertyTable;
+class PropertyValues;
 class TarvikSmokeMgr;
 
 /// Tells a device-programming application what it may offer its user for a device.
@@ -52,7 +53,7 @@ public:
     using Texts = std::map<StringBase, StringBase, ltptstr>;
 
     /// Texts, each once, in byte order.
-    using TextSet = PropertyValues::TextSet;
+    using TextSet = std::set<StringBase, ltptstr>;
 
     ConstraintsManager(const ConstraintsManager&) = delete;
     ConstraintsManager& operator=(const ConstraintsManager&) = delete;
@@ -386,11 +387,7 @@ private:
     StringBase loadDevice(const StringBase& device, const char* package);
     void loadFamily(const StringBase& family);
     void loadFamilyTables(PM_DEVKEY* accessor, const char* family);
-    void growProperties();
     void loadProperties(PM_DEVKEY* accessor, const StringBase& owner);
-    PropertyValues::Owner propertyOwner(const StringBase& name) const;
-    void loadSingleProperties(PM_DEVKEY* accessor, const StringBase& owner);
-    void loadMultipleProperties(PM_DEVKEY* accessor, const StringBase& owner);
 
     // Checks.
     const NameSet* modeDeviceSet(TARVIKNS::MODE_TYPE mode, int location) const;
@@ -413,34 +410,12 @@ private:
     StringBase operationOwner(const StringBase& device);
     bool isProgramOptionTableLoaded(const char* name) const;
     StringBase loadedOptionOwner(const StringBase& device, const char* package);
-    const PropertyValues* findStored(std::string_view owner, std::string_view property) const;
     const PropertyValues* findLoaded(std::string_view owner, std::string_view property) const;
     const PropertyValues* findProperty(const char* device, const char* key);
 
     // Dumps.
     StringBase supportedDeviceNameAt(int position) const;
     StringBase programOptionPackageNameAt(int position) const;
-
-    /// An owner and a property, looked up as the text "owner_property" without joining them.
-    struct PropertyKey {
-        std::string_view owner;
-        std::string_view property;
-    };
-
-    /// Hashes the keys of properties by their CRC-32. Not `noexcept`, for the reason of `TextHash`.
-    struct PropertyKeyHash {
-        using is_transparent = void;
-        std::size_t operator()(const StringBase& key) const { return key.CRC32(); }
-        std::size_t operator()(const PropertyKey& key) const;
-    };
-    struct PropertyKeyEqual {
-        using is_transparent = void;
-        bool operator()(const StringBase& left, const StringBase& right) const noexcept {
-            return left == right;
-        }
-        bool operator()(const PropertyKey& left, const StringBase& right) const noexcept;
-    };
-    using Properties = std::unordered_map<StringBase, PropertyValues, PropertyKeyHash, PropertyKeyEqual>;
 
     bool m_exceptions = false;
     PM_DEVKEY* m_devKey = nullptr; ///< of the base database; lives as long as the process
@@ -474,8 +449,8 @@ private:
     TextSet m_loadedFamilies;            ///< owners whose properties are loaded
     NameSequence m_operationsLoaded;     ///< families whose operations are loaded
     NameSequence m_programOptionsLoaded; ///< owners whose program options are loaded
-    Properties m_deviceProperties;       ///< "owner_property" to values
-    Texts m_deviceFamilyCache;           ///< lower-cased base name to family
+    std::unique_ptr<PropertyTable> m_deviceProperties;
+    Texts m_deviceFamilyCache; ///< lower-cased base name to family
 
     /// Apart from all else, so that the shortcuts stand close together however much is loaded between them.
     std::pmr::unsynchronized_pool_resource m_shortcutMemory;

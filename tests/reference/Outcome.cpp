@@ -3,6 +3,8 @@
 
 #include "support/TarvikTestPeer.h"
 
+#include "PropertyTable.h"
+
 #include <tarvik/ConstraintsManager.h>
 
 #include <algorithm>
@@ -120,10 +122,9 @@ std::vector<Message> ManagerMessages::take() { return std::exchange(m_messages, 
 
 namespace {
 
-/// A hash map's entries, in order.
-template <typename Entries>
-auto ordered(const Entries& entries) {
-    std::map<StringBase, ConstraintsManager::TextSet, ltptstr> result;
+/// The entries of the table, in order of their keys.
+auto ordered(const PropertyTable& entries) {
+    std::map<std::string, ConstraintsManager::TextSet> result;
     for (const auto& [key, values] : entries) {
         result.emplace(key, values.set());
     }

@@ -58,7 +58,7 @@ public:
     auto& loadedFamilies() { return m_manager.m_loadedFamilies; }
     auto& operationsLoaded() { return m_manager.m_operationsLoaded; }
     auto& programOptionsLoaded() { return m_manager.m_programOptionsLoaded; }
-    auto& deviceProperties() { return m_manager.m_deviceProperties; }
+    const PropertyTable& deviceProperties() { return *m_manager.m_deviceProperties; }
     auto& deviceFamilyCache() { return m_manager.m_deviceFamilyCache; }
     auto& programOptionPackageIndex() { return m_manager.m_programOptionPackageIndex; }
     auto& operationOptions() { return m_manager.m_operationOptions; }

@@ -6,6 +6,7 @@
 #include "support/TarvikTestPeer.h"
 
 #include "PermissionTable.h"
+#include "PropertyTable.h"
 
 #include <AcdReader.h>
 #include <AcdStore.h>
@@ -101,6 +102,8 @@ template <typename Exception, typename Call>
     }
     return -1;
 }
+
+[[nodiscard]] inline std::string text(std::string_view value) { return std::string(value); }
 
 [[nodiscard]] inline std::string text(const StringBase& value) {
     return std::string(value.c_str(), value.GetLength());

@@ -129,20 +129,6 @@ TEST(ModeLookUp, GivesNothingWhileExceptionsAreOff) {
     EXPECT_THAT(session.messages.take(), IsEmpty());
 }
 
-TEST(PropertyTable, StartsWith193BucketsAndALoadFactorOf1) {
-    BaseSession session("");
-    EXPECT_EQ(session.peer.deviceProperties().bucket_count(), 193U);
-    EXPECT_EQ(session.peer.deviceProperties().max_load_factor(), 1.0F);
-}
-
-TEST(PropertyTable, PlacesAKeyByItsCrc32) {
-    BaseSession session("");
-    for (const char* key : {"", "KS50_FLASH", "kestrel_VENDOR", "\xff"}) {
-        EXPECT_EQ(session.peer.deviceProperties().bucket(StringBase(key)), StringBase(key).CRC32() % 193)
-            << key;
-    }
-}
-
 TEST(Members, WithoutDataAreEmpty) {
     BaseSession session("");
     TarvikTestPeer& peer = session.peer;

@@ -3,6 +3,8 @@
 #include <support/Fixtures.h>
 #include <support/TarvikTestPeer.h>
 
+#include <PropertyTable.h>
+
 #include <TarvikException.h>
 
 #include <gtest/gtest.h>
