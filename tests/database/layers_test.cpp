@@ -142,11 +142,16 @@ TEST_F(Layers, ABrokenHeaderOnTopDropsKeysOnTopOnly) {
 
 // Sizes
 
+namespace {
+
+acd::LayerText layer(const char* path, const std::string& text) {
+    acd::MemorySource source(text);
+    return {path, acd::readWhole(source)};
+}
+
+} // namespace
+
 TEST(LongestValues, AnAppendThatGrowsOverThemIsLeftOut) {
-    const auto layer = [](const char* path, const std::string& text) {
-        acd::MemorySource source(text);
-        return acd::LayerText{path, acd::readWhole(source)};
-    };
     std::vector<acd::LayerText> layers;
     layers.push_back(layer("low", "KEY = 1234\nKEY += 5678\n"));
     layers.push_back(layer("top", "KEY += 9ab\nKEY += 9a\nOTHER = 12345678901\n"));
@@ -161,6 +166,20 @@ TEST(LongestValues, AnAppendThatGrowsOverThemIsLeftOut) {
     EXPECT_EQ(faults[0].fault.place.line, 1U);
     EXPECT_EQ(faults[0].fault.place.column, 8U);
     EXPECT_EQ(acd::describe(faults[0].fault), "the value would grow over 1 GiB by '9ab'");
+}
+
+TEST(LongestValues, AnAppendThatIsHiddenIsLeftOutWithoutAWord) {
+    std::vector<acd::LayerText> layers;
+    layers.push_back(layer("low", "KEY = 1234\nKEY += 5678901\nKEY += 567890\n"));
+    layers.push_back(layer("top", "KEY = 1\n"));
+    std::vector<acd::LayerFault> faults;
+    const acd::Database database(std::move(layers), faults, 10);
+
+    const acd::Value& standing = *database.find(nullptr, "KEY");
+    EXPECT_EQ(standing.text(), "1");
+    ASSERT_EQ(database.replaced(standing).size(), 1U);
+    EXPECT_EQ(database.replaced(standing)[0].text(), "1234567890");
+    EXPECT_THAT(faults, IsEmpty());
 }
 
 namespace {
@@ -210,4 +229,6 @@ TEST_F(Layers, AreNamedByTheirDirectories) {
     EXPECT_EQ(AcdStore::value("kestrel", "A")->fragments.front().layer, directory.path("top"));
     AcdStore::setMemoryFiles({{"kestrel.acd", "A = a\n"}});
     EXPECT_EQ(AcdStore::value("kestrel", "A")->fragments.front().layer, "");
+    AcdStore::setMemoryFiles({{"/kestrel.acd", "A = a\n"}});
+    EXPECT_EQ(AcdStore::value("/kestrel", "A")->fragments.front().layer, "/");
 }
