@@ -22,8 +22,8 @@ bool isJoined(std::string_view key, std::string_view owner, std::string_view pro
 PropertyTable::PropertyTable() : m_buckets(FIRST_BUCKETS, NONE) { m_links.reserve(FIRST_BUCKETS); }
 
 const PropertyValues* PropertyTable::find(std::string_view owner, std::string_view property) const noexcept {
-    const Ordinal found = search(checksumOf(owner, property), owner, property);
-    return found == NONE ? nullptr : &m_entries[found].values;
+    const Entry* const found = search(checksumOf(owner, property), owner, property);
+    return found == nullptr ? nullptr : &found->values;
 }
 
 void PropertyTable::assign(std::string_view owner, std::vector<Found> found) {
@@ -43,16 +43,16 @@ void PropertyTable::assign(std::string_view owner, std::vector<Found> found) {
 
 void PropertyTable::assign(std::uint32_t checksum, std::string_view owner, Found& found) {
     const std::string_view property = ltptstr::view(found.name);
-    if (const Ordinal known = search(checksum, owner, property); known != NONE) {
-        m_entries[known].values = std::move(found.values);
+    if (Entry* const known = search(checksum, owner, property)) {
+        known->values = std::move(found.values);
         return;
     }
     if (m_links.size() == m_buckets.size()) {
         grow();
     }
-    m_entries.push_back({keep(owner, property), std::move(found.values)});
+    Entry& entry = m_entries.emplace_back(Entry{keep(owner, property), std::move(found.values)});
     Ordinal& first = m_buckets[bucketOf(checksum)];
-    m_links.push_back({checksum, std::exchange(first, static_cast<Ordinal>(m_links.size()))});
+    m_links.push_back({checksum, std::exchange(first, static_cast<Ordinal>(m_links.size())), &entry});
 }
 
 std::uint32_t PropertyTable::checksumOf(std::string_view owner, std::string_view property) noexcept {
@@ -60,14 +60,15 @@ std::uint32_t PropertyTable::checksumOf(std::string_view owner, std::string_view
     return StringBase::CRC32(property.data(), property.size(), start);
 }
 
-PropertyTable::Ordinal PropertyTable::search(std::uint32_t checksum, std::string_view owner,
-                                             std::string_view property) const noexcept {
-    Ordinal entry = m_buckets[bucketOf(checksum)];
-    while (entry != NONE &&
-           (m_links[entry].checksum != checksum || !isJoined(m_entries[entry].key, owner, property))) {
-        entry = m_links[entry].next;
+PropertyTable::Entry* PropertyTable::search(std::uint32_t checksum, std::string_view owner,
+                                            std::string_view property) const noexcept {
+    for (Ordinal place = m_buckets[bucketOf(checksum)]; place != NONE; place = m_links[place].next) {
+        const Link& link = m_links[place];
+        if (link.checksum == checksum && isJoined(link.entry->key, owner, property)) {
+            return link.entry;
+        }
     }
-    return entry;
+    return nullptr;
 }
 
 /// Puts "owner_property" where it stays.
@@ -85,8 +86,8 @@ void PropertyTable::grow() {
     std::vector<Ordinal> more(2 * m_buckets.size() + 1, NONE);
     m_links.reserve(more.size());
     m_buckets.swap(more);
-    for (Ordinal entry = 0; entry != m_links.size(); ++entry) {
-        Link& link = m_links[entry];
-        link.next = std::exchange(m_buckets[bucketOf(link.checksum)], entry);
+    for (Ordinal place = 0; place != m_links.size(); ++place) {
+        Link& link = m_links[place];
+        link.next = std::exchange(m_buckets[bucketOf(link.checksum)], place);
     }
 }

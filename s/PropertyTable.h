@@ -60,14 +60,15 @@ private:
     struct Link {
         std::uint32_t checksum; ///< of the entry's key
         Ordinal next;           ///< entry in the same bucket; `NONE` for the last
+        Entry* entry;
     };
 
     [[nodiscard]] static std::uint32_t checksumOf(std::string_view owner, std::string_view property) noexcept;
     [[nodiscard]] std::uint32_t bucketOf(std::uint32_t checksum) const noexcept {
         return checksum % static_cast<std::uint32_t>(m_buckets.size());
     }
-    [[nodiscard]] Ordinal search(std::uint32_t checksum, std::string_view owner,
-                                 std::string_view property) const noexcept;
+    [[nodiscard]] Entry* search(std::uint32_t checksum, std::string_view owner,
+                                std::string_view property) const noexcept;
     void assign(std::uint32_t checksum, std::string_view owner, Found& found);
     [[nodiscard]] std::string_view keep(std::string_view owner, std::string_view property);
     void grow();

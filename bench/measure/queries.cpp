@@ -2,6 +2,9 @@
 #include "measure/Ask.h"
 #include "measure/Clock.h"
 #include "measure/Results.h"
+#ifdef TARVIK_BENCHMARK_HWDB
+#include "peers/HwdbPeer.h"
+#endif
 #include "peers/JsonPeers.h"
 #include "peers/LmdbPeer.h"
 #include "peers/ManagerPeer.h"
@@ -12,6 +15,7 @@
 #include <cstdlib>
 #include <exception>
 #include <limits>
+#include <span>
 #include <stdexcept>
 #include <tuple>
 
@@ -37,10 +41,20 @@ double nanoseconds(Action action) {
     return processorNanoseconds() - start;
 }
 
-using Questions = std::vector<Question>;
+using Questions = std::span<const Question>;
+
+/// The questions that a contender is timed with.
+template <typename Peer>
+Questions asked(Questions questions) {
+    if constexpr (requires { Peer::QUESTIONS; }) {
+        return questions.first(Peer::QUESTIONS);
+    } else {
+        return questions;
+    }
+}
 
 template <typename Ask, typename Peer>
-void askAll(Peer& peer, const Questions& questions) {
+void askAll(Peer& peer, Questions questions) {
     std::uint64_t sum = 0;
     for (const Question& question : questions) {
         sum += Ask::ask(peer, question);
@@ -50,7 +64,7 @@ void askAll(Peer& peer, const Questions& questions) {
 
 /// The place of the next question depends on the answer to the one before.
 template <typename Ask, typename Peer>
-void askInTurn(Peer& peer, const Questions& questions) {
+void askInTurn(Peer& peer, Questions questions) {
     const std::uint64_t impossible = impossibleAnswer;
     std::size_t place = 0;
     while (place < questions.size()) {
@@ -61,7 +75,7 @@ void askInTurn(Peer& peer, const Questions& questions) {
 }
 
 template <typename Ask, typename Expected, typename Peer>
-void requireSameAnswers(Expected& expected, Peer& peer, const Questions& questions) {
+void requireSameAnswers(Expected& expected, Peer& peer, Questions questions) {
     for (const Question& question : questions) {
         if (Ask::ask(expected, question) != Ask::ask(peer, question)) {
             throw std::runtime_error(std::string(Peer::NAME) + " answers otherwise: " + Ask::NAME + " of " +
@@ -71,7 +85,7 @@ void requireSameAnswers(Expected& expected, Peer& peer, const Questions& questio
 }
 
 template <typename Expected, typename Peer>
-void requireSameAnswers(Expected& expected, Peer& peer, const Questions& questions) {
+void requireSameAnswers(Expected& expected, Peer& peer, Questions questions) {
     requireSameAnswers<AskOperations>(expected, peer, questions);
     requireSameAnswers<AskOptions>(expected, peer, questions);
     requireSameAnswers<AskAllows>(expected, peer, questions);
@@ -85,7 +99,7 @@ void requireSameAnswers(Expected& expected, Peer& peer, const Questions& questio
 }
 
 template <typename Ask, typename Peer>
-double allocationsEach(Peer& peer, const Questions& questions) {
+double allocationsEach(Peer& peer, Questions questions) {
     const std::size_t before = allocationsSoFar();
     askAll<Ask>(peer, questions);
     return static_cast<double>(allocationsSoFar() - before) / static_cast<double>(questions.size());
@@ -93,17 +107,18 @@ double allocationsEach(Peer& peer, const Questions& questions) {
 
 /// Asks all contenders one kind of question, in rounds, and reports the medians.
 template <typename Ask, typename... Peers>
-void compare(std::string_view size, const Questions& questions, std::tuple<Peers&...> peers) {
+void compare(std::string_view size, Questions questions, std::tuple<Peers&...> peers) {
     const std::size_t count = sizeof...(Peers);
     std::vector<std::vector<double>> independent(count);
     std::vector<std::vector<double>> dependent(count);
     for (int round = 0; round < ROUNDS; ++round) {
         std::size_t contender = 0;
         const auto time = [&](auto& peer) {
-            const auto each = static_cast<double>(questions.size());
-            askAll<Ask>(peer, questions); // the caches are this contender's again
-            independent[contender].push_back(nanoseconds([&] { askAll<Ask>(peer, questions); }) / each);
-            dependent[contender].push_back(nanoseconds([&] { askInTurn<Ask>(peer, questions); }) / each);
+            const Questions own = asked<std::remove_reference_t<decltype(peer)>>(questions);
+            const auto each = static_cast<double>(own.size());
+            askAll<Ask>(peer, own); // the caches are this contender's again
+            independent[contender].push_back(nanoseconds([&] { askAll<Ask>(peer, own); }) / each);
+            dependent[contender].push_back(nanoseconds([&] { askInTurn<Ask>(peer, own); }) / each);
             ++contender;
         };
         std::apply([&](auto&... peer) { (time(peer), ...); }, peers);
@@ -122,7 +137,7 @@ void compare(std::string_view size, const Questions& questions, std::tuple<Peers
 
 void run(const Size& size, const std::string& directory, const std::string& scratch) {
     const Facts facts = makeFacts(size, USUAL_SEED);
-    const Questions questions = makeQuestions(facts, QUESTIONS, QUESTION_SEED);
+    const std::vector<Question> questions = makeQuestions(facts, QUESTIONS, QUESTION_SEED);
     ManagerPeer manager(directory);
     manager.load(facts);
     OrderedMapPeer orderedMap(facts);
@@ -139,7 +154,13 @@ void run(const Size& size, const std::string& directory, const std::string& scra
     requireSameAnswers(orderedMap, json, questions);
     requireSameAnswers(orderedMap, onDemand, questions);
 
+#ifdef TARVIK_BENCHMARK_HWDB
+    HwdbPeer hwdb(facts, scratch);
+    requireSameAnswers(orderedMap, hwdb, questions);
+    const auto peers = std::tie(manager, orderedMap, hashMap, sqlite, lmdb, json, onDemand, hwdb);
+#else
     const auto peers = std::tie(manager, orderedMap, hashMap, sqlite, lmdb, json, onDemand);
+#endif
     compare<AskOperations>(size.name, questions, peers);
     compare<AskOptions>(size.name, questions, peers);
     compare<AskAllows>(size.name, questions, peers);
