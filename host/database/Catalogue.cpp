@@ -30,19 +30,16 @@ constexpr std::string_view ENDING = ".acd";
 }
 
 /// Reads what is in a file, unless that failed before; the first failure is reported.
-/// @return whether it was read
 template <typename Read>
-bool attempt(SourceFile& file, Reports& reports, Read read) {
+void attempt(SourceFile& file, Reports& reports, Read read) {
     if (file.isUnreadable) {
-        return false;
+        return;
     }
     try {
         read();
-        return true;
     } catch (const Unreadable& unreadable) {
         reports.add(file.path, location::FILE_UNREADABLE, unreadable.what());
         file.isUnreadable = true;
-        return false;
     }
 }
 

@@ -67,12 +67,13 @@ PM_DEVKEY::PM_DEVKEY(const acd::Database& database, const acd::Section* section)
 
 const char* PM_DEVKEY::getstringbykey(const char* key, const char* separator, short index,
                                       const char* subSeparator, short subIndex) {
-    if (key == nullptr || index < 0 || (subSeparator != nullptr && subIndex < 0)) {
+    if (key == nullptr) {
         return nullptr;
     }
     if (!isSame(m_key, key) || !isSame(m_separator, separator)) {
         select(key, orEmpty(separator));
     }
+    // A negative index becomes one that is larger than any list.
     if (m_value.empty() || !moveToItem(static_cast<std::size_t>(index))) {
         return nullptr;
     }

@@ -26,7 +26,7 @@ namespace ascii {
             return difference;
         }
     }
-    return left.size() == right.size() ? 0 : (left.size() < right.size() ? -1 : 1);
+    return static_cast<int>(left.size() > right.size()) - static_cast<int>(left.size() < right.size());
 }
 
 } // namespace ascii

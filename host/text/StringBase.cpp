@@ -75,9 +75,7 @@ void StringBase::MakeLower() noexcept {
 }
 
 void StringBase::Truncate(std::size_t length) noexcept {
-    if (length < m_text.size()) {
-        m_text.resize(length);
-    }
+    m_text.resize(std::min(length, m_text.size()));
 }
 
 int StringBase::ICompare(const StringBase& other) const noexcept {

@@ -2,6 +2,7 @@
 
 #include "text/Ascii.h"
 
+#include <algorithm>
 #include <cstdint>
 #include <cstring>
 
@@ -44,18 +45,13 @@ long UT_STR::AToL(const char* text) noexcept {
     if (*text == '-' || *text == '+') {
         ++text;
     }
-    // One past what a negative number can hold is enough to know that it saturates.
+    // What a negative number can hold at most: there it saturates.
     constexpr std::int64_t LIMIT = std::int64_t{1} << 31;
     std::int64_t number = 0;
     for (; isDigit(*text); ++text) {
-        if (number <= LIMIT) {
-            number = number * 10 + (*text - '0');
-        }
+        number = std::min(number * 10 + (*text - '0'), LIMIT);
     }
-    if (isNegative) {
-        return static_cast<long>(number > LIMIT ? -LIMIT : -number);
-    }
-    return static_cast<long>(number >= LIMIT ? LIMIT - 1 : number);
+    return static_cast<long>(isNegative ? -number : std::min(number, LIMIT - 1));
 }
 
 StringBase UT_STR::Upper(const char* text) {

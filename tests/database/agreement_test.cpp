@@ -167,6 +167,37 @@ TEST(Agreement, OfReaderAndPlainReaderOnNoise) {
     }
 }
 
+TEST(Agreement, OfScanAndReaderOnLinesThatABufferOfAnySizeCutsApart) {
+    for (const std::string text : {"",
+                                   "\n",
+                                   "[A]",
+                                   "[A]\n",
+                                   "[A]\r\n[B]\r\n",
+                                   " \t[A] \n\t [B]",
+                                   "\r[A]\n",
+                                   "x [A]\n[B]",
+                                   "a[A]\n[B]",
+                                   "[A\n[B]",
+                                   "[]\n[A]",
+                                   "[A]x\n[B]",
+                                   "[A ]\n[B]",
+                                   "\xEF\xBB\xBF[A]\n[B]",
+                                   "K = 12\n\xEF\xBB\xBF[A]\n[B]",
+                                   "\n\xEF\xBB\xBF[A]\n",
+                                   "K = 1\\\n[A]\n[B]",
+                                   "K = 1\\\r\n[A]\r\n[B]",
+                                   "[A]\\\n[B]\n[C]",
+                                   "#\\\n[A]\n[B]",
+                                   "\\\n[A]\n[B]",
+                                   "[A\\\n]\n[B]",
+                                   "K = [A]\n[B]\nL = [C]\n"}) {
+        for (std::size_t size = 1; size != 40; ++size) {
+            acd::HeaderScan scan(size);
+            ASSERT_NO_FATAL_FAILURE(expectScanAgrees(scan, text, static_cast<unsigned>(size))) << size;
+        }
+    }
+}
+
 TEST(Agreement, OfScanAndReaderOnHostileTexts) {
     HostileTexts texts(4);
     acd::HeaderScan scan;

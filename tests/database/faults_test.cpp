@@ -1,5 +1,10 @@
 #include "DatabaseFixtures.h"
 
+#include "database/Fault.h"
+
+#include <iomanip>
+#include <sstream>
+
 // What is wrong with a line costs that line and gives one message with its place; reading goes on behind it.
 
 using std::nullopt;
@@ -65,6 +70,12 @@ TEST_F(Faults, ANulInAValue) {
 TEST_F(Faults, ANulInAKey) { expectFault("K\0Y = a\nAFTER = ok\n"sv, 1, "1:2: NUL byte in 'K\\x00Y = a'"); }
 
 TEST_F(Faults, ANulWithoutEqualsSign) { expectFault("\0\nAFTER = ok\n"sv, 1, "1:1: NUL byte in '\\x00'"); }
+
+TEST_F(Faults, ANulThatIsAllOfAFile) {
+    EXPECT_THAT(devicesIn("\0"sv), IsEmpty());
+    EXPECT_EQ(valueOf("kestrel", "KEY"), nullopt);
+    EXPECT_THAT(messages.take(), ElementsAre(info(1, "kestrel.acd:1:1: NUL byte in '\\x00'\n")));
+}
 
 TEST_F(Faults, ANulOnAContinuedLine) {
     expectFault("KEY = a\\\n b\0\nAFTER = ok\n"sv, 2, "2:3: NUL byte in 'KEY = ab\\x00'");
@@ -248,4 +259,51 @@ TEST_F(Faults, MayBeReceivedByAReaderOfDatabases) {
     EXPECT_STREQ(AcdReader("A").getPM(), "kestrel");
     EXPECT_THAT(received, ElementsAre("kestrel.acd:1:1: no '=' in 'broken'\n"));
     EXPECT_EQ(familyOf("A"), nullopt);
+}
+
+namespace {
+
+/// The byte as a text shows it that a terminal would obey.
+std::string escaped(int byte) {
+    std::ostringstream text;
+    text << "\\x" << std::hex << std::setw(2) << std::setfill('0') << byte;
+    return text.str();
+}
+
+} // namespace
+
+TEST(PrintableText, EscapesControlBytes) {
+    for (int byte = 0; byte < 256; ++byte) {
+        const std::string text(1, static_cast<char>(byte));
+        const bool isControl = byte < 0x20 || byte == 0x7F;
+        EXPECT_EQ(acd::printable(text), isControl ? escaped(byte) : text) << byte;
+        EXPECT_EQ(acd::printable("a" + text + "b"), "a" + (isControl ? escaped(byte) : text) + "b") << byte;
+    }
+}
+
+TEST(PrintableText, EscapesTheControlCharactersOfUtf8) {
+    for (int byte = 0x80; byte < 0xC0; ++byte) {
+        const std::string text{'\xC2', static_cast<char>(byte)};
+        const std::string shown = byte < 0xA0 ? escaped(0xC2) + escaped(byte) : text;
+        EXPECT_EQ(acd::printable(text), shown) << byte;
+        EXPECT_EQ(acd::printable("a" + text + "b"), "a" + shown + "b") << byte;
+        const std::string letter{'\xC3', static_cast<char>(byte)};
+        EXPECT_EQ(acd::printable(letter), letter) << byte;
+    }
+}
+
+TEST(Excerpts, OfTextsThatAreNotUtf8AreCutAllTheSame) {
+    EXPECT_EQ(acd::excerpt(std::string(61, '\x80')), std::string(56, '\x80') + "...");
+    EXPECT_EQ(acd::excerpt(std::string(60, '\x80')), std::string(60, '\x80'));
+}
+
+TEST(Excerpts, AreCutBeforeTheCharacterThatTheyWouldCutApart) {
+    const std::string characters[] = {"\xC3\xA4", "\xE2\x82\xAC", "\xF0\x9F\x94\xA7"};
+    for (const std::string& character : characters) {
+        for (std::size_t left = 0; left <= character.size(); ++left) {
+            const std::string before(60 - left, 'a');
+            EXPECT_EQ(acd::excerpt(before + character + "behind"),
+                      before + (left == character.size() ? character : "") + "...");
+        }
+    }
 }

@@ -6,6 +6,7 @@
 #include <cstring>
 #include <deque>
 
+#include <fcntl.h>
 #include <unistd.h>
 
 // What the system may do while a file is read: interrupt, hand out little, fail, or show another size than before.
@@ -30,6 +31,15 @@ ssize_t scriptedRead(int descriptor, void* buffer, std::size_t size) {
         return -1;
     }
     return ::read(descriptor, buffer, std::min(size, static_cast<std::size_t>(step)));
+}
+
+/// Nothing, unless the descriptor is closed in what the process starts, blocks nobody and can only be read.
+ssize_t examiningRead(int descriptor, void*, std::size_t) {
+    const int status = ::fcntl(descriptor, F_GETFL);
+    const bool isAsWanted = (::fcntl(descriptor, F_GETFD) & FD_CLOEXEC) != 0 && (status & O_NONBLOCK) != 0 &&
+                            (status & O_ACCMODE) == O_RDONLY;
+    errno = EBADF;
+    return isAsWanted ? 0 : -1;
 }
 
 /// A file without end; nothing is written, as nobody looks.
@@ -69,6 +79,12 @@ TEST_F(FileReading, GoesOnAfterInterruptions) {
 
 TEST_F(FileReading, FailsWhenTheSystemFails) {
     EXPECT_EQ(reasonOf([&] { (void)readAll({4, -EIO}); }), "Input/output error");
+}
+
+TEST_F(FileReading, KeepsTheFileFromOtherProgramsAndBlocksNobody) {
+    acd::FileSource source(path, examiningRead);
+    char byte = 0;
+    EXPECT_EQ(reasonOf([&] { EXPECT_EQ(source.read(&byte, 1), 0U); }), "none");
 }
 
 TEST_F(FileReading, ReadsNoMoreThanIsThereWhenTheFileShrinks) {

@@ -80,6 +80,20 @@ TEST_F(Names, ANullNameIsTheEmptyName) {
     EXPECT_EQ(valueOf(nullptr, "KEY"), nullopt);
 }
 
+TEST_F(Names, ANullNameIsNoneOfThoseThereAre) {
+    std::map<std::string, std::string> files;
+    for (char name = '!'; name <= '~'; ++name) {
+        files[std::string{name} + ".acd"] = std::string{name} + " = x\n";
+    }
+    AcdStore::setMemoryFiles(std::move(files));
+    EXPECT_EQ(familyOf("~"), "~");
+    EXPECT_EQ(familyOf(nullptr), nullopt);
+    EXPECT_STREQ(AcdReader(nullptr).getPM(), "base");
+    EXPECT_EQ(AcdStore::value("~", "~")->text, "x");
+    EXPECT_EQ(AcdStore::value(nullptr, "~"), nullopt);
+    EXPECT_EQ(AcdStore::value("~", nullptr), nullopt);
+}
+
 TEST_F(Names, OddOnesFindNothing) {
     for (const char* const name :
          {"", "_", "_KS50", ".acd", "acd", "kestrel.ac", "kestrel.acd.acd", "KS50 ", " KS50", "[KS50]",

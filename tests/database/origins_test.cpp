@@ -113,6 +113,13 @@ TEST_F(Origins, TellTheSectionsValuesFromTheFamilys) {
     EXPECT_THAT(originsOf("A", "OWN"), ElementsAre("0 k.acd:2:7"));
 }
 
+TEST_F(Origins, OfAnEmptySectionAreTheFamilys) {
+    read("OWN = f\n[A]\n[B]\nKEY = b\n");
+    EXPECT_FALSE(AcdStore::value("A", "OWN")->fromSection);
+    EXPECT_FALSE(AcdStore::value("B", "OWN")->fromSection);
+    EXPECT_EQ(AcdStore::value("A", "KEY"), nullopt);
+}
+
 TEST_F(Origins, OfAnySingleByteCanBeAsked) {
     read("KEY = ab\\\n  cd\nKEY +=\nKEY += ef\n");
     const AcdStore::Value value = *AcdStore::value("k", "KEY");

@@ -16,6 +16,7 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::Optional;
+using testing::SizeIs;
 using namespace std::string_view_literals;
 
 class SearchPaths : public DatabaseTest {
@@ -53,6 +54,23 @@ TEST_F(SearchPaths, OfTheEnvironmentWithoutAnyPartDoNotCount) {
     setenv("TARVIK_DATABASE", "::", 1);
     EXPECT_EQ(acd::defaultSearchPath().directories, unset.directories);
     EXPECT_EQ(acd::defaultSearchPath().tried, unset.tried);
+}
+
+TEST_F(SearchPaths, OtherwiseComeFromWhereTheCodeStands) {
+    // Here the code is part of the test program.
+    const acd::SearchPath beside = acd::installedSearchPath(std::filesystem::read_symlink("/proc/self/exe"));
+    EXPECT_THAT(beside.tried, SizeIs(2));
+    EXPECT_EQ(acd::defaultSearchPath().directories, beside.directories);
+    EXPECT_EQ(acd::defaultSearchPath().tried, beside.tried);
+}
+
+TEST_F(SearchPaths, ThatLeadNowhereAreNamed) {
+    const std::vector<std::string> tried = acd::defaultSearchPath().tried;
+    ASSERT_THAT(tried, SizeIs(2));
+    EXPECT_THROW(AcdReader(), DataNotFoundException);
+    EXPECT_THAT(messages.take(),
+                ElementsAre(info(acd::location::BASE_MISSING, "no base.acd in " + tried[0] + ", " + tried[1] +
+                                                                  ", and TARVIK_DATABASE is not set\n")));
 }
 
 TEST_F(SearchPaths, ThatWereSetGoBeforeTheEnvironment) {

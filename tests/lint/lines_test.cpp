@@ -12,6 +12,7 @@
 
 #include <string>
 #include <utility>
+#include <vector>
 
 using Kind = AcdLines::Kind;
 
@@ -48,6 +49,25 @@ TEST(AcdLines, CountALineThatGoesOnBeforeItHoldsAnything) {
     EXPECT_TRUE(lines.comments().empty());
 }
 
+TEST(AcdLines, KnowWhereTheirNamesStand) {
+    const AcdLines lines("  A = 1\n [KS50]\nB\\\n  = 2\n[\\\n   KS75]\n\tC\\\n D = 3\n");
+    std::vector<std::pair<unsigned, unsigned>> places;
+    for (const AcdLines::Line& line : lines.lines()) {
+        places.emplace_back(line.line, line.column);
+    }
+    using testing::Pair;
+    EXPECT_THAT(places, testing::ElementsAre(Pair(1, 3), Pair(2, 3), Pair(3, 1), Pair(6, 4), Pair(7, 2)));
+}
+
+TEST(AcdLines, HaveNoFragmentsWithoutText) {
+    const AcdLines lines("A = 1\\\n  \\\n\\\n\nB = \\\n\\\n  2\n");
+    ASSERT_EQ(lines.lines().size(), 2U);
+    ASSERT_EQ(lines.lines()[0].fragments.size(), 1U);
+    EXPECT_EQ(lines.lines()[0].fragments[0].line, 1U);
+    ASSERT_EQ(lines.lines()[1].fragments.size(), 1U);
+    EXPECT_EQ(lines.lines()[1].fragments[0].line, 7U);
+}
+
 TEST(AcdLines, KeepComments) {
     const AcdLines lines("A = 1\n  # one\r\n# two");
     ASSERT_EQ(lines.comments().size(), 2U);
@@ -55,6 +75,16 @@ TEST(AcdLines, KeepComments) {
     EXPECT_EQ(lines.comments()[0].column, 3U);
     EXPECT_EQ(lines.comments()[0].text, "# one");
     EXPECT_EQ(lines.comments()[1].text, "# two");
+}
+
+TEST(AcdLines, TakeNothingButBlanksBeforeAComment) {
+    using namespace std::string_view_literals;
+    for (int byte = 0; byte < 256; ++byte) {
+        const std::string text = static_cast<char>(byte) + std::string("# one");
+        EXPECT_EQ(AcdLines(text).comments().size(),
+                  " \t\n#"sv.find(text[0]) == std::string_view::npos ? 0U : 1U)
+            << byte;
+    }
 }
 
 TEST(AcdLines, ShowTheSourceAsItStands) {

@@ -1,5 +1,9 @@
 #include "CoreFixtures.h"
 
+#include <Port_MsgManData.h>
+
+#include <stdexcept>
+
 // Which family a device belongs to: resolution, its cache, seeding, and the predicates built on them.
 
 using testing::Contains;
@@ -29,6 +33,19 @@ TEST(PartFamily, OfADeviceIsTheFamilyThatHoldsIt) {
     EXPECT_EQ(session.familyOf("KS100"), "kestrel");
     EXPECT_EQ(session.familyOf("OS1"), "Osprey");
     EXPECT_THAT(session.messages.take(), IsEmpty());
+}
+
+TEST(PartFamily, OfALookUpThatRaisesIsEmpty) {
+    const DatabaseDirectory directory;
+    directory.writeFile("base.acd", "DEVICE_SUPPORTED = kestrel\n");
+    directory.writeFile("kestrel.acd", "");
+    directory.makeDirectory("unreadable.acd");
+    ManagerSession session(directory);
+    session.peer.partFamily() = "former";
+    // The scan for devices reports what it can't read.
+    Port_MsgManData::setSink([](const Port_MsgManData::Message&) { throw std::runtime_error("no room"); });
+    EXPECT_THROW(static_cast<void>(session.manager.getPartFamily("KS50")), std::runtime_error);
+    EXPECT_EQ(text(session.peer.partFamily()), "");
 }
 
 TEST(PartFamily, IsFoundInAnyCase) {
