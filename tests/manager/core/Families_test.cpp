@@ -37,12 +37,11 @@ TEST(PartFamily, OfADeviceIsTheFamilyThatHoldsIt) {
 
 TEST(PartFamily, OfALookUpThatRaisesIsEmpty) {
     const DatabaseDirectory directory;
-    directory.writeFile("base.acd", "DEVICE_SUPPORTED = kestrel\n");
-    directory.writeFile("kestrel.acd", "");
     directory.makeDirectory("unreadable.acd");
-    ManagerSession session(directory);
+    FamilySession session;
     session.peer.partFamily() = "former";
     // The scan for devices reports what it can't read.
+    AcdStore::setSearchPath({directory.path()});
     Port_MsgManData::setSink([](const Port_MsgManData::Message&) { throw std::runtime_error("no room"); });
     EXPECT_THROW(static_cast<void>(session.manager.getPartFamily("KS50")), std::runtime_error);
     EXPECT_EQ(text(session.peer.partFamily()), "");
