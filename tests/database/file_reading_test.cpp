@@ -133,6 +133,11 @@ TEST_F(FileReading, ReadsMemoryPortionByPortion) {
     EXPECT_EQ(source.read(buffer, 3), 0U);
 }
 
+TEST_F(FileReading, AcceptsATextOfAGibibyte) {
+    const char byte = 0;
+    EXPECT_EQ(acd::MemorySource({&byte, acd::LARGEST_FILE}).expectedSize(), acd::LARGEST_FILE);
+}
+
 TEST_F(FileReading, RefusesATextOverAGibibyte) {
     const char byte = 0;
     EXPECT_EQ(reasonOf([&] {
