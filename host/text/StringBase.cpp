@@ -74,9 +74,7 @@ void StringBase::MakeLower() noexcept {
     std::transform(m_text.begin(), m_text.end(), m_text.begin(), ascii::toLower);
 }
 
-void StringBase::Truncate(std::size_t length) noexcept {
-    m_text.resize(std::min(length, m_text.size()));
-}
+void StringBase::Truncate(std::size_t length) noexcept { m_text.resize(std::min(length, m_text.size())); }
 
 int StringBase::ICompare(const StringBase& other) const noexcept {
     return ascii::compareIgnoringCase(m_text, other.m_text);
