@@ -7,6 +7,7 @@
 #include <deque>
 
 #include <fcntl.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 // What the system may do while a file is read: interrupt, hand out little, fail, or show another size than before.
@@ -52,6 +53,18 @@ std::string reasonOf(const std::function<void()>& action) {
         return unreadable.what();
     }
     return "none";
+}
+
+TEST(Directories, OneThatWasRemovedSinceItWasOpenedIsEmpty) {
+    // Not even "." is left in it, and what an earlier call failed with is none of its faults.
+    const std::string path = testing::TempDir() + "tarvik_removed_" + std::to_string(getpid());
+    ASSERT_EQ(::mkdir(path.c_str(), 0700), 0);
+    const int descriptor = ::open(path.c_str(), O_RDONLY | O_DIRECTORY);
+    ASSERT_NE(descriptor, -1);
+    ASSERT_EQ(::rmdir(path.c_str()), 0);
+    errno = EACCES;
+    EXPECT_TRUE(acd::listDirectory("/proc/self/fd/" + std::to_string(descriptor)).empty());
+    ::close(descriptor);
 }
 
 } // namespace
