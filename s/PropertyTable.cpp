@@ -1,5 +1,7 @@
 #include "PropertyTable.h"
 
+#include "Text.h"
+
 #include <StringBase.h>
 
 #include <algorithm>
@@ -32,7 +34,7 @@ void PropertyTable::assign(std::string_view owner, std::vector<Found> found) {
     for (std::size_t first = 0; first < found.size(); first += checksums.size()) {
         const std::size_t count = std::min(checksums.size(), found.size() - first);
         for (std::size_t place = 0; place != count; ++place) {
-            checksums[place] = checksumOf(owner, ltptstr::view(found[first + place].name));
+            checksums[place] = checksumOf(owner, view(found[first + place].name));
             __builtin_prefetch(&m_buckets[bucketOf(checksums[place])]);
         }
         for (std::size_t place = 0; place != count; ++place) {
@@ -42,7 +44,7 @@ void PropertyTable::assign(std::string_view owner, std::vector<Found> found) {
 }
 
 void PropertyTable::assign(std::uint32_t checksum, std::string_view owner, Found& found) {
-    const std::string_view property = ltptstr::view(found.name);
+    const std::string_view property = view(found.name);
     if (Entry* const known = search(checksum, owner, property)) {
         known->values = std::move(found.values);
         return;
