@@ -60,7 +60,7 @@ const ConstraintsManager::Shortcut* ConstraintsManager::recall(const Shortcuts& 
 /// operations goes this way; and only where the owner has the block itself, as then nothing else is resolved.
 void ConstraintsManager::keepOperationShortcut(const StringBase& device, const StringBase& owner,
                                                std::size_t block) {
-    if (block >= m_supportedDevices.size() || m_supportedDevices[block] != owner || owner.GetLength() == 0 ||
+    if (block >= m_supportedDevices.size() || m_supportedDevices[block] != owner ||
         m_loadedFamilies.find(view(owner)) == m_loadedFamilies.end() ||
         !m_operationsLoaded.contains(view(owner))) {
         return;

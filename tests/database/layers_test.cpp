@@ -228,6 +228,11 @@ TEST_F(Layers, AreNamedByTheirDirectories) {
     write("top/kestrel.acd", "A = a\n");
     search({"top"});
     EXPECT_EQ(AcdStore::value("kestrel", "A")->fragments.front().layer, directory.path("top"));
+    write("t/kestrel.acd", "A = a\n");
+    std::filesystem::current_path(directory.path());
+    AcdStore::setSearchPath({"t"});
+    EXPECT_EQ(AcdStore::value("kestrel", "A")->fragments.front().layer, "t");
+    std::filesystem::current_path("/");
     AcdStore::setMemoryFiles({{"kestrel.acd", "A = a\n"}});
     EXPECT_EQ(AcdStore::value("kestrel", "A")->fragments.front().layer, "");
 }
