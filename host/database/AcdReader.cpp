@@ -1,6 +1,7 @@
 #include <AcdReader.h>
 
 #include "database/Store.h"
+#include "text/OrEmpty.h"
 
 // Readers are thin: a reader finds its database in the store, and leaves it there.
 
@@ -20,7 +21,7 @@ AcdReader::AcdReader() {
 
 AcdReader::AcdReader(const char* name) {
     acd::Store& store = acd::Store::instance();
-    const acd::Opened opened = store.open(name == nullptr ? "" : name);
+    const acd::Opened opened = store.open(orEmpty(name));
     m_accessor = &store.accessor(opened);
     m_module = opened.family == nullptr ? NO_MODULE : opened.family->name.c_str();
 }

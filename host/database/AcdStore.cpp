@@ -1,6 +1,7 @@
 #include <AcdStore.h>
 
 #include "database/Store.h"
+#include "text/OrEmpty.h"
 
 #include <algorithm>
 #include <iterator>
@@ -63,8 +64,8 @@ namespace {
 } // namespace
 
 std::optional<AcdStore::Value> AcdStore::value(const char* name, const char* key) {
-    const acd::Opened opened = Store::instance().open(name == nullptr ? "" : name);
-    const acd::Value* const found = opened.database->find(opened.section, key == nullptr ? "" : key);
+    const acd::Opened opened = Store::instance().open(orEmpty(name));
+    const acd::Value* const found = opened.database->find(opened.section, orEmpty(key));
     if (found == nullptr) {
         return std::nullopt;
     }

@@ -2,6 +2,7 @@
 
 #include "database/Database.h"
 #include "database/Store.h"
+#include "text/OrEmpty.h"
 
 #include <algorithm>
 
@@ -9,10 +10,6 @@
 // the value of the latest key, the latest item and the latest field in it.
 
 namespace {
-
-[[nodiscard]] std::string_view orEmpty(const char* text) noexcept {
-    return text == nullptr ? std::string_view() : std::string_view(text);
-}
 
 /// Whether a text that was kept is the one given, null being the empty one. Those are a few bytes: two calls into the
 /// C library would cost more than the comparison.

@@ -1,14 +1,9 @@
 #include "TarvikException.h"
 
 #include "Port_MsgManData.h"
+#include "text/OrEmpty.h"
 
 // The exceptions. Their destructors stand here so that each type has one home, and is caught across libraries.
-
-namespace {
-
-const char* orEmpty(const char* text) noexcept { return text == nullptr ? "" : text; }
-
-} // namespace
 
 Port::Exception::~Exception() = default;
 

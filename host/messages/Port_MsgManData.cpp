@@ -1,6 +1,7 @@
 #include "Port_MsgManData.h"
 
 #include "text/Formatting.h"
+#include "text/OrEmpty.h"
 
 #include <cstdarg>
 #include <cstdio>
@@ -49,8 +50,6 @@ void send(const Port_MsgManData::Message& message) {
         sendByDefault(message);
     }
 }
-
-const char* orEmpty(const char* text) noexcept { return text == nullptr ? "" : text; }
 
 void sendDebug(std::string_view text) { send({Port_MsgManData::Channel::DEBUG, "", "", 0, "", text}); }
 

@@ -1,6 +1,7 @@
 #include "UT_STR.h"
 
 #include "text/Ascii.h"
+#include "text/OrEmpty.h"
 
 #include <algorithm>
 #include <cstdint>
@@ -9,8 +10,6 @@
 // Operations on NUL-terminated texts.
 
 namespace {
-
-const char* orEmpty(const char* text) noexcept { return text == nullptr ? "" : text; }
 
 bool isBlank(char byte) noexcept { return byte == ' ' || (byte >= '\t' && byte <= '\r'); }
 
