@@ -18,7 +18,7 @@ std::string textOf(const char* text) { return text == nullptr ? "" : text; }
 
 long decimal(const std::string& text) {
     std::size_t at = 0;
-    while (at < text.size() && (text[at] == ' ' || text[at] == '\t')) {
+    while (at < text.size() && std::string(" \t\n\v\f\r").find(text[at]) != std::string::npos) {
         ++at;
     }
     const bool negative = at < text.size() && text[at] == '-';

@@ -118,6 +118,7 @@ TEST(ReferenceVocabulary, DisplayNamesKeepTheirSpelling) {
 
 TEST(ReferenceVocabulary, NumbersAreReadUpToTheFirstOtherByte) {
     EXPECT_EQ(decimal(" -12x"), -12);
+    EXPECT_EQ(decimal("\t\n\v\f\r4"), 4);
     EXPECT_EQ(decimal("+3"), 3);
     EXPECT_EQ(decimal("- 3"), 0);
     EXPECT_EQ(decimal(""), 0);
