@@ -24,6 +24,10 @@ PROPERTY = VENDOR,a vendor whose name is longer than short texts are
 [dev1]
 PROPERTY = A_PROPERTY,a value that is longer than short texts are
 [dev2]
+[longdevicenameforoperations]
+[longdevicenameforoptions]
+[longdevicenameforchecks]
+[longdevicenameforscans]
 )"},
     {"fam2.acd", R"(
 OPERATION = VERIFY,Bscan,USB2
@@ -55,12 +59,18 @@ std::size_t allocationsWhenWarm(Question question) {
 }
 
 TEST(WarmQuestions, AboutMasksAllocateNothing) {
+    // Each name is longer than short texts are, and asked about in one way only.
     const ManagerOver manager(DATABASES);
-    EXPECT_EQ(allocationsWhenWarm([&] { EXPECT_EQ(operations(manager, "dev1"), PROGRAM); }), 0U);
-    EXPECT_EQ(allocationsWhenWarm([&] { EXPECT_EQ(options(manager, "dev1"), maskOf(0)); }), 0U);
-    EXPECT_EQ(allocationsWhenWarm([&] { EXPECT_TRUE(mayProgram(manager, "dev1")); }), 0U);
-    EXPECT_EQ(allocationsWhenWarm(
-                  [&] { EXPECT_EQ(manager->getBsdlOperations("dev1", OUTPUT_TYPE::USB2), maskOf(19)); }),
+    EXPECT_EQ(
+        allocationsWhenWarm([&] { EXPECT_EQ(operations(manager, "longdevicenameforoperations"), PROGRAM); }),
+        0U);
+    EXPECT_EQ(
+        allocationsWhenWarm([&] { EXPECT_EQ(options(manager, "longdevicenameforoptions"), maskOf(0)); }), 0U);
+    EXPECT_EQ(allocationsWhenWarm([&] { EXPECT_TRUE(mayProgram(manager, "longdevicenameforchecks")); }), 0U);
+    EXPECT_EQ(allocationsWhenWarm([&] {
+                  EXPECT_EQ(manager->getBsdlOperations("longdevicenameforscans", OUTPUT_TYPE::USB2),
+                            maskOf(19));
+              }),
               0U);
 }
 
