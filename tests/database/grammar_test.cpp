@@ -132,6 +132,11 @@ TEST_F(Continuation, HoldsNoCommentAndNoHeader) {
     EXPECT_THAT(AcdStore::devices("kestrel"), IsEmpty());
 }
 
+TEST_F(Continuation, IsNotBroughtAboutByABackslashThatIsText) {
+    EXPECT_THAT(valueIn("KEY = a\\\\\n\nOTHER = b\n", "KEY"), Optional("a\\"sv));
+    EXPECT_THAT(valueOf("kestrel", "OTHER"), Optional("b"sv));
+}
+
 TEST_F(Continuation, EndsWithABlankLine) {
     EXPECT_THAT(valueIn("KEY = a\\\n\nOTHER = b\n", "KEY"), Optional("a"sv));
     EXPECT_THAT(valueOf("kestrel", "OTHER"), Optional("b"sv));

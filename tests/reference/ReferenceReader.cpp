@@ -45,12 +45,15 @@ bool isNothing(const std::string& line) { return trim(line).empty() || trim(line
 /// A line with those that it goes on in; nothing when the file ends before the line does.
 std::optional<std::string> joinedLine(const std::vector<std::string>& lines, std::size_t& next) {
     std::string joined = lines[next++];
-    while (joined.ends_with('\\')) {
+    bool goesOn = joined.ends_with('\\');
+    while (goesOn) {
         joined = trimRight(joined.substr(0, joined.size() - 1));
         if (next == lines.size()) {
             return std::nullopt;
         }
-        joined += trimLeft(lines[next++]);
+        const std::string& more = lines[next++];
+        joined += trimLeft(more);
+        goesOn = more.ends_with('\\');
     }
     return joined;
 }

@@ -46,6 +46,10 @@ TEST(ReferenceReader, ALineGoesOnBehindABackslash) {
                 ElementsAre(Pair("A", "a,b,c"), Pair("B", "2")));
 }
 
+TEST(ReferenceReader, ABackslashThatIsTextDoesNotLetALineGoOn) {
+    EXPECT_THAT(parse("A = a\\\\\n\nB = 2\n").own, ElementsAre(Pair("A", "a\\"), Pair("B", "2")));
+}
+
 TEST(ReferenceReader, NothingIsACommentOrAHeaderInsideAContinuation) {
     EXPECT_THAT(parse("A = a\\\n#b\\\n[c]\nB = 2\n").own, ElementsAre(Pair("A", "a#b[c]"), Pair("B", "2")));
 }
