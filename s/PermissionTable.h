@@ -61,6 +61,7 @@ private:
     [[nodiscard]] bool isCell(std::size_t block, int mode, int output) const noexcept {
         return block < m_blocks && isWithin(mode, m_modes) && isWithin(output, m_outputs);
     }
+
     [[nodiscard]] std::size_t position(std::size_t block, int mode, int output) const noexcept {
         const auto modes = static_cast<std::size_t>(m_modes);
         const auto outputs = static_cast<std::size_t>(m_outputs);

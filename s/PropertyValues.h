@@ -16,10 +16,10 @@ public:
     /// Texts, each once, in byte order.
     using TextSet = std::set<StringBase, ltptstr>;
 
-    /// Who holds a property: the length of its name (the map has its text), and whether it is a flash.
+    /// Who holds a property: the length of its name (the table has its text), and whether it is a flash.
     struct Owner {
-        std::uint32_t length = 0; ///< of the owner's name, in bytes
-        bool isFlash = false;     ///< is the owner an SPI flash?
+        std::uint32_t length; ///< of the owner's name, in bytes
+        bool isFlash;         ///< is the owner an SPI flash?
     };
 
     /// With one value.
@@ -39,6 +39,7 @@ public:
 
     /// @return whose the values are
     [[nodiscard]] const Owner& owner() const noexcept { return m_owner; }
+
     /// @return whether there is no value
     [[nodiscard]] bool empty() const noexcept { return m_set != nullptr && m_set->empty(); }
 
@@ -58,8 +59,10 @@ public:
         }
         return *m_set;
     }
+
     /// @return the first value in byte order
     [[nodiscard]] auto begin() const { return set().begin(); }
+
     /// @return the end behind the last one
     [[nodiscard]] auto end() const { return set().end(); }
 

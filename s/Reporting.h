@@ -23,7 +23,6 @@ inline constexpr int OUTPUT_REFUSED_WITH_DEVICE = 249;
 inline constexpr int DEVICE_REFUSED_WITH_OUTPUT = 256;
 
 inline constexpr int PROPERTY_NOT_FOUND = 437;
-inline constexpr int DUMPED_MODE_UNKNOWN = 583;
 inline constexpr int CHECKED_MODE_UNKNOWN = 644;
 
 inline constexpr int PROPERTY_WITHOUT_VALUE = 1011;
