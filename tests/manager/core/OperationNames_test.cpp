@@ -204,7 +204,8 @@ TEST(OperationNames, ReportsNameTheirSource) {
     std::vector<std::string> origins;
     Port_MsgManData::setSink([&](const Port_MsgManData::Message& message) {
         origins.push_back(std::string(message.product) + "|" + std::string(message.source));
-        EXPECT_FALSE(message.revision.empty());
+        EXPECT_EQ(message.line, 1300);
+        EXPECT_EQ(message.revision, "1.0");
     });
     EXPECT_EQ(ConstraintsManager::operationString2Type("nonsense"), NO_OPERATION);
     EXPECT_EQ(text(ConstraintsManager::operationType2String(NO_OPERATION)), "");

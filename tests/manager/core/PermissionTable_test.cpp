@@ -58,6 +58,15 @@ TEST(PermissionTable, MaskOfAFullColumnHasNoBitAboveTheRows) {
     EXPECT_EQ(table.mask(0, 0, 0), 0x00FFFFFFU);
 }
 
+TEST(PermissionTable, HasNoMoreRowsThanAMaskHasBits) {
+    PermissionTable table(1, 40, 1, 1);
+    for (int row = 1; row < 40; ++row) {
+        table.allow(0, row, 0, 0);
+    }
+    EXPECT_EQ(table.mask(0, 0, 0), 0xFFFFFFFEU);
+    EXPECT_FALSE(table.allows(0, 32, 0, 0));
+}
+
 TEST(PermissionTable, CellsOutsideTheExtentsAreDropped) {
     PermissionTable table(2, 32, 6, 5);
     for (const std::size_t block : {std::size_t{0}, std::size_t{1}, std::size_t{2}, HUGE_BLOCK}) {

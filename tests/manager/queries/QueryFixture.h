@@ -62,6 +62,7 @@ void expectRaises(int line, Call call) {
         EXPECT_EQ(raised.line(), line);
         EXPECT_STREQ(raised.product(), "Tarvik");
         EXPECT_STREQ(raised.source(), "../s/ConstraintsManager");
+        EXPECT_STREQ(raised.revision(), "1.0");
     }
 }
 
