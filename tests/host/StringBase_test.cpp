@@ -160,6 +160,7 @@ TEST(StringBaseCase, IsThatOfTheAsciiLettersAlone) {
 TEST(StringBaseSearch, FindsTheFirstCharacterAtOrBehind) {
     const StringBase text("KS50_TQ144_X");
     EXPECT_EQ(text.GetIndexOfFirstChar('_'), 4U);
+    EXPECT_EQ(text.GetIndexOfFirstChar('K'), 0U);
     EXPECT_EQ(text.GetIndexOfFirstChar('_', 4), 4U);
     EXPECT_EQ(text.GetIndexOfFirstChar('_', 5), 10U);
     EXPECT_EQ(text.GetIndexOfFirstChar('K', 0), 0U);
