@@ -171,15 +171,16 @@ TEST(LongestValues, AnAppendThatGrowsOverThemIsLeftOut) {
     EXPECT_EQ(acd::describe(faults[0].fault), "the value would grow over 1 GiB by '9ab'");
 }
 
-TEST(LongestValues, WhatALayerHidesIsLeftOutInSilence) {
-    std::vector<acd::LayerText> layers = lowAndTop("KEY = 1234\nKEY += 5678\nKEY += 9a\n", "KEY = a\n");
+TEST(LongestValues, AnAppendThatIsHiddenIsLeftOutWithoutAWord) {
+    std::vector<acd::LayerText> layers =
+        lowAndTop("KEY = 1234\nKEY += 5678901\nKEY += 567890\n", "KEY = 1\n");
     std::vector<acd::LayerFault> faults;
-    const acd::Database database(std::move(layers), faults, 8);
+    const acd::Database database(std::move(layers), faults, 10);
 
-    const acd::Value& value = *database.find(nullptr, "KEY");
-    EXPECT_EQ(value.text(), "a");
-    ASSERT_EQ(database.replaced(value).size(), 1U);
-    EXPECT_EQ(database.replaced(value).front().text(), "12345678");
+    const acd::Value& standing = *database.find(nullptr, "KEY");
+    EXPECT_EQ(standing.text(), "1");
+    ASSERT_EQ(database.replaced(standing).size(), 1U);
+    EXPECT_EQ(database.replaced(standing)[0].text(), "1234567890");
     EXPECT_THAT(faults, IsEmpty());
 }
 
@@ -235,4 +236,6 @@ TEST_F(Layers, AreNamedByTheirDirectories) {
     std::filesystem::current_path("/");
     AcdStore::setMemoryFiles({{"kestrel.acd", "A = a\n"}});
     EXPECT_EQ(AcdStore::value("kestrel", "A")->fragments.front().layer, "");
+    AcdStore::setMemoryFiles({{"/kestrel.acd", "A = a\n"}});
+    EXPECT_EQ(AcdStore::value("/kestrel", "A")->fragments.front().layer, "/");
 }

@@ -59,6 +59,16 @@ std::size_t allocationsWhenWarm(Question question) {
 }
 
 TEST(WarmQuestions, AboutMasksAllocateNothing) {
+    const ManagerOver manager(DATABASES);
+    EXPECT_EQ(allocationsWhenWarm([&] { EXPECT_EQ(operations(manager, "dev1"), PROGRAM); }), 0U);
+    EXPECT_EQ(allocationsWhenWarm([&] { EXPECT_EQ(options(manager, "dev1"), maskOf(0)); }), 0U);
+    EXPECT_EQ(allocationsWhenWarm([&] { EXPECT_TRUE(mayProgram(manager, "dev1")); }), 0U);
+    EXPECT_EQ(allocationsWhenWarm(
+                  [&] { EXPECT_EQ(manager->getBsdlOperations("dev1", OUTPUT_TYPE::USB2), maskOf(19)); }),
+              0U);
+}
+
+TEST(WarmQuestions, AboutMasksOfLongNamesAllocateNothing) {
     // Each name is longer than short texts are, and asked about in one way only.
     const ManagerOver manager(DATABASES);
     EXPECT_EQ(
