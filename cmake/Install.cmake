@@ -38,11 +38,11 @@ if(TARGET tarvik)
   install(FILES docs/tarvik.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1 COMPONENT tool)
   install(DIRECTORY cli/schema DESTINATION ${CMAKE_INSTALL_DATADIR}/tarvik COMPONENT tool)
   # Where each shell looks for completions by itself.
-  install(FILES cli/completion/tarvik.bash RENAME tarvik
+  install(FILES cli/app/completion/tarvik.bash RENAME tarvik
     DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions COMPONENT tool)
-  install(FILES cli/completion/_tarvik
+  install(FILES cli/app/completion/_tarvik
     DESTINATION ${CMAKE_INSTALL_DATADIR}/zsh/site-functions COMPONENT tool)
-  install(FILES cli/completion/tarvik.fish
+  install(FILES cli/app/completion/tarvik.fish
     DESTINATION ${CMAKE_INSTALL_DATADIR}/fish/vendor_completions.d COMPONENT tool)
 endif()
 install(DIRECTORY database/ DESTINATION ${CMAKE_INSTALL_DATADIR}/tarvik/demonstration COMPONENT data)

@@ -2,10 +2,10 @@
 // must get one answer, in a form that can be read, and no fault may end the run.
 #include "Input.h"
 
-#include "Json.h"
-#include "Tool.h"
-#include "commands/Declarations.h"
+#include "commands/Commands.h"
+#include "query/Tool.h"
 #include "support/TarvikTestPeer.h"
+#include "text/Json.h"
 
 #include <CLI/CLI.hpp>
 

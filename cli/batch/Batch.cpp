@@ -1,10 +1,10 @@
 // `batch`: one request a line in, one answer a line out, for the whole exported interface.
-#include "commands/Declarations.h"
+#include "commands/Commands.h"
 
-#include "Tool.h"
 #include "batch/Calls.h"
 #include "batch/LineReader.h"
 #include "batch/RequestReader.h"
+#include "query/Tool.h"
 
 #include <TarvikException.h>
 #include <tarvik/ConstraintsManager.h>
@@ -69,7 +69,7 @@ private:
     bool m_ended = false;
 };
 
-Status run(Tool& tool) {
+ExitCode run(Tool& tool) {
     tool.openDatabase();
     Output& output = tool.output();
     LineReader lines(output);
@@ -84,7 +84,7 @@ Status run(Tool& tool) {
         }
     }
     output.flush();
-    return Status::YES;
+    return ExitCode::YES;
 }
 
 } // namespace

@@ -1,7 +1,7 @@
 #pragma once
 
-#include "Json.h"
-#include "Vocabulary.h"
+#include "model/Vocabulary.h"
+#include "text/Json.h"
 
 #include <TarvikSmokeMgr.h>
 #include <tarvik/ConstraintsManager.h>

@@ -1,7 +1,7 @@
 // The exported interface as a table: one row for each method, and the rules that match requests with rows.
-#include "Calls.h"
+#include "batch/Calls.h"
 
-#include "Nearest.h"
+#include "text/Suggest.h"
 
 #include <fmt/format.h>
 #include <fmt/ranges.h>

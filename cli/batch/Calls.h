@@ -1,8 +1,8 @@
 #pragma once
 
-#include "Json.h"
-#include "RequestReader.h"
 #include "batch/Binding.h"
+#include "batch/RequestReader.h"
+#include "text/Json.h"
 
 #include <string>
 

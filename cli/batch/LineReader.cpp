@@ -1,8 +1,8 @@
 // Buffered reading by hand: iostreams can't tell whether a read would wait, and answers must not wait then.
-#include "LineReader.h"
+#include "batch/LineReader.h"
 
-#include "Output.h"
-#include "Status.h"
+#include "term/ExitCode.h"
+#include "term/Output.h"
 
 #include <cerrno>
 #include <cstring>
@@ -73,7 +73,8 @@ bool LineReader::fill() {
     }
     m_buffer.resize(kept + static_cast<std::size_t>(count < 0 ? 0 : count));
     if (count < 0) {
-        throw Failure(Status::FAULT, std::string("can't read standard input: ") + std::strerror(errno));
+        throw CommandError(ExitCode::FAULT,
+                           std::string("can't read standard input: ") + std::strerror(errno));
     }
     m_ended = count == 0;
     return !m_ended;

@@ -21,7 +21,7 @@ public:
 
     /// The next line; nothing at the end of the input, or when it would have to wait and nobody reads the
     /// output any more. What stands behind the last line end counts as a line.
-    /// @throw Failure (FAULT) when the input can't be read
+    /// @throw CommandError (FAULT) when the input can't be read
     [[nodiscard]] std::optional<Line> next();
 
 private:

@@ -1,5 +1,5 @@
 // Reads requests strictly: a name given twice or not known is a fault of the caller that must not go unseen.
-#include "RequestReader.h"
+#include "batch/RequestReader.h"
 
 #include <fmt/format.h>
 

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Json.h"
+#include "text/Json.h"
 
 #include <string>
 #include <string_view>

@@ -1,10 +1,10 @@
 // `check`: may it be done? Answered by exactly the one check of the manager that takes what was given.
-#include "commands/Declarations.h"
+#include "commands/Commands.h"
 
-#include "Catalogue.h"
-#include "Tool.h"
-#include "Verdict.h"
-#include "Vocabulary.h"
+#include "model/Catalogue.h"
+#include "model/Vocabulary.h"
+#include "query/Tool.h"
+#include "term/Verdict.h"
 
 #include <tarvik/ConstraintsManager.h>
 
@@ -58,12 +58,12 @@ void requireCheck(const Question& question) {
     if (possible) {
         return;
     }
-    throw Failure(Status::FAULT, "check takes one of these:\n"
-                                 "  --mode M --output O\n"
-                                 "  DEVICE --mode M [--package P]\n"
-                                 "  DEVICE --mode M --output O [--package P]\n"
-                                 "  DEVICE --mode M --output O --operation OP\n"
-                                 "  DEVICE --mode M --operation OP");
+    throw CommandError(ExitCode::FAULT, "check takes one of these:\n"
+                                        "  --mode M --output O\n"
+                                        "  DEVICE --mode M [--package P]\n"
+                                        "  DEVICE --mode M --output O [--package P]\n"
+                                        "  DEVICE --mode M --output O --operation OP\n"
+                                        "  DEVICE --mode M --operation OP");
 }
 
 /// The one check that takes what was given.
@@ -112,14 +112,14 @@ Json inJson(const Question& question) {
             {"operation", keyOrNull(question.operation)}};
 }
 
-Status run(Tool& tool, const Arguments& arguments) {
+ExitCode run(Tool& tool, const Arguments& arguments) {
     const Question question = read(arguments);
     requireCheck(question);
     ConstraintsManager& manager = tool.manager();
     const bool allowed = ask(manager, question);
     const bool known = !question.device || manager.isKorvelDevice(question.device->c_str());
-    const Status status = tool.answer(Verdict{allowed, inWords(question), inJson(question)},
-                                      allowed ? Status::YES : Status::NO);
+    const ExitCode status = tool.answer(Verdict{allowed, inWords(question), inJson(question)},
+                                        allowed ? ExitCode::YES : ExitCode::NO);
     if (!known) {
         tool.note(catalogue::unknownDevice(*question.device).what());
     }

@@ -1,11 +1,11 @@
 // `devices`: the devices of the database, with family and IDCODE.
-#include "commands/Declarations.h"
+#include "commands/Commands.h"
 
-#include "Catalogue.h"
-#include "Idcodes.h"
-#include "Nearest.h"
-#include "Table.h"
-#include "Tool.h"
+#include "model/Catalogue.h"
+#include "model/Idcodes.h"
+#include "query/Tool.h"
+#include "term/Table.h"
+#include "text/Suggest.h"
 
 #include <tarvik/ConstraintsManager.h>
 
@@ -72,13 +72,13 @@ std::vector<std::string> deviceNames(const std::string& wantedFamily) {
         }
     }
     if (!familyFound && !wantedFamily.empty()) {
-        throw Failure(Status::NO, fmt::format("the database has no family \"{}\" with devices{}",
-                                              wantedFamily, didYouMean(wantedFamily, families)));
+        throw CommandError(ExitCode::NO, fmt::format("the database has no family \"{}\" with devices{}",
+                                                     wantedFamily, didYouMean(wantedFamily, families)));
     }
     return names;
 }
 
-Status run(Tool& tool, const Arguments& arguments) {
+ExitCode run(Tool& tool, const Arguments& arguments) {
     ConstraintsManager& manager = tool.manager();
     const IdcodeFinder idcodes(manager);
     Devices devices;
@@ -88,10 +88,10 @@ Status run(Tool& tool, const Arguments& arguments) {
         }
     }
     if (devices.empty()) {
-        throw Failure(Status::NO, arguments.glob.empty()
-                                      ? "there is no such device"
-                                      : fmt::format("no device matches \"{}\"{}", arguments.glob,
-                                                    didYouMean(arguments.glob, catalogue::names())));
+        throw CommandError(ExitCode::NO, arguments.glob.empty()
+                                             ? "there is no such device"
+                                             : fmt::format("no device matches \"{}\"{}", arguments.glob,
+                                                           didYouMean(arguments.glob, catalogue::names())));
     }
     return tool.answer(devices);
 }

@@ -1,8 +1,8 @@
 // `diff`: which answers two databases give differently.
-#include "commands/Declarations.h"
+#include "commands/Commands.h"
 
-#include "Tool.h"
 #include "diff/Presentation.h"
+#include "query/Tool.h"
 
 #include <CLI/CLI.hpp>
 
@@ -27,7 +27,7 @@ std::vector<std::string> layers(const std::string& text) {
         }
     }
     if (directories.empty()) {
-        throw Failure(Status::FAULT, "a database has no directory: \"" + text + '"');
+        throw CommandError(ExitCode::FAULT, "a database has no directory: \"" + text + '"');
     }
     return directories;
 }
@@ -42,11 +42,11 @@ std::string asText(const ReleaseNotes& notes, const Terminal& /*any*/) {
 }
 Json asJson(const ReleaseNotes& notes) { return diff::asJson(notes.comparison); }
 
-Status run(Tool& tool, const Arguments& arguments) {
+ExitCode run(Tool& tool, const Arguments& arguments) {
     const auto [oldFacts, newFacts] =
         diff::factsOf(layers(arguments.oldDatabase), layers(arguments.newDatabase));
     const diff::Comparison comparison = diff::compare(oldFacts, newFacts);
-    const Status status = comparison.isEmpty() ? Status::YES : Status::NO;
+    const ExitCode status = comparison.isEmpty() ? ExitCode::YES : ExitCode::NO;
     return arguments.format == "markdown" ? tool.answer(ReleaseNotes{comparison}, status)
                                           : tool.answer(comparison, status);
 }

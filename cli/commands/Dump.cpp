@@ -1,10 +1,10 @@
 // `dump`: the manager's smoke-test tables, byte for byte.
-#include "commands/Declarations.h"
+#include "commands/Commands.h"
 
-#include "Catalogue.h"
-#include "Nearest.h"
-#include "Table.h"
-#include "Tool.h"
+#include "model/Catalogue.h"
+#include "query/Tool.h"
+#include "term/Table.h"
+#include "text/Suggest.h"
 
 #include <TarvikSmokeMgr.h>
 #include <tarvik/ConstraintsManager.h>
@@ -58,12 +58,13 @@ void load(ConstraintsManager& manager, const std::string& device) {
         manager.getProgramOptions(device.c_str(), MODE_TYPE::BS, OUTPUT_TYPE::PARALLEL, nullptr));
 }
 
-Status run(Tool& tool, const Arguments& arguments) {
+ExitCode run(Tool& tool, const Arguments& arguments) {
     const auto recorded = RECORDED.find(arguments.table);
     if (recorded == RECORDED.end() && arguments.table != MULTIBOOT) {
         const std::vector<std::string> names = tableNames();
-        throw Failure(Status::FAULT, fmt::format("unknown table \"{}\"{}\ntables:\n{}", arguments.table,
-                                                 didYouMean(arguments.table, names), wrapped(names, 2)));
+        throw CommandError(ExitCode::FAULT,
+                           fmt::format("unknown table \"{}\"{}\ntables:\n{}", arguments.table,
+                                       didYouMean(arguments.table, names), wrapped(names, 2)));
     }
     ConstraintsManager& manager = tool.manager();
     for (const std::string& device : arguments.devices) {

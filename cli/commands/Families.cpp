@@ -1,10 +1,10 @@
 // `families`: the part families of the database, with the modes in which their devices may be configured.
-#include "commands/Declarations.h"
+#include "commands/Commands.h"
 
-#include "Catalogue.h"
-#include "Questions.h"
-#include "Table.h"
-#include "Tool.h"
+#include "model/Catalogue.h"
+#include "query/ManagerQueries.h"
+#include "query/Tool.h"
+#include "term/Table.h"
 
 #include <CLI/CLI.hpp>
 
@@ -37,7 +37,7 @@ Json asJson(const Families& families) {
     return {{"families", list}};
 }
 
-Status run(Tool& tool) {
+ExitCode run(Tool& tool) {
     tool.openDatabase();
     Families families;
     for (const std::string& name : catalogue::families()) {

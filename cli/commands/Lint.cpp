@@ -1,12 +1,12 @@
 // `lint`: what is wrong with a database, by file, line and column.
-#include "commands/Declarations.h"
+#include "commands/Commands.h"
 
-#include "Database.h"
-#include "Progress.h"
-#include "Table.h"
-#include "Tool.h"
-#include "lint/Ignores.h"
 #include "lint/Report.h"
+#include "lint/Suppressions.h"
+#include "query/Database.h"
+#include "query/Tool.h"
+#include "term/Progress.h"
+#include "term/Table.h"
 
 #include <CLI/CLI.hpp>
 
@@ -39,8 +39,9 @@ void requireCodes(const std::vector<std::string>& prefixes) {
             std::any_of(lint::rules().begin(), lint::rules().end(),
                         [&](const lint::Rule* rule) { return rule->code.starts_with(prefix); });
         if (prefix.empty() || !isKnown) {
-            throw Failure(Status::FAULT,
-                          fmt::format("no code begins with \"{}\"; see: tarvik lint --explain all", prefix));
+            throw CommandError(
+                ExitCode::FAULT,
+                fmt::format("no code begins with \"{}\"; see: tarvik lint --explain all", prefix));
         }
     }
 }
@@ -85,7 +86,7 @@ Json asJson(const Explanations& explanations) {
     return {{"rules", list}};
 }
 
-Status explain(Tool& tool, const Arguments& arguments) {
+ExitCode explain(Tool& tool, const Arguments& arguments) {
     const bool all =
         std::find(arguments.explained.begin(), arguments.explained.end(), "all") != arguments.explained.end();
     if (!all) {
@@ -122,10 +123,10 @@ lint::Report examine(const lint::Model& model, const Arguments& arguments) {
     return {lint::sorted(std::move(all), model)};
 }
 
-Status show(Tool& tool, const lint::Report& report, const Arguments& arguments) {
+ExitCode show(Tool& tool, const lint::Report& report, const Arguments& arguments) {
     const bool isRefused =
         report.count(lint::Level::ERROR) != 0 || (arguments.strict && !report.findings.empty());
-    const Status status = isRefused ? Status::NO : Status::YES;
+    const ExitCode status = isRefused ? ExitCode::NO : ExitCode::YES;
     if (arguments.format == "text") {
         if (!report.findings.empty()) {
             tool.note(summary(report));
@@ -145,7 +146,7 @@ Status show(Tool& tool, const lint::Report& report, const Arguments& arguments) 
     return status;
 }
 
-Status run(Tool& tool, const Arguments& arguments) {
+ExitCode run(Tool& tool, const Arguments& arguments) {
     requireCodes(arguments.selected);
     requireCodes(arguments.ignored);
     if (!arguments.explained.empty()) {

@@ -1,10 +1,10 @@
 // `operations`, `options` and `bsdl`: the names that the manager's masks stand for.
-#include "commands/Declarations.h"
+#include "commands/Commands.h"
 
-#include "Questions.h"
-#include "Table.h"
-#include "Tool.h"
-#include "Vocabulary.h"
+#include "model/Vocabulary.h"
+#include "query/ManagerQueries.h"
+#include "query/Tool.h"
+#include "term/Table.h"
 
 #include <tarvik/ConstraintsManager.h>
 
@@ -65,16 +65,16 @@ void addOptions(Members& members, const ConstraintsManager& manager) {
 }
 
 /// Shows the members; an empty list says so beside the answer, lest it be taken for a failure.
-Status show(Tool& tool, const Arguments& arguments, const Members& members) {
+ExitCode show(Tool& tool, const Arguments& arguments, const Members& members) {
     questions::requireKnown(tool.manager(), arguments.device);
-    const Status status = tool.answer(members);
+    const ExitCode status = tool.answer(members);
     if (members.keys.empty()) {
         tool.note(fmt::format("\"{}\" offers no {} there", arguments.device, members.kind));
     }
     return status;
 }
 
-Status runOperations(Tool& tool, const Arguments& arguments) {
+ExitCode runOperations(Tool& tool, const Arguments& arguments) {
     const TARVIKNS::MODE_TYPE mode = vocabulary::readMode(arguments.mode);
     const TARVIKNS::OUTPUT_TYPE output = vocabulary::readOutput(arguments.output);
     ConstraintsManager& manager = tool.manager();
@@ -88,7 +88,7 @@ Status runOperations(Tool& tool, const Arguments& arguments) {
     return show(tool, arguments, members);
 }
 
-Status runOptions(Tool& tool, const Arguments& arguments) {
+ExitCode runOptions(Tool& tool, const Arguments& arguments) {
     const TARVIKNS::MODE_TYPE mode = vocabulary::readMode(arguments.mode);
     const TARVIKNS::OUTPUT_TYPE output = vocabulary::readOutput(arguments.output);
     const char* const package = arguments.package ? arguments.package->c_str() : nullptr;
@@ -105,7 +105,7 @@ Status runOptions(Tool& tool, const Arguments& arguments) {
     return show(tool, arguments, members);
 }
 
-Status runBsdl(Tool& tool, const Arguments& arguments) {
+ExitCode runBsdl(Tool& tool, const Arguments& arguments) {
     const TARVIKNS::OUTPUT_TYPE output = vocabulary::readOutput(arguments.output);
     ConstraintsManager& manager = tool.manager();
     Members members{{{"device", arguments.device}, {"output", vocabulary::key(output)}},

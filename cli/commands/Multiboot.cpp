@@ -1,12 +1,12 @@
 // `multiboot`: does a device support a multiboot arrangement?
-#include "commands/Declarations.h"
+#include "commands/Commands.h"
 
-#include "Catalogue.h"
-#include "Multiboot.h"
-#include "Nearest.h"
-#include "Table.h"
-#include "Tool.h"
-#include "Verdict.h"
+#include "model/Catalogue.h"
+#include "model/Multiboot.h"
+#include "query/Tool.h"
+#include "term/Table.h"
+#include "term/Verdict.h"
+#include "text/Suggest.h"
 
 #include <tarvik/ConstraintsManager.h>
 
@@ -35,8 +35,9 @@ const std::string& readWord(const char* kind, const std::vector<std::string>& wo
                                     [&](const std::string& word) { return sameWithoutCase(word, text); });
     if (found == words.end()) {
         others.insert(others.end(), words.begin(), words.end());
-        throw Failure(Status::FAULT, fmt::format("unknown multiboot {} \"{}\"{}\n{}s, in any case:\n{}", kind,
-                                                 text, didYouMean(text, others), kind, wrapped(words, 2)));
+        throw CommandError(ExitCode::FAULT,
+                           fmt::format("unknown multiboot {} \"{}\"{}\n{}s, in any case:\n{}", kind, text,
+                                       didYouMean(text, others), kind, wrapped(words, 2)));
     }
     return *found;
 }
@@ -54,9 +55,10 @@ const std::string& readType(const std::string& text) {
     return readWord("type", multiboot::TYPES, text, shortTypes);
 }
 
-Status run(Tool& tool, const Arguments& arguments) {
+ExitCode run(Tool& tool, const Arguments& arguments) {
     if (!arguments.lead && !arguments.chain) {
-        throw Failure(Status::FAULT, "multiboot takes --lead or --chain\nsee: tarvik multiboot --help");
+        throw CommandError(ExitCode::FAULT,
+                           "multiboot takes --lead or --chain\nsee: tarvik multiboot --help");
     }
     const std::string& type = readType(arguments.type);
     const std::string& width = readWord("width", multiboot::WIDTHS, arguments.width);
@@ -69,7 +71,7 @@ Status run(Tool& tool, const Arguments& arguments) {
         supported,
         fmt::format("{} as {} device of {} {}", arguments.device, position, type, width),
         {{"device", arguments.device}, {"type", type}, {"width", width}, {"position", position}}};
-    const Status status = tool.answer(verdict, supported ? Status::YES : Status::NO);
+    const ExitCode status = tool.answer(verdict, supported ? ExitCode::YES : ExitCode::NO);
     if (!known) {
         tool.note(catalogue::unknownDevice(arguments.device).what());
     }

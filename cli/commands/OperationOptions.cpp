@@ -1,9 +1,9 @@
 // `operation-options`: the options that an operation of a device carries in a mode.
-#include "commands/Declarations.h"
+#include "commands/Commands.h"
 
-#include "Questions.h"
-#include "Tool.h"
-#include "Vocabulary.h"
+#include "model/Vocabulary.h"
+#include "query/ManagerQueries.h"
+#include "query/Tool.h"
 
 #include <tarvik/ConstraintsManager.h>
 
@@ -43,7 +43,7 @@ Json asJson(const OperationOptions& answer) {
             {"options", answer.options}};
 }
 
-Status run(Tool& tool, const Arguments& arguments) {
+ExitCode run(Tool& tool, const Arguments& arguments) {
     const TARVIKNS::MODE_TYPE mode = vocabulary::readMode(arguments.mode);
     // Properties are named by the key of an operation, whatever text stood for it.
     const std::string& operation = vocabulary::key(vocabulary::readOperation(arguments.operation));
@@ -54,7 +54,7 @@ Status run(Tool& tool, const Arguments& arguments) {
         answer.options.push_back(plain(option));
     }
     questions::requireKnown(manager, arguments.device);
-    const Status status = tool.answer(answer);
+    const ExitCode status = tool.answer(answer);
     if (answer.options.empty()) {
         tool.note(fmt::format("{} of \"{}\" carries no options in mode {}", operation, arguments.device,
                               answer.mode));

@@ -1,9 +1,9 @@
 // `property`: the values of a property of a device.
-#include "commands/Declarations.h"
+#include "commands/Commands.h"
 
-#include "Properties.h"
-#include "Questions.h"
-#include "Tool.h"
+#include "query/ManagerQueries.h"
+#include "query/Properties.h"
+#include "query/Tool.h"
 
 #include <tarvik/ConstraintsManager.h>
 
@@ -35,7 +35,7 @@ std::vector<std::string> values(ConstraintsManager& manager, const char* device,
     return all.empty() ? std::vector<std::string>{value} : all;
 }
 
-Status run(Tool& tool, const Arguments& arguments) {
+ExitCode run(Tool& tool, const Arguments& arguments) {
     ConstraintsManager& manager = tool.manager();
     const std::string& device = arguments.device;
     const PropertyAnswer answer{device, arguments.key,

@@ -1,8 +1,8 @@
 // `report`: a page about all devices, to look at in a browser.
-#include "commands/Declarations.h"
+#include "commands/Commands.h"
 
-#include "Tool.h"
-#include "report/File.h"
+#include "query/Tool.h"
+#include "report/AtomicFile.h"
 #include "report/Page.h"
 
 #include <CLI/CLI.hpp>
@@ -38,11 +38,12 @@ struct Shown {
 std::string asText(const Shown& shown, const Terminal& /*any*/) { return shown.page.html(); }
 
 Json asJson(const Shown& /*shown*/) {
-    throw Failure(Status::FAULT, "with --json, report takes a file: -o - and the JSON object both go to "
-                                 "standard output\nsee: tarvik report --help");
+    throw CommandError(ExitCode::FAULT,
+                       "with --json, report takes a file: -o - and the JSON object both go to "
+                       "standard output\nsee: tarvik report --help");
 }
 
-Status run(Tool& tool, const std::string& file) {
+ExitCode run(Tool& tool, const std::string& file) {
     tool.openDatabase();
     report::Page page;
     report::survey(tool, [&](const report::Subject& subject) { page.add(subject); });

@@ -1,10 +1,10 @@
 // `show`: everything about one device, to read or to process.
-#include "commands/Declarations.h"
+#include "commands/Commands.h"
 
-#include "DeviceSheet.h"
-#include "Table.h"
-#include "Tool.h"
-#include "Vocabulary.h"
+#include "model/Vocabulary.h"
+#include "query/DeviceDetails.h"
+#include "query/Tool.h"
+#include "term/Table.h"
 
 #include <CLI/CLI.hpp>
 
@@ -182,7 +182,7 @@ Json asJson(const Sheet& sheet) {
             {"options", asJson(facts.options)}};
 }
 
-Status run(Tool& tool, const std::string& device) { return tool.answer(Sheet{deviceSheet(tool, device)}); }
+ExitCode run(Tool& tool, const std::string& device) { return tool.answer(Sheet{deviceSheet(tool, device)}); }
 
 } // namespace
 

@@ -1,10 +1,10 @@
 // `spi`: the SPI and BPI flashes, and their properties.
-#include "commands/Declarations.h"
+#include "commands/Commands.h"
 
-#include "Nearest.h"
-#include "Properties.h"
-#include "Table.h"
-#include "Tool.h"
+#include "query/Properties.h"
+#include "query/Tool.h"
+#include "term/Table.h"
+#include "text/Suggest.h"
 
 #include <tarvik/ConstraintsManager.h>
 
@@ -53,22 +53,22 @@ std::string asText(const Flash& flash, const Terminal& terminal) {
 
 Json asJson(const Flash& flash) { return {{"device", flash.name}, {"properties", asJson(flash.properties)}}; }
 
-Status listFlashes(Tool& tool) {
+ExitCode listFlashes(Tool& tool) {
     // The manager's start-up reads what is listed here, and says what is wrong with it.
     static_cast<void>(tool.manager());
     return tool.answer(Flashes{catalogue::flashes()});
 }
 
-Failure unknownFlash(const std::string& name) {
+CommandError unknownFlash(const std::string& name) {
     std::vector<std::string> names;
     for (const catalogue::Flash& flash : catalogue::flashes()) {
         names.push_back(flash.name);
         names.push_back(flash.family);
     }
-    return {Status::NO, fmt::format("the database has no flash \"{}\"{}", name, didYouMean(name, names))};
+    return {ExitCode::NO, fmt::format("the database has no flash \"{}\"{}", name, didYouMean(name, names))};
 }
 
-Status run(Tool& tool, const Arguments& arguments) {
+ExitCode run(Tool& tool, const Arguments& arguments) {
     if (!arguments.device) {
         return listFlashes(tool);
     }

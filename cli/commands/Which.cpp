@@ -1,11 +1,11 @@
 // `which`: the inverse of `check` and `property`: the devices for which it holds.
-#include "commands/Declarations.h"
+#include "commands/Commands.h"
 
-#include "Progress.h"
-#include "Table.h"
-#include "Tool.h"
-#include "Vocabulary.h"
-#include "why/Census.h"
+#include "model/Vocabulary.h"
+#include "query/Census.h"
+#include "query/Tool.h"
+#include "term/Progress.h"
+#include "term/Table.h"
 
 #include <TarvikException.h>
 #include <tarvik/ConstraintsManager.h>
@@ -57,11 +57,11 @@ Json asJson(const Holders& holders) {
     return object;
 }
 
-Failure usage() {
-    return {Status::FAULT, "which takes one of\n"
-                           "  --operation OP --mode M --output O\n"
-                           "  --operation OP --mode M\n"
-                           "  --property KEY=VALUE"};
+CommandError usage() {
+    return {ExitCode::FAULT, "which takes one of\n"
+                             "  --operation OP --mode M --output O\n"
+                             "  --operation OP --mode M\n"
+                             "  --property KEY=VALUE"};
 }
 
 Question readProperty(const Arguments& arguments) {
@@ -129,7 +129,7 @@ std::vector<why::Entry> askAll(Tool& tool, const Question& question) {
                           [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
 }
 
-Status run(Tool& tool, const Arguments& arguments) {
+ExitCode run(Tool& tool, const Arguments& arguments) {
     const Question question = read(arguments);
     Holders holders{asked(question), {}, {}};
     for (why::Entry& entry : askAll(tool, question)) {
@@ -139,7 +139,7 @@ Status run(Tool& tool, const Arguments& arguments) {
             holders.faults.push_back(std::move(entry.name));
         }
     }
-    const Status status = tool.answer(holders, holders.devices.empty() ? Status::NO : Status::YES);
+    const ExitCode status = tool.answer(holders, holders.devices.empty() ? ExitCode::NO : ExitCode::YES);
     if (!holders.faults.empty()) {
         tool.note(fmt::format("no answer for {} devices, the first \"{}\": see tarvik why",
                               holders.faults.size(), holders.faults.front()));

@@ -1,12 +1,12 @@
 // `why`: the answer of `check`, `options`, `bsdl` or `property`, and the records that lead to it.
-#include "commands/Declarations.h"
+#include "commands/Commands.h"
 
-#include "Catalogue.h"
-#include "Nearest.h"
-#include "Table.h"
-#include "Tool.h"
-#include "Vocabulary.h"
-#include "why/Explanation.h"
+#include "explain/Explanation.h"
+#include "model/Catalogue.h"
+#include "model/Vocabulary.h"
+#include "query/Tool.h"
+#include "term/Table.h"
+#include "text/Suggest.h"
 
 #include <tarvik/ConstraintsManager.h>
 
@@ -94,15 +94,16 @@ Question::Kind kindOf(const Arguments& arguments) {
         }
         usage += std::string("\n  ") + form.usage;
     }
-    throw Failure(Status::FAULT, usage);
+    throw CommandError(ExitCode::FAULT, usage);
 }
 
 TARVIKNS::PROGRAM_OPTION readOption(const std::string& text) {
     const std::vector<std::string>& keys = vocabulary::options();
     const auto found = std::find(keys.begin(), keys.end(), text);
     if (found == keys.end()) {
-        throw Failure(Status::FAULT, fmt::format("unknown option \"{}\"{}\noptions, in upper case:\n{}", text,
-                                                 didYouMean(text, keys), wrapped(keys, 2)));
+        throw CommandError(ExitCode::FAULT,
+                           fmt::format("unknown option \"{}\"{}\noptions, in upper case:\n{}", text,
+                                       didYouMean(text, keys), wrapped(keys, 2)));
     }
     return static_cast<TARVIKNS::PROGRAM_OPTION>(found - keys.begin());
 }
@@ -130,19 +131,19 @@ Question read(const Arguments& arguments) {
     return question;
 }
 
-Status status(Verdict verdict) {
+ExitCode status(Verdict verdict) {
     switch (verdict) {
     case Verdict::YES:
-        return Status::YES;
+        return ExitCode::YES;
     case Verdict::NO:
-        return Status::NO;
+        return ExitCode::NO;
     case Verdict::FAULT:
         break;
     }
-    return Status::FAULT;
+    return ExitCode::FAULT;
 }
 
-Status run(Tool& tool, const Arguments& arguments) {
+ExitCode run(Tool& tool, const Arguments& arguments) {
     const Question question = read(arguments);
     ConstraintsManager& manager = tool.manager();
     const Verdict verdict = why::ask(manager, question);
@@ -155,7 +156,7 @@ Status run(Tool& tool, const Arguments& arguments) {
             answer.explanation.steps.push_back(std::move(step));
         }
     }
-    const Status result = tool.answer(answer, status(verdict));
+    const ExitCode result = tool.answer(answer, status(verdict));
     if (!known) {
         tool.note(catalogue::unknownDevice(question.device).what());
     }

@@ -1,7 +1,7 @@
 // Holds the answers of two databases against each other, and tells what devices have in common once.
 #include "diff/Comparison.h"
 
-#include "diff/Wire.h"
+#include "diff/Serialization.h"
 
 #include <fmt/format.h>
 

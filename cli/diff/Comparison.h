@@ -1,6 +1,6 @@
 #pragma once
 
-#include "diff/Facts.h"
+#include "diff/Snapshot.h"
 
 #include <cstddef>
 #include <map>

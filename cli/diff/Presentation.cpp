@@ -1,8 +1,8 @@
 // How a comparison reads: what is alike for several cells of the tables is one line.
 #include "diff/Presentation.h"
 
-#include "Table.h"
-#include "Vocabulary.h"
+#include "model/Vocabulary.h"
+#include "term/Table.h"
 
 #include <fmt/format.h>
 

@@ -1,8 +1,8 @@
 #pragma once
 
-#include "Json.h"
-#include "Terminal.h"
 #include "diff/Comparison.h"
+#include "term/Terminal.h"
+#include "text/Json.h"
 
 #include <string>
 

@@ -1,7 +1,7 @@
 // Gathers findings, puts them in order, and names them in a way that outlives edits elsewhere in the file.
 #include "lint/Findings.h"
 
-#include "Nearest.h"
+#include "text/Suggest.h"
 
 #include <fmt/format.h>
 

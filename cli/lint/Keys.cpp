@@ -1,8 +1,8 @@
 // Which keys the manager reads in which file, and how it splits their values.
 #include "lint/Keys.h"
 
-#include "Multiboot.h"
-#include "Vocabulary.h"
+#include "model/Multiboot.h"
+#include "model/Vocabulary.h"
 
 #include <algorithm>
 

@@ -1,8 +1,8 @@
 // Makes the model that all rules look at: files merged as the readers merge them, every piece with its place.
 #include "lint/Model.h"
 
-#include "Nearest.h"
 #include "lint/Keys.h"
+#include "text/Suggest.h"
 
 #include <algorithm>
 #include <iterator>

@@ -1,8 +1,8 @@
 #pragma once
 
-#include "Json.h"
-#include "Terminal.h"
 #include "lint/Findings.h"
+#include "term/Terminal.h"
+#include "text/Json.h"
 
 #include <cstddef>
 #include <string>

@@ -2,7 +2,7 @@
 #include "lint/Rule.h"
 
 #include "lint/Findings.h"
-#include "lint/rules/Groups.h"
+#include "lint/rules/RuleSets.h"
 
 #include <algorithm>
 

@@ -1,8 +1,8 @@
 // The overview that the page opens with: what there is, at a glance.
 #include "report/Overview.h"
 
-#include "Vocabulary.h"
-#include "report/Text.h"
+#include "model/Vocabulary.h"
+#include "report/HtmlEscape.h"
 
 #include <fmt/format.h>
 

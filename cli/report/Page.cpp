@@ -1,9 +1,9 @@
 // Puts the sections into the frame that page.html is.
 #include "report/Page.h"
 
-#include "Vocabulary.h"
+#include "model/Vocabulary.h"
+#include "report/HtmlEscape.h"
 #include "report/PageFiles.h"
-#include "report/Text.h"
 
 #include <AcdStore.h>
 

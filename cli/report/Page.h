@@ -1,8 +1,8 @@
 #pragma once
 
-#include "report/Data.h"
+#include "report/HtmlSections.h"
 #include "report/Overview.h"
-#include "report/Parts.h"
+#include "report/PageData.h"
 
 #include <string>
 

@@ -1,11 +1,11 @@
 // Asks about all devices, in one process as far as the answers stay those of a manager that was asked nothing.
 #include "report/Survey.h"
 
-#include "Progress.h"
-#include "Tool.h"
-#include "why/Apart.h"
-#include "why/Members.h"
-#include "why/Oddities.h"
+#include "query/Apart.h"
+#include "query/DeviceList.h"
+#include "query/OrderDependentNames.h"
+#include "query/Tool.h"
+#include "term/Progress.h"
 
 #include <TarvikException.h>
 #include <tarvik/ConstraintsManager.h>
@@ -104,7 +104,7 @@ Subject askApart(Tool& tool, const why::Member& member) {
         Packed object;
         try {
             object = packed(deviceSheet(tool, member.name));
-        } catch (const Failure& failure) {
+        } catch (const CommandError& failure) {
             object["fault"] = failure.what();
         } catch (const TarvikException& fault) {
             object["fault"] = fmt::format("the database can't be read: {}", fault.what());

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "DeviceSheet.h"
+#include "query/DeviceDetails.h"
 
 #include <functional>
 #include <string>

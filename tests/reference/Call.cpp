@@ -1,5 +1,5 @@
 // Calls as values: their signatures, and how they print as C++.
-#include "reference/Call.h"
+#include "Call.h"
 
 #include <cstdio>
 #include <ostream>

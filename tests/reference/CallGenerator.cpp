@@ -1,8 +1,8 @@
 // Makes up calls of all exported methods, mostly about what random databases hold.
-#include "reference/CallGenerator.h"
+#include "CallGenerator.h"
 
-#include "reference/ReferenceReader.h"
-#include "reference/Words.h"
+#include "ReferenceReader.h"
+#include "Words.h"
 
 #include <limits>
 

@@ -1,7 +1,7 @@
 #pragma once
 
-#include "reference/Call.h"
-#include "reference/Picker.h"
+#include "Call.h"
+#include "Picker.h"
 
 namespace reference {
 

@@ -1,7 +1,7 @@
 // Puts the same calls to the manager and to the reference, and compares what comes of them.
-#include "reference/CallRunner.h"
+#include "CallRunner.h"
 
-#include "reference/Reference.h"
+#include "Reference.h"
 #include "support/TarvikTestPeer.h"
 
 #include <TarvikException.h>

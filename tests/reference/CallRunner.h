@@ -1,7 +1,7 @@
 #pragma once
 
-#include "reference/Call.h"
-#include "reference/Outcome.h"
+#include "Call.h"
+#include "Outcome.h"
 
 #include <string>
 

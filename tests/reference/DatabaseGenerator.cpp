@@ -1,8 +1,8 @@
 // Makes up databases: all files, keys and forms of lines that there are, from few words.
-#include "reference/DatabaseGenerator.h"
+#include "DatabaseGenerator.h"
 
-#include "reference/ReferenceReader.h"
-#include "reference/Words.h"
+#include "ReferenceReader.h"
+#include "Words.h"
 
 #include <functional>
 

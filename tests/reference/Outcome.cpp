@@ -1,5 +1,5 @@
 // What comes of calls, brought to one form and compared.
-#include "reference/Outcome.h"
+#include "Outcome.h"
 
 #include "support/TarvikTestPeer.h"
 

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "reference/Reference.h"
+#include "Reference.h"
 
 #include <Port_MsgManData.h>
 #include <StringBase.h>

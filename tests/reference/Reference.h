@@ -1,6 +1,6 @@
 #pragma once
 
-#include "reference/ReferenceReader.h"
+#include "ReferenceReader.h"
 
 #include <tarvik/TARVIKNS.h>
 

@@ -1,5 +1,5 @@
 // The reference's device catalogue: families, what is loaded on demand, SPI flash and multiboot.
-#include "reference/Reference.h"
+#include "Reference.h"
 
 #include <algorithm>
 

@@ -1,5 +1,5 @@
 // The reference's dumps.
-#include "reference/Reference.h"
+#include "Reference.h"
 
 namespace reference {
 

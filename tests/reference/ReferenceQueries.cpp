@@ -1,5 +1,5 @@
 // The reference's questions about one device: what it offers, and its properties.
-#include "reference/Reference.h"
+#include "Reference.h"
 
 #include <algorithm>
 

@@ -1,6 +1,6 @@
 // The reference's own reader of database files: as plain as can be, and apart from the host layer, so that a
 // fault of one can't hide in the other.
-#include "reference/ReferenceReader.h"
+#include "ReferenceReader.h"
 
 #include <algorithm>
 #include <set>

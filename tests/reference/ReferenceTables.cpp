@@ -1,5 +1,5 @@
 // The reference's start-up, its constraint tables and the entries that fill them.
-#include "reference/Reference.h"
+#include "Reference.h"
 
 #include <algorithm>
 #include <cstddef>

@@ -1,6 +1,6 @@
 // The reference's vocabulary: the key names, display names and converters, typed a second time so that a slip in
 // the manager's tables shows.
-#include "reference/Reference.h"
+#include "Reference.h"
 
 namespace reference {
 

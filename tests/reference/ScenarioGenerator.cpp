@@ -1,9 +1,9 @@
 // Random scenarios, and how a failing one is made small: by cutting its text, which needs no memory of how the
 // text was made.
-#include "reference/ScenarioGenerator.h"
+#include "ScenarioGenerator.h"
 
-#include "reference/CallGenerator.h"
-#include "reference/ReferenceReader.h"
+#include "CallGenerator.h"
+#include "ReferenceReader.h"
 
 namespace reference {
 

@@ -1,7 +1,7 @@
 #pragma once
 
-#include "reference/Call.h"
-#include "reference/DatabaseGenerator.h"
+#include "Call.h"
+#include "DatabaseGenerator.h"
 
 #include <rapidcheck.h>
 

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "reference/Picker.h"
+#include "Picker.h"
 
 #include <string>
 

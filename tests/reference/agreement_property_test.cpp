@@ -1,6 +1,6 @@
 // Holds the manager against the reference, over random databases and random sequences of calls.
-#include "reference/CallRunner.h"
-#include "reference/ScenarioGenerator.h"
+#include "CallRunner.h"
+#include "ScenarioGenerator.h"
 
 #include <gtest/gtest.h>
 #include <rapidcheck.h>

@@ -1,5 +1,5 @@
 // Manager and reference over scenarios written by hand; those that a random search finds are put here too.
-#include "reference/CallRunner.h"
+#include "CallRunner.h"
 
 #include <gtest/gtest.h>
 

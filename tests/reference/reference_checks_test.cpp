@@ -1,5 +1,5 @@
 // The reference's checks of mode, output and device.
-#include "reference/Reference.h"
+#include "Reference.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

@@ -1,6 +1,6 @@
 // The reference's dumps.
-#include "reference/BaseOnly.h"
-#include "reference/Reference.h"
+#include "BaseOnly.h"
+#include "Reference.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

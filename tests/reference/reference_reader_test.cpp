@@ -1,5 +1,5 @@
 // The reference's reader of database files.
-#include "reference/ReferenceReader.h"
+#include "ReferenceReader.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

@@ -1,6 +1,6 @@
 // The reference's converters.
-#include "reference/BaseOnly.h"
-#include "reference/Reference.h"
+#include "BaseOnly.h"
+#include "Reference.h"
 
 #include <gtest/gtest.h>
 

@@ -1,7 +1,7 @@
 // Random scenarios: that they reach what is to be compared, print as tests, and shrink.
-#include "reference/CallRunner.h"
-#include "reference/Reference.h"
-#include "reference/ScenarioGenerator.h"
+#include "CallRunner.h"
+#include "Reference.h"
+#include "ScenarioGenerator.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

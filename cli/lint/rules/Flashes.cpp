@@ -1,10 +1,10 @@
 // Rules about spi.acd: its names are looked up in upper case, its classes only where they are families too.
 #include "lint/Findings.h"
 #include "lint/Keys.h"
-#include "lint/rules/Groups.h"
+#include "lint/rules/RuleSets.h"
 
-#include "Multiboot.h"
-#include "Nearest.h"
+#include "model/Multiboot.h"
+#include "text/Suggest.h"
 
 #include <fmt/format.h>
 

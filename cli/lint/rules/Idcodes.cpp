@@ -1,6 +1,6 @@
 // Rules about IDCODE: the codes by which devices are told apart on the cable.
 #include "lint/Findings.h"
-#include "lint/rules/Groups.h"
+#include "lint/rules/RuleSets.h"
 
 #include <fmt/format.h>
 

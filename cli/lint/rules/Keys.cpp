@@ -2,9 +2,9 @@
 #include "lint/Keys.h"
 
 #include "lint/Findings.h"
-#include "lint/rules/Groups.h"
+#include "lint/rules/RuleSets.h"
 
-#include "Nearest.h"
+#include "text/Suggest.h"
 
 #include <fmt/format.h>
 

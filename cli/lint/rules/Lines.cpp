@@ -1,5 +1,5 @@
 // Rules about lines that the reader can make nothing of: each costs the line, and is reported where it stands.
-#include "lint/rules/Groups.h"
+#include "lint/rules/RuleSets.h"
 
 #include "lint/Findings.h"
 

@@ -1,6 +1,6 @@
 // Rules about the items and fields of values: nothing is trimmed and nothing is skipped when they are read.
 #include "lint/Findings.h"
-#include "lint/rules/Groups.h"
+#include "lint/rules/RuleSets.h"
 
 #include <fmt/format.h>
 

@@ -1,8 +1,8 @@
 // Rules about the mode keys of base.acd and the parts that it excludes from modes.
 #include "lint/Findings.h"
-#include "lint/rules/Groups.h"
+#include "lint/rules/RuleSets.h"
 
-#include "Vocabulary.h"
+#include "model/Vocabulary.h"
 
 #include <fmt/format.h>
 

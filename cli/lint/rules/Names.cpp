@@ -1,8 +1,8 @@
 // Rules about the names of families and devices: one that looks good and is never found is the dearest mistake.
 #include "lint/Findings.h"
-#include "lint/rules/Groups.h"
+#include "lint/rules/RuleSets.h"
 
-#include "Nearest.h"
+#include "text/Suggest.h"
 
 #include <fmt/format.h>
 

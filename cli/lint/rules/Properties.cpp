@@ -1,10 +1,10 @@
 // Rules about PROPERTY, PROPERTIES and the _PROPERTY keys of flashes: names, counts and values that go together.
 #include "lint/Findings.h"
 #include "lint/Keys.h"
-#include "lint/rules/Groups.h"
+#include "lint/rules/RuleSets.h"
 
-#include "Nearest.h"
-#include "Vocabulary.h"
+#include "model/Vocabulary.h"
+#include "text/Suggest.h"
 
 #include <fmt/format.h>
 

@@ -1,6 +1,6 @@
 // Rules about DEVICE_SUPPORTED and PROGRAM_OPTION_PACKAGE: what has no table raises when it is asked about.
 #include "lint/Findings.h"
-#include "lint/rules/Groups.h"
+#include "lint/rules/RuleSets.h"
 
 #include <fmt/format.h>
 

@@ -1,9 +1,9 @@
 // Rules about OPERATION, BSDL_OPERATION and PROGRAM_OPTION: which cells of the permission tables they turn on.
 #include "lint/Findings.h"
-#include "lint/rules/Groups.h"
+#include "lint/rules/RuleSets.h"
 
-#include "Nearest.h"
-#include "Vocabulary.h"
+#include "model/Vocabulary.h"
+#include "text/Suggest.h"
 
 #include <tarvik/ConstraintsManager.h>
 

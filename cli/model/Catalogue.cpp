@@ -1,0 +1,162 @@
+// Names and origins from the host layer's database, for lists, suggestions, and to say where a value stands.
+#include "model/Catalogue.h"
+
+#include "text/Suggest.h"
+
+#include <TarvikException.h>
+
+#include <fmt/format.h>
+
+#include <iterator>
+#include <utility>
+
+namespace catalogue {
+
+namespace {
+
+/// The manager's SPI catalogue is this file, whatever else may be called "spi".
+constexpr const char* SPI_DATABASE = "spi.acd";
+
+bool isOwnFamily(const std::string& family) {
+    return !sameWithoutCase(family, "base") && !sameWithoutCase(family, "spi");
+}
+
+/// Calls `use(piece, offset)` for each piece. An empty text has none.
+template <typename Use>
+void forEachPiece(std::string_view text, char separator, Use use) {
+    for (std::size_t start = 0; !text.empty() && start <= text.size();) {
+        const std::size_t end = std::min(text.find(separator, start), text.size());
+        use(text.substr(start, end - start), start);
+        start = end + 1;
+    }
+}
+
+/// The last entry of each name.
+std::map<std::string, Entry> lastEntries(const AcdStore::Value& value) {
+    std::map<std::string, Entry> found;
+    forEachPiece(value.text, ':', [&](std::string_view text, std::size_t offset) {
+        Entry entry{originOf(value.at(offset)), value.fromSection, std::string(text), {}};
+        const auto [known, isNew] = found.try_emplace(std::string(text.substr(0, text.find(','))));
+        if (!isNew) {
+            Entry& former = known->second;
+            entry.shadows = std::move(former.shadows);
+            // An entry that was appended on top.
+            if (former.origin.layer != entry.origin.layer) {
+                entry.shadows.insert(entry.shadows.begin(), {former.origin, former.text});
+            }
+        }
+        known->second = std::move(entry);
+    });
+    return found;
+}
+
+} // namespace
+
+std::string asText(const Origin& origin) {
+    return fmt::format("{}:{}:{}", origin.file, origin.line, origin.column);
+}
+
+Json asJson(const Origin& origin) {
+    Json object{{"file", origin.file}, {"line", origin.line}, {"column", origin.column}};
+    if (AcdStore::searchPath().size() > 1) {
+        object["layer"] = origin.layer;
+    }
+    return object;
+}
+
+Origin originOf(const AcdStore::Fragment& place) {
+    return {std::string(place.file), place.line, place.column, std::string(place.layer)};
+}
+
+Shadows shadowsOf(const AcdStore::Value& value) {
+    Shadows shadows;
+    for (const AcdStore::Value& replaced : value.replaced) {
+        shadows.push_back({originOf(replaced.fragments.front()), std::string(replaced.text)});
+    }
+    return shadows;
+}
+
+Json asJson(const Shadows& shadows) {
+    Json list = Json::array();
+    for (const Shadow& shadow : shadows) {
+        Json object = asJson(shadow.origin);
+        object["text"] = shadow.text;
+        list.push_back(std::move(object));
+    }
+    return list;
+}
+
+std::map<std::string, Entry> entries(const std::string& database, const std::string& key) {
+    const std::optional<AcdStore::Value> value = AcdStore::value(database.c_str(), key.c_str());
+    if (!value) {
+        return {};
+    }
+    std::map<std::string, Entry> found = lastEntries(*value);
+    for (const AcdStore::Value& replaced : value->replaced) {
+        for (auto& [name, below] : lastEntries(replaced)) {
+            if (const auto entry = found.find(name); entry != found.end()) {
+                Shadows& shadows = entry->second.shadows;
+                shadows.push_back({below.origin, std::move(below.text)});
+                std::move(below.shadows.begin(), below.shadows.end(), std::back_inserter(shadows));
+            }
+        }
+    }
+    return found;
+}
+
+std::vector<std::string> list(const std::string& database, const std::string& key) {
+    std::vector<std::string> texts;
+    if (const std::optional<AcdStore::Value> value = AcdStore::value(database.c_str(), key.c_str())) {
+        forEachPiece(value->text, ',', [&](std::string_view text, std::size_t) { texts.emplace_back(text); });
+    }
+    return texts;
+}
+
+std::vector<std::string> families() {
+    std::vector<std::string> own;
+    for (std::string& family : AcdStore::families()) {
+        if (isOwnFamily(family)) {
+            own.push_back(std::move(family));
+        }
+    }
+    return own;
+}
+
+std::vector<Flash> flashes() {
+    std::vector<Flash> all;
+    for (const std::string& family : list(SPI_DATABASE, "DEVICE_FAMILY")) {
+        for (std::string& name : list(SPI_DATABASE, family + "_DEVICES")) {
+            all.push_back({std::move(name), family});
+        }
+    }
+    return all;
+}
+
+std::vector<std::string> names() {
+    std::vector<std::string> all;
+    for (const std::string& family : families()) {
+        all.push_back(family);
+        try {
+            for (std::string& device : AcdStore::devices(family)) {
+                all.push_back(std::move(device));
+            }
+        } catch (const DataNotFoundException&) {
+            // A family that can't be read has no names to offer; the question itself was about another name.
+        }
+    }
+    try {
+        for (Flash& flash : flashes()) {
+            all.push_back(std::move(flash.name));
+        }
+    } catch (const DataNotFoundException&) {
+        // Likewise.
+    }
+    return all;
+}
+
+CommandError unknownDevice(const std::string& name) {
+    return {ExitCode::NO,
+            fmt::format("the database has no device \"{}\"{}", name, didYouMean(name, names()))};
+}
+
+} // namespace catalogue

@@ -1,0 +1,82 @@
+// Shows answers, messages and faults the one way, in text or in JSON.
+#include "query/Tool.h"
+
+#include "query/Database.h"
+
+#include <tarvik/ConstraintsManager.h>
+
+#include <unistd.h>
+#include <utility>
+
+using Channel = Port_MsgManData::Channel;
+
+Tool::Tool(Settings settings)
+    : m_settings(std::move(settings)), m_terminal(STDOUT_FILENO, m_settings.colours) {}
+
+void Tool::openDatabase() {
+    if (!m_opened) {
+        ::openDatabase(m_settings.databases);
+        m_opened = true;
+    }
+}
+
+ConstraintsManager& Tool::manager() {
+    openDatabase();
+    ConstraintsManager* const manager = ConstraintsManager::getConstraintsManager();
+    if (manager == nullptr) {
+        throw std::bad_alloc();
+    }
+    manager->setExceptions(false);
+    return *manager;
+}
+
+void Tool::note(const std::string& text) const { writeError("tarvik: " + text); }
+
+ExitCode Tool::fail(const CommandError& failure) {
+    const std::vector<Messages::Message> messages = showMessages();
+    note(failure.what());
+    try {
+        if (m_settings.json) {
+            writeJson({{"error", failure.what()}}, messages);
+        }
+        m_output.flush();
+    } catch (const CommandError&) {
+        // The output is what failed, and that is told already.
+        return ExitCode::FAULT;
+    }
+    return failure.status();
+}
+
+void Tool::showText(const std::string& text) {
+    showMessages();
+    m_output.write(text);
+    m_output.flush();
+}
+
+void Tool::showJson(const Json& facts) {
+    writeJson(facts, showMessages());
+    m_output.flush();
+}
+
+void Tool::writeJson(const Json& facts, const std::vector<Messages::Message>& messages) {
+    Json document{{"version", 1}};
+    document.update(facts);
+    document["messages"] = asJson(messages);
+    m_output.write(oneLine(document) + '\n');
+}
+
+std::vector<Messages::Message> Tool::showMessages() {
+    std::vector<Messages::Message> shown;
+    for (Messages::Message& message : m_messages.take()) {
+        if (message.channel == Channel::DEBUG && !m_settings.verbose) {
+            continue;
+        }
+        if (message.channel != Channel::STATUS) {
+            writeError(message.text);
+        } else if (!m_settings.json) {
+            m_output.write(message.text);
+        }
+        shown.push_back(std::move(message));
+    }
+    return shown;
+}

@@ -1,0 +1,71 @@
+#pragma once
+
+#include "term/ExitCode.h"
+#include "term/Messages.h"
+#include "term/Output.h"
+#include "term/Terminal.h"
+#include "text/Json.h"
+
+#include <string>
+#include <vector>
+
+class ConstraintsManager;
+
+/// What every command works with: the database, the manager, and the one place where answers are shown.
+class Tool {
+public:
+    struct Settings {
+        std::vector<std::string> databases;
+        bool json = false;
+        bool verbose = false;
+        Terminal::Colours colours = Terminal::Colours::AUTOMATIC;
+    };
+
+    explicit Tool(Settings settings);
+
+    /// Opens the database; a second call does nothing.
+    /// @throw CommandError (FAULT) when it is missing or can't be read
+    void openDatabase();
+
+    /// The manager, with exceptions off, on the database.
+    /// @throw CommandError (FAULT) as `openDatabase`
+    [[nodiscard]] ConstraintsManager& manager();
+
+    [[nodiscard]] Messages& messages() noexcept { return m_messages; }
+    [[nodiscard]] Output& output() noexcept { return m_output; }
+
+    /// Shows what a command found, as text or as a JSON object, behind the messages that came with it.
+    /// @param facts anything with `std::string asText(facts, const Terminal&)` and `Json asJson(facts)`
+    /// @return the status
+    template <typename Facts>
+    [[nodiscard]] ExitCode answer(const Facts& facts, ExitCode status = ExitCode::YES) {
+        if (m_settings.json) {
+            showJson(asJson(facts));
+        } else {
+            showText(asText(facts, m_terminal));
+        }
+        return status;
+    }
+
+    /// Tells the user something beside the answer.
+    void note(const std::string& text) const;
+
+    /// Shows why there is no answer.
+    /// @return the status
+    [[nodiscard]] ExitCode fail(const CommandError& failure);
+
+private:
+    void showText(const std::string& text);
+    void showJson(const Json& facts);
+    void writeJson(const Json& facts, const std::vector<Messages::Message>& messages);
+
+    /// Info and debug messages go to standard error; status messages go where text answers go, while in JSON
+    /// they stand in the object alone. Debug messages count only when they were asked for.
+    std::vector<Messages::Message> showMessages();
+
+    Settings m_settings;
+    Messages m_messages;
+    Output m_output;
+    Terminal m_terminal;
+    bool m_opened = false;
+};

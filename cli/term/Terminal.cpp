@@ -1,0 +1,74 @@
+// The one place that knows terminals: whether there is one, how wide it is, and how it is told to colour a text.
+#include "term/Terminal.h"
+
+#include <charconv>
+#include <cstdlib>
+#include <optional>
+#include <sys/ioctl.h>
+#include <unistd.h>
+
+namespace {
+
+/// A variable of the environment; one without a text counts as absent.
+std::optional<std::string_view> variable(const char* name) {
+    const char* const text = std::getenv(name);
+    return text == nullptr || *text == '\0' ? std::nullopt : std::optional<std::string_view>(text);
+}
+
+bool isControl(std::string_view text, std::size_t index) {
+    const auto byte = static_cast<unsigned char>(text[index]);
+    const auto next = index + 1 < text.size() ? static_cast<unsigned char>(text[index + 1]) : 0U;
+    return byte < 0x20 || byte == 0x7F || (byte == 0xC2 && next >= 0x80 && next <= 0x9F);
+}
+
+std::size_t columnsOf(int descriptor) {
+    if (const std::optional<std::string_view> columns = variable("COLUMNS")) {
+        std::size_t number = 0;
+        const char* const end = columns->data() + columns->size();
+        const std::from_chars_result read = std::from_chars(columns->data(), end, number);
+        if (read.ec == std::errc() && read.ptr == end && number != 0) {
+            return number;
+        }
+    }
+    winsize size{};
+    return ::ioctl(descriptor, TIOCGWINSZ, &size) == 0 && size.ws_col != 0 ? size.ws_col : LINE_WIDTH;
+}
+
+bool showsColours(bool isTerminal, Terminal::Colours colours) {
+    if (colours != Terminal::Colours::AUTOMATIC) {
+        return colours == Terminal::Colours::ALWAYS;
+    }
+    return isTerminal && !variable("NO_COLOR") && variable("TERM").value_or("dumb") != "dumb";
+}
+
+} // namespace
+
+std::string printable(std::string_view text) {
+    std::string shown;
+    for (std::size_t i = 0; i < text.size(); ++i) {
+        if (text[i] == '\t') {
+            shown += ' ';
+        } else if (isControl(text, i)) {
+            shown += '?';
+            i += text[i] == '\xC2' ? 1U : 0U;
+        } else {
+            shown += text[i];
+        }
+    }
+    return shown;
+}
+
+Terminal::Terminal(int descriptor, Colours colours)
+    : m_isTerminal(::isatty(descriptor) == 1), m_hasColours(showsColours(m_isTerminal, colours)),
+      m_width(columnsOf(descriptor)) {}
+
+std::string Terminal::shown(std::string_view text) const {
+    return m_isTerminal ? printable(text) : std::string(text);
+}
+
+std::string Terminal::marked(const char* colour, std::string_view text) const {
+    if (!m_hasColours || text.empty()) {
+        return std::string(text);
+    }
+    return std::string("\x1b[").append(colour).append("m").append(text).append("\x1b[0m");
+}

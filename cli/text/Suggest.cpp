@@ -1,0 +1,77 @@
+// Suggestions for mistyped names: the edit distance, cut off where a suggestion would be a guess.
+#include "text/Suggest.h"
+
+#include <algorithm>
+#include <numeric>
+
+namespace {
+
+char lowerCase(char letter) {
+    return letter >= 'A' && letter <= 'Z' ? static_cast<char>(letter - 'A' + 'a') : letter;
+}
+
+/// The least number of insertions, deletions and replacements that turn one text into the other.
+std::size_t distance(std::string_view left, std::string_view right) {
+    std::vector<std::size_t> row(right.size() + 1);
+    std::iota(row.begin(), row.end(), std::size_t{0});
+    for (std::size_t i = 0; i < left.size(); ++i) {
+        std::size_t diagonal = row[0];
+        row[0] = i + 1;
+        for (std::size_t j = 0; j < right.size(); ++j) {
+            const std::size_t replaced = diagonal + (left[i] == right[j] ? 0 : 1);
+            diagonal = row[j + 1];
+            row[j + 1] = std::min({replaced, diagonal + 1, row[j] + 1});
+        }
+    }
+    return row.back();
+}
+
+std::size_t difference(std::size_t left, std::size_t right) {
+    return std::max(left, right) - std::min(left, right);
+}
+
+} // namespace
+
+bool sameWithoutCase(std::string_view left, std::string_view right) {
+    return std::equal(left.begin(), left.end(), right.begin(), right.end(),
+                      [](char one, char other) { return lowerCase(one) == lowerCase(other); });
+}
+
+std::string lowerCase(std::string_view text) {
+    std::string lower(text);
+    std::transform(lower.begin(), lower.end(), lower.begin(), [](char letter) { return lowerCase(letter); });
+    return lower;
+}
+
+std::optional<std::string> nearest(std::string_view text, const std::vector<std::string>& candidates) {
+    // Nobody mistypes a name of this length; and the distance costs the product of both lengths.
+    constexpr std::size_t LONGEST = 100;
+    if (text.empty() || text.size() > LONGEST) {
+        return std::nullopt;
+    }
+    const std::string wanted = lowerCase(text);
+    std::size_t limit = std::max<std::size_t>(1, wanted.size() / 3) + 1;
+    const std::string* best = nullptr;
+    const std::string* continued = nullptr;
+    for (const std::string& candidate : candidates) {
+        const std::string name = lowerCase(candidate);
+        if (continued == nullptr && wanted.size() > 1 && name.starts_with(wanted)) {
+            continued = &candidate;
+        }
+        if (difference(name.size(), wanted.size()) >= limit) {
+            continue;
+        }
+        const std::size_t found = distance(wanted, name);
+        if (found < limit && found < std::max(wanted.size(), name.size())) {
+            limit = found;
+            best = &candidate;
+        }
+    }
+    best = best == nullptr ? continued : best;
+    return best == nullptr ? std::nullopt : std::optional(*best);
+}
+
+std::string didYouMean(std::string_view text, const std::vector<std::string>& candidates) {
+    const std::optional<std::string> candidate = nearest(text, candidates);
+    return candidate ? "; did you mean \"" + *candidate + "\"?" : std::string();
+}

@@ -1,0 +1,78 @@
+// The command line itself: help, versions, and what is no command.
+#include "cli/support/SmallDatabase.h"
+
+#include <gmock/gmock.h>
+
+namespace {
+
+using testing::HasSubstr;
+using testing::IsEmpty;
+using testing::StartsWith;
+
+TEST(CommandLine, VersionNamesTheTool) {
+    const Outcome outcome = runTool({"--version"});
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_THAT(outcome.output, StartsWith("tarvik "));
+}
+
+TEST(CommandLine, NoCommandIsAFault) {
+    const Outcome outcome = runTool(std::vector<std::string>{});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_THAT(outcome.output, IsEmpty());
+    EXPECT_THAT(outcome.error, StartsWith("tarvik: a command is required\nsee: tarvik --help\n"));
+}
+
+TEST(CommandLine, UnknownCommandIsAFaultWithASuggestion) {
+    const Outcome outcome = runTool({"devises"});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_THAT(outcome.error,
+                StartsWith("tarvik: unknown command \"devises\"; did you mean \"devices\"?\n"));
+}
+
+TEST(CommandLine, UnknownOptionIsAFaultWithASuggestion) {
+    EXPECT_EQ(runTool({"--frob"}).error, "tarvik: unknown option \"--frob\"\nsee: tarvik --help\n");
+    EXPECT_THAT(runTool({"--jsn", "devices"}).error,
+                StartsWith("tarvik: unknown option \"--jsn\"; did you mean \"--json\"?\n"));
+    const Outcome outcome = runTool({"devices", "--famly", "finch"});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_EQ(outcome.error, "tarvik: unknown option \"--famly\"; did you mean \"--family\"?\n"
+                             "see: tarvik devices --help\n");
+}
+
+TEST(CommandLine, TooManyArgumentsAreAFault) {
+    const Outcome outcome = runTool({"show", "FN10", "FN20"});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_EQ(outcome.error, "tarvik: \"FN20\" is one argument too many\nsee: tarvik show --help\n");
+}
+
+TEST(CommandLine, FaultsAreToldInJsonToo) {
+    EXPECT_EQ(runTool({"show", "--json"}).output,
+              "{\"version\":1,\"error\":\"DEVICE is required\\nsee: tarvik show --help\",\"messages\":[]}\n");
+}
+
+TEST(CommandLine, MissingArgumentIsAFaultThatNamesTheHelp) {
+    const Outcome outcome = runTool({"show"});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_THAT(outcome.error, HasSubstr("DEVICE"));
+    EXPECT_THAT(outcome.error, HasSubstr("see: tarvik show --help"));
+}
+
+TEST(CommandLine, OptionsOfTheToolMayStandBehindTheCommand) {
+    const SmallDatabase database;
+    const Outcome outcome = runTool({"families", "--json", "--database", database.path()});
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_THAT(outcome.output, StartsWith("{\"version\":1,"));
+}
+
+TEST(CommandLine, ADeviceMayBeNamedAsACommand) {
+    const SmallDatabase database;
+    EXPECT_THAT(database.run({"check", "spi", "--mode", "SPI"}).output, StartsWith("yes: spi "));
+}
+
+TEST(CommandLine, VocabularyNeedsNoDatabase) {
+    const Outcome outcome = runTool({"--database", "/nowhere", "vocabulary"});
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_THAT(outcome.error, IsEmpty());
+}
+
+} // namespace

@@ -1,0 +1,189 @@
+// The commands that answer yes or no: check and multiboot.
+#include "cli/support/SmallDatabase.h"
+
+#include <gmock/gmock.h>
+
+namespace {
+
+using nlohmann::json;
+using testing::HasSubstr;
+
+TEST(Check, ModeAndOutput) {
+    const SmallDatabase database;
+    const Outcome yes = database.run({"check", "--mode", "BS", "--output", "USB2"});
+    EXPECT_EQ(yes.status, 0);
+    EXPECT_EQ(yes.output, "yes: mode BS through USB2\n");
+    EXPECT_EQ(yes.error, "");
+    const Outcome no = database.run({"check", "--mode", "BS", "--output", "ZORVA"});
+    EXPECT_EQ(no.status, 1);
+    EXPECT_EQ(no.output, "no: mode BS through ZORVA\n");
+    EXPECT_EQ(no.error, "ZORVA cable is not supported in Boundary Scan mode\n");
+}
+
+TEST(Check, DeviceInMode) {
+    const SmallDatabase database;
+    EXPECT_EQ(database.run({"check", "FN10", "--mode", "SS"}).output, "yes: FN10 in mode SS\n");
+    const Outcome no = database.run({"check", "FN10", "--mode", "SM"});
+    EXPECT_EQ(no.status, 1);
+    EXPECT_EQ(no.error, "FN10 is not supported in Select Map mode\n");
+}
+
+TEST(Check, PackageInMode) {
+    const SmallDatabase database;
+    const Outcome no = database.run({"check", "FN10", "--mode", "SS", "--package", "P48"});
+    EXPECT_EQ(no.status, 1);
+    EXPECT_EQ(no.output, "no: FN10 in package P48 in mode SS\n");
+    EXPECT_EQ(no.error, "FN10_P48 is not supported in Slave Serial mode\n");
+    EXPECT_EQ(database.run({"check", "FN10", "--mode", "SS", "--package", "P64"}).status, 0);
+}
+
+TEST(Check, DeviceInModeThroughOutput) {
+    const SmallDatabase database;
+    EXPECT_EQ(database.run({"check", "FN10", "--mode", "BS", "--output", "USB2"}).output,
+              "yes: FN10 in mode BS through USB2\n");
+    EXPECT_EQ(database.run({"check", "FN10", "--mode", "BS", "--output", "SVF"}).status, 1);
+}
+
+// Without an output the mode takes every device; with one the family must be listed for the mode.
+TEST(Check, WhatIsGivenPicksTheCheck) {
+    const SmallDatabase database;
+    EXPECT_EQ(database.run({"check", "FN10", "--mode", "PFF"}).status, 0);
+    EXPECT_EQ(database.run({"check", "FN10", "--mode", "PFF", "--output", "SVF"}).status, 1);
+}
+
+TEST(Check, PackageInModeThroughOutput) {
+    const SmallDatabase database;
+    const std::vector<std::string> question{"check",    "FN10",     "--mode",    "SS",
+                                            "--output", "PARALLEL", "--package", "P48"};
+    const Outcome no = database.run(question);
+    EXPECT_EQ(no.status, 1);
+    EXPECT_EQ(no.error, "FN10_P48 is not supported in Slave Serial mode\n");
+}
+
+TEST(Check, OperationInModeThroughOutput) {
+    const SmallDatabase database;
+    EXPECT_EQ(
+        database.run({"check", "FN10", "--mode", "BS", "--output", "USB2", "--operation", "program"}).output,
+        "yes: PROGRAM of FN10 in mode BS through USB2\n");
+    EXPECT_EQ(
+        database.run({"check", "FN10", "--mode", "SS", "--output", "PARALLEL", "--operation", "PROGRAM"})
+            .status,
+        1);
+}
+
+// The same operation and mode: this check reads the device's property, not the table of operations.
+TEST(Check, OperationInMode) {
+    const SmallDatabase database;
+    EXPECT_EQ(database.run({"check", "FN10", "--mode", "SS", "--operation", "PROGRAM"}).output,
+              "yes: PROGRAM of FN10 in mode SS\n");
+    EXPECT_EQ(database.run({"check", "FN10", "--mode", "SS", "--operation", "VERIFY"}).status, 1);
+}
+
+TEST(Check, JsonHoldsTheQuestionAndTheRefusal) {
+    const SmallDatabase database;
+    EXPECT_EQ(database.json({"check", "FN10", "--mode", "SS", "--package", "P48"}), json::parse(R"({
+        "version": 1, "allowed": false, "device": "FN10", "mode": "SS", "output": null, "package": "P48",
+        "operation": null,
+        "messages": [{"channel": "info", "line": 229,
+                      "text": "FN10_P48 is not supported in Slave Serial mode\n"}]})"));
+}
+
+TEST(Check, UnknownDeviceIsNoted) {
+    const SmallDatabase database;
+    const Outcome no = database.run({"check", "FN11", "--mode", "BS"});
+    EXPECT_EQ(no.status, 1);
+    EXPECT_THAT(no.error, HasSubstr("tarvik: the database has no device \"FN11\""));
+    // The manager takes every device in this mode, and the answer is the manager's.
+    const Outcome yes = database.run({"check", "FN11", "--mode", "PFF"});
+    EXPECT_EQ(yes.status, 0);
+    EXPECT_THAT(yes.error, HasSubstr("tarvik: the database has no device \"FN11\""));
+}
+
+TEST(Check, OtherCombinationsAreFaultsThatSayWhatIsPossible) {
+    const SmallDatabase database;
+    const std::vector<std::vector<std::string>> combinations{
+        {"check", "--mode", "BS"},
+        {"check", "--mode", "BS", "--package", "P48"},
+        {"check", "--mode", "BS", "--operation", "ERASE"},
+        {"check", "--mode", "BS", "--output", "USB2", "--package", "P48"},
+        {"check", "--mode", "BS", "--output", "USB2", "--operation", "ERASE"},
+        {"check", "FN10", "--mode", "BS", "--operation", "ERASE", "--package", "P48"},
+        {"check", "FN10", "--mode", "BS", "--output", "USB2", "--operation", "ERASE", "--package", "P48"},
+    };
+    for (const std::vector<std::string>& combination : combinations) {
+        const Outcome outcome = database.run(combination);
+        EXPECT_EQ(outcome.status, 2) << testing::PrintToString(combination);
+        EXPECT_EQ(outcome.output, "");
+        EXPECT_THAT(outcome.error, HasSubstr("DEVICE --mode M --output O [--package P]\n"));
+    }
+}
+
+TEST(Check, ModeIsRequired) { EXPECT_EQ(SmallDatabase().run({"check", "FN10"}).status, 2); }
+
+TEST(Check, UnknownWordsAreFaults) {
+    const SmallDatabase database;
+    EXPECT_EQ(database.run({"check", "FN10", "--mode", "XX"}).status, 2);
+    EXPECT_EQ(database.run({"check", "FN10", "--mode", "BS", "--output", "XX"}).status, 2);
+    EXPECT_EQ(database.run({"check", "FN10", "--mode", "BS", "--operation", "XX"}).status, 2);
+}
+
+TEST(Check, UsageFaultsNeedNoDatabase) {
+    const Outcome outcome = runTool({"--database", "/nowhere", "check", "--mode", "BS"});
+    EXPECT_THAT(outcome.error, testing::StartsWith("tarvik: check takes one of these:\n"));
+}
+
+TEST(Multiboot, TypeIsReadWithAndWithoutItsPrefixInAnyCase) {
+    const SmallDatabase database;
+    for (const char* const type : {"MB_SPI", "mb_spi", "TYPE_MB_SPI", "type_mb_spi"}) {
+        const Outcome yes = database.run({"multiboot", "fla", "--type", type, "--width", "none", "--lead"});
+        EXPECT_EQ(yes.status, 0);
+        EXPECT_EQ(yes.output, "yes: fla as lead device of TYPE_MB_SPI NONE\n");
+    }
+}
+
+TEST(Multiboot, PositionCounts) {
+    const SmallDatabase database;
+    const Outcome no = database.run({"multiboot", "FLA", "--type", "MB_SPI", "--width", "NONE", "--chain"});
+    EXPECT_EQ(no.status, 1);
+    EXPECT_EQ(no.output, "no: FLA as chain device of TYPE_MB_SPI NONE\n");
+}
+
+TEST(Multiboot, PositionIsGivenOnce) {
+    const SmallDatabase database;
+    EXPECT_EQ(database.run({"multiboot", "FLA", "--type", "BPI", "--width", "SERIAL"}).status, 2);
+    EXPECT_EQ(
+        database.run({"multiboot", "FLA", "--type", "BPI", "--width", "SERIAL", "--lead", "--chain"}).status,
+        2);
+}
+
+TEST(Multiboot, CombinationThatNoTypeHasIsANo) {
+    const SmallDatabase database;
+    EXPECT_EQ(database.run({"multiboot", "FLA", "--type", "BPI", "--width", "NONE", "--lead"}).status, 1);
+}
+
+TEST(Multiboot, UnknownWordsAreFaults) {
+    const SmallDatabase database;
+    const Outcome type = database.run({"multiboot", "FLA", "--type", "MB", "--width", "NONE", "--lead"});
+    EXPECT_EQ(type.status, 2);
+    EXPECT_THAT(type.error, HasSubstr("unknown multiboot type \"MB\"; did you mean \"MB_SPI\"?\n"));
+    EXPECT_THAT(type.error, HasSubstr("TYPE_BPI, TYPE_MB_SPI, TYPE_MB_BPI, TYPE_MB_QPRM"));
+    const Outcome width = database.run({"multiboot", "FLA", "--type", "BPI", "--width", "WIDE", "--lead"});
+    EXPECT_EQ(width.status, 2);
+    EXPECT_THAT(width.error, HasSubstr("SERIAL, PARALLEL, NONE"));
+}
+
+TEST(Multiboot, JsonHoldsTheQuestion) {
+    const SmallDatabase database;
+    EXPECT_EQ(database.json({"multiboot", "FLA", "--type", "MB_SPI", "--width", "NONE", "--lead"}),
+              json::parse(R"({"version": 1, "allowed": true, "device": "FLA", "type": "TYPE_MB_SPI",
+                              "width": "NONE", "position": "lead", "messages": []})"));
+}
+
+TEST(Multiboot, UnknownDeviceIsNoted) {
+    const SmallDatabase database;
+    const Outcome no = database.run({"multiboot", "FLX", "--type", "MB_SPI", "--width", "NONE", "--lead"});
+    EXPECT_EQ(no.status, 1);
+    EXPECT_THAT(no.error, HasSubstr("the database has no device \"FLX\"; did you mean \"FLA\"?"));
+}
+
+} // namespace

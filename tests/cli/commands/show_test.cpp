@@ -1,0 +1,221 @@
+// `show`: everything about one device.
+#include "cli/support/SmallDatabase.h"
+
+#include <gmock/gmock.h>
+
+namespace {
+
+using nlohmann::json;
+using testing::HasSubstr;
+using testing::Not;
+using testing::StartsWith;
+
+TEST(Show, WholeSheetOfADevice) {
+    const SmallDatabase database;
+    const Outcome outcome = database.run({"show", "FN10"});
+    const std::string family = database.path("finch.acd");
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_EQ(outcome.error, "");
+    EXPECT_EQ(outcome.output, "Device  FN10\n"
+                              "Family  finch\n"
+                              "IDCODE  0x0010  " +
+                                  database.path("base.acd") +
+                                  ":7:10\n"
+                                  "Modes   BS SS SPI PFF\n"
+                                  "\n"
+                                  "Properties\n"
+                                  "  PROPERTY    VALUE          FROM    WHERE\n"
+                                  "  CORE        1.8            device  " +
+                                  family +
+                                  ":9:20\n"
+                                  "  OP_PROGRAM  ERASE, VERIFY  family  " +
+                                  family +
+                                  ":6:30\n"
+                                  "  PINS        44             device  " +
+                                  family +
+                                  ":9:12\n"
+                                  "  PROGRAM     BS, SS         family  " +
+                                  family +
+                                  ":6:14\n"
+                                  "  VENDOR      Korvel         family  " +
+                                  family +
+                                  ":5:12\n"
+                                  "\n"
+                                  "Multiboot\n"
+                                  "  TYPE_MB_SPI  NONE  lead\n"
+                                  "\n"
+                                  "Operations\n"
+                                  "  through  P PARALLEL  Z ZORVA  U USB2  S SVF  T STAPL\n"
+                                  "           BS     SS     SM  BSFILE  DP770  SPI    BSDL\n"
+                                  "  PROGRAM  P-U--  -      -   -       -      -      -\n"
+                                  "  VERIFY   -      P----  -   -       -      -      -\n"
+                                  "  ERASE    -      -      -   -       -      --U--  -\n"
+                                  "  HIGHZ    -      -      -   -       -      -      --US-\n"
+                                  "\n"
+                                  "Programming options\n"
+                                  "  through  P PARALLEL  Z ZORVA  U USB2  S SVF  T STAPL\n"
+                                  "         BS     SS  SM  BSFILE  DP770  SPI\n"
+                                  "  ERASE  --U--  -   -   -       -      -\n");
+}
+
+TEST(Show, WholeSheetInJson) {
+    const SmallDatabase database;
+    const json answer = database.json({"show", "FN10"});
+    EXPECT_EQ(answer["version"], 1);
+    EXPECT_EQ(answer["device"], "FN10");
+    EXPECT_EQ(answer["spelling"], "FN10");
+    EXPECT_EQ(answer["family"], "finch");
+    EXPECT_EQ(answer["idcode"],
+              json({{"value", "0x0010"}, {"file", database.path("base.acd")}, {"line", 7}, {"column", 10}}));
+    EXPECT_EQ(answer["modes"], json::parse(R"(["BS", "SS", "SPI", "PFF"])"));
+    EXPECT_EQ(answer["properties"].size(), 5U);
+    EXPECT_EQ(answer["properties"][1], json({{"key", "OP_PROGRAM"},
+                                             {"values", {"ERASE", "VERIFY"}},
+                                             {"from", "family"},
+                                             {"file", database.path("finch.acd")},
+                                             {"line", 6},
+                                             {"column", 30}}));
+    EXPECT_EQ(answer["flash"], false);
+    EXPECT_EQ(answer["flashProperties"], json::array());
+    EXPECT_EQ(answer["multiboot"],
+              json::parse(R"([{"type": "TYPE_MB_SPI", "width": "NONE", "position": "lead"}])"));
+    EXPECT_EQ(answer["operations"], json::parse(R"({"PROGRAM": {"BS": ["PARALLEL", "USB2"]},
+                                                    "VERIFY": {"SS": ["PARALLEL"]},
+                                                    "ERASE": {"SPI": ["USB2"]}})"));
+    EXPECT_EQ(answer["bsdl"], json::parse(R"({"HIGHZ": ["USB2", "SVF"]})"));
+    EXPECT_EQ(answer["options"], json::parse(R"({"ERASE": {"BS": ["USB2"]}})"));
+    EXPECT_EQ(answer["messages"], json::array());
+}
+
+TEST(Show, NameInAnotherCaseIsShownInBoth) {
+    const SmallDatabase database;
+    const Outcome outcome = database.run({"show", "Fn20"});
+    EXPECT_THAT(outcome.output,
+                StartsWith("Device  Fn20 (in the database: FN20)\nFamily  finch\nIDCODE  0x0020"));
+    EXPECT_EQ(database.json({"show", "Fn20"})["spelling"], "FN20");
+}
+
+TEST(Show, FamilyIsSpeltAsItsFile) {
+    const SmallDatabase database;
+    EXPECT_THAT(database.run({"show", "FINCH"}).output, HasSubstr("Family  finch\n"));
+}
+
+TEST(Show, PackageDoesNotChangeTheIdcode) {
+    const SmallDatabase database;
+    EXPECT_THAT(database.run({"show", "FN10_P48"}).output, HasSubstr("IDCODE  0x0010"));
+}
+
+TEST(Show, FlashHasFlashProperties) {
+    const SmallDatabase database;
+    const Outcome outcome = database.run({"show", "FLB"});
+    EXPECT_THAT(outcome.output, StartsWith("Device  FLB\nFamily  spi (a flash)\nModes   SPI PFF\n"));
+    EXPECT_THAT(outcome.output,
+                HasSubstr("\nFlash properties\n  PROPERTY  VALUE  FROM  WHERE\n  BUS       SPI    ST1 "));
+    EXPECT_THAT(outcome.output, Not(HasSubstr("IDCODE")));
+}
+
+TEST(Show, PropertyWithoutValuesSaysSo) {
+    const DatabaseDirectory directory(
+        {{"base.acd", "DEVICE_SUPPORTED = finch\n"}, {"finch.acd", "[FN10]\nPROPERTIES = VOID,0\n"}});
+    EXPECT_THAT(runTool({"--database", directory.path(), "show", "FN10"}).output,
+                HasSubstr("  VOID      (none)  device"));
+}
+
+TEST(Show, LongListsOfValuesAreBroken) {
+    const DatabaseDirectory directory(
+        {{"base.acd", "DEVICE_SUPPORTED = finch\n"},
+         {"finch.acd", "[FN10]\nPROPERTIES = LONG,4,AAAAAAAAAA,BBBBBBBBBB,CCCCCCCCCC,DDDDDDDDDD\n"}});
+    EXPECT_THAT(runTool({"--database", directory.path(), "show", "FN10"}).output,
+                testing::ContainsRegex("LONG      AAAAAAAAAA, BBBBBBBBBB,  device  .*:2:14\n"
+                                       "            CCCCCCCCCC, DDDDDDDDDD\n"));
+}
+
+TEST(Show, LaterEntryOfANameIsTheOneShown) {
+    const DatabaseDirectory directory({{"base.acd", "DEVICE_SUPPORTED = finch\n"},
+                                       {"finch.acd", "[FN10]\n"
+                                                     "PROPERTIES = KEY,1,SEVERAL\n"
+                                                     "PROPERTY = KEY,FIRST:KEY,SECOND:OTHER,A:OTHER,B\n"}});
+    const json properties =
+        json::parse(runTool({"--database", directory.path(), "show", "FN10", "--json"}).output)["properties"];
+    EXPECT_EQ(properties[0]["values"], json({"SEVERAL"}));
+    EXPECT_EQ(properties[0]["line"], 2);
+    EXPECT_EQ(properties[1]["values"], json({"B"}));
+    EXPECT_EQ(properties[1]["column"], 41);
+}
+
+TEST(Show, UnknownDeviceIsANoWithASuggestion) {
+    const SmallDatabase database;
+    const Outcome outcome = database.run({"show", "FN11"});
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_EQ(outcome.output, "");
+    EXPECT_EQ(outcome.error, "tarvik: the database has no device \"FN11\"; did you mean \"FN10\"?\n");
+}
+
+// The properties alone would make the manager take the device's own options for its family's.
+TEST(Show, AnswersDoNotDependOnEachOther) {
+    const SmallDatabase database;
+    const json sheet = database.json({"show", "FN10"});
+    EXPECT_EQ(sheet["options"], json::parse(R"({"ERASE": {"BS": ["USB2"]}})"));
+    const json asked = database.json({"options", "FN10", "--mode", "BS", "--output", "USB2"});
+    EXPECT_EQ(asked["options"], json({"ERASE"}));
+}
+
+TEST(Show, FamilyThatCannotBeReadIsAFaultThatNamesIt) {
+    const DatabaseDirectory directory(
+        {{"base.acd", "DEVICE_SUPPORTED = finch\n"}, {"spi.acd", "DEVICE_FAMILY = NV\n"}});
+    std::filesystem::create_directory(directory.path("finch.acd"));
+    const Outcome outcome = runTool({"--database", directory.path(), "show", "finch"});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_THAT(outcome.error, HasSubstr("finch.acd"));
+}
+
+TEST(Show, BadRecordsRaiseNothing) {
+    const DatabaseDirectory directory(
+        {{"base.acd", "DEVICE_SUPPORTED = finch\n"},
+         {"finch.acd", "OPERATION = NOTHING,BS,USB2:PROGRAM,BS,XX,USB2\n[FN10]\n"}});
+    const Outcome outcome = runTool({"--database", directory.path(), "show", "FN10"});
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_THAT(outcome.output, HasSubstr("PROGRAM  --U--"));
+    EXPECT_EQ(outcome.error, "Operation NOTHING is not defined.\n");
+}
+
+TEST(Show, NamesWhatLayersShadow) {
+    const SmallDatabase below;
+    const DatabaseDirectory above(DatabaseDirectory::Files{{"base.acd", "IDCODE += :FN10,0x0030\n"},
+                                                           {"finch.acd", "[FN10]\nPROPERTY = PINS,48\n"}});
+    const Outcome outcome =
+        runTool({{"--database", above.path(), "--database", below.path(), "show", "FN10"}, {}, {}, {}});
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_THAT(outcome.output,
+                HasSubstr("IDCODE  0x0030  " + above.path("base.acd") + ":1:12\n        shadows " +
+                          below.path("base.acd") + ":7:10: FN10,0x0010\n"));
+    EXPECT_THAT(outcome.output,
+                testing::ContainsRegex("PINS +48 +device +" + above.path("finch.acd") + ":2:12\n +" +
+                                       "PINS,44 +shadowed +" + below.path("finch.acd") + ":9:12\n"));
+}
+
+TEST(Show, NamesLayersInJson) {
+    const SmallDatabase below;
+    const DatabaseDirectory above(
+        DatabaseDirectory::Files{{"finch.acd", "[FN10]\nPROPERTY = PINS,48\nPROPERTY += :PINS,52\n"}});
+    const json sheet = json::parse(
+        runTool(
+            {{"--database", above.path(), "--database", below.path(), "show", "FN10", "--json"}, {}, {}, {}})
+            .output);
+    EXPECT_EQ(sheet.at("idcode").at("layer"), below.path());
+    EXPECT_FALSE(sheet.at("idcode").contains("shadows"));
+    for (const json& property : sheet.at("properties")) {
+        EXPECT_EQ(property.contains("shadows"), property.at("key") == "PINS");
+        if (property.at("key") == "PINS") {
+            EXPECT_EQ(property.at("layer"), above.path());
+            EXPECT_EQ(property.at("shadows"), json::array({{{"file", below.path("finch.acd")},
+                                                            {"line", 9},
+                                                            {"column", 12},
+                                                            {"layer", below.path()},
+                                                            {"text", "PINS,44"}}}));
+        }
+    }
+    EXPECT_FALSE(below.json({"show", "FN10"}).at("idcode").contains("layer"));
+}
+
+} // namespace

@@ -1,0 +1,41 @@
+// Where answers go, when there is nobody to take them, or no room.
+#include "cli/support/SmallDatabase.h"
+
+#include <gmock/gmock.h>
+
+namespace {
+
+using testing::HasSubstr;
+
+TEST(Output, FullDiskIsAFault) {
+    const SmallDatabase database;
+    for (const std::vector<std::string>& arguments :
+         {std::vector<std::string>{"devices"}, {"devices", "--json"}, {"batch"}, {"--help"}}) {
+        Start start = database.start(arguments);
+        start.input = "{\"call\": \"getOperationOrders\"}\n";
+        start.outputPath = "/dev/full";
+        const Outcome outcome = runTool(start);
+        EXPECT_EQ(outcome.status, 2);
+        EXPECT_EQ(outcome.error, "tarvik: can't write to standard output: No space left on device\n");
+    }
+}
+
+TEST(Output, ReaderThatLeavesEndsABatchQuietly) {
+    const SmallDatabase database;
+    Conversation batch(database.start({"batch"}));
+    batch.write("{\"id\": 1, \"call\": \"getOperationOrders\"}\n");
+    EXPECT_THAT(batch.readLine(), HasSubstr("\"id\":1"));
+    batch.closeOutput();
+    batch.write("{\"id\": 2, \"call\": \"getOperationOrders\"}\n");
+    // It ends although its input goes on.
+    EXPECT_EQ(batch.wait(), 0);
+}
+
+TEST(Output, ReaderThatLeavesAtOnceIsNoFault) {
+    const SmallDatabase database;
+    Conversation devices(database.start({"dump", "operations"}));
+    devices.closeOutput();
+    EXPECT_EQ(devices.wait(), 0);
+}
+
+} // namespace
