@@ -141,7 +141,7 @@ ExitCode run(int argc, char** argv) {
     } catch (const CommandError& failure) {
         return tool.fail(failure);
     } catch (const TarvikException& fault) {
-        return tool.fail({ExitCode::FAULT, fmt::format("the database can't be read: {}", fault.what())});
+        return tool.fail({ExitCode::FAULT, fmt::format("the database can't be read: {}", fault.typeName())});
     }
 }
 

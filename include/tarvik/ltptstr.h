@@ -5,7 +5,8 @@
 #include <string_view>
 
 /// The ordering of every set and map that is keyed by text: the common prefix compared as unsigned bytes, on
-/// a tie the shorter text first. Case-sensitive. Look-ups take a `std::string_view` without copying it.
+/// a tie the shorter text first. Case-sensitive. Look-ups take
+/// texts of any kind (`const char*`, `std::string`, `std::string_view`) without copying them.
 struct ltptstr {
     /// Look-ups take whatever `view` takes.
     using is_transparent = void;
@@ -15,6 +16,13 @@ struct ltptstr {
     /// @return all of them, NULs included
     [[nodiscard]] static std::string_view view(const StringBase& text) noexcept {
         return {text.c_str(), text.GetLength()};
+    }
+
+    /// The bytes of a NUL-terminated text.
+    /// @param text null is the empty text; must outlive the result
+    /// @return its bytes
+    [[nodiscard]] static std::string_view view(const char* text) noexcept {
+        return text == nullptr ? std::string_view() : std::string_view(text);
     }
 
     /// As above, of a text that is one already.
