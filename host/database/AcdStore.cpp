@@ -76,7 +76,7 @@ AcdStore::SourceSpan AcdStore::Value::at(std::size_t offset) const {
     const auto behind =
         std::upper_bound(spans.begin(), spans.end(), offset,
                          [](std::size_t wanted, const SourceSpan& span) { return wanted < span.offset; });
-    // Of spans at the same offset all but the last are empty: the byte stands in the last.
+    // Of spans at the same offset all but the last are empty: the byte is in the last.
     SourceSpan span = *std::prev(behind);
     span.column += static_cast<unsigned>(offset - span.offset);
     return span;

@@ -27,7 +27,7 @@ struct SourceFile {
     const std::string* text; ///< of a file in memory; null for one on disk
     bool isUnreadable = false;
     std::vector<std::string>
-        caseCollisions{}; ///< paths in the same layer that differ in case alone, and don't count
+        caseCollisions{}; ///< paths in the same layer that differ in case alone, and are not read
 };
 
 /// A family and what is known of it so far.

@@ -11,7 +11,7 @@
 #include <utility>
 
 // How the files of a family become one set of values: gathered in order, layer over layer, then sorted by
-// section and key, so that all that is said of a key stands together and is merged in one go.
+// section and key, so that all lines about a key are adjacent and are merged together.
 
 namespace acd {
 
@@ -120,7 +120,7 @@ void DatabaseBuilder::assign(const Line& line) {
 }
 
 void DatabaseBuilder::merge() {
-    // Stable: what is said of one key stays in the order in which it is said.
+    // Stable: the lines about one key stay in their order.
     std::stable_sort(
         m_assignments.begin(), m_assignments.end(),
         [](const Assignment& left, const Assignment& right) { return left.sortKey() < right.sortKey(); });
@@ -142,8 +142,8 @@ void DatabaseBuilder::merge() {
     m_database.m_spans.shrink_to_fit();
 }
 
-/// Keeps what a layer hides of the layers below it.
-/// @param last the assignment that stands
+/// Records the values of lower layers that an upper layer replaces.
+/// @param last the assignment that takes effect
 void DatabaseBuilder::recordShadowed(Assignments::iterator first, Assignments::iterator last) {
     const auto owner = static_cast<std::uint32_t>(m_database.m_values.size());
     const auto layerOf = [this](const Assignment& assignment) {
@@ -161,7 +161,7 @@ void DatabaseBuilder::recordShadowed(Assignments::iterator first, Assignments::i
     }
 }
 
-/// Joins what stands for one key in a text and spans of its own.
+/// Joins the texts that make up one value, and their spans.
 Value DatabaseBuilder::join(Assignments::iterator first, Assignments::iterator last) {
     if (std::distance(first, last) == 1) {
         return first->value;

@@ -16,7 +16,7 @@
 
 namespace acd {
 
-/// One layer's file of a family, read but not yet taken apart.
+/// One layer's file of a family, read but not yet parsed.
 struct LayerText {
     std::string path;
     Text text;
@@ -67,7 +67,7 @@ private:
     friend class DatabaseBuilder;
     friend class Database;
 
-    std::uint32_t m_first = 0; ///< its values stand together, in order of their keys
+    std::uint32_t m_first = 0; ///< its values are adjacent, in order of their keys
     std::uint32_t m_count = 0;
 };
 
@@ -77,14 +77,14 @@ public:
     /// Without a single key.
     Database() = default;
 
-    /// Takes the files apart.
+    /// Parses and merges files.
     /// @param layers the bottom one first
     /// @param errors what is wrong with them is added here
     /// @param maxValueLength what no value may grow over by appending, at most 4 GiB
     explicit Database(std::vector<LayerText> layers, std::vector<LayerError>& errors,
                       std::size_t maxValueLength = MAX_FILE_SIZE);
 
-    /// Merges files that were taken apart already, and must outlive the database.
+    /// Merges files that were parsed already and must outlive the database.
     /// @param layers the bottom one first
     /// @param oversized the texts that would make a value too long are added here
     /// @param maxValueLength as above
@@ -139,8 +139,8 @@ private:
     CaseInsensitiveNameSet m_sectionNames;
     std::vector<Section> m_sections{1}; ///< the family's own first
     std::vector<Value> m_values;
-    std::vector<Value> m_replaced;               ///< those of one value stand together
-    std::vector<std::uint32_t> m_replacedOwners; ///< of each, the place of the value that stands for it
+    std::vector<Value> m_replaced;               ///< those of one value are adjacent
+    std::vector<std::uint32_t> m_replacedOwners; ///< of each, the index of the value that replaces it
     std::vector<LayerSpan> m_spans;
     std::vector<std::unique_ptr<char[]>> m_joinedTexts; ///< of values that were appended to
 };

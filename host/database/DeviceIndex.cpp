@@ -1,6 +1,6 @@
 #include "database/DeviceIndex.h"
 
-// The map from devices to families. Its names are its own, as the files that they stand in are mostly not
+// The map from devices to families. It copies the names, since the files that contain them are mostly not
 // kept.
 
 namespace acd {

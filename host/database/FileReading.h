@@ -39,10 +39,10 @@ public:
     [[nodiscard]] virtual std::size_t read(char* buffer, std::size_t size) = 0;
 };
 
-/// The bytes of a regular file. Nothing else is waited for: a pipe or a device is refused, and never blocks.
+/// The bytes of a regular file. A pipe or a device is refused, and never waited for.
 class FileSource final : public ByteSource {
 public:
-    /// The system's `read`, or what stands in for it in a test.
+    /// The system's `read`, or its replacement in a test.
     using ReadCall = ssize_t (*)(int descriptor, void* buffer, std::size_t size);
 
     /// @throw ReadError

@@ -4,8 +4,8 @@
 #include <cstring>
 #include <iterator>
 
-// The grammar of database files. Nobody else takes a file's text apart; the scan for the device index only
-// knows enough to find plain headers fast, and hands whatever is not plain to this reader.
+// The grammar of database files. All files are parsed here. The scan for the device index only knows enough to
+// find plain headers fast, and passes all other files to this reader.
 
 namespace acd {
 
@@ -72,7 +72,7 @@ bool LineReader::next(Line& line) {
             continue;
         }
         const bool isHeader = *first.begin == '[';
-        // A malformed header must not leave the keys behind it to the device before it.
+        // A malformed header must not leave the keys after it to the device before it.
         line.error.closesSection = isHeader;
         const bool isComplete = join(first);
         if (m_text.size() > MAX_LINE_LENGTH) {
@@ -89,7 +89,7 @@ bool LineReader::next(Line& line) {
     return false;
 }
 
-/// Takes the bytes up to the next line end off the text; a CR counts as part of the line end before LF only.
+/// Takes the next physical line from the text. A CR belongs to the line end only before an LF.
 LineReader::PhysicalLine LineReader::takePhysicalLine() noexcept {
     char* const start = m_next;
     char* end = static_cast<char*>(std::memchr(start, '\n', static_cast<std::size_t>(m_end - start)));
@@ -108,9 +108,9 @@ LineReader::PhysicalLine LineReader::takePhysicalLine() noexcept {
     return {begin, end, {++m_lineNumber, static_cast<std::uint32_t>(begin - start) + 1}};
 }
 
-/// Joins a line with all that it goes on with, right behind its first piece: the lines so used up leave room
+/// Joins a line with its continuations, right after its first part: the lines that are consumed leave room
 /// enough.
-/// @return false when the file ends behind a `\`, which the text then shows
+/// @return false when the file ends after a `\`, which the text then includes
 bool LineReader::join(const PhysicalLine& first) {
     m_spans.assign(1, {0, first.location});
     char* piece = first.begin;
@@ -187,7 +187,7 @@ void LineReader::readAssignment(Line& line) const {
     locateValue(line);
 }
 
-/// Gives the value the spans that it consists of; an empty one stands right behind the `=`.
+/// Sets the spans of the value; an empty value is located right after the `=`.
 void LineReader::locateValue(Line& line) const {
     const auto begin = static_cast<std::size_t>(line.value.data() - m_text.data());
     line.spans.clear();

@@ -37,7 +37,7 @@ struct Header {
 /// Reads a line that begins with `[` and does not end with a blank.
 [[nodiscard]] Header parseHeader(std::string_view line) noexcept;
 
-/// Where a piece of a joined text was written.
+/// Where a part of a joined text was written.
 struct SourceSpan {
     std::uint32_t offset; ///< of its first byte in the text
     SourceLocation location;
@@ -49,7 +49,7 @@ struct Line {
         HEADER,     ///< opens the section `name`
         ASSIGNMENT, ///< `name = value`
         APPEND,     ///< `name += value`
-        INVALID,    ///< means nothing
+        INVALID,    ///< has an error
     };
 
     Kind kind = Kind::INVALID;
@@ -63,13 +63,13 @@ struct Line {
 /// Walks over the text of a database file, line by line as they are meant. The one place that knows the
 /// grammar.
 ///
-/// The kind of a line is decided by its first physical line: a comment (`#`) never goes on, anything else
-/// does behind a `\`, and what it goes on with is neither comment nor header.
+/// The kind of a line is decided by its first physical line: a comment (`#`) is never
+/// continued, any other line is after a `\`, and a continuation is never a comment or a header.
 class LineReader {
 public:
     static constexpr std::size_t MAX_LINE_LENGTH = std::size_t{16} << 20;
 
-    /// The text is changed: lines that go on are joined in place, so that a value is one view into it. It
+    /// The text is changed: continued lines are joined in place, so that a value is one view into it. It
     /// must outlive the lines.
     /// @param size at most 4 GiB
     LineReader(char* text, std::size_t size) noexcept;

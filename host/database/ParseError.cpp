@@ -4,7 +4,7 @@
 
 #include <cstddef>
 
-// How an error is put into words. Apart from the reading, so that whoever gathers errors can word them alike.
+// The texts of errors, in one place for all who report them.
 
 namespace acd {
 

@@ -35,13 +35,13 @@ struct ParseError {
     std::string excerpt; ///< the offending text, printable and shortened
 };
 
-/// Says what the error is, in one line without its place.
+/// Describes the error in one line, without its location.
 [[nodiscard]] std::string describe(const ParseError& error);
 
 /// The text with its control bytes as `\x1b`, so that it does no harm on a terminal.
 [[nodiscard]] std::string printable(std::string_view text);
 
-/// As `printable`; of a long text the beginning, with `...` behind.
+/// As `printable`; of a long text the beginning, followed by `...`.
 [[nodiscard]] std::string excerpt(std::string_view text);
 
 } // namespace acd

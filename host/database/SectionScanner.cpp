@@ -5,7 +5,7 @@
 #include <cstring>
 
 // The fast search for headers: from one `[` to the next, and a look at the line around it. Where more than
-// that line matters (one that goes on, or one that may itself be what another goes on with) the file is left
+// that line matters (one that is continued, or one that may itself be a continuation) the file is left
 // to the full reader, so that the two can't disagree.
 
 namespace acd {
@@ -49,8 +49,8 @@ const PackedStrings& SectionScanner::names(const std::function<std::unique_ptr<B
     return m_names;
 }
 
-/// Scans a file buffer by buffer, each cut behind its last whole line.
-/// @return false when only the full reader can tell
+/// Scans a file buffer by buffer, each cut after its last whole line.
+/// @return false when the full reader is needed
 bool SectionScanner::scan(ByteSource& source) {
     std::size_t filled = 0;
     bool isStart = true;

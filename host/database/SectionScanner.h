@@ -11,7 +11,7 @@
 
 namespace acd {
 
-/// Names, one behind the other in one block of memory.
+/// Names, stored one after the other in one block of memory.
 class PackedStrings {
 public:
     void clear() noexcept {
@@ -39,7 +39,7 @@ public:
     explicit SectionScanner(std::size_t bufferSize = BUFFER_SIZE);
 
     /// The names that the well-formed headers of a file give, in order, repeated ones included.
-    /// @param open opens the file; asked a second time where the fast way can't tell
+    /// @param open opens the file; called a second time if the fast scan is not enough
     /// @return valid until the next call
     /// @throw ReadError
     [[nodiscard]] const PackedStrings& names(const std::function<std::unique_ptr<ByteSource>()>& open);

@@ -6,7 +6,7 @@
 
 #include <utility>
 
-// The one store of the process: where its databases come from, what names stand for in them, and the errors
+// The one store of the process: where its databases come from, what names mean in them, and the errors
 // raised when what is there can't be read.
 
 namespace acd {

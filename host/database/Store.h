@@ -46,10 +46,10 @@ public:
     /// The family of that name; null when there is none.
     [[nodiscard]] Family* family(std::string_view name);
 
-    /// Finds what a name stands for: a file, a family or a device; failing that, the name up to its first "_".
+    /// Resolves a name: a file, a family or a device; failing that, the name up to its first "_".
     [[nodiscard]] Resolution resolve(std::string_view name);
 
-    /// Opens what a name stands for.
+    /// Opens what a name resolves to.
     /// @throw DataNotFoundException when it can't be read
     [[nodiscard]] DatabaseHandle open(std::string_view name);
 

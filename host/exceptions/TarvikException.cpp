@@ -6,7 +6,7 @@
 
 #include <utility>
 
-// The exceptions. Their destructors stand here so that each type has one home, and is caught across libraries.
+// The exceptions. Their destructors are defined here so that each type is unique, and is caught across libraries.
 
 Port::Exception::~Exception() = default;
 

@@ -7,9 +7,9 @@
 #include <string_view>
 #include <vector>
 
-/// The lines of one database file as they are meant: continuations joined, blank lines gone, comments apart.
+/// The logical lines of one database file: continuations joined, blank lines removed, comments separate.
 ///
-/// For tools that tell what a file says and what is wrong with it. Whoever wants answers asks `AcdReader`.
+/// For tools that show what a file contains and what is wrong with it. Use `AcdReader` to read values.
 class __attribute__((visibility("default"))) AcdLines {
 public:
     /// What a line is.
@@ -17,7 +17,7 @@ public:
         HEADER,     ///< `[name]`
         ASSIGNMENT, ///< `name = value`
         APPEND,     ///< `name += value`
-        INVALID,    ///< means nothing
+        INVALID,    ///< has an error
     };
 
     /// What can be wrong with a line.
@@ -25,17 +25,17 @@ public:
         NONE,               ///< nothing
         NO_EQUALS_SIGN,     ///< neither a header nor an assignment
         EMPTY_KEY,          ///< nothing before the `=`
-        BLANK_IN_KEY,       ///< a blank inside what stands before the `=`
+        BLANK_IN_KEY,       ///< a blank inside the text before the `=`
         NUL_BYTE,           ///< a byte 0 anywhere
         LINE_TOO_LONG,      ///< over 16 MiB, its continuations joined
         CONTINUED_AT_END,   ///< `\` at the end of the file
         UNCLOSED_HEADER,    ///< `[` without `]`
         EMPTY_NAME,         ///< `[]`
         BLANK_IN_NAME,      ///< a blank inside a header's name
-        TEXT_BEHIND_HEADER, ///< something behind the `]`
+        TEXT_BEHIND_HEADER, ///< text after the `]`
     };
 
-    /// Where a piece of a value was written; lines and columns are counted from 1, columns in bytes.
+    /// Where a part of a value was written; lines and columns are counted from 1, columns in bytes.
     struct SourceSpan {
         std::size_t offset; ///< of its first byte in the value
         unsigned line;      ///< of the file
@@ -50,7 +50,7 @@ public:
         std::string_view name;         ///< of a section, or the key; empty for an error
         std::string_view value;        ///< empty for headers and errors
         std::vector<SourceSpan> spans; ///< of the value, in order; one at least, even of an empty value
-        unsigned line;                 ///< of the file, where the name or the error stands
+        unsigned line;                 ///< of the file, where the name or the error is
         unsigned column;               ///< of the same
         ParseError error;              ///< `NONE` for all other kinds
         bool closesSection;            ///< a header's error: the keys up to the next header belong to nothing
@@ -69,7 +69,7 @@ public:
     /// @throw DataNotFoundException when a file can't be read; an info message that names it goes before
     [[nodiscard]] static std::vector<AcdLines> ofDatabase();
 
-    /// Takes a text apart.
+    /// Parses a text.
     /// @param text the whole file
     /// @param path how the file is shown
     /// @param family the name of its family, as the readers spell it
@@ -99,7 +99,7 @@ public:
     /// @return the comments, likewise
     [[nodiscard]] const std::vector<Comment>& comments() const noexcept { return m_comments; }
 
-    /// A line of the file as it stands there.
+    /// A physical line of the file.
     /// @param line counted from 1
     /// @return its text without the line end; empty where there is none; lives as long as this object
     [[nodiscard]] std::string_view source(unsigned line) const noexcept;

@@ -10,7 +10,7 @@
 #include <string_view>
 #include <vector>
 
-/// Which databases there are, and what stands where in them.
+/// Which databases there are, and what they contain where.
 ///
 /// The readers answer from one store a process. Where it looks is settled before the first reader: by
 /// `setSearchPath` or `setMemoryFiles`, else by the environment variable TARVIK_DATABASE (directories
@@ -43,7 +43,7 @@ public:
     /// @throw DataNotFoundException when the family's file can't be read
     [[nodiscard]] static std::vector<std::string> devices(const std::string& family);
 
-    /// Where a piece of a value was written. A value is one fragment, or several where lines are continued or
+    /// Where a part of a value was written. A value has one span, or several where lines are continued or
     /// texts appended.
     struct SourceSpan {
         std::size_t offset;     ///< of its first byte in the value
@@ -65,7 +65,7 @@ public:
 
         /// Where one byte of the text was written.
         /// @param offset of the byte
-        /// @return the fragment that it stands in, its column moved to that byte
+        /// @return the span that contains it, its column moved to that byte
         [[nodiscard]] SourceSpan at(std::size_t offset) const;
     };
 
@@ -107,7 +107,7 @@ public:
         bool fromSection; ///< whether the key is in the device's section, not the family's own keys
     };
 
-    /// Is told of every read.
+    /// Receives every read.
     using ReadObserver = std::function<void(const Read&)>;
 
     /// Calls `observer` after each read of any accessor, before the reader gets the result. Costs one branch a

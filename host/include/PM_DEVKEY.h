@@ -15,7 +15,7 @@ class ReadLog;
 class Section;
 } // namespace acd
 
-/// Reads keyed values of one database: a device's accessor sees its family's keys behind its own.
+/// Reads keyed values of one database: a device's accessor falls back to its family's keys.
 class __attribute__((visibility("default"))) PM_DEVKEY {
 public:
     /// Opens a file on a configuration. No such file gives an empty database.

@@ -18,7 +18,7 @@
 /// The message manager: everything that the libraries say goes through it, and out through one sink.
 ///
 /// Each `issue...` method comes twice. The one without further arguments takes a finished text and is safe
-/// whatever it holds: `%%` gives `%`, any other `%` stands as it is. The other is printf-like; a null text
+/// for any content: `%%` gives `%`, any other `%` stays as it is. The other is printf-like; a null text
 /// formats as `(null)`; it is a template only so that overload resolution prefers the other one where there
 /// are no further arguments.
 class __attribute__((visibility("default"))) Port_MsgManData {
@@ -66,7 +66,7 @@ public:
     void issueInfo(const char* text) const;
 
     /// Issues a notice to the user.
-    /// @param format as of printf, and so are the arguments behind it
+    /// @param format as of printf, as are the arguments after it
     template <typename Formatted = void>
     [[gnu::format(printf, 2, 3)]] void issueInfo(const char* format, ...) const;
 
@@ -75,7 +75,7 @@ public:
     void issueStatus(const char* text) const;
 
     /// Issues a status or dump line, or a piece of one.
-    /// @param format as of printf, and so are the arguments behind it
+    /// @param format as of printf, as are the arguments after it
     template <typename Formatted = void>
     [[gnu::format(printf, 2, 3)]] void issueStatus(const char* format, ...) const;
 
@@ -84,7 +84,7 @@ public:
     static void debugStub(const char* text);
 
     /// Issues trace output for developers.
-    /// @param format as of printf, and so are the arguments behind it
+    /// @param format as of printf, as are the arguments after it
     template <typename Formatted = void>
     [[gnu::format(printf, 1, 2)]] static void debugStub(const char* format, ...);
 

@@ -11,8 +11,8 @@
 
 /// A byte string with length: the text type of every interface and container of the system.
 ///
-/// Any byte may stand in it, NUL included; nothing is ever interpreted as a character encoding. Case is that
-/// of ASCII alone: bytes over 127 have none. A null text counts as the empty text wherever one is accepted.
+/// It may contain any byte, NUL included; nothing is ever interpreted as a character encoding. Case is that
+/// of ASCII alone: bytes over 127 have none. A null text is treated as the empty text everywhere.
 class __attribute__((visibility("default"))) StringBase {
 public:
     /// What `GetIndexOfFirstChar` answers for an absent character: all bits set.
@@ -74,12 +74,12 @@ public:
     [[nodiscard]] const char* end() const noexcept { return m_text.data() + m_text.size(); }
 
     /// Becomes a finished text.
-    /// @param text `%%` in it gives `%`, any other `%` stands as it is
+    /// @param text `%%` in it gives `%`, any other `%` stays as it is
     void Format(const char* text);
 
     /// Becomes what printf would print. A null text formats as `(null)`. A template only so that overload
     /// resolution prefers the finished text where there are no further arguments.
-    /// @param format as of printf, and so are the arguments behind it
+    /// @param format as of printf, as are the arguments after it
     template <typename Formatted = void>
     [[gnu::format(printf, 2, 3)]] void Format(const char* format, ...);
 
@@ -92,7 +92,7 @@ public:
     /// Looks for a character.
     /// @param wanted the character
     /// @param from the index to start at
-    /// @return the index of the first one at or behind `from`; `NOT_FOUND` when there is none
+    /// @return the index of the first one at or after `from`; `NOT_FOUND` when there is none
     [[nodiscard]] std::size_t GetIndexOfFirstChar(char wanted, std::size_t from = 0) const noexcept {
         return m_text.find(wanted, from);
     }

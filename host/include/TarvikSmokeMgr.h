@@ -8,12 +8,12 @@
 class __attribute__((visibility("default"))) TarvikSmokeMgr {
 public:
     /// Records a finished piece.
-    /// @param piece safe whatever it holds: `%%` gives `%`, any other `%` stands as it is
+    /// @param piece safe for any content: `%%` gives `%`, any other `%` stays as it is
     void smokeStatus(const char* piece);
 
     /// Records what printf would print. A null text formats as `(null)`. A template only so that overload
     /// resolution prefers the finished piece where there are no further arguments.
-    /// @param format as of printf, and so are the arguments behind it
+    /// @param format as of printf, as are the arguments after it
     template <typename Formatted = void>
     [[gnu::format(printf, 2, 3)]] void smokeStatus(const char* format, ...);
 

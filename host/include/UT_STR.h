@@ -2,7 +2,7 @@
 
 #include "StringBase.h"
 
-/// Operations on NUL-terminated texts. A null text counts as the empty text; case is that of ASCII alone.
+/// Operations on NUL-terminated texts. A null text is treated as the empty text; case is that of ASCII alone.
 namespace UT_STR {
 
 /// Compares in byte order, as unsigned bytes.

@@ -4,7 +4,7 @@
 #include <cstddef>
 #include <cstdio>
 
-// Formatting, apart from the classes that offer it: texts, messages and the recorder all format alike.
+// The formatting that texts, messages and the recorder share.
 
 std::string formatting::unescapePercent(const char* text) {
     std::string result;

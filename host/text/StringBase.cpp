@@ -16,7 +16,7 @@
 
 namespace {
 
-/// The CRC-32 of each byte, and (row n) of each byte with n zero bytes behind it, so that several bytes can be
+/// The CRC-32 of each byte, and (row n) of each byte followed by n zero bytes, so that several bytes can be
 /// taken at once.
 using ChecksumTables = std::array<std::array<std::uint32_t, 256>, 8>;
 
@@ -46,7 +46,7 @@ std::uint32_t loadLe32(const char* bytes) noexcept {
     return byte(0) | byte(1) << 8 | byte(2) << 16 | byte(3) << 24;
 }
 
-/// What four bytes add to the checksum of a text in which `behind` more bytes follow on them.
+/// What four bytes add to the checksum of a text in which `behind` more bytes follow.
 std::uint32_t crcStep(std::uint32_t word, std::size_t behind) noexcept {
     return CHECKSUMS[behind + 3][word & 0xFF] ^ CHECKSUMS[behind + 2][word >> 8 & 0xFF] ^
            CHECKSUMS[behind + 1][word >> 16 & 0xFF] ^ CHECKSUMS[behind][word >> 24];
