@@ -50,7 +50,7 @@ const std::vector<Token>& Value::list() const {
 }
 
 void Value::assign(const AcdLines& file, const AcdLines::Line& line, char separator) {
-    const AcdLines::Fragment& first = line.fragments.front();
+    const AcdLines::SourceSpan& first = line.spans.front();
     const Token value{line.value, {&file, first.line, first.column}};
     if (line.kind == AcdLines::Kind::ASSIGNMENT) {
         if (!m_source.text.empty() && m_source.key.location.file != &file) {
@@ -73,9 +73,8 @@ void Value::assign(const AcdLines& file, const AcdLines::Line& line, char separa
         joinedAppends.push_back(value);
         m_source.text += separator;
     }
-    for (const AcdLines::Fragment& fragment : line.fragments) {
-        m_source.spans.push_back(
-            {m_source.text.size() + fragment.offset, {&file, fragment.line, fragment.column}});
+    for (const AcdLines::SourceSpan& span : line.spans) {
+        m_source.spans.push_back({m_source.text.size() + span.offset, {&file, span.line, span.column}});
     }
     m_source.text += line.value;
 }
@@ -98,11 +97,12 @@ std::vector<Item> Value::itemsOf(const SourceText& source, std::vector<Token>& t
         std::vector<Token> fields;
         // Databases are mostly fields: growing step by step would take twice the memory.
         fields.reserve(
-            std::min(splitter::MAX_ITEMS,
+            std::min(AcdText::MAX_PARTS,
                      static_cast<std::size_t>(std::count(item.begin(), item.end(), splitter::FIELDS)) + 1));
-        const std::size_t end = splitter::forEachField(item, [&](std::string_view field, std::size_t at) {
-            fields.push_back(source.token(field, offset + at));
-        });
+        const std::size_t end =
+            splitter::forEachField(item, splitter::FIELDS, [&](std::string_view field, std::size_t at) {
+                fields.push_back(source.token(field, offset + at));
+            });
         if (end != text.npos) {
             truncated.push_back(source.token(itemAt(item, end, splitter::FIELDS), offset + end));
         }
@@ -214,6 +214,11 @@ Model::Model(std::vector<AcdLines> files) : m_files(std::move(files)) {
         m_familyNames.push_back(family.name);
         m_lowerFamilies.insert(lowerCase(family.name));
     }
+    // spi is a family even without a file.
+    if (m_spi == nullptr) {
+        m_familyNames.emplace_back("spi");
+        m_lowerFamilies.insert("spi");
+    }
     splitValues();
     m_supported = texts(baseKeys().list(schema::DEVICE_SUPPORTED));
     m_optionPackages = texts(baseKeys().list(schema::PROGRAM_OPTION_PACKAGE));
@@ -237,7 +242,7 @@ void Model::addFile(const AcdLines& file) {
     }
     Section* open = &family.own;
     for (const AcdLines::Line& line : file.lines()) {
-        if (line.kind == AcdLines::Kind::FAULT) {
+        if (line.kind == AcdLines::Kind::INVALID) {
             open = line.closesSection ? nullptr : open;
         } else if (line.kind == AcdLines::Kind::HEADER) {
             Section*& section = sections[lowerCase(line.name)];

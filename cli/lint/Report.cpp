@@ -1,6 +1,8 @@
 // Shows findings to people, and to programs in the tool's own JSON.
 #include "lint/Report.h"
 
+#include <AcdText.h>
+
 #include <fmt/format.h>
 
 #include <algorithm>
@@ -13,13 +15,11 @@ namespace {
 constexpr std::size_t EXCERPT_MARGIN = 10;
 constexpr std::size_t MIN_EXCERPT = 20;
 
-bool continuesCharacter(char byte) { return (static_cast<unsigned char>(byte) & 0xC0U) == 0x80U; }
-
 /// The number of columns, reading the text as UTF-8.
 std::size_t width(std::string_view text) {
     const std::string shown = printable(text);
-    return static_cast<std::size_t>(
-        std::count_if(shown.begin(), shown.end(), [](char byte) { return !continuesCharacter(byte); }));
+    return static_cast<std::size_t>(std::count_if(
+        shown.begin(), shown.end(), [](char byte) { return !AcdText::continuesCharacter(byte); }));
 }
 
 /// The line of the file, or of a long line the part around the finding, and a caret below it.
@@ -28,7 +28,7 @@ std::string excerpt(const Finding& finding, const Terminal& terminal) {
     const std::string_view line = finding.location.file->source(finding.location.line);
     const std::size_t at = std::min<std::size_t>(finding.location.column - 1, line.size());
     std::size_t begin = line.size() <= room ? 0 : at - std::min(at, room / 2);
-    while (begin > 0 && continuesCharacter(line[begin])) {
+    while (begin > 0 && AcdText::continuesCharacter(line[begin])) {
         --begin;
     }
     const std::string_view shown = line.substr(begin, room);

@@ -5,6 +5,7 @@
 #include "model/Vocabulary.h"
 #include "text/Suggest.h"
 
+#include <AcdText.h>
 #include <tarvik/ConstraintsManager.h>
 
 #include <algorithm>
@@ -98,9 +99,7 @@ std::optional<std::size_t> position(const std::vector<std::string>& all, std::st
 
 std::string upperCase(std::string_view text) {
     std::string upper(text);
-    std::transform(upper.begin(), upper.end(), upper.begin(), [](char letter) {
-        return letter >= 'a' && letter <= 'z' ? static_cast<char>(letter - 'a' + 'A') : letter;
-    });
+    std::transform(upper.begin(), upper.end(), upper.begin(), AcdText::toUpper);
     return upper;
 }
 

@@ -111,29 +111,29 @@ constexpr Rule LONE_CR{
 line.)",
     "PROPERTY = PINS,140<CR>PROPERTIES = PACKAGES,1,TQ100"};
 
-const Rule* ruleFor(AcdLines::Fault fault) {
-    switch (fault) {
-    case AcdLines::Fault::NO_EQUALS_SIGN:
+const Rule* ruleFor(AcdLines::ParseError error) {
+    switch (error) {
+    case AcdLines::ParseError::NO_EQUALS_SIGN:
         return &NO_EQUALS_SIGN;
-    case AcdLines::Fault::EMPTY_KEY:
+    case AcdLines::ParseError::EMPTY_KEY:
         return &EMPTY_KEY;
-    case AcdLines::Fault::BLANK_IN_KEY:
+    case AcdLines::ParseError::BLANK_IN_KEY:
         return &BLANK_IN_KEY;
-    case AcdLines::Fault::NUL_BYTE:
+    case AcdLines::ParseError::NUL_BYTE:
         return &NUL_BYTE;
-    case AcdLines::Fault::LINE_TOO_LONG:
+    case AcdLines::ParseError::LINE_TOO_LONG:
         return &LINE_TOO_LONG;
-    case AcdLines::Fault::CONTINUED_AT_END:
+    case AcdLines::ParseError::CONTINUED_AT_END:
         return &CONTINUED_AT_END;
-    case AcdLines::Fault::UNCLOSED_HEADER:
+    case AcdLines::ParseError::UNCLOSED_HEADER:
         return &UNCLOSED_HEADER;
-    case AcdLines::Fault::EMPTY_NAME:
+    case AcdLines::ParseError::EMPTY_NAME:
         return &EMPTY_NAME;
-    case AcdLines::Fault::BLANK_IN_NAME:
+    case AcdLines::ParseError::BLANK_IN_NAME:
         return &BLANK_IN_NAME;
-    case AcdLines::Fault::TEXT_BEHIND_HEADER:
+    case AcdLines::ParseError::TEXT_BEHIND_HEADER:
         return &TEXT_AFTER_HEADER;
-    case AcdLines::Fault::NONE:
+    case AcdLines::ParseError::NONE:
         break;
     }
     return nullptr;
@@ -161,15 +161,14 @@ const char* looksLike(std::string_view text) {
 }
 
 void checkSwallowed(const AcdLines& file, const AcdLines::Line& line, Findings& findings) {
-    for (const AcdLines::Fragment& fragment : line.fragments) {
-        if (fragment.line == line.line) {
+    for (const AcdLines::SourceSpan& span : line.spans) {
+        if (span.line == line.line) {
             continue;
         }
-        const std::string_view source = file.source(fragment.line);
-        const std::string_view text =
-            source.substr(std::min<std::size_t>(fragment.column - 1, source.size()));
+        const std::string_view source = file.source(span.line);
+        const std::string_view text = source.substr(std::min<std::size_t>(span.column - 1, source.size()));
         if (const char* const what = looksLike(text)) {
-            findings.add(SWALLOWED_LINE, {text, {&file, fragment.line, fragment.column}},
+            findings.add(SWALLOWED_LINE, {text, {&file, span.line, span.column}},
                          "this is no line of its own but part of the value of {}, though it looks like {}",
                          quoted(line.name), what);
         }
@@ -191,7 +190,7 @@ void check(const Model& model, Findings& findings) {
             checkReturns(file, comment.line, findings);
         }
         for (const AcdLines::Line& line : file.lines()) {
-            if (const Rule* const rule = ruleFor(line.fault)) {
+            if (const Rule* const rule = ruleFor(line.error)) {
                 findings.addText(*rule, {{}, {&file, line.line, line.column}}, line.text);
             }
             checkSwallowed(file, line, findings);

@@ -179,23 +179,30 @@ Token listKey(const Model& model, std::string_view key) {
     return value == nullptr ? model.base()->start() : value->key;
 }
 
+void checkTables(const Model& model, const std::string& family, Findings& findings) {
+    if (!model.supported().contains(family)) {
+        findings.add(UNSUPPORTED_FAMILY, listKey(model, schema::DEVICE_SUPPORTED),
+                     "DEVICE_SUPPORTED lacks the family {}", quoted(family));
+    }
+    if (!model.optionPackages().contains(family)) {
+        findings.add(NO_OPTION_TABLE, listKey(model, schema::PROGRAM_OPTION_PACKAGE),
+                     "PROGRAM_OPTION_PACKAGE lacks the family {}", quoted(family));
+    }
+}
+
 void checkFamilies(const Model& model, Findings& findings) {
     for (const FamilyData& family : model.families()) {
-        const bool isSupported = model.supported().contains(family.name);
-        const bool hasOptions = model.optionPackages().contains(family.name);
-        if (!isSupported && !hasOptions && !isUnderAMode(model, family.name)) {
+        if (!model.supported().contains(family.name) && !model.optionPackages().contains(family.name) &&
+            !isUnderAMode(model, family.name)) {
             findings.add(UNLISTED_FAMILY, family.start(), "no list of base.acd names the family {}",
                          quoted(family.name));
-            continue;
+        } else {
+            checkTables(model, family.name, findings);
         }
-        if (!isSupported) {
-            findings.add(UNSUPPORTED_FAMILY, listKey(model, schema::DEVICE_SUPPORTED),
-                         "DEVICE_SUPPORTED lacks the family {}", quoted(family.name));
-        }
-        if (!hasOptions) {
-            findings.add(NO_OPTION_TABLE, listKey(model, schema::PROGRAM_OPTION_PACKAGE),
-                         "PROGRAM_OPTION_PACKAGE lacks the family {}", quoted(family.name));
-        }
+    }
+    // In SPI mode every device is looked up as spi, with or without flashes.
+    if (model.spi() == nullptr && model.baseKeys().find("SPI") != nullptr) {
+        checkTables(model, "spi", findings);
     }
     for (const std::string_view name : model.supported()) {
         if (model.device(name) != nullptr && !model.optionPackages().contains(name)) {

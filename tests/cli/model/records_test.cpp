@@ -46,9 +46,9 @@ TEST(Splitter, GivesOneItemMoreThanThereAreSeparators) {
 
 TEST(Splitter, EndsWhereTheReadersDo) {
     const auto ignore = [](std::string_view, std::size_t) {};
-    const std::string commas(splitter::MAX_ITEMS - 1, ',');
+    const std::string commas(AcdText::MAX_PARTS - 1, ',');
     EXPECT_EQ(splitter::forEachItem(commas, ',', ignore), std::string_view::npos);
-    EXPECT_EQ(splitter::forEachItem(commas + ",x", ',', ignore), splitter::MAX_ITEMS);
+    EXPECT_EQ(splitter::forEachItem(commas + ",x", ',', ignore), AcdText::MAX_PARTS);
 }
 
 TEST(Records, HaveThePlaceOfEachField) {
