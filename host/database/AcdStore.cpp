@@ -1,5 +1,7 @@
 #include <AcdStore.h>
 
+#include "database/FileNames.h"
+#include "database/ReadLog.h"
 #include "database/Store.h"
 #include "text/OrEmpty.h"
 
@@ -43,20 +45,13 @@ std::vector<std::string> AcdStore::devices(const std::string& family) {
 
 namespace {
 
-/// The directory that a path leads through; empty for the name of a memory file.
-[[nodiscard]] std::string_view directoryOf(std::string_view path) {
-    const std::size_t slash = path.rfind('/');
-    // The slash of the root is its name.
-    return slash == path.npos ? std::string_view() : path.substr(0, std::max<std::size_t>(slash, 1));
-}
-
 [[nodiscard]] AcdStore::Value publicValue(const acd::Opened& opened, const acd::Value& value,
                                           bool fromSection) {
     AcdStore::Value result{value.text(), {}, fromSection, {}};
     for (const acd::Fragment& fragment : opened.database->fragments(value)) {
         const std::string_view path = opened.database->path(fragment.layer);
         result.fragments.push_back(
-            {fragment.offset, path, directoryOf(path), fragment.place.line, fragment.place.column});
+            {fragment.offset, path, acd::directoryOf(path), fragment.place.line, fragment.place.column});
     }
     return result;
 }
@@ -87,4 +82,11 @@ AcdStore::Fragment AcdStore::Value::at(std::size_t offset) const {
     return fragment;
 }
 
-void AcdStore::forget() { Store::forget(); }
+AcdStore::ReadObserver AcdStore::setReadObserver(ReadObserver observer) {
+    return acd::ReadLog::setObserver(std::move(observer));
+}
+
+void AcdStore::forget() {
+    setReadObserver({});
+    Store::forget();
+}

@@ -1,5 +1,7 @@
 #include "database/Catalogue.h"
 
+#include "database/FileNames.h"
+
 #include <algorithm>
 #include <filesystem>
 #include <system_error>
@@ -11,14 +13,6 @@
 namespace acd {
 
 namespace {
-
-constexpr std::string_view ENDING = ".acd";
-
-/// The family that a file name stands for; empty when it is no database's name.
-[[nodiscard]] std::string_view familyName(std::string_view fileName) noexcept {
-    const std::size_t length = fileName.size() - std::min(fileName.size(), ENDING.size());
-    return sameName(fileName.substr(length), ENDING) ? fileName.substr(0, length) : std::string_view();
-}
 
 [[nodiscard]] std::string joinPath(const std::string& directory, const std::string& name) {
     return directory.ends_with('/') ? directory + name : directory + '/' + name;

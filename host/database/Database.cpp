@@ -1,5 +1,6 @@
 #include "database/Database.h"
 
+#include "database/FileNames.h"
 #include "database/LineReader.h"
 
 #include <algorithm>
@@ -211,6 +212,15 @@ const Section* Database::section(std::string_view name) const noexcept {
 
 std::size_t Database::ordinal(const Section* section) const noexcept {
     return section == nullptr ? 0 : static_cast<std::size_t>(section - m_sections.data());
+}
+
+std::string_view Database::sectionName(const Section* section) const noexcept {
+    return section == nullptr ? std::string_view()
+                              : m_sectionNames[static_cast<std::uint32_t>(ordinal(section) - 1)];
+}
+
+std::string_view Database::family() const noexcept {
+    return m_layers.empty() ? std::string_view() : familyName(fileNameOf(m_layers.front().path));
 }
 
 const Value* Database::find(const Section* section, std::string_view key) const noexcept {

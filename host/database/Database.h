@@ -98,6 +98,12 @@ public:
     /// The values of layers below that `KEY = ...` on top replaced, the upper ones first.
     [[nodiscard]] std::span<const Value> replaced(const Value& value) const noexcept;
 
+    /// The name of a section as its first header spells it; empty for the family's own (null).
+    [[nodiscard]] std::string_view sectionName(const Section* section) const noexcept;
+
+    /// The family's name as the bottom layer's file spells it; empty without a file.
+    [[nodiscard]] std::string_view family() const noexcept;
+
     [[nodiscard]] std::string_view path(std::uint32_t layer) const noexcept { return m_layers[layer].path; }
 
 private:

@@ -1,6 +1,7 @@
 #include <PM_DEVKEY.h>
 
 #include "database/Database.h"
+#include "database/ReadLog.h"
 #include "database/Store.h"
 #include "text/OrEmpty.h"
 
@@ -62,17 +63,25 @@ PM_DEVKEY::PM_DEVKEY(const char* file, const PM_PIC&, unsigned char, unsigned ch
 PM_DEVKEY::PM_DEVKEY(const acd::Database& database, const acd::Section* section) noexcept
     : m_database(database), m_section(section) {}
 
+PM_DEVKEY::~PM_DEVKEY() { acd::ReadLog::forget(*this); }
+
 const char* PM_DEVKEY::getstringbykey(const char* key, const char* separator, short index,
                                       const char* subSeparator, short subIndex) {
-    if (key == nullptr) {
-        return nullptr;
-    }
+    m_request = {index, subIndex, subSeparator != nullptr, false};
+    m_request.isFound = find(orEmpty(key), separator, subSeparator);
+    acd::ReadLog::add(*this);
+    return m_request.isFound ? m_result.c_str() : nullptr;
+}
+
+/// Looks for what `m_request` asks for, and makes it the result.
+/// @return whether it exists
+bool PM_DEVKEY::find(const char* key, const char* separator, const char* subSeparator) {
     if (!isSame(m_key, key) || !isSame(m_separator, separator)) {
         select(key, orEmpty(separator));
     }
     // A negative index becomes one that is larger than any list.
-    if (m_value.empty() || !moveToItem(static_cast<std::size_t>(index))) {
-        return nullptr;
+    if (m_value.empty() || !moveToItem(static_cast<std::size_t>(m_request.index))) {
+        return false;
     }
     std::string_view piece = m_item.piece(m_value);
     if (subSeparator != nullptr) {
@@ -80,13 +89,13 @@ const char* PM_DEVKEY::getstringbykey(const char* key, const char* separator, sh
             m_subSeparator = subSeparator;
             m_field.start(piece, m_subSeparator);
         }
-        if (!m_field.moveTo(static_cast<std::size_t>(subIndex), piece, m_subSeparator)) {
-            return nullptr;
+        if (!m_field.moveTo(static_cast<std::size_t>(m_request.subIndex), piece, m_subSeparator)) {
+            return false;
         }
         piece = m_field.piece(piece);
     }
     m_result = piece;
-    return m_result.c_str();
+    return true;
 }
 
 /// Makes the value of `key` the current one, split at `separator`.

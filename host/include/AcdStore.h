@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstddef>
+#include <functional>
 #include <map>
 #include <optional>
 #include <string>
@@ -71,10 +72,51 @@ public:
     /// @throw DataNotFoundException when the family's file can't be read
     [[nodiscard]] static std::optional<Value> value(const char* name, const char* key);
 
+    /// A place in a database file.
+    struct SourceLocation {
+        std::string_view file;  ///< the path, or the name of a memory file; empty: no place
+        std::string_view layer; ///< the directory of the search path; empty for a memory file
+        unsigned line = 0;      ///< counted from 1
+        unsigned column = 0;    ///< counted from 1, in bytes
+    };
+
+    /// One call of `PM_DEVKEY::getstringbykey`. The texts `key`, `separator`, `subSeparator` and `text` are valid
+    /// during the observer's call; all others live as long as the process.
+    struct Read {
+        std::string_view family; ///< whose database was read, as its file spells it; empty: an empty database
+        std::string_view
+            device; ///< whose accessor was asked, as its section spells it; empty: the family's own
+
+        std::string_view key;
+        std::string_view separator; ///< between items; empty: the whole value is item 0
+        short item;                 ///< the index that was asked for, counted from 0
+        const char* subSeparator;   ///< between the fields of an item; null: the whole item was asked for
+        short field;                ///< the index that was asked for, counted from 0; without a meaning if
+                                    ///< `subSeparator` is null
+
+        const char* text;        ///< the result; null when the key, the item or the field does not exist
+        SourceLocation location; ///< of the first byte of `text`; no place when that is null
+
+        std::string_view value;      ///< the whole value of the key; empty when there is no such key
+        std::string_view itemText;   ///< the whole item, in `value`; empty when there is no such item
+        SourceLocation itemLocation; ///< of the first byte of the item; no place when there is no such item
+        bool fromSection; ///< whether the key is in the device's section, not the family's own keys
+    };
+
+    /// Is told of every read.
+    using ReadObserver = std::function<void(const Read&)>;
+
+    /// Calls `observer` after each read of any accessor, before the reader gets the result. Costs one branch a
+    /// read while there is no observer. What the observer throws passes through to whoever reads. Reads that
+    /// the observer makes itself are not observed, and must not be made on the accessor that is being read.
+    /// @param observer an empty one ends the observation
+    /// @return the former observer; empty when there was none
+    static ReadObserver setReadObserver(ReadObserver observer);
+
 private:
     friend class TarvikTestPeer;
 
-    /// Forgets everything, the search path included, as if nothing had been asked yet. All readers and
+    /// Forgets everything, the search path and the observer included, as if nothing had been asked yet. All readers and
     /// accessors become invalid.
     static void forget();
 };

@@ -8,6 +8,7 @@ class PM_PIC;
 
 namespace acd {
 class Database;
+class ReadLog;
 class Section;
 } // namespace acd
 
@@ -29,6 +30,8 @@ public:
     /// @param section must outlive it, too; null: the family's own keys
     PM_DEVKEY(const acd::Database& database, const acd::Section* section) noexcept;
 
+    ~PM_DEVKEY();
+
     PM_DEVKEY(const PM_DEVKEY&) = delete;
     PM_DEVKEY& operator=(const PM_DEVKEY&) = delete;
 
@@ -48,6 +51,8 @@ public:
                                              const char* subSeparator, short subIndex);
 
 private:
+    friend class acd::ReadLog;
+
     /// Where a walk over the pieces of a text stands.
     struct Cursor {
         std::size_t index = 0;
@@ -62,6 +67,15 @@ private:
         }
     };
 
+    /// What the latest call asked for, and whether it exists.
+    struct Request {
+        short index = 0;
+        short subIndex = 0;
+        bool hasSubSeparator = false;
+        bool isFound = false;
+    };
+
+    [[nodiscard]] bool find(const char* key, const char* separator, const char* subSeparator);
     void select(std::string_view key, std::string_view separator);
     bool moveToItem(std::size_t index) noexcept;
 
@@ -76,5 +90,6 @@ private:
     std::string m_subSeparator;
     Cursor m_field;
 
+    Request m_request;
     std::string m_result;
 };
