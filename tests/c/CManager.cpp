@@ -38,6 +38,11 @@ void check(tarvik_status status) {
     }
     case TARVIK_NO_MEMORY:
         throw std::bad_alloc();
+    case TARVIK_CALLBACK_FAILED: // our own callback had no memory to keep the message
+        if (std::string(error.type) == "std::bad_alloc") {
+            throw std::bad_alloc();
+        }
+        [[fallthrough]];
     default:
         throw std::logic_error(error.text);
     }
