@@ -20,7 +20,7 @@ class Message(NamedTuple):
     revision: str
 
 
-MessageCallback = Callable[[Message], None]
+MessageCallback = Callable[[Message], object]
 
 _LOGGER = logging.getLogger("tarvik")
 _LEVELS = {Channel.INFO: logging.INFO, Channel.STATUS: logging.INFO, Channel.DEBUG: logging.DEBUG}
