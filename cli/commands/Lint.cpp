@@ -8,12 +8,11 @@
 #include "term/Progress.h"
 #include "term/Table.h"
 
-#include <CLI/CLI.hpp>
-
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
 #include <algorithm>
+#include <charconv>
 #include <iterator>
 #include <memory>
 #include <set>
@@ -155,31 +154,64 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     return show(tool, examine(model, selected, ignored), arguments);
 }
 
-} // namespace
-
-Action declareLint(CLI::App& parser) {
+Action declare(ArgumentList& list) {
     auto arguments = std::make_shared<Arguments>();
-    parser
-        .add_option("DIR", arguments->directories,
-                    "Directories of the database, the first one on top; default: the database that the other "
-                    "commands use")
-        ->type_name("");
-    const auto addCodes = [&parser](const char* name, std::vector<std::string>& codes,
-                                    const char* description) {
-        parser.add_option(name, codes, description)
-            ->type_name("CODE")
-            ->delimiter(',')
-            ->allow_extra_args(false);
+    list = {
+        {.name = "DIR",
+         .description =
+             "The directories of the database, the uppermost layer first, or one of its files; without them, "
+             "the database that the other commands use",
+         .kind = ValueKind::PATH,
+         .target = &arguments->directories},
+        {.name = "--select",
+         .value = "CODE",
+         .description = "Report only rules whose code starts with one of these prefixes (comma-separated)",
+         .kind = ValueKind::LINT_CODE,
+         .isCommaSeparated = true,
+         .target = &arguments->selected},
+        {.name = "--ignore",
+         .value = "CODE",
+         .description = "Do not report rules whose code starts with one of these prefixes (comma-separated)",
+         .kind = ValueKind::LINT_CODE,
+         .isCommaSeparated = true,
+         .target = &arguments->ignored},
+        {.name = "--explain",
+         .value = "CODE",
+         .description =
+             "Explain the rules whose code starts with one of these prefixes (comma-separated), or all",
+         .kind = ValueKind::LINT_CODE,
+         .isCommaSeparated = true,
+         .target = &arguments->explained},
+        {.name = "--format",
+         .value = "FORMAT",
+         .description = "The form of the result",
+         .kind = ValueKind::CHOICE,
+         .choices = {"text", "json", "sarif", "github"},
+         .target = &arguments->format},
+        {.name = "--baseline",
+         .value = "FILE",
+         .description = "Do not report the findings of this former report, written by --format json",
+         .kind = ValueKind::PATH,
+         .target = &arguments->baseline},
+        {.name = "--max",
+         .value = "N",
+         .description = "Print at most N findings, and how many there are of each rule",
+         .target = &arguments->most},
+        {.name = "--strict",
+         .description = "Exit with status 1 for warnings, too",
+         .target = &arguments->strict},
     };
-    addCodes("--select", arguments->selected,
-             "Report only rules whose code starts with one of these prefixes (comma-separated)");
-    addCodes("--ignore", arguments->ignored,
-             "Do not report rules whose code starts with one of these prefixes");
-    addCodes("--explain", arguments->explained,
-             "Explain the rules whose code starts with one of these prefixes, or \"all\", and exit");
-    parser.add_option("--format", arguments->format, "Output format: text, json or sarif")
-        ->check(CLI::IsMember({"text", "json", "sarif"}))
-        ->type_name("FORMAT");
-    parser.add_flag("--strict", arguments->strict, "Exit with 1 on warnings, too");
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }
+
+} // namespace
+
+const Command command::LINT{
+    "lint",
+    "Check a database for mistakes",
+    "",
+    "tarvik lint database\n"
+    "tarvik lint site company --strict --format sarif\n"
+    "tarvik lint --explain T105",
+    declare,
+};
