@@ -7,7 +7,7 @@
 class Output;
 
 /// Reads standard input line by line, and flushes the output whenever it has to wait.
-class LineReader {
+class InputLines {
 public:
     /// What is longer than this is not kept.
     static constexpr std::size_t LONGEST = std::size_t{16} * 1024 * 1024;
@@ -17,7 +17,7 @@ public:
         bool tooLong;          ///< the text was dropped
     };
 
-    explicit LineReader(Output& output) : m_output(output) {}
+    explicit InputLines(Output& output) : m_output(output) {}
 
     /// The next line; nothing at the end of the input, or when it would have to wait and nobody reads the
     /// output any more. What stands behind the last line end counts as a line.

@@ -1,5 +1,5 @@
 // Buffered reading by hand: iostreams can't tell whether a read would wait, and answers must not wait then.
-#include "batch/LineReader.h"
+#include "batch/InputLines.h"
 
 #include "term/ExitCode.h"
 #include "term/Output.h"
@@ -25,7 +25,7 @@ void waitForInput() {
 
 } // namespace
 
-std::optional<LineReader::Line> LineReader::next() {
+std::optional<InputLines::Line> InputLines::next() {
     bool tooLong = false;
     for (;;) {
         const std::size_t end = m_buffer.find('\n', m_scanned);
@@ -51,7 +51,7 @@ std::optional<LineReader::Line> LineReader::next() {
     }
 }
 
-bool LineReader::fill() {
+bool InputLines::fill() {
     m_buffer.erase(0, m_start);
     m_scanned -= m_start;
     m_start = 0;
