@@ -82,7 +82,7 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     Devices devices;
     for (const std::string& name : deviceNames(arguments.family)) {
         if (matches(arguments.glob, name)) {
-            devices.push_back({name, plain(manager.getPartFamily(name.c_str())), idcodes.find(name)});
+            devices.push_back({name, toStdString(manager.getPartFamily(name.c_str())), idcodes.find(name)});
         }
     }
     if (devices.empty()) {

@@ -42,7 +42,7 @@ struct MaskMembers {
     MaskMembers members{std::move(device), std::move(asked), "operations", mask, {}, {}};
     for (const TARVIKNS::OP_TYPE operation : questions::operations(manager, mask)) {
         members.keys.push_back(vocabulary::key(operation));
-        members.names.push_back(vocabulary::operationNames().at(static_cast<std::size_t>(operation)));
+        members.names.push_back(vocabulary::displayName(operation));
     }
     return members;
 }

@@ -30,7 +30,7 @@ struct OperationOptions {
 std::string asText(const OperationOptions& answer, const Terminal& terminal) {
     std::string text;
     for (const std::string& option : answer.options) {
-        text += terminal.shown(option) + '\n';
+        text += terminal.sanitised(option) + '\n';
     }
     return text;
 }
@@ -50,7 +50,7 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     OperationOptions answer{arguments.device, operation, vocabulary::key(mode), {}};
     for (const StringBase& option :
          manager.getDeviceOperationOptions(arguments.device.c_str(), operation.c_str(), mode)) {
-        answer.options.push_back(plain(option));
+        answer.options.push_back(toStdString(option));
     }
     questions::requireKnown(manager, arguments.device);
     const ExitCode status = tool.answer(answer);

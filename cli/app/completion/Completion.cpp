@@ -29,15 +29,10 @@ struct Candidate {
 
 using Words = std::vector<std::string>;
 
-Words joined(Words left, const Words& right) {
-    left.insert(left.end(), right.begin(), right.end());
-    return left;
-}
-
 Words modes() {
     Words all = vocabulary::modes();
-    for (std::size_t mode = 0; mode < vocabulary::modes().size(); ++mode) {
-        all = joined(std::move(all), vocabulary::otherModeTexts(static_cast<TARVIKNS::MODE_TYPE>(mode)));
+    for (const vocabulary::Word& word : vocabulary::words(vocabulary::Kind::MODE)) {
+        all.insert(all.end(), word.others.begin(), word.others.end());
     }
     return all;
 }
@@ -60,14 +55,15 @@ ConstraintsManager& manager() {
 
 /// The properties of a device and its family, or of all families when there is no device.
 Words properties(const PartialCommandLine& line) {
-    const Words owners = line.operands.empty()
-                             ? catalogue::families()
-                             : Words{device(line), plain(manager().getPartFamily(device(line).c_str()))};
+    const Words owners =
+        line.operands.empty()
+            ? catalogue::families()
+            : Words{device(line), toStdString(manager().getPartFamily(device(line).c_str()))};
     std::set<std::string> keys;
     for (const std::string& owner : owners) {
         addKeys(keys, owner, "PROPERTY");
         addKeys(keys, owner, "PROPERTIES");
-        addKeys(keys, "spi.acd", plain(UT_STR::Upper(owner.c_str())) + "_PROPERTY");
+        addKeys(keys, "spi.acd", toStdString(UT_STR::Upper(owner.c_str())) + "_PROPERTY");
     }
     return {keys.begin(), keys.end()};
 }
@@ -83,7 +79,7 @@ Words propertiesToSet(const PartialCommandLine& line) {
 Words packages(const PartialCommandLine& line) {
     Words all;
     for (const StringBase& package : manager().getDeviceStringProperties(device(line).c_str(), "PACKAGES")) {
-        all.push_back(plain(package));
+        all.push_back(toStdString(package));
     }
     return all;
 }
@@ -106,10 +102,12 @@ Words codes() {
 
 /// The words that an argument can have.
 /// @throw CommandError (NO) where a file's name is expected
-Words valuesOf(const PartialCommandLine& line, const Argument& argument) {
+Words valuesOf(const CommandLine& all, const PartialCommandLine& line, const Argument& argument) {
     switch (argument.kind) {
     case ValueKind::PATH:
         throw CommandError(ExitCode::NO, "a file's name");
+    case ValueKind::COMMAND:
+        return all.commandNames();
     case ValueKind::DEVICE:
         return catalogue::names();
     case ValueKind::FLASH:
@@ -166,10 +164,10 @@ void openDatabase(const PartialCommandLine& partial) {
     }
 }
 
-std::vector<Candidate> argumentsOf(const PartialCommandLine& partial) {
+std::vector<Candidate> argumentsOf(const CommandLine& line, const PartialCommandLine& partial) {
     openDatabase(partial);
     std::vector<Candidate> all;
-    for (const std::string& word : valuesOf(partial, *partial.argument)) {
+    for (const std::string& word : valuesOf(line, partial, *partial.argument)) {
         all.push_back({partial.prefix + word, ""});
     }
     return all;
@@ -180,7 +178,7 @@ std::vector<Candidate> candidates(const CommandLine& line, const PartialCommandL
         return optionsOf(line, partial.command);
     }
     if (partial.argument != nullptr) {
-        return argumentsOf(partial);
+        return argumentsOf(line, partial);
     }
     return partial.command == nullptr && partial.prefix.empty() ? commandsOf(line) : std::vector<Candidate>{};
 }

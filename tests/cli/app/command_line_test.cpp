@@ -10,20 +10,20 @@ using testing::IsEmpty;
 using testing::StartsWith;
 
 TEST(CommandLine, VersionNamesTheTool) {
-    const Outcome outcome = runTool({"--version"});
+    const ProcessResult outcome = runTool({"--version"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.output, StartsWith("tarvik "));
 }
 
 TEST(CommandLine, NoCommandIsAFault) {
-    const Outcome outcome = runTool(std::vector<std::string>{});
+    const ProcessResult outcome = runTool(std::vector<std::string>{});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.output, IsEmpty());
     EXPECT_THAT(outcome.error, StartsWith("tarvik: a command is required\nsee: tarvik --help\n"));
 }
 
 TEST(CommandLine, UnknownCommandIsAFaultWithASuggestion) {
-    const Outcome outcome = runTool({"devises"});
+    const ProcessResult outcome = runTool({"devises"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error,
                 StartsWith("tarvik: unknown command \"devises\"; did you mean \"devices\"?\n"));
@@ -33,14 +33,14 @@ TEST(CommandLine, UnknownOptionIsAFaultWithASuggestion) {
     EXPECT_EQ(runTool({"--frob"}).error, "tarvik: unknown option \"--frob\"\nsee: tarvik --help\n");
     EXPECT_THAT(runTool({"--jsn", "devices"}).error,
                 StartsWith("tarvik: unknown option \"--jsn\"; did you mean \"--json\"?\n"));
-    const Outcome outcome = runTool({"devices", "--famly", "finch"});
+    const ProcessResult outcome = runTool({"devices", "--famly", "finch"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_EQ(outcome.error, "tarvik: unknown option \"--famly\"; did you mean \"--family\"?\n"
                              "see: tarvik devices --help\n");
 }
 
 TEST(CommandLine, TooManyArgumentsAreAFault) {
-    const Outcome outcome = runTool({"show", "FN10", "FN20"});
+    const ProcessResult outcome = runTool({"show", "FN10", "FN20"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_EQ(outcome.error, "tarvik: \"FN20\" is one argument too many\nsee: tarvik show --help\n");
 }
@@ -51,7 +51,7 @@ TEST(CommandLine, FaultsAreToldInJsonToo) {
 }
 
 TEST(CommandLine, MissingArgumentIsAFaultThatNamesTheHelp) {
-    const Outcome outcome = runTool({"show"});
+    const ProcessResult outcome = runTool({"show"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, HasSubstr("DEVICE"));
     EXPECT_THAT(outcome.error, HasSubstr("see: tarvik show --help"));
@@ -59,7 +59,7 @@ TEST(CommandLine, MissingArgumentIsAFaultThatNamesTheHelp) {
 
 TEST(CommandLine, OptionsOfTheToolMayStandBehindTheCommand) {
     const SmallDatabase database;
-    const Outcome outcome = runTool({"families", "--json", "--database", database.path()});
+    const ProcessResult outcome = runTool({"families", "--json", "--database", database.path()});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.output, StartsWith("{\"version\":1,"));
 }
@@ -70,7 +70,7 @@ TEST(CommandLine, ADeviceMayBeNamedAsACommand) {
 }
 
 TEST(CommandLine, VocabularyNeedsNoDatabase) {
-    const Outcome outcome = runTool({"--database", "/nowhere", "vocabulary"});
+    const ProcessResult outcome = runTool({"--database", "/nowhere", "vocabulary"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.error, IsEmpty());
 }

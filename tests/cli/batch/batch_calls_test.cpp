@@ -139,7 +139,7 @@ TEST(BatchCalls, MasksAreSigned) {
     const DatabaseDirectory directory(
         {{"base.acd", "DEVICE_SUPPORTED = finch\nPROGRAM_OPTION_PACKAGE = finch\n"},
          {"finch.acd", "OPERATION = EXPRESSQSVF,BS,USB2\n[FN10]\n"}});
-    Start start{{"--database", directory.path(), "batch"}, "", {}, ""};
+    ProcessOptions start{{"--database", directory.path(), "batch"}, "", {}, ""};
     start.input = request("getDeviceOperations", R"(["FN10", 0, 2])");
     EXPECT_EQ(json::parse(runTool(start).output)["result"], -2147483648LL);
 }

@@ -11,7 +11,7 @@ using testing::StartsWith;
 
 TEST(Operations, KeysStandWithTheirDisplayNames) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"operations", "FN10", "--mode", "BS", "--output", "USB2"});
+    const ProcessResult outcome = database.run({"operations", "FN10", "--mode", "BS", "--output", "USB2"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.output, "PROGRAM  Program\n");
     EXPECT_EQ(outcome.error, "");
@@ -32,7 +32,7 @@ TEST(Operations, SpiModeAnswersForTheFlashes) {
 
 TEST(Operations, NoneIsAnAnswerWithANote) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"operations", "FN10", "--mode", "SM", "--output", "USB2"});
+    const ProcessResult outcome = database.run({"operations", "FN10", "--mode", "SM", "--output", "USB2"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.output, "");
     EXPECT_EQ(outcome.error, "tarvik: \"FN10\" offers no operations there\n");
@@ -40,7 +40,7 @@ TEST(Operations, NoneIsAnAnswerWithANote) {
 
 TEST(Operations, UnknownDeviceIsANoWithASuggestion) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"operations", "FN1", "--mode", "BS", "--output", "USB2"});
+    const ProcessResult outcome = database.run({"operations", "FN1", "--mode", "BS", "--output", "USB2"});
     EXPECT_EQ(outcome.status, 1);
     EXPECT_EQ(outcome.error, "tarvik: the database has no device \"FN1\"; did you mean \"FN10\"?\n");
     EXPECT_EQ(database.json({"operations", "FN1", "--mode", "BS", "--output", "USB2"})["error"],
@@ -57,7 +57,7 @@ TEST(Operations, ModesHaveManyTextsInAnyCase) {
 
 TEST(Operations, UnknownModeIsAFaultThatSaysWhatIsAccepted) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"operations", "FN10", "--mode", "BSCN", "--output", "USB2"});
+    const ProcessResult outcome = database.run({"operations", "FN10", "--mode", "BSCN", "--output", "USB2"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_EQ(outcome.output, "");
     EXPECT_THAT(outcome.error, StartsWith("tarvik: unknown mode \"BSCN\"; did you mean \"Bscan\"?\n"));
@@ -71,7 +71,7 @@ TEST(Operations, EmptyModeIsUnknown) {
 
 TEST(Operations, OutputsAreReadWithTheirCase) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"operations", "FN10", "--mode", "BS", "--output", "usb2"});
+    const ProcessResult outcome = database.run({"operations", "FN10", "--mode", "BS", "--output", "usb2"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, StartsWith("tarvik: unknown output \"usb2\"; did you mean \"USB2\"?\n"));
 }
@@ -139,7 +139,7 @@ TEST(OperationOptions, OperationIsReadByKeyOrDisplayNameInAnyCase) {
 
 TEST(OperationOptions, NoneIsAnAnswerWithANote) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"operation-options", "FN10", "PROGRAM", "--mode", "SM"});
+    const ProcessResult outcome = database.run({"operation-options", "FN10", "PROGRAM", "--mode", "SM"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.output, "");
     EXPECT_THAT(outcome.error, HasSubstr("PROGRAM of \"FN10\" carries no options in mode SM"));
@@ -147,7 +147,7 @@ TEST(OperationOptions, NoneIsAnAnswerWithANote) {
 
 TEST(OperationOptions, UnknownOperationIsAFaultWithASuggestion) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"operation-options", "FN10", "PROGAM", "--mode", "BS"});
+    const ProcessResult outcome = database.run({"operation-options", "FN10", "PROGAM", "--mode", "BS"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error,
                 StartsWith("tarvik: unknown operation \"PROGAM\"; did you mean \"PROGRAM\"?\n"));

@@ -115,7 +115,7 @@ TEST(Terminals, NoColoursWhereTheyAreNotWanted) {
 
 TEST(Terminals, NoColoursInAPipeUnlessAskedFor) {
     const SmallDatabase database;
-    Start start = database.start({"devices"});
+    ProcessOptions start = database.start({"devices"});
     start.environment = {{"TERM", "xterm"}};
     EXPECT_THAT(runTool(start).output, Not(HasSubstr(ESCAPE)));
     start.arguments.insert(start.arguments.end(), {"--color", "always"});
