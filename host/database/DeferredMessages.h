@@ -1,6 +1,6 @@
 #pragma once
 
-#include "database/Fault.h"
+#include "database/ParseError.h"
 
 #include <list>
 #include <string>
@@ -24,10 +24,10 @@ inline constexpr int DIRECTORY_UNREADABLE = 103;
 
 /// What there is to say to the user. Gathered first and issued when the work is done, since whoever receives
 /// a message may raise, or ask for the next database.
-class Reports {
+class DeferredMessages {
 public:
-    /// A fault in a line of a file.
-    void add(std::string_view path, const Fault& fault);
+    /// An error in a line of a file.
+    void add(std::string_view path, const ParseError& error);
 
     /// A file or directory that can't be read.
     void add(std::string_view path, int location, const char* reason);
@@ -36,7 +36,7 @@ public:
     void addMissingBase(const std::string& where);
 
     /// Adds what the other has, which then has none.
-    void add(Reports&& other) noexcept { m_reports.splice(m_reports.end(), other.m_reports); }
+    void add(DeferredMessages&& other) noexcept { m_messages.splice(m_messages.end(), other.m_messages); }
 
     /// Issues what was added, in order, each once.
     void issue();
@@ -47,7 +47,7 @@ private:
         std::string text;
     };
 
-    std::list<Report> m_reports;
+    std::list<Report> m_messages;
 };
 
 } // namespace acd

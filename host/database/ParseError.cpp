@@ -1,18 +1,16 @@
-#include "database/Fault.h"
+#include "database/ParseError.h"
+
+#include <AcdText.h>
 
 #include <cstddef>
 
-// How a fault is put into words. Apart from the reading, so that whoever gathers faults can word them alike.
+// How an error is put into words. Apart from the reading, so that whoever gathers errors can word them alike.
 
 namespace acd {
 
 namespace {
 
-constexpr std::size_t LONGEST_EXCERPT = 60;
-
-[[nodiscard]] bool continuesCharacter(char byte) noexcept {
-    return (static_cast<unsigned char>(byte) & 0xC0) == 0x80;
-}
+constexpr std::size_t MAX_EXCERPT_LENGTH = 60;
 
 /// C0 controls and DEL; C1 controls as UTF-8 writes them, which a terminal obeys as well.
 [[nodiscard]] bool isControl(std::string_view text, std::size_t index) noexcept {
@@ -29,30 +27,30 @@ void appendEscaped(std::string& text, char byte) {
     text += DIGITS[value & 0xF];
 }
 
-[[nodiscard]] std::string whatIsWrong(const Fault& fault) {
-    std::string quoted = '\'' + fault.fragment + '\'';
-    switch (fault.kind) {
-    case FaultKind::NO_EQUALS_SIGN:
+[[nodiscard]] std::string whatIsWrong(const ParseError& error) {
+    std::string quoted = '\'' + error.excerpt + '\'';
+    switch (error.kind) {
+    case ParseErrorKind::NO_EQUALS_SIGN:
         return "no '=' in " + quoted;
-    case FaultKind::EMPTY_KEY:
+    case ParseErrorKind::EMPTY_KEY:
         return "no key before the '=' of " + quoted;
-    case FaultKind::BLANK_IN_KEY:
+    case ParseErrorKind::BLANK_IN_KEY:
         return "blank in the key " + quoted;
-    case FaultKind::NUL_BYTE:
+    case ParseErrorKind::NUL_BYTE:
         return "NUL byte in " + quoted;
-    case FaultKind::LINE_TOO_LONG:
+    case ParseErrorKind::LINE_TOO_LONG:
         return "line of more than 16 MiB: " + quoted;
-    case FaultKind::CONTINUED_AT_END:
+    case ParseErrorKind::CONTINUED_AT_END:
         return "the file ends where this line should go on: " + quoted;
-    case FaultKind::UNCLOSED_HEADER:
+    case ParseErrorKind::UNCLOSED_HEADER:
         return "header without ']': " + quoted;
-    case FaultKind::EMPTY_NAME:
+    case ParseErrorKind::EMPTY_NAME:
         return "header without a name: " + quoted;
-    case FaultKind::BLANK_IN_NAME:
+    case ParseErrorKind::BLANK_IN_NAME:
         return "blank in the name of a header: " + quoted;
-    case FaultKind::TEXT_BEHIND_HEADER:
+    case ParseErrorKind::TEXT_BEHIND_HEADER:
         return "text behind a header: " + quoted;
-    case FaultKind::VALUE_TOO_LONG:
+    case ParseErrorKind::VALUE_TOO_LONG:
         break;
     }
     return "the value would grow over 1 GiB by " + quoted;
@@ -60,9 +58,9 @@ void appendEscaped(std::string& text, char byte) {
 
 } // namespace
 
-std::string describe(const Fault& fault) {
-    std::string text = whatIsWrong(fault);
-    if (fault.closesSection) {
+std::string describe(const ParseError& error) {
+    std::string text = whatIsWrong(error);
+    if (error.closesSection) {
         text += "; the keys up to the next header are dropped";
     }
     return text;
@@ -85,11 +83,11 @@ std::string printable(std::string_view text) {
 }
 
 std::string excerpt(std::string_view text) {
-    if (text.size() <= LONGEST_EXCERPT) {
+    if (text.size() <= MAX_EXCERPT_LENGTH) {
         return printable(text);
     }
-    std::size_t length = LONGEST_EXCERPT;
-    while (length > LONGEST_EXCERPT - 4 && continuesCharacter(text[length])) {
+    std::size_t length = MAX_EXCERPT_LENGTH;
+    while (length > MAX_EXCERPT_LENGTH - 4 && AcdText::continuesCharacter(text[length])) {
         --length;
     }
     return printable(text.substr(0, length)) + "...";

@@ -7,13 +7,13 @@
 namespace acd {
 
 /// A place in a file; both are counted from 1, the column in bytes.
-struct Place {
+struct SourceLocation {
     std::uint32_t line;
     std::uint32_t column;
 };
 
 /// What can be wrong with a line.
-enum class FaultKind {
+enum class ParseErrorKind {
     NO_EQUALS_SIGN,
     EMPTY_KEY,
     BLANK_IN_KEY,
@@ -27,16 +27,16 @@ enum class FaultKind {
     VALUE_TOO_LONG, ///< an append that would make a value larger than a file may be
 };
 
-/// A fault that costs a line.
-struct Fault {
-    FaultKind kind;
-    bool closesSection; ///< a header's fault: the keys up to the next header belong to nothing
-    Place place;
-    std::string fragment; ///< the offending text, printable and shortened
+/// An error that costs a line.
+struct ParseError {
+    ParseErrorKind kind;
+    bool closesSection; ///< a header's error: the keys up to the next header belong to nothing
+    SourceLocation location;
+    std::string excerpt; ///< the offending text, printable and shortened
 };
 
-/// Says what the fault is, in one line without its place.
-[[nodiscard]] std::string describe(const Fault& fault);
+/// Says what the error is, in one line without its place.
+[[nodiscard]] std::string describe(const ParseError& error);
 
 /// The text with its control bytes as `\x1b`, so that it does no harm on a terminal.
 [[nodiscard]] std::string printable(std::string_view text);

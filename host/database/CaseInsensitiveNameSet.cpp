@@ -1,6 +1,6 @@
-#include "database/NameTable.h"
+#include "database/CaseInsensitiveNameSet.h"
 
-#include "text/Ascii.h"
+#include <AcdText.h>
 
 #include <algorithm>
 
@@ -11,24 +11,20 @@ namespace acd {
 
 namespace {
 
-constexpr std::size_t SMALLEST_TABLE = 8;
+constexpr std::size_t MIN_TABLE_SIZE = 8;
 
 /// FNV-1a of the lower-case name, folded so that the low bits depend on all of it.
 [[nodiscard]] std::uint32_t hashOf(std::string_view name) noexcept {
     std::uint64_t hash = 0xCBF29CE484222325;
     for (const char byte : name) {
-        hash = (hash ^ static_cast<unsigned char>(ascii::toLower(byte))) * 0x100000001B3;
+        hash = (hash ^ static_cast<unsigned char>(AcdText::toLower(byte))) * 0x100000001B3;
     }
     return static_cast<std::uint32_t>(hash ^ (hash >> 32));
 }
 
 } // namespace
 
-bool sameName(std::string_view left, std::string_view right) noexcept {
-    return left.size() == right.size() && ascii::compareIgnoringCase(left, right) == 0;
-}
-
-std::uint32_t NameTable::add(std::string_view name) {
+std::uint32_t CaseInsensitiveNameSet::add(std::string_view name) {
     // At most three quarters of the slots are taken, so that every search ends.
     if (m_names.size() + 1 > m_slots.size() / 4 * 3) {
         grow();
@@ -42,23 +38,24 @@ std::uint32_t NameTable::add(std::string_view name) {
     return slot.ordinal;
 }
 
-std::uint32_t NameTable::find(std::string_view name) const noexcept {
+std::uint32_t CaseInsensitiveNameSet::find(std::string_view name) const noexcept {
     return m_slots.empty() ? NONE : m_slots[slotOf(hashOf(name), name)].ordinal;
 }
 
 /// The slot that holds `name`, or the free one where it belongs.
-std::size_t NameTable::slotOf(std::uint32_t hash, std::string_view name) const noexcept {
+std::size_t CaseInsensitiveNameSet::slotOf(std::uint32_t hash, std::string_view name) const noexcept {
     const std::size_t mask = m_slots.size() - 1;
     std::size_t index = hash & mask;
-    while (m_slots[index].ordinal != NONE &&
-           (m_slots[index].hash != hash || !sameName(m_names[m_slots[index].ordinal], name))) {
+    while (
+        m_slots[index].ordinal != NONE &&
+        (m_slots[index].hash != hash || !AcdText::equalsIgnoreCase(m_names[m_slots[index].ordinal], name))) {
         index = (index + 1) & mask;
     }
     return index;
 }
 
-void NameTable::grow() {
-    std::vector<Slot> larger(std::max(SMALLEST_TABLE, m_slots.size() * 2), Slot{0, NONE});
+void CaseInsensitiveNameSet::grow() {
+    std::vector<Slot> larger(std::max(MIN_TABLE_SIZE, m_slots.size() * 2), Slot{0, NONE});
     const std::size_t mask = larger.size() - 1;
     for (const Slot& slot : m_slots) {
         if (slot.ordinal != NONE) {

@@ -1,4 +1,4 @@
-#include "database/HeaderScan.h"
+#include "database/SectionScanner.h"
 
 #include "database/LineReader.h"
 
@@ -32,15 +32,15 @@ namespace {
 
 } // namespace
 
-void NameList::add(std::string_view name) {
+void PackedStrings::add(std::string_view name) {
     m_bytes.insert(m_bytes.end(), name.begin(), name.end());
     m_ends.push_back(static_cast<std::uint32_t>(m_bytes.size()));
 }
 
-HeaderScan::HeaderScan(std::size_t bufferSize)
+SectionScanner::SectionScanner(std::size_t bufferSize)
     : m_bufferSize(bufferSize), m_buffer(std::make_unique_for_overwrite<char[]>(bufferSize)) {}
 
-const NameList& HeaderScan::names(const std::function<std::unique_ptr<ByteSource>()>& open) {
+const PackedStrings& SectionScanner::names(const std::function<std::unique_ptr<ByteSource>()>& open) {
     m_names.clear();
     if (!scan(*open())) {
         m_names.clear();
@@ -51,7 +51,7 @@ const NameList& HeaderScan::names(const std::function<std::unique_ptr<ByteSource
 
 /// Scans a file buffer by buffer, each cut behind its last whole line.
 /// @return false when only the full reader can tell
-bool HeaderScan::scan(ByteSource& source) {
+bool SectionScanner::scan(ByteSource& source) {
     std::size_t filled = 0;
     bool isStart = true;
     bool afterContinuation = false;
@@ -86,7 +86,7 @@ bool HeaderScan::scan(ByteSource& source) {
 }
 
 /// @param afterContinuation whether the line before these ends in a `\`
-bool HeaderScan::scanLines(std::string_view lines, bool afterContinuation) {
+bool SectionScanner::scanLines(std::string_view lines, bool afterContinuation) {
     std::size_t next = 0;
     while ((next = lines.find('[', next)) != lines.npos) {
         const std::size_t bracket = next++;
@@ -115,8 +115,8 @@ bool HeaderScan::scanLines(std::string_view lines, bool afterContinuation) {
     return true;
 }
 
-void HeaderScan::parse(ByteSource& source) {
-    const Text text = readWhole(source);
+void SectionScanner::parse(ByteSource& source) {
+    const Text text = readAll(source);
     LineReader reader(text.bytes.get(), text.size);
     Line line;
     while (reader.next(line)) {

@@ -7,12 +7,9 @@
 
 namespace acd {
 
-/// Whether two names are the same without regard to ASCII case.
-[[nodiscard]] bool sameName(std::string_view left, std::string_view right) noexcept;
-
 /// A set of names without regard to ASCII case. Each has an ordinal, in order of arrival, and the spelling
 /// with which it came first. The table holds views: the texts must outlive it.
-class NameTable {
+class CaseInsensitiveNameSet {
 public:
     /// The ordinal of a name that is not in the table.
     static constexpr std::uint32_t NONE = 0xFFFFFFFF;

@@ -12,7 +12,7 @@
 namespace acd {
 
 /// Names, one behind the other in one block of memory.
-class NameList {
+class PackedStrings {
 public:
     void clear() noexcept {
         m_bytes.clear();
@@ -31,18 +31,18 @@ private:
 };
 
 /// Finds the names of the sections of many files, much faster than reading them line by line would.
-class HeaderScan {
+class SectionScanner {
 public:
     static constexpr std::size_t BUFFER_SIZE = std::size_t{256} << 10;
 
     /// @param bufferSize another size than the usual one, for tests
-    explicit HeaderScan(std::size_t bufferSize = BUFFER_SIZE);
+    explicit SectionScanner(std::size_t bufferSize = BUFFER_SIZE);
 
     /// The names that the well-formed headers of a file give, in order, repeated ones included.
     /// @param open opens the file; asked a second time where the fast way can't tell
     /// @return valid until the next call
-    /// @throw Unreadable
-    [[nodiscard]] const NameList& names(const std::function<std::unique_ptr<ByteSource>()>& open);
+    /// @throw ReadError
+    [[nodiscard]] const PackedStrings& names(const std::function<std::unique_ptr<ByteSource>()>& open);
 
 private:
     [[nodiscard]] bool scan(ByteSource& source);
@@ -51,7 +51,7 @@ private:
 
     std::size_t m_bufferSize;
     std::unique_ptr<char[]> m_buffer; ///< used again for each file: fresh memory is dear
-    NameList m_names;
+    PackedStrings m_names;
 };
 
 } // namespace acd
