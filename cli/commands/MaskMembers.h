@@ -47,12 +47,22 @@ struct MaskMembers {
     return members;
 }
 
-/// Shows the members. An empty answer is explained, so that it is not taken for a failure.
+/// " in mode SS through SVF"
+[[nodiscard]] inline std::string circumstances(const Json& asked) {
+    std::string text;
+    if (asked.contains("mode")) {
+        text += " in mode " + asked["mode"].get<std::string>();
+    }
+    return text + " through " + asked["output"].get<std::string>();
+}
+
+/// Shows the members. An empty answer is a no, with a note so that it is not taken for a failure.
 [[nodiscard]] inline ExitCode showMembers(Tool& tool, const MaskMembers& members) {
     questions::requireKnown(tool.manager(), members.device);
-    const ExitCode status = tool.answer(members);
+    const ExitCode status = tool.answer(members, members.keys.empty() ? ExitCode::NO : ExitCode::YES);
     if (members.keys.empty()) {
-        tool.note(fmt::format("\"{}\" offers no {} there", members.device, members.kind));
+        tool.note(
+            fmt::format("{} allows no {}{}", members.device, members.kind, circumstances(members.asked)));
     }
     return status;
 }

@@ -1,4 +1,4 @@
-// `operation-options`: the options that an operation of a device carries in a mode.
+// `operation-options`: the options that an operation of a device has in a mode.
 #include "commands/Commands.h"
 
 #include "commands/CommonArguments.h"
@@ -53,10 +53,10 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
         answer.options.push_back(toStdString(option));
     }
     questions::requireKnown(manager, arguments.device);
-    const ExitCode status = tool.answer(answer);
+    const ExitCode status = tool.answer(answer, answer.options.empty() ? ExitCode::NO : ExitCode::YES);
     if (answer.options.empty()) {
-        tool.note(fmt::format("{} of \"{}\" carries no options in mode {}", operation, arguments.device,
-                              answer.mode));
+        tool.note(
+            fmt::format("{} of {} has no options in mode {}", operation, arguments.device, answer.mode));
     }
     return status;
 }

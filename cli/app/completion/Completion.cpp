@@ -68,7 +68,31 @@ Words properties(const PartialCommandLine& line) {
     return {keys.begin(), keys.end()};
 }
 
-Words propertiesToSet(const PartialCommandLine& line) {
+/// The values that any device has for a property.
+std::set<std::string> valuesOfProperty(const std::string& key) {
+    std::set<std::string> values;
+    for (const std::string& device : catalogue::names()) {
+        for (const StringBase& value : manager().getDeviceStringProperties(device.c_str(), key.c_str())) {
+            values.insert(toStdString(value));
+        }
+        if (manager().isSpiDevice(device.c_str())) {
+            values.insert(manager().getSpiDeviceStringProperty(device.c_str(), key.c_str()));
+        }
+    }
+    values.erase("");
+    return values;
+}
+
+/// "VENDOR=" for each property; after "VENDOR=" its values.
+Words assignments(const PartialCommandLine& line) {
+    const std::size_t equals = line.partialWord.find('=');
+    if (equals != std::string::npos) {
+        Words all;
+        for (const std::string& value : valuesOfProperty(line.partialWord.substr(0, equals))) {
+            all.push_back(line.partialWord.substr(0, equals + 1) + value);
+        }
+        return all;
+    }
     Words keys = properties(line);
     for (std::string& key : keys) {
         key += '=';
@@ -127,7 +151,7 @@ Words valuesOf(const CommandLine& all, const PartialCommandLine& line, const Arg
     case ValueKind::PROPERTY:
         return properties(line);
     case ValueKind::PROPERTY_VALUE:
-        return propertiesToSet(line);
+        return assignments(line);
     case ValueKind::LINT_CODE:
         return codes();
     case ValueKind::TEXT:

@@ -15,11 +15,58 @@ TEST(CommandLine, VersionNamesTheTool) {
     EXPECT_THAT(outcome.output, StartsWith("tarvik "));
 }
 
-TEST(CommandLine, NoCommandIsAFault) {
+TEST(CommandLine, VersionHasAShortName) { EXPECT_EQ(runTool({"-V"}).output, runTool({"--version"}).output); }
+
+TEST(CommandLine, WithoutArgumentsTheHelpIsShown) {
     const ProcessResult outcome = runTool(std::vector<std::string>{});
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_EQ(outcome.output, runTool({"--help"}).output);
+    EXPECT_THAT(outcome.output, HasSubstr("\nCommands:\n"));
+}
+
+TEST(CommandLine, NoCommandIsAFault) {
+    const ProcessResult outcome = runTool({"--verbose"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.output, IsEmpty());
     EXPECT_THAT(outcome.error, StartsWith("tarvik: a command is required\nsee: tarvik --help\n"));
+}
+
+TEST(CommandLine, HelpIsACommandToo) {
+    EXPECT_EQ(runTool({"help"}).output, runTool({"--help"}).output);
+    EXPECT_EQ(runTool({"help", "check"}).output, runTool({"check", "--help"}).output);
+    const ProcessResult outcome = runTool({"help", "chek"});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_EQ(outcome.error, "tarvik: unknown command \"chek\"; did you mean \"check\"?\nsee: tarvik help\n");
+}
+
+TEST(CommandLine, HelpNamesPossibleValues) {
+    EXPECT_THAT(runTool({"help", "check"}).output,
+                testing::AllOf(HasSubstr("BS, SS, SM, BSFILE"), HasSubstr("PARALLEL, ZORVA"),
+                               HasSubstr("PROGRAM, PROGRAMFLASH")));
+    EXPECT_THAT(runTool({"help", "why"}).output, HasSubstr("READPROTECT"));
+    EXPECT_THAT(runTool({"help", "lint"}).output, HasSubstr("text, json, sarif"));
+}
+
+TEST(CommandLine, HelpIsShownWithoutWhatIsRequired) {
+    EXPECT_EQ(runTool({"show", "--help"}).status, 0);
+    EXPECT_EQ(runTool({"show", "-h", "--version"}).output, runTool({"help", "show"}).output);
+}
+
+TEST(CommandLine, OptionsAfterTwoDashesAreReported) {
+    const ProcessResult outcome = runTool({"check", "--", "KS50", "--mode", "BS"});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_EQ(outcome.error, "tarvik: \"--mode\" comes after \"--\", so it is not read as an option\n"
+                             "see: tarvik check --help\n");
+}
+
+TEST(CommandLine, UnknownChoicesAreFaultsThatSayWhatIsAccepted) {
+    const ProcessResult outcome = runTool({"dump", "operation"});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_THAT(outcome.error,
+                StartsWith("tarvik: unknown table \"operation\"; did you mean \"operations\"?\n"
+                           "accepted: "));
+    EXPECT_THAT(runTool({"families", "--color", "red"}).error,
+                StartsWith("tarvik: unknown when \"red\"\naccepted: auto, always, never\n"));
 }
 
 TEST(CommandLine, UnknownCommandIsAFaultWithASuggestion) {

@@ -40,9 +40,10 @@ protected:
 };
 
 TEST_F(Completion, OffersCommandsWithTheirSummaries) {
-    EXPECT_THAT(offered({"d"}), ElementsAre("devices", "dump", "diff"));
+    EXPECT_THAT(offered({"d"}), ElementsAre("devices", "diff", "dump"));
     EXPECT_EQ(run({"fam"}).output, "families\tList the part families and their modes\n");
     EXPECT_THAT(offered({""}), Not(Contains("complete")));
+    EXPECT_THAT(offered({"help", "f"}), ElementsAre("families"));
     EXPECT_THAT(offered({"--json", "vo"}), ElementsAre("vocabulary"));
 }
 
@@ -77,6 +78,9 @@ TEST_F(Completion, OffersWhatTheDeviceHas) {
     EXPECT_THAT(offered({"property", "FLA", ""}), ElementsAre("DENSITY", "PAGE"));
     EXPECT_THAT(offered({"why", "FN10", "--property", "V"}), ElementsAre("VENDOR"));
     EXPECT_THAT(offered({"which", "--property", "V"}), ElementsAre("VENDOR="));
+    EXPECT_THAT(offered({"which", "--property", "VENDOR="}), ElementsAre("VENDOR=Korvel"));
+    EXPECT_THAT(offered({"which", "--property=VENDOR=k"}), ElementsAre("--property=VENDOR=Korvel"));
+    EXPECT_THAT(offered({"which", "--property", "NO="}), IsEmpty());
     const DatabaseDirectory packages({{"base.acd", "DEVICE_SUPPORTED = finch\n"},
                                       {"finch.acd", "PROPERTIES = PACKAGES,2,P48,TQ100\n[FN10]\n"},
                                       {"spi.acd", ""}});

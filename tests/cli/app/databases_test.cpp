@@ -31,15 +31,16 @@ TEST(Databases, GivenDirectoryIsAnsweredFromWithoutANote) {
 
 TEST(Databases, EnvironmentNamesOne) {
     const SmallDatabase database;
-    const ProcessResult outcome = runTool(ProcessOptions{{"devices"}, "", {{"TARVIK_DATABASE", database.path()}}, ""});
+    const ProcessResult outcome =
+        runTool(ProcessOptions{{"devices"}, "", {{"TARVIK_DATABASE", database.path()}}, ""});
     EXPECT_THAT(outcome.output, HasSubstr("FN10"));
     EXPECT_THAT(outcome.error, IsEmpty());
 }
 
 TEST(Databases, OptionOutranksTheEnvironment) {
     const SmallDatabase database;
-    const ProcessResult outcome =
-        runTool(ProcessOptions{{"--database", database.path(), "devices"}, "", {{"TARVIK_DATABASE", "/nowhere"}}, ""});
+    const ProcessResult outcome = runTool(ProcessOptions{
+        {"--database", database.path(), "devices"}, "", {{"TARVIK_DATABASE", "/nowhere"}}, ""});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.output, HasSubstr("FN10"));
 }
@@ -52,7 +53,8 @@ TEST(Databases, NoneGivenIsTheDemonstrationWithANote) {
 }
 
 TEST(Databases, EmptyEnvironmentNamesNone) {
-    EXPECT_EQ(runTool(ProcessOptions{{"families"}, "", {{"TARVIK_DATABASE", ""}}, ""}).error, DEMONSTRATION_NOTE);
+    EXPECT_EQ(runTool(ProcessOptions{{"families"}, "", {{"TARVIK_DATABASE", ""}}, ""}).error,
+              DEMONSTRATION_NOTE);
 }
 
 TEST(Databases, FirstLayerIsOnTop) {
@@ -78,7 +80,8 @@ TEST(Databases, MissingLayerIsAFaultThatNamesAllPaths) {
 }
 
 TEST(Databases, MissingDirectoryOfTheEnvironmentIsAFault) {
-    const ProcessResult outcome = runTool(ProcessOptions{{"devices"}, "", {{"TARVIK_DATABASE", "/nowhere:/neither"}}, ""});
+    const ProcessResult outcome =
+        runTool(ProcessOptions{{"devices"}, "", {{"TARVIK_DATABASE", "/nowhere:/neither"}}, ""});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, HasSubstr("tried: \"/nowhere\", \"/neither\"\n"));
 }

@@ -107,6 +107,7 @@ std::vector<Endings> endings(const std::string& database) {
          {{database}, {database, "/nowhere"}, {"/nowhere", database}}},
         {"report", {{"-o", "/dev/null"}}, {}, {{}, {"-o", "/nowhere/page.html"}}},
         {"batch", {{}}, {}, {{"zz"}}},
+        {"help", {{}, {"check"}}, {}, {{"zz"}}},
     };
 }
 

@@ -135,7 +135,8 @@ TEST(Check, UsageFaultsNeedNoDatabase) {
 TEST(Multiboot, TypeIsReadWithAndWithoutItsPrefixInAnyCase) {
     const SmallDatabase database;
     for (const char* const type : {"MB_SPI", "mb_spi", "TYPE_MB_SPI", "type_mb_spi"}) {
-        const ProcessResult yes = database.run({"multiboot", "fla", "--type", type, "--width", "none", "--lead"});
+        const ProcessResult yes =
+            database.run({"multiboot", "fla", "--type", type, "--width", "none", "--lead"});
         EXPECT_EQ(yes.status, 0);
         EXPECT_EQ(yes.output, "yes: fla as lead device of TYPE_MB_SPI NONE\n");
     }
@@ -143,7 +144,8 @@ TEST(Multiboot, TypeIsReadWithAndWithoutItsPrefixInAnyCase) {
 
 TEST(Multiboot, PositionCounts) {
     const SmallDatabase database;
-    const ProcessResult no = database.run({"multiboot", "FLA", "--type", "MB_SPI", "--width", "NONE", "--chain"});
+    const ProcessResult no =
+        database.run({"multiboot", "FLA", "--type", "MB_SPI", "--width", "NONE", "--chain"});
     EXPECT_EQ(no.status, 1);
     EXPECT_EQ(no.output, "no: FLA as chain device of TYPE_MB_SPI NONE\n");
 }
@@ -163,11 +165,13 @@ TEST(Multiboot, CombinationThatNoTypeHasIsANo) {
 
 TEST(Multiboot, UnknownWordsAreFaults) {
     const SmallDatabase database;
-    const ProcessResult type = database.run({"multiboot", "FLA", "--type", "MB", "--width", "NONE", "--lead"});
+    const ProcessResult type =
+        database.run({"multiboot", "FLA", "--type", "MB", "--width", "NONE", "--lead"});
     EXPECT_EQ(type.status, 2);
     EXPECT_THAT(type.error, HasSubstr("unknown multiboot type \"MB\"; did you mean \"MB_SPI\"?\n"));
     EXPECT_THAT(type.error, HasSubstr("TYPE_BPI, TYPE_MB_SPI, TYPE_MB_BPI, TYPE_MB_QPRM"));
-    const ProcessResult width = database.run({"multiboot", "FLA", "--type", "BPI", "--width", "WIDE", "--lead"});
+    const ProcessResult width =
+        database.run({"multiboot", "FLA", "--type", "BPI", "--width", "WIDE", "--lead"});
     EXPECT_EQ(width.status, 2);
     EXPECT_THAT(width.error, HasSubstr("SERIAL, PARALLEL, NONE"));
 }
@@ -181,7 +185,8 @@ TEST(Multiboot, JsonHoldsTheQuestion) {
 
 TEST(Multiboot, UnknownDeviceIsNoted) {
     const SmallDatabase database;
-    const ProcessResult no = database.run({"multiboot", "FLX", "--type", "MB_SPI", "--width", "NONE", "--lead"});
+    const ProcessResult no =
+        database.run({"multiboot", "FLX", "--type", "MB_SPI", "--width", "NONE", "--lead"});
     EXPECT_EQ(no.status, 1);
     EXPECT_THAT(no.error, HasSubstr("the database has no device \"FLX\"; did you mean \"FLA\"?"));
 }

@@ -94,8 +94,8 @@ TEST(Families, SameInJson) {
 TEST(Vocabulary, ModesComeWithTheirOtherTexts) {
     const ProcessResult outcome = runTool({"vocabulary"});
     EXPECT_EQ(outcome.status, 0);
-    EXPECT_THAT(outcome.output, HasSubstr("0  BS       Bscan\n"));
-    EXPECT_THAT(outcome.output, HasSubstr("6  KITECF   CF CompactFlash\n"));
+    EXPECT_THAT(outcome.output, HasSubstr("0  BS       Bscan            Boundary Scan mode\n"));
+    EXPECT_THAT(outcome.output, HasSubstr("6  KITECF   CF CompactFlash  Kite Compact Flash  mode\n"));
 }
 
 TEST(Vocabulary, AllValuesStandInTheirOrder) {
@@ -105,14 +105,23 @@ TEST(Vocabulary, AllValuesStandInTheirOrder) {
     EXPECT_EQ(answer["outputs"].size(), 10U);
     EXPECT_EQ(answer["operations"].size(), 32U);
     EXPECT_EQ(answer["options"].size(), 24U);
-    EXPECT_EQ(answer["modes"][4], json::parse(R"({"value": 4, "key": "DP770", "also": ["DTCONFIG"]})"));
+    EXPECT_EQ(
+        answer["modes"][4],
+        json::parse(
+            R"({"value": 4, "key": "DP770", "also": ["DTCONFIG"], "name": "Destop Programming mode"})"));
     EXPECT_EQ(answer["operations"][2],
               json::parse(R"({"value": 2, "key": "PROGRAMFPGAONLY", "name": "Program FPGA Only "})"));
 }
 
+TEST(Devices, NamesOnlyAreWithoutHeader) {
+    const SmallDatabase database;
+    EXPECT_EQ(database.run({"devices", "--names"}).output, "FN10\nFN20\n");
+}
+
 TEST(Vocabulary, WordsThatDatabasesCannotUseAreMarked) {
     const json answer = json::parse(runTool({"vocabulary", "--json"}).output);
-    EXPECT_EQ(answer["outputs"][5], json::parse(R"({"value": 5, "key": "QSVF", "inDatabases": false})"));
+    EXPECT_EQ(answer["outputs"][5],
+              json::parse(R"({"value": 5, "key": "QSVF", "inDatabases": false, "name": "QSVF"})"));
     EXPECT_EQ(answer["outputs"][6]["inDatabases"], true);
     EXPECT_EQ(answer["options"][16]["inDatabases"], true);
     EXPECT_EQ(answer["options"][17]["inDatabases"], false);

@@ -129,7 +129,8 @@ TEST(Which, NamesTheDevicesThatHaveNoAnswer) {
         {{"base.acd", "DEVICE_SUPPORTED = finch\nBS = outputs,USB2:families,finch\n"},
          {"finch.acd", "PROGRAM_OPTION = NONSENSE,Bscan,USB2\n[FN10]\n[FN20]\n"},
          {"spi.acd", "DEVICE_FAMILY = ST1\n"}});
-    const ProcessResult outcome = runTool({"--database", database.path(), "which", "--property", "VENDOR=Korvel"});
+    const ProcessResult outcome =
+        runTool({"--database", database.path(), "which", "--property", "VENDOR=Korvel"});
     EXPECT_EQ(outcome.status, 1);
     EXPECT_THAT(outcome.error, HasSubstr("no answer for 2 devices, the first \"FN10\": see tarvik why"));
     EXPECT_THAT(
