@@ -42,8 +42,8 @@ bool sameWithoutCase(std::string_view left, std::string_view right) {
 
 std::string lowerCase(std::string_view text) { return AcdText::lowerCase(text); }
 
-std::optional<std::string> nearest(std::string_view text, const std::vector<std::string>& candidates) {
-    // Nobody mistypes a name of this length; and the distance costs the product of both lengths.
+std::optional<std::string> suggest(std::string_view text, const std::vector<std::string>& candidates) {
+    // A name of this length is not mistyped, and the distance costs the product of both lengths.
     constexpr std::size_t LONGEST = 100;
     if (text.empty() || text.size() > LONGEST) {
         return std::nullopt;
@@ -71,6 +71,6 @@ std::optional<std::string> nearest(std::string_view text, const std::vector<std:
 }
 
 std::string didYouMean(std::string_view text, const std::vector<std::string>& candidates) {
-    const std::optional<std::string> candidate = nearest(text, candidates);
+    const std::optional<std::string> candidate = suggest(text, candidates);
     return candidate ? "; did you mean \"" + *candidate + "\"?" : std::string();
 }
