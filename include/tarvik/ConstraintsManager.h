@@ -345,6 +345,7 @@ public:
     void dumpMbBpiSpi() const;
 
 private:
+    friend class ManagerFactory;
     friend class TarvikTestPeer;
 
     ConstraintsManager();
