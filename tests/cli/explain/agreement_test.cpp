@@ -1,6 +1,8 @@
 // Holds the verdict of every explanation against the manager's, over random databases.
 #include "WhyFixtures.h"
 
+#include "model/Vocabulary.h"
+
 #include "reference/DatabaseGenerator.h"
 #include "reference/Words.h"
 
@@ -85,11 +87,10 @@ Tally compareOverRandomDatabases(Health health, int seed) {
         Picker pick(rc::Random(static_cast<std::uint64_t>(seed * DATABASES + number)));
         const Files files = makeDatabases(pick, health);
         const Databases databases(files);
-        const why::StartUp facts = why::readStartUp();
         for (int asked = 0; asked < QUESTIONS; ++asked) {
             const Question question = randomQuestion(pick);
             const Verdict verdict = why::ask(Databases::freshManager(), question);
-            const why::Explanation explanation = why::explain(facts, question);
+            const why::Explanation explanation = why::explain(question);
             tally.count(verdict);
             if (verdict != explanation.verdict || explanation.steps.empty()) {
                 ADD_FAILURE() << asPlainText({question, verdict, explanation}) << shown(files);
@@ -119,12 +120,11 @@ TEST(WhyAgreement, AlternativesAreAllowed) {
     for (int number = 0; number < 30; ++number) {
         Picker pick(rc::Random(static_cast<std::uint64_t>(5000 + number)));
         const Databases databases(makeDatabases(pick, Health::SOUND));
-        const why::StartUp facts = why::readStartUp();
         for (int asked = 0; asked < 10; ++asked) {
             Question question = randomQuestion(pick);
             question.kind = Kind::DEVICE;
-            const why::Step instead = stepAbout(why::alternatives(facts, question), "instead");
-            for (int mode = 0; mode < static_cast<int>(why::StartUp::MODES); ++mode) {
+            const why::Step instead = stepAbout(why::alternatives(question), "instead");
+            for (int mode = 0; mode < static_cast<int>(vocabulary::modes().size()); ++mode) {
                 question.mode = static_cast<TARVIKNS::MODE_TYPE>(mode);
                 const std::string key = plain(ConstraintsManager::modeType2String(question.mode));
                 const std::string words = " " + instead.text.substr(instead.text.rfind("mode ") + 5) + ",";
