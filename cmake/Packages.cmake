@@ -26,6 +26,8 @@ set(this_version "(= ${PROJECT_VERSION}-${CPACK_DEBIAN_PACKAGE_RELEASE})")
 
 set(CPACK_DEBIAN_LIBRARY_PACKAGE_SECTION libs)
 set(CPACK_DEBIAN_LIBRARY_PACKAGE_SHLIBDEPS ON)
+set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS_PRIVATE_DIRS # the manager needs the host layer, which is in the same package
+  ${PROJECT_BINARY_DIR}/host ${PROJECT_BINARY_DIR}/s)
 set(CPACK_DEBIAN_PACKAGE_GENERATE_SHLIBS ON)
 set(CPACK_DEBIAN_PACKAGE_GENERATE_SHLIBS_POLICY ">=")
 set(CPACK_DEBIAN_LIBRARY_PACKAGE_RECOMMENDS ${database_package})
@@ -49,9 +51,6 @@ a pkg-config file, guides and an example.")
 
 set(CPACK_DEBIAN_TOOLS_PACKAGE_SECTION devel)
 set(CPACK_DEBIAN_TOOLS_PACKAGE_SHLIBDEPS ON)
-set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS_PRIVATE_DIRS # our own libraries, whose package is named below
-  ${PROJECT_BINARY_DIR}/host ${PROJECT_BINARY_DIR}/s)
-set(CPACK_DEBIAN_TOOLS_PACKAGE_DEPENDS "${library_package} ${this_version}")
 set(CPACK_DEBIAN_TOOLS_PACKAGE_RECOMMENDS ${database_package})
 set(CPACK_DEBIAN_TOOLS_DESCRIPTION "device-programming constraints - command-line tool
 The command tarvik asks a device database what a device-programming

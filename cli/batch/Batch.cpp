@@ -1,15 +1,13 @@
-// `batch`: one request a line in, one answer a line out, for the whole exported interface.
-#include "commands/Commands.h"
+// Answers requests for the whole exported interface: one a line in, one answer a line out.
+#include "batch/Batch.h"
 
 #include "batch/Calls.h"
-#include "batch/LineReader.h"
+#include "batch/InputLines.h"
 #include "batch/RequestReader.h"
 #include "query/Tool.h"
 
 #include <TarvikException.h>
 #include <tarvik/ConstraintsManager.h>
-
-#include <CLI/CLI.hpp>
 
 #include <fmt/format.h>
 
@@ -18,7 +16,7 @@ namespace {
 bool isBlank(std::string_view text) { return text.find_first_not_of(" \t\r") == std::string_view::npos; }
 
 /// The result of a call, or the exception that it raised.
-std::pair<const char*, Json> made(const PreparedCall& prepared, ConstraintsManager& manager) {
+std::pair<const char*, Json> invoke(const PreparedCall& prepared, ConstraintsManager& manager) {
     try {
         return {"result", prepared.call->invoke(manager, prepared.arguments)};
     } catch (const TarvikException& exception) {
@@ -27,13 +25,13 @@ std::pair<const char*, Json> made(const PreparedCall& prepared, ConstraintsManag
 }
 
 /// Answers requests from the one manager, which the first of them makes.
-class Answerer {
+class RequestHandler {
 public:
-    explicit Answerer(Messages& messages) : m_messages(messages) {}
+    explicit RequestHandler(Messages& messages) : m_messages(messages) {}
 
-    [[nodiscard]] Json answer(const LineReader::Line& line) {
+    [[nodiscard]] Json answer(const InputLines::Line& line) {
         if (line.tooLong) {
-            return error({}, fmt::format("a line longer than {} bytes", LineReader::LONGEST));
+            return error({}, fmt::format("a line longer than {} bytes", InputLines::LONGEST));
         }
         Request request = readRequest(line.text);
         if (!request.fault.empty()) {
@@ -43,9 +41,9 @@ public:
         if (prepared.call == nullptr) {
             return error(std::move(request.id), prepared.fault);
         }
-        m_ended = endsTheRun(*prepared.call);
+        m_ended = isShutdown(*prepared.call);
         Json answer{{"id", std::move(request.id)}};
-        auto [kind, value] = made(prepared, manager());
+        auto [kind, value] = invoke(prepared, manager());
         answer[kind] = std::move(value);
         answer["messages"] = asJson(m_messages.take());
         return answer;
@@ -69,24 +67,26 @@ private:
     bool m_ended = false;
 };
 
+} // namespace
+
+namespace batch {
+
 ExitCode run(Tool& tool) {
     tool.openDatabase();
     Output& output = tool.output();
-    LineReader lines(output);
-    Answerer answerer(tool.messages());
-    while (!answerer.ended() && !output.closed()) {
-        const std::optional<LineReader::Line> line = lines.next();
+    InputLines lines(output);
+    RequestHandler handler(tool.messages());
+    while (!handler.ended() && !output.closed()) {
+        const std::optional<InputLines::Line> line = lines.next();
         if (!line) {
             break;
         }
         if (line->tooLong || !isBlank(line->text)) {
-            output.write(oneLine(answerer.answer(*line)) + '\n');
+            output.write(oneLine(handler.answer(*line)) + '\n');
         }
     }
     output.flush();
     return ExitCode::YES;
 }
 
-} // namespace
-
-Action declareBatch(CLI::App&) { return run; }
+} // namespace batch

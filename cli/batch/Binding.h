@@ -74,39 +74,39 @@ Type read(const Json& argument) {
     }
 }
 
-inline Json written(Json value) { return value; }
-inline Json written(bool value) { return value; }
-inline Json written(int value) { return value; }
-inline Json written(long value) { return value; }
-inline Json written(const char* text) { return text == nullptr ? Json() : Json(text); }
-inline Json written(const StringBase& text) { return plain(text); }
-inline Json written(const ConstraintsManager* manager) { return manager != nullptr; }
+inline Json toJson(Json value) { return value; }
+inline Json toJson(bool value) { return value; }
+inline Json toJson(int value) { return value; }
+inline Json toJson(long value) { return value; }
+inline Json toJson(const char* text) { return text == nullptr ? Json() : Json(text); }
+inline Json toJson(const StringBase& text) { return plain(text); }
+inline Json toJson(const ConstraintsManager* manager) { return manager != nullptr; }
 
 template <typename Type>
-requires std::is_enum_v<Type> Json written(Type value) { return static_cast<int>(value); }
+requires std::is_enum_v<Type> Json toJson(Type value) { return static_cast<int>(value); }
 
 template <typename Type>
-Json written(const std::vector<Type>& values) {
+Json toJson(const std::vector<Type>& values) {
     Json list = Json::array();
     for (const Type& value : values) {
-        list.push_back(written(value));
+        list.push_back(toJson(value));
     }
     return list;
 }
 
-inline Json written(const ConstraintsManager::TextSet& texts) {
+inline Json toJson(const ConstraintsManager::TextSet& texts) {
     Json list = Json::array();
     for (const StringBase& text : texts) {
-        list.push_back(written(text));
+        list.push_back(toJson(text));
     }
     return list;
 }
 
-inline Json written(const ConstraintsManager::Texts& texts) {
+inline Json toJson(const ConstraintsManager::Texts& texts) {
     // The names of a map differ already: appended as they are, since setting each searches all before it.
     Json::object_t object;
     for (const auto& [name, text] : texts) {
-        object.emplace_back(plain(name), written(text));
+        object.emplace_back(plain(name), toJson(text));
     }
     return object;
 }
@@ -138,7 +138,7 @@ Json invoke(ConstraintsManager& manager, const Arguments& arguments, Signature<R
         call();
         return nullptr;
     } else {
-        return written(call());
+        return toJson(call());
     }
 }
 

@@ -136,7 +136,7 @@ bool isEnumeration(Kind kind) {
     return kind == Kind::MODE || kind == Kind::OUTPUT || kind == Kind::OPERATION || kind == Kind::OPTION;
 }
 
-bool suits(Kind kind, const Json& argument, bool named) {
+bool matchesKind(Kind kind, const Json& argument, bool named) {
     if (isEnumeration(kind)) {
         return argument.is_number_integer() || (named && argument.is_string());
     }
@@ -144,7 +144,7 @@ bool suits(Kind kind, const Json& argument, bool named) {
 }
 
 /// Arranges the arguments in the order of the parameters. @return false when count, names or kinds differ
-bool arrange(const Call& call, Json& arguments, std::array<Json*, binding::MOST_PARAMETERS>& arranged) {
+bool bindArguments(const Call& call, Json& arguments, std::array<Json*, binding::MOST_PARAMETERS>& bound) {
     const bool named = arguments.is_object();
     if (arguments.size() != call.count) {
         return false;
@@ -156,11 +156,11 @@ bool arrange(const Call& call, Json& arguments, std::array<Json*, binding::MOST_
             if (found == arguments.end()) {
                 return false;
             }
-            arranged[i] = &*found;
+            bound[i] = &*found;
         } else {
-            arranged[i] = &arguments[i];
+            bound[i] = &arguments[i];
         }
-        if (!suits(parameter.kind, *arranged[i], named)) {
+        if (!matchesKind(parameter.kind, *bound[i], named)) {
             return false;
         }
     }
@@ -190,7 +190,7 @@ bool fitsInt(const Json& number) {
 }
 
 /// Turns a key name into its number. @return what is wrong with the argument; empty when nothing is
-std::string settle(const Parameter& parameter, Json& argument) {
+std::string normaliseArgument(const Parameter& parameter, Json& argument) {
     if (isEnumeration(parameter.kind)) {
         if (!argument.is_string()) {
             return fitsInt(argument) ? "" : fmt::format("\"{}\" is out of range", parameter.name);
@@ -260,20 +260,21 @@ PreparedCall prepare(Request& request) {
         prepared.fault = unknownCall(request.call);
         return prepared;
     }
-    std::array<Json*, binding::MOST_PARAMETERS> arranged{};
+    std::array<Json*, binding::MOST_PARAMETERS> bound{};
     const auto overload =
-        std::find_if(found->second.begin(), found->second.end(),
-                     [&](const Call& candidate) { return arrange(candidate, request.arguments, arranged); });
+        std::find_if(found->second.begin(), found->second.end(), [&](const Call& candidate) {
+            return bindArguments(candidate, request.arguments, bound);
+        });
     if (overload == found->second.end()) {
         prepared.fault = described(found->second);
         return prepared;
     }
     for (std::size_t i = 0; i < overload->count && prepared.fault.empty(); ++i) {
-        prepared.fault = settle(overload->parameters[i], *arranged[i]);
-        prepared.arguments[i] = arranged[i];
+        prepared.fault = normaliseArgument(overload->parameters[i], *bound[i]);
+        prepared.arguments[i] = bound[i];
     }
     prepared.call = prepared.fault.empty() ? &*overload : nullptr;
     return prepared;
 }
 
-bool endsTheRun(const Call& call) { return call.name == REMOVE; }
+bool isShutdown(const Call& call) { return call.name == REMOVE; }

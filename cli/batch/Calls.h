@@ -18,4 +18,4 @@ struct PreparedCall {
 [[nodiscard]] PreparedCall prepare(Request& request);
 
 /// Does this call remove the manager, so that nothing may follow it?
-[[nodiscard]] bool endsTheRun(const binding::Call& call);
+[[nodiscard]] bool isShutdown(const binding::Call& call);

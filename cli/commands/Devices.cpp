@@ -9,8 +9,6 @@
 
 #include <tarvik/ConstraintsManager.h>
 
-#include <CLI/CLI.hpp>
-
 #include <fmt/format.h>
 
 #include <fnmatch.h>
@@ -96,12 +94,29 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     return tool.answer(devices);
 }
 
-} // namespace
-
-Action declareDevices(CLI::App& parser) {
+Action declare(ArgumentList& list) {
     auto arguments = std::make_shared<Arguments>();
-    parser.add_option("--family", arguments->family, "Only the devices of this family")->type_name("FAMILY");
-    parser.add_option("GLOB", arguments->glob, "Only the names that match, in any case: * and ? and [...]")
-        ->type_name("");
+    list = {
+        {.name = "--family",
+         .value = "FAMILY",
+         .description = "List only the devices of this family",
+         .kind = ValueKind::FAMILY,
+         .target = &arguments->family},
+        {.name = "GLOB",
+         .description = "List only the devices whose name matches, in any case; *, ? and [...] are wildcards",
+         .kind = ValueKind::DEVICE,
+         .target = &arguments->glob},
+    };
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }
+
+} // namespace
+
+const Command command::DEVICES{
+    "devices",
+    "List devices with family and IDCODE",
+    "",
+    "tarvik devices --family kestrel\n"
+    "tarvik devices 'ks*'",
+    declare,
+};

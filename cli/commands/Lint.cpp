@@ -8,8 +8,6 @@
 #include "term/Progress.h"
 #include "term/Table.h"
 
-#include <CLI/CLI.hpp>
-
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
@@ -163,30 +161,55 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     return show(tool, examine(model, arguments), arguments);
 }
 
-} // namespace
-
-Action declareLint(CLI::App& parser) {
+Action declare(ArgumentList& list) {
     auto arguments = std::make_shared<Arguments>();
-    parser
-        .add_option("DIR", arguments->directories,
-                    "The database's directories, layers with the first one on top; without them, the "
-                    "database that the other commands answer from")
-        ->type_name("");
-    const auto addCodes = [&parser](const char* name, std::vector<std::string>& codes,
-                                    const char* description) {
-        parser.add_option(name, codes, description)
-            ->type_name("CODE")
-            ->delimiter(',')
-            ->allow_extra_args(false);
+    list = {
+        {.name = "DIR",
+         .description =
+             "The directories of the database, the uppermost layer first; without them, the database "
+             "that the other commands use",
+         .kind = ValueKind::PATH,
+         .target = &arguments->directories},
+        {.name = "--select",
+         .value = "CODE",
+         .description = "Report only rules whose code starts with one of these prefixes (comma-separated)",
+         .kind = ValueKind::LINT_CODE,
+         .isCommaSeparated = true,
+         .target = &arguments->selected},
+        {.name = "--ignore",
+         .value = "CODE",
+         .description = "Do not report rules whose code starts with one of these prefixes (comma-separated)",
+         .kind = ValueKind::LINT_CODE,
+         .isCommaSeparated = true,
+         .target = &arguments->ignored},
+        {.name = "--explain",
+         .value = "CODE",
+         .description =
+             "Explain the rules whose code starts with one of these prefixes (comma-separated), or all",
+         .kind = ValueKind::LINT_CODE,
+         .isCommaSeparated = true,
+         .target = &arguments->explained},
+        {.name = "--format",
+         .value = "FORMAT",
+         .description = "The form of the result",
+         .kind = ValueKind::CHOICE,
+         .choices = {"text", "json", "sarif"},
+         .target = &arguments->format},
+        {.name = "--strict",
+         .description = "Exit with status 1 for warnings, too",
+         .target = &arguments->strict},
     };
-    addCodes("--select", arguments->selected,
-             "Tell only what has a code that begins so; several between commas");
-    addCodes("--ignore", arguments->ignored, "Tell nothing that has a code that begins so");
-    addCodes("--explain", arguments->explained,
-             "Explain the codes that begin so, or \"all\", and do nothing else");
-    parser.add_option("--format", arguments->format, "How to tell it: text, json or sarif")
-        ->check(CLI::IsMember({"text", "json", "sarif"}))
-        ->type_name("FORMAT");
-    parser.add_flag("--strict", arguments->strict, "Warnings count as findings too");
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }
+
+} // namespace
+
+const Command command::LINT{
+    "lint",
+    "Check a database for mistakes",
+    "",
+    "tarvik lint database\n"
+    "tarvik lint site company --strict --format sarif\n"
+    "tarvik lint --explain T105",
+    declare,
+};

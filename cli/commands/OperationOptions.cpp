@@ -1,13 +1,12 @@
 // `operation-options`: the options that an operation of a device carries in a mode.
 #include "commands/Commands.h"
 
+#include "commands/CommonArguments.h"
 #include "model/Vocabulary.h"
 #include "query/ManagerQueries.h"
 #include "query/Tool.h"
 
 #include <tarvik/ConstraintsManager.h>
-
-#include <CLI/CLI.hpp>
 
 #include <fmt/format.h>
 
@@ -62,12 +61,26 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     return status;
 }
 
-} // namespace
-
-Action declareOperationOptions(CLI::App& parser) {
+Action declare(ArgumentList& list) {
     auto arguments = std::make_shared<Arguments>();
-    parser.add_option("DEVICE", arguments->device, "The device, or a family")->type_name("")->required();
-    parser.add_option("OPERATION", arguments->operation, "The operation")->type_name("")->required();
-    parser.add_option("-m,--mode", arguments->mode, "The configuration mode")->type_name("MODE")->required();
+    list = {
+        argument::device(&arguments->device),
+        {.name = "OPERATION",
+         .description = "The operation",
+         .kind = ValueKind::OPERATION,
+         .required = true,
+         .target = &arguments->operation},
+        argument::mode(&arguments->mode),
+    };
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }
+
+} // namespace
+
+const Command command::OPERATION_OPTIONS{
+    "operation-options",
+    "List the options of an operation",
+    "",
+    "tarvik operation-options KS50 PROGRAM --mode BS",
+    declare,
+};

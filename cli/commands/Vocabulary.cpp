@@ -8,8 +8,6 @@
 #include <TarvikException.h>
 #include <tarvik/ConstraintsManager.h>
 
-#include <CLI/CLI.hpp>
-
 #include <fmt/ranges.h>
 
 namespace {
@@ -114,8 +112,11 @@ Json asJson(const Words& words) {
             {"options", asJson(words.options)}};
 }
 
+ExitCode run(Tool& tool) { return tool.answer(words()); }
+
 } // namespace
 
-Action declareVocabulary(CLI::App&) {
-    return [](Tool& tool) { return tool.answer(words()); };
-}
+const Command command::VOCABULARY{
+    "vocabulary",        "List modes, outputs, operations and options",        "",
+    "tarvik vocabulary", [](ArgumentList& /*none*/) -> Action { return run; },
+};

@@ -52,12 +52,12 @@ void Entry::assign(const AcdLines& file, const AcdLines::Line& line) {
         tooLong.clear();
     }
     if (line.value.size() > LONGEST - m_text.size()) {
-        const AcdLines::Fragment& first = line.fragments.front();
+        const AcdLines::SourceSpan& first = line.spans.front();
         tooLong.push_back({line.value, {&file, first.line, first.column}});
         return;
     }
     key = {line.name, {&file, line.line, line.column}};
-    for (const AcdLines::Fragment& fragment : line.fragments) {
+    for (const AcdLines::SourceSpan& fragment : line.spans) {
         m_fragments.push_back({m_text.size() + fragment.offset, {&file, fragment.line, fragment.column}});
     }
     m_text += line.value;
@@ -158,7 +158,7 @@ void Model::addFile(const AcdLines& file) {
     }
     Section* open = &family.own;
     for (const AcdLines::Line& line : file.lines()) {
-        if (line.kind == AcdLines::Kind::FAULT) {
+        if (line.kind == AcdLines::Kind::INVALID) {
             open = line.closesSection ? nullptr : open;
         } else if (line.kind == AcdLines::Kind::HEADER) {
             Section*& section = sections[lowerCase(line.name)];

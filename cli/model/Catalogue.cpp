@@ -64,14 +64,14 @@ Json asJson(const Origin& origin) {
     return object;
 }
 
-Origin originOf(const AcdStore::Fragment& place) {
+Origin originOf(const AcdStore::SourceSpan& place) {
     return {std::string(place.file), place.line, place.column, std::string(place.layer)};
 }
 
 Shadows shadowsOf(const AcdStore::Value& value) {
     Shadows shadows;
     for (const AcdStore::Value& replaced : value.replaced) {
-        shadows.push_back({originOf(replaced.fragments.front()), std::string(replaced.text)});
+        shadows.push_back({originOf(replaced.spans.front()), std::string(replaced.text)});
     }
     return shadows;
 }

@@ -1,6 +1,6 @@
 #include "database/FileNames.h"
 
-#include "database/NameTable.h"
+#include <AcdText.h>
 
 #include <algorithm>
 #include <cstddef>
@@ -20,7 +20,8 @@ std::string_view fileNameOf(std::string_view path) noexcept { return path.substr
 std::string_view familyName(std::string_view fileName) noexcept {
     constexpr std::string_view EXTENSION = ".acd";
     const std::size_t length = fileName.size() - std::min(fileName.size(), EXTENSION.size());
-    return sameName(fileName.substr(length), EXTENSION) ? fileName.substr(0, length) : std::string_view();
+    return AcdText::equalsIgnoreCase(fileName.substr(length), EXTENSION) ? fileName.substr(0, length)
+                                                                         : std::string_view();
 }
 
 } // namespace acd

@@ -5,10 +5,7 @@
 
 #include <PM_DEVKEY.h>
 
-#include <algorithm>
-#include <iterator>
 #include <memory>
-#include <span>
 #include <utility>
 
 // What was read last, described for those who explain an answer or an exception.
@@ -29,15 +26,9 @@ Observer& currentObserver() {
 /// Where the byte at an offset of a value was written.
 [[nodiscard]] AcdStore::SourceLocation locationIn(const Database& database, const Value& value,
                                                   std::size_t offset) {
-    const std::span<const Fragment> fragments = database.fragments(value);
-    const auto next = std::upper_bound(
-        fragments.begin(), fragments.end(), offset,
-        [](std::size_t wanted, const Fragment& fragment) { return wanted < fragment.offset; });
-    // Of fragments at the same offset all but the last are empty: the byte is in the last.
-    const Fragment& fragment = *std::prev(next);
-    const std::string_view path = database.path(fragment.layer);
-    return {path, directoryOf(path), fragment.place.line,
-            fragment.place.column + static_cast<unsigned>(offset - fragment.offset)};
+    const LayerSpan span = database.locate(value, offset);
+    const std::string_view path = database.path(span.layer);
+    return {path, directoryOf(path), span.location.line, span.location.column};
 }
 
 } // namespace
@@ -73,16 +64,16 @@ AcdStore::Read ReadLog::describe(const PM_DEVKEY& accessor) {
     }
     read.value = value->text();
     read.fromSection = accessor.m_section != nullptr && database.holds(*accessor.m_section, *value);
-    const PM_DEVKEY::Cursor& item = accessor.m_item;
-    if (read.value.empty() || item.index != static_cast<std::size_t>(request.index)) {
+    const AcdText::PartCursor& item = accessor.m_item;
+    if (read.value.empty() || item.index() != static_cast<std::size_t>(request.index)) {
         return read;
     }
-    read.itemText = item.piece(read.value);
-    read.itemLocation = locationIn(database, *value, item.position);
+    read.itemText = item.part(read.value);
+    read.itemLocation = locationIn(database, *value, item.offset());
     if (request.isFound) {
-        const std::size_t offset = request.hasSubSeparator ? accessor.m_field.position : 0;
+        const std::size_t offset = request.hasSubSeparator ? accessor.m_field.offset() : 0;
         read.text = accessor.m_result.c_str();
-        read.location = locationIn(database, *value, item.position + offset);
+        read.location = locationIn(database, *value, item.offset() + offset);
     }
     return read;
 }

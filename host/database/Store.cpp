@@ -17,7 +17,7 @@ Store*& Store::current() {
 
 Store& Store::instance() { return *current(); }
 
-void Store::forget() { delete std::exchange(current(), new Store); }
+void Store::resetForTesting() { delete std::exchange(current(), new Store); }
 
 void Store::setSearchPath(std::vector<std::string> directories) {
     retire();
@@ -49,14 +49,14 @@ const SearchPath& Store::searchPath() {
 
 Catalogue& Store::catalogue() {
     if (m_catalogue == nullptr) {
-        Reports found;
+        DeferredMessages found;
         m_catalogue = m_memoryFiles != nullptr ? std::make_unique<Catalogue>(m_memoryFiles)
                                                : std::make_unique<Catalogue>(directories(), found);
-        m_reports.add(std::move(found));
+        m_messages.add(std::move(found));
     }
     // Who receives the reports may set another search path; this catalogue then lives on, retired.
     Catalogue& catalogue = *m_catalogue;
-    m_reports.issue();
+    m_messages.issue();
     return catalogue;
 }
 
@@ -73,17 +73,17 @@ Resolution Store::resolve(std::string_view name) {
         if (Family* const family = catalogue.family(whole)) {
             return {family, {}};
         }
-        return {catalogue.familyOfDevice(whole, m_reports), whole};
+        return {catalogue.familyOfDevice(whole, m_messages), whole};
     };
     Resolution resolution = resolveWhole(name);
     if (const std::size_t cut = name.find('_'); resolution.family == nullptr && cut != name.npos) {
         resolution = resolveWhole(name.substr(0, cut));
     }
-    m_reports.issue();
+    m_messages.issue();
     return resolution;
 }
 
-Opened Store::open(std::string_view name) {
+DatabaseHandle Store::open(std::string_view name) {
     const Resolution resolution = resolve(name);
     if (resolution.family == nullptr) {
         return {nullptr, &m_nothing, nullptr};
@@ -92,12 +92,12 @@ Opened Store::open(std::string_view name) {
     return {resolution.family, &database, database.section(resolution.device)};
 }
 
-Opened Store::openBase() {
+DatabaseHandle Store::openBase() {
     if (Family* const base = family("base")) {
         return {base, &database(*base), nullptr};
     }
-    m_reports.addMissingBase(placesSearched());
-    m_reports.issue();
+    m_messages.addMissingBase(placesSearched());
+    m_messages.issue();
     throw DataNotFoundException(PRODUCT, SOURCE, REVISION, location::BASE_MISSING);
 }
 
@@ -118,8 +118,8 @@ std::string Store::placesSearched() {
 }
 
 const Database& Store::database(Family& family) {
-    const Database* const database = catalogue().database(family, m_reports);
-    m_reports.issue();
+    const Database* const database = catalogue().database(family, m_messages);
+    m_messages.issue();
     if (database == nullptr) {
         throw DataNotFoundException(PRODUCT, SOURCE, REVISION, location::FILE_UNREADABLE);
     }
@@ -133,15 +133,15 @@ const Database& Store::databaseOfFile(std::string_view fileName) {
 
 Text Store::read(const SourceFile& file) {
     try {
-        return readWhole(*catalogue().open(file));
-    } catch (const Unreadable& unreadable) {
-        m_reports.add(file.path, location::FILE_UNREADABLE, unreadable.what());
+        return readAll(*catalogue().open(file));
+    } catch (const ReadError& unreadable) {
+        m_messages.add(file.path, location::FILE_UNREADABLE, unreadable.what());
     }
-    m_reports.issue();
+    m_messages.issue();
     throw DataNotFoundException(PRODUCT, SOURCE, REVISION, location::FILE_UNREADABLE);
 }
 
-PM_DEVKEY& Store::accessor(const Opened& opened) {
+PM_DEVKEY& Store::accessor(const DatabaseHandle& opened) {
     if (opened.family == nullptr) {
         return m_nothingAccessor;
     }

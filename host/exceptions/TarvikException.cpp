@@ -1,7 +1,7 @@
 #include "TarvikException.h"
 
 #include "Port_MsgManData.h"
-#include "text/OrEmpty.h"
+#include "text/NullToEmpty.h"
 
 // The exceptions. Their destructors stand here so that each type has one home, and is caught across libraries.
 
@@ -9,7 +9,8 @@ Port::Exception::~Exception() = default;
 
 TarvikException::TarvikException(const char* product, const char* source, const char* revision,
                                  int line) noexcept
-    : m_product(orEmpty(product)), m_source(orEmpty(source)), m_revision(orEmpty(revision)), m_line(line) {}
+    : m_product(nullToEmpty(product)), m_source(nullToEmpty(source)), m_revision(nullToEmpty(revision)),
+      m_line(line) {}
 
 TarvikException::~TarvikException() = default;
 

@@ -41,7 +41,7 @@ public:
 
     /// Where a piece of a value was written. A value is one fragment, or several where lines are continued or
     /// texts appended.
-    struct Fragment {
+    struct SourceSpan {
         std::size_t offset;     ///< of its first byte in the value
         std::string_view file;  ///< the path, or the name of a memory file
         std::string_view layer; ///< the directory of the search path; empty for a memory file
@@ -51,9 +51,9 @@ public:
 
     /// A value with its origin.
     struct Value {
-        std::string_view text;           ///< lives as long as the process
-        std::vector<Fragment> fragments; ///< in order; never empty
-        bool fromSection;                ///< false: one of the family's own keys
+        std::string_view text;         ///< lives as long as the process
+        std::vector<SourceSpan> spans; ///< in order; never empty
+        bool fromSection;              ///< false: one of the family's own keys
 
         /// The values of layers below that `KEY = ...` on top replaced, the upper ones first. They have none
         /// themselves.
@@ -62,7 +62,7 @@ public:
         /// Where one byte of the text was written.
         /// @param offset of the byte
         /// @return the fragment that it stands in, its column moved to that byte
-        [[nodiscard]] Fragment at(std::size_t offset) const;
+        [[nodiscard]] SourceSpan at(std::size_t offset) const;
     };
 
     /// A value and where it comes from.
@@ -118,5 +118,5 @@ private:
 
     /// Forgets everything, the search path and the observer included, as if nothing had been asked yet. All readers and
     /// accessors become invalid.
-    static void forget();
+    static void resetForTesting();
 };

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <AcdText.h>
+
 #include <cstddef>
 #include <string>
 #include <string_view>
@@ -53,20 +55,6 @@ public:
 private:
     friend class acd::ReadLog;
 
-    /// Where a walk over the pieces of a text stands.
-    struct Cursor {
-        std::size_t index = 0;
-        std::size_t position = 0; ///< of the piece's first byte
-        std::size_t end = 0;      ///< behind its last one
-
-        void start(std::string_view text, std::string_view separator) noexcept;
-        bool moveTo(std::size_t wanted, std::string_view text, std::string_view separator) noexcept;
-        void findEnd(std::string_view text, std::string_view separator) noexcept;
-        [[nodiscard]] std::string_view piece(std::string_view text) const noexcept {
-            return text.substr(position, end - position);
-        }
-    };
-
     /// What the latest call asked for, and whether it exists.
     struct Request {
         short index = 0;
@@ -85,10 +73,10 @@ private:
     std::string m_key;
     std::string m_separator;
     std::string_view m_value;
-    Cursor m_item;
+    AcdText::PartCursor m_item;
 
     std::string m_subSeparator;
-    Cursor m_field;
+    AcdText::PartCursor m_field;
 
     Request m_request;
     std::string m_result;

@@ -54,7 +54,7 @@ void checkDuplicates(const Model& model, Findings& findings) {
             if (line.kind == AcdLines::Kind::HEADER) {
                 section = lowerCase(line.name);
                 isDropped = false;
-            } else if (line.kind == AcdLines::Kind::FAULT) {
+            } else if (line.kind == AcdLines::Kind::INVALID) {
                 isDropped = isDropped || line.closesSection;
             } else if (!isDropped) {
                 const auto [known, isFirst] = lines.try_emplace({section, line.name}, line.line);
@@ -98,7 +98,7 @@ public:
         for (const AcdLines::Line& line : file.lines()) {
             if (line.kind == AcdLines::Kind::HEADER) {
                 open = Open::SECTION;
-            } else if (line.kind == AcdLines::Kind::FAULT) {
+            } else if (line.kind == AcdLines::Kind::INVALID) {
                 open = line.closesSection ? Open::NOTHING : open;
             } else if (open == Open::OWN && !isRead(line.name)) {
                 add(file, line, hint(line.name, m_own));

@@ -71,29 +71,29 @@ constexpr Rule SWALLOWED_LINE{"L112", Level::ERROR, "line that goes on into a he
                               "comment is no comment. Drop the \"\\\", or move the comment above the key.",
                               "PROPERTY = PINS,140: \\\n[KS100]"};
 
-const Rule* ruleFor(AcdLines::Fault fault) {
+const Rule* ruleFor(AcdLines::ParseError fault) {
     switch (fault) {
-    case AcdLines::Fault::NO_EQUALS_SIGN:
+    case AcdLines::ParseError::NO_EQUALS_SIGN:
         return &NO_EQUALS_SIGN;
-    case AcdLines::Fault::EMPTY_KEY:
+    case AcdLines::ParseError::EMPTY_KEY:
         return &EMPTY_KEY;
-    case AcdLines::Fault::BLANK_IN_KEY:
+    case AcdLines::ParseError::BLANK_IN_KEY:
         return &BLANK_IN_KEY;
-    case AcdLines::Fault::NUL_BYTE:
+    case AcdLines::ParseError::NUL_BYTE:
         return &NUL_BYTE;
-    case AcdLines::Fault::LINE_TOO_LONG:
+    case AcdLines::ParseError::LINE_TOO_LONG:
         return &LINE_TOO_LONG;
-    case AcdLines::Fault::CONTINUED_AT_END:
+    case AcdLines::ParseError::CONTINUED_AT_END:
         return &CONTINUED_AT_END;
-    case AcdLines::Fault::UNCLOSED_HEADER:
+    case AcdLines::ParseError::UNCLOSED_HEADER:
         return &UNCLOSED_HEADER;
-    case AcdLines::Fault::EMPTY_NAME:
+    case AcdLines::ParseError::EMPTY_NAME:
         return &EMPTY_NAME;
-    case AcdLines::Fault::BLANK_IN_NAME:
+    case AcdLines::ParseError::BLANK_IN_NAME:
         return &BLANK_IN_NAME;
-    case AcdLines::Fault::TEXT_BEHIND_HEADER:
+    case AcdLines::ParseError::TEXT_BEHIND_HEADER:
         return &TEXT_BEHIND_HEADER;
-    case AcdLines::Fault::NONE:
+    case AcdLines::ParseError::NONE:
         break;
     }
     return nullptr;
@@ -121,7 +121,7 @@ const char* disguise(std::string_view text) {
 }
 
 void checkSwallowed(const AcdLines& file, const AcdLines::Line& line, Findings& findings) {
-    for (const AcdLines::Fragment& fragment : line.fragments) {
+    for (const AcdLines::SourceSpan& fragment : line.spans) {
         if (fragment.line == line.line) {
             continue;
         }
@@ -149,7 +149,7 @@ void checkLengths(const Section& section, Findings& findings) {
 void check(const Model& model, Findings& findings) {
     for (const AcdLines& file : model.files()) {
         for (const AcdLines::Line& line : file.lines()) {
-            if (const Rule* const rule = ruleFor(line.fault)) {
+            if (const Rule* const rule = ruleFor(line.error)) {
                 findings.add(*rule, {{}, {&file, line.line, line.column}}, line.text);
             }
             checkSwallowed(file, line, findings);

@@ -166,7 +166,7 @@ void checkOptionPackages(const Model& model, Findings& findings) {
 void check(const Model& model, Findings& findings) {
     for (const AcdLines& file : model.files()) {
         checkReopened(file, findings);
-        for (const std::string& other : file.namesakes()) {
+        for (const std::string& other : file.caseCollisions()) {
             findings.add(SAME_FILE_NAME, startOf(file),
                          fmt::format("nothing is read from {}: this file is called alike and comes first",
                                      quoted(other.substr(other.rfind('/') + 1))));

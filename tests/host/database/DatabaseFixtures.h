@@ -58,7 +58,7 @@ private:
 /// Starts each test with a store that knows nothing yet, and takes all messages.
 class DatabaseTest : public testing::Test {
 protected:
-    DatabaseTest() { acd::Store::forget(); }
+    DatabaseTest() { acd::Store::resetForTesting(); }
 
     MessageRecorder messages;
 };

@@ -1,6 +1,6 @@
 #include "DatabaseFixtures.h"
 
-#include "database/Fault.h"
+#include "database/ParseError.h"
 
 #include <iomanip>
 #include <sstream>

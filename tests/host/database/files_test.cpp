@@ -51,7 +51,7 @@ protected:
         EXPECT_THAT(valueOf("Z", "KEY"), Optional("z"sv));
         EXPECT_THAT(messages.take(), IsEmpty());
 
-        acd::Store::forget();
+        acd::Store::resetForTesting();
         AcdStore::setSearchPath({directory.path()});
         EXPECT_THAT(valueOf("Z", "KEY"), Optional("z"sv));
         EXPECT_THAT(messages.take(), ElementsAre(unreadable(file, reason)));

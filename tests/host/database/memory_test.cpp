@@ -20,7 +20,7 @@ namespace {
 class MemoryUse : public testing::Test {
 protected:
     MemoryUse() {
-        acd::Store::forget();
+        acd::Store::resetForTesting();
         // Takes messages without asking for memory itself.
         Port_MsgManData::setSink([this](const Port_MsgManData::Message&) { ++messages; });
         directory.write("low/base.acd", "LIST = a,b\nLIST += ,c\n");
@@ -78,7 +78,7 @@ protected:
         bool isDone = false;
         while (!isDone) {
             ++failing;
-            acd::Store::forget();
+            acd::Store::resetForTesting();
             messages = 0;
             prepare();
             isDone = runFailing(failing, [&] { (void)answers(); });

@@ -1,6 +1,6 @@
 #include "DatabaseFixtures.h"
 
-#include "database/NameTable.h"
+#include "database/CaseInsensitiveNameSet.h"
 
 // What a name stands for: a file, a family, a device, or its beginning.
 
@@ -155,20 +155,20 @@ TEST_F(Names, DevicesAreThoseOfTheFamily) {
 // The table behind all that
 
 TEST(NameTables, CountNamesInOrderOfArrival) {
-    acd::NameTable table;
+    acd::CaseInsensitiveNameSet table;
     EXPECT_EQ(table.add("b"), 0U);
     EXPECT_EQ(table.add("a"), 1U);
     EXPECT_EQ(table.add("B"), 0U);
     EXPECT_EQ(table.size(), 2U);
     EXPECT_EQ(table[0], "b");
     EXPECT_EQ(table.find("A"), 1U);
-    EXPECT_EQ(table.find("c"), acd::NameTable::NONE);
+    EXPECT_EQ(table.find("c"), acd::CaseInsensitiveNameSet::NONE);
 }
 
 TEST(NameTables, AnEmptyOneHasNoNames) {
-    const acd::NameTable table;
-    EXPECT_EQ(table.find(""), acd::NameTable::NONE);
-    EXPECT_EQ(table.find("a"), acd::NameTable::NONE);
+    const acd::CaseInsensitiveNameSet table;
+    EXPECT_EQ(table.find(""), acd::CaseInsensitiveNameSet::NONE);
+    EXPECT_EQ(table.find("a"), acd::CaseInsensitiveNameSet::NONE);
 }
 
 // So many that some of them hash alike: there are 2^32 hashes.
@@ -177,20 +177,20 @@ TEST(NameTables, HoldManyNames) {
     for (int index = 0; index < 300000; ++index) {
         names.push_back("Name" + std::to_string(index));
     }
-    acd::NameTable table;
+    acd::CaseInsensitiveNameSet table;
     for (std::uint32_t index = 0; index != names.size(); ++index) {
         ASSERT_EQ(table.add(names[index]), index);
     }
     for (std::uint32_t index = 0; index != names.size(); ++index) {
         ASSERT_EQ(table.find("nAME" + std::to_string(index)), index);
     }
-    EXPECT_EQ(table.find("name300000"), acd::NameTable::NONE);
+    EXPECT_EQ(table.find("name300000"), acd::CaseInsensitiveNameSet::NONE);
 }
 
 TEST(NameTables, TellApartWhatOnlyLooksLikeCase) {
-    acd::NameTable table;
+    acd::CaseInsensitiveNameSet table;
     table.add("@[`{\xC0");
     for (const char* const other : {"`[`{\xC0", "@{`{\xC0", "@[@{\xC0", "@[`[\xC0", "@[`{\xE0", "@[`{"}) {
-        EXPECT_EQ(table.find(other), acd::NameTable::NONE) << other;
+        EXPECT_EQ(table.find(other), acd::CaseInsensitiveNameSet::NONE) << other;
     }
 }

@@ -127,7 +127,7 @@ TEST_F(SearchPaths, AreForgottenWithAllThatWasRead) {
     EXPECT_THAT(valueOf("kestrel", "KEY"), Optional("a"sv));
     directory.write("a/kestrel.acd", "KEY = c\n");
     setenv("TARVIK_DATABASE", a.c_str(), 1);
-    acd::Store::forget();
+    acd::Store::resetForTesting();
     EXPECT_THAT(valueOf("kestrel", "KEY"), Optional("c"sv));
 }
 
