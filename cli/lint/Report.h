@@ -10,11 +10,11 @@
 
 namespace lint {
 
-/// What a run of the linter has to tell.
+/// The result of a run of the linter.
 struct Report {
     std::vector<Finding> findings;
 
-    [[nodiscard]] std::size_t count(Level level) const;
+    [[nodiscard]] std::size_t count(Severity severity) const;
 };
 
 /// "2 errors, 1 warning".
@@ -26,7 +26,7 @@ struct Report {
 /// An object of all findings.
 [[nodiscard]] Json asJson(const Report& report);
 
-/// A log of SARIF 2.1.0.
+/// A log in SARIF 2.1.0.
 [[nodiscard]] Json asSarif(const Report& report);
 
 } // namespace lint

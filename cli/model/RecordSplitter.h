@@ -1,42 +1,36 @@
 #pragma once
 
-#include <algorithm>
+#include <AcdText.h>
+
 #include <cstddef>
 #include <string_view>
 
-/// Splits values as the manager's readers do: n separators make n+1 items, nothing is trimmed, and an empty value
-/// has no items.
+/// Splits whole values as the manager's readers do: an empty value has no items.
 namespace splitter {
 
 inline constexpr char RECORDS = ':'; ///< ends a record
 inline constexpr char FIELDS = ',';  ///< ends a field of a record, or an item of a flat list
 
-/// How many items the readers count: they number them with 16 bits, from 0 to 32767.
-inline constexpr std::size_t MAX_ITEMS = 32768;
-
-/// Calls `use(item, offset)` for each item that the readers see.
-/// @return the offset of the first item that they do not see; `npos` when they see all
+/// Calls `use(field, offset)` for each field of a record that the readers see; an empty record has one empty field.
+/// @return the offset of the first field that they do not see; `npos` when they see all
 template <typename Use>
-std::size_t forEachItem(std::string_view text, char separator, Use use) {
-    std::size_t count = 0;
-    for (std::size_t start = 0; !text.empty() && start <= text.size();) {
-        if (count++ == MAX_ITEMS) {
-            return start;
+std::size_t forEachField(std::string_view record, char separator, Use use) {
+    AcdText::PartCursor cursor;
+    const std::string_view text(&separator, 1);
+    cursor.start(record, text);
+    for (std::size_t index = 0; cursor.moveTo(index, record, text); ++index) {
+        if (index == AcdText::MAX_PARTS) {
+            return cursor.offset();
         }
-        const std::size_t end = std::min(text.find(separator, start), text.size());
-        use(text.substr(start, end - start), start);
-        start = end + 1;
+        use(cursor.part(record), cursor.offset());
     }
-    return text.npos;
+    return record.npos;
 }
 
-/// The fields of one record: an empty record has one empty field.
+/// Calls `use(item, offset)` for each item of a value, likewise.
 template <typename Use>
-std::size_t forEachField(std::string_view record, Use use) {
-    if (record.empty()) {
-        use(record, std::size_t{0});
-    }
-    return forEachItem(record, FIELDS, use);
+std::size_t forEachItem(std::string_view value, char separator, Use use) {
+    return value.empty() ? value.npos : forEachField(value, separator, use);
 }
 
 } // namespace splitter

@@ -17,7 +17,7 @@ SourceText sourceText(const AcdStore::Value& value, std::string_view text, std::
 void addRecords(const AcdStore::Value& value, std::vector<Record>& records) {
     splitter::forEachItem(value.text, splitter::RECORDS, [&](std::string_view text, std::size_t offset) {
         Record& record = records.emplace_back(Record{sourceText(value, text, offset), {}});
-        splitter::forEachField(text, [&](std::string_view field, std::size_t within) {
+        splitter::forEachField(text, splitter::FIELDS, [&](std::string_view field, std::size_t within) {
             record.fields.push_back(sourceText(value, field, offset + within));
         });
     });
