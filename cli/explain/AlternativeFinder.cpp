@@ -4,11 +4,11 @@
 #include "explain/ExplanationBuilder.h"
 
 #include "model/Catalogue.h"
+#include "model/Schema.h"
 #include "model/Vocabulary.h"
 #include "text/Suggest.h"
 
 #include <AcdStore.h>
-#include <UT_STR.h>
 
 #include <fmt/format.h>
 
@@ -71,7 +71,7 @@ public:
     }
 
 private:
-    [[nodiscard]] bool isYes() const { return Inquiry(m_question).verdict == Verdict::YES; }
+    [[nodiscard]] bool isYes() const { return askFreshManager(m_question) == Verdict::YES; }
 
     /// In SPI mode the tables of all flashes answer for every device.
     [[nodiscard]] bool isAnsweredForAll() const {
@@ -168,15 +168,15 @@ private:
             for (const ReadLog::Value& value : log.values()) {
                 if (value.key == key) {
                     for (const ReadLog::Item& record : value.items) {
-                        keys.push_back(record.fields.at(0)->text);
+                        keys.push_back(record.field(0)->text);
                     }
                 }
             }
         };
         const Inquiry asked(m_question);
-        addKeys(asked.startUp, plain(UT_STR::Upper((m_question.device + "_PROPERTY").c_str())));
-        addKeys(asked.reads, "PROPERTY");
-        addKeys(asked.reads, "PROPERTIES");
+        addKeys(asked.startUp, schema::propertyKey(m_question.device));
+        addKeys(asked.reads, schema::PROPERTY);
+        addKeys(asked.reads, schema::PROPERTIES);
         if (std::find(keys.begin(), keys.end(), m_question.property) != keys.end()) {
             return;
         }
@@ -230,7 +230,7 @@ private:
             return;
         }
         std::vector<std::string> found;
-        for (const std::string& name : catalogue::list("base.acd", "PROGRAM_OPTION_PACKAGE")) {
+        for (const std::string& name : catalogue::list(schema::BASE, schema::PROGRAM_OPTION_PACKAGE)) {
             if (name.size() > m_question.device.size() && name.starts_with(m_question.device)) {
                 with(&Question::package, std::optional(name.substr(m_question.device.size())), [&] {
                     if (isYes()) {
@@ -250,8 +250,6 @@ private:
 
 } // namespace
 
-std::vector<Step> alternatives(const Question& question) {
-    return AlternativeFinder(question).run();
-}
+std::vector<Step> alternatives(const Question& question) { return AlternativeFinder(question).run(); }
 
 } // namespace why

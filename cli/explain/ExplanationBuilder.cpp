@@ -1,6 +1,7 @@
 // Starts and ends an explanation, and explains how names become families.
 #include "explain/ExplanationBuilder.h"
 
+#include "model/Schema.h"
 #include "text/Suggest.h"
 
 #include <PicConfig.h>
@@ -89,10 +90,10 @@ std::string ExplanationBuilder::addNameStep() {
 /// Where spi.acd lists a flash or a family of flashes.
 ReadLog::Match ExplanationBuilder::flashListing(const std::string& name) const {
     const std::string upper = plain(UT_STR::Upper(name.c_str()));
-    Match found = m_asked.startUp.findItem("DEVICE_FAMILY", upper);
-    if (const ReadLog::Value* const families = m_asked.startUp.find("DEVICE_FAMILY")) {
+    Match found = m_asked.startUp.findItem(schema::DEVICE_FAMILY, upper);
+    if (const ReadLog::Value* const families = m_asked.startUp.find(schema::DEVICE_FAMILY)) {
         for (auto family = families->items.begin(); !found && family != families->items.end(); ++family) {
-            found = m_asked.startUp.findItem(family->whole.text + "_DEVICES", upper);
+            found = m_asked.startUp.findItem(schema::devicesKey(family->whole.text), upper);
         }
     }
     return found;
@@ -127,7 +128,7 @@ void ExplanationBuilder::add(const char* topic, std::string text) {
 }
 
 void ExplanationBuilder::add(const char* topic, std::string text, const Match& place) {
-    m_steps.push_back({topic, std::move(text), *place.text, place.value->shadows()});
+    m_steps.push_back({topic, std::move(text), place.sourceText(), place.value->shadows()});
 }
 
 } // namespace why

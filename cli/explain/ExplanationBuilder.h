@@ -45,7 +45,8 @@ private:
     [[nodiscard]] bool isAllowedBy(const ReadLog::Item& record) const;
     void addUnknownMode(const Permission& permission);
     void addUnusedWords(const Permission& permission);
-    void addShadowedRecords(const std::string& word);
+    [[nodiscard]] const ReadLog::Value* consulted() const;
+    void addNoRecord(const std::string& table, const std::string& word);
     void addShadowedRecords(const std::string& database, const std::string& key, const std::string& word);
 
     // Properties.

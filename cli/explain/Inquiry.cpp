@@ -5,6 +5,12 @@
 
 namespace why {
 
+Verdict askFreshManager(const Question& question) {
+    const ManagerFactory::Manager manager = ManagerFactory::make();
+    manager->setExceptions(false);
+    return ask(*manager, question);
+}
+
 Inquiry::Inquiry(const Question& question) {
     startUp.record([&] { manager = ManagerFactory::make(); });
     manager->setExceptions(false);

@@ -7,6 +7,9 @@
 
 namespace why {
 
+/// The answer of a manager that was asked nothing before.
+[[nodiscard]] Verdict askFreshManager(const Question& question);
+
 /// A question to a manager that was asked nothing before, its answer, and what the manager read on the way.
 struct Inquiry {
     explicit Inquiry(const Question& question);

@@ -1,6 +1,7 @@
 // What a mode can use, and what can be configured in it: the mode tables of the base database.
 #include "explain/ExplanationBuilder.h"
 
+#include "model/Schema.h"
 #include "model/Vocabulary.h"
 
 #include <tarvik/ConstraintsManager.h>
@@ -29,9 +30,9 @@ std::vector<ReadLog::Match> ExplanationBuilder::modeWords(int record) const {
     std::vector<Match> words;
     const std::string& key = vocabulary::key(m_question.mode);
     if (const ReadLog::Value* const value = m_asked.startUp.findWithItem(key, record)) {
-        for (const auto& [number, field] : value->item(record)->fields) {
-            if (field) {
-                words.push_back({value, &*field});
+        for (const ReadLog::Field& field : value->item(record)->fields) {
+            if (field.text) {
+                words.push_back({value, &*field.text});
             }
         }
     }
@@ -120,7 +121,7 @@ bool ExplanationBuilder::isExcluded(const std::string& device) {
         return false;
     }
     const std::string part = vocabulary::key(m_question.mode) + "_" + device + "_" + *m_question.package;
-    const Match excluded = m_asked.startUp.findItem("NOT_SUPPORTED_PART_IN_MODE", part);
+    const Match excluded = m_asked.startUp.findItem(schema::NOT_SUPPORTED_PART_IN_MODE, part);
     if (!excluded) {
         add("table", fmt::format("NOT_SUPPORTED_PART_IN_MODE does not hold {}", part));
         return false;

@@ -1,6 +1,7 @@
 // Operations, boundary-scan operations and options: which permission table answers, and which of its records.
 #include "explain/ExplanationBuilder.h"
 
+#include "model/Schema.h"
 #include "model/Vocabulary.h"
 #include "text/Suggest.h"
 
@@ -30,7 +31,7 @@ bool isModeWord(const std::string& word) {
 
 /// The text of a field as the manager's converters get it.
 const char* textOf(const ReadLog::Item& record, int field) {
-    const SourceText* const found = record.field(field);
+    const ReadLog::Text* const found = record.field(field);
     return found == nullptr ? nullptr : found->text.c_str();
 }
 
@@ -44,9 +45,10 @@ struct Table {
 };
 
 const Table& tableOf(Kind kind) {
-    static constexpr Table OPERATIONS{"OPERATION", "DEVICE_SUPPORTED", "operations", true, 2};
-    static constexpr Table BSDL{"BSDL_OPERATION", "DEVICE_SUPPORTED", "operations", false, 1};
-    static constexpr Table OPTIONS{"PROGRAM_OPTION", "PROGRAM_OPTION_PACKAGE", "options", true, 2};
+    static constexpr Table OPERATIONS{schema::OPERATION, schema::DEVICE_SUPPORTED, "operations", true, 2};
+    static constexpr Table BSDL{schema::BSDL_OPERATION, schema::DEVICE_SUPPORTED, "operations", false, 1};
+    static constexpr Table OPTIONS{schema::PROGRAM_OPTION, schema::PROGRAM_OPTION_PACKAGE, "options", true,
+                                   2};
     return kind == Kind::OPTION ? OPTIONS : kind == Kind::BSDL ? BSDL : OPERATIONS;
 }
 
@@ -80,7 +82,7 @@ bool ExplanationBuilder::permission() {
 std::string ExplanationBuilder::operationOwner() {
     const std::string& device = m_question.device;
     const std::string base = withoutPackage(device);
-    if (const Match own = m_asked.startUp.findItem("DEVICE_SUPPORTED", base)) {
+    if (const Match own = m_asked.startUp.findItem(schema::DEVICE_SUPPORTED, base)) {
         add("name", fmt::format("DEVICE_SUPPORTED lists \"{}\": it has a table of its own", base), own);
         return device;
     }
@@ -97,7 +99,7 @@ std::string ExplanationBuilder::optionOwner() {
     const std::string joined = device + m_question.package.value_or("");
     const bool isFamily = m_asked.familyOf(device) == device;
     const auto isListed = [&](const std::string& name) {
-        const Match listing = m_asked.startUp.findItem("PROGRAM_OPTION_PACKAGE", name);
+        const Match listing = m_asked.startUp.findItem(schema::PROGRAM_OPTION_PACKAGE, name);
         if (listing) {
             add("name", fmt::format("PROGRAM_OPTION_PACKAGE lists \"{}\": it has options of its own", name),
                 listing);
@@ -137,7 +139,14 @@ bool ExplanationBuilder::hasTable(std::string& owner) {
     const bool isFound = m_question.kind == Kind::OPTION || m_asked.startUp.findItem(table.list, base);
     const std::string name = isFound ? owner : m_asked.familyOf(owner);
     if (const Match listing = m_asked.startUp.findItem(table.list, name)) {
-        add("table", fmt::format("{} of {}", table.key, name), listing);
+        std::string text = fmt::format("{} of {}", table.key, name);
+        const ReadLog::Value* const records = consulted();
+        if (records != nullptr && !records->items.empty() &&
+            (records->fromSection ? records->device : records->family) != name) {
+            text += records->fromSection ? fmt::format(", read from [{}]", records->device)
+                                         : ", read from " + records->family;
+        }
+        add("table", std::move(text), listing);
         owner = name;
         return true;
     }
@@ -176,25 +185,23 @@ bool ExplanationBuilder::isAllowedBy(const ReadLog::Item& record) const {
     if (table.hasModes && ConstraintsManager::modeString2Type(textOf(record, 1)) != m_question.mode) {
         return false;
     }
-    return std::any_of(record.fields.lower_bound(table.firstOutput), record.fields.end(),
-                       [&](const auto& output) {
-                           return output.second && ConstraintsManager::cableString2Type(
-                                                       output.second->text.c_str()) == m_question.output;
-                       });
+    return std::any_of(record.fields.begin(), record.fields.end(), [&](const ReadLog::Field& field) {
+        return field.number >= table.firstOutput && field.text &&
+               ConstraintsManager::cableString2Type(field.text->text.c_str()) == m_question.output;
+    });
 }
 
 bool ExplanationBuilder::isAllowedIn(const std::string& table) {
     const bool isOption = m_question.kind == Kind::OPTION;
     const bool withMode = tableOf(m_question.kind).hasModes;
-    const std::string& word = isOption
-                                  ? vocabulary::options().at(static_cast<std::size_t>(m_question.option))
-                                  : vocabulary::key(m_question.operation);
+    const std::string& word = isOption ? vocabulary::options().at(static_cast<std::size_t>(m_question.option))
+                                       : vocabulary::key(m_question.operation);
     const std::string where = (withMode ? " in mode " + vocabulary::key(m_question.mode) : "") + " through " +
                               vocabulary::key(m_question.output);
     if (isOption && table != m_question.device) {
         // What is loaded is a device that has tables of its own, by its own name alone.
         const std::string base = withoutPackage(m_question.device);
-        const Match own = m_asked.startUp.findItem("DEVICE_SUPPORTED", base);
+        const Match own = m_asked.startUp.findItem(schema::DEVICE_SUPPORTED, base);
         if (own && table == m_question.device + m_question.package.value_or("")) {
             add("rule",
                 fmt::format("DEVICE_SUPPORTED lists \"{}\", so options are read for \"{}\" alone, and \"{}\" "
@@ -213,14 +220,13 @@ bool ExplanationBuilder::isAllowedIn(const std::string& table) {
         }
     }
     if (permissions.empty()) {
-        add("absent", fmt::format("no record of {} names {}", table, word));
-        addShadowedRecords(word);
-    } else if (permissions.size() == 1) {
-        add("absent", fmt::format("the one record for {} does not allow it{}", word, where),
-            {permissions.front().value, &permissions.front().record->whole});
+        addNoRecord(table, word);
     } else {
         add("absent",
-            fmt::format("none of the {} records for {} allows it{}", permissions.size(), word, where));
+            permissions.size() == 1
+                ? fmt::format("the one record for {} does not allow it{}", word, where)
+                : fmt::format("none of the {} records for {} allows it{}", permissions.size(), word, where),
+            {permissions.front().value, &permissions.front().record->whole});
     }
     if (isOption && m_question.option > TARVIKNS::PROGRAM_OPTION::SECTOR_LOCKDOWN) {
         add("note", fmt::format("no database can name the option {}", word));
@@ -232,22 +238,35 @@ bool ExplanationBuilder::isAllowedIn(const std::string& table) {
     return false;
 }
 
-/// Notes the records that a layer on top removed by setting their key.
-void ExplanationBuilder::addShadowedRecords(const std::string& word) {
+/// The value whose records answer: that of the owner, or that of "spi", which was read before.
+const ReadLog::Value* ExplanationBuilder::consulted() const {
     const char* const key = tableOf(m_question.kind).key;
     const ReadLog::Value* const own = m_asked.reads.find(key);
-    const ReadLog::Value* const value = own != nullptr ? own : m_asked.startUp.find(key);
+    return own != nullptr ? own : m_asked.startUp.find(key);
+}
+
+void ExplanationBuilder::addNoRecord(const std::string& table, const std::string& word) {
+    const ReadLog::Value* const value = consulted();
+    const std::string text = fmt::format("no record of {} names {}", table, word);
+    if (value != nullptr && !value->items.empty()) {
+        add("absent", text, {value, &value->items.front().whole});
+    } else if (value != nullptr && value->family.empty()) {
+        add("absent", fmt::format("{}: there is no section [{}]", text, table));
+    } else {
+        add("absent", fmt::format("{}: there is no {}", text, tableOf(m_question.kind).key));
+    }
     if (value != nullptr) {
-        addShadowedRecords(value->accessorName(), key, word);
+        addShadowedRecords(value->accessorName(), value->key, word);
     }
 }
 
+/// Notes the records that a layer on top removed by setting their key.
 void ExplanationBuilder::addShadowedRecords(const std::string& database, const std::string& key,
                                             const std::string& word) {
     for (const catalogue::Record& record : catalogue::readRecords(database, key).shadowed) {
         if (sameWithoutCase(record.fields.front().text, word)) {
-            m_steps.push_back({"note", fmt::format("a layer on top sets {} anew, without this record", key),
-                               record.whole});
+            m_steps.push_back(
+                {"note", fmt::format("a layer on top sets {} anew, without this record", key), record.whole});
         }
     }
 }
@@ -255,22 +274,21 @@ void ExplanationBuilder::addShadowedRecords(const std::string& database, const s
 void ExplanationBuilder::addUnknownMode(const Permission& permission) {
     const char* const word = textOf(*permission.record, 1);
     if (tableOf(m_question.kind).hasModes && (word == nullptr || !isModeWord(word))) {
-        add("note", fmt::format("\"{}\" is no mode, and counts as Boundary Scan", word == nullptr ? "" : word),
+        add("note",
+            fmt::format("\"{}\" is no mode, and counts as Boundary Scan", word == nullptr ? "" : word),
             {permission.value, &permission.record->whole});
     }
 }
 
 /// Notes words of a record that allow nothing.
 void ExplanationBuilder::addUnusedWords(const Permission& permission) {
-    const auto& fields = permission.record->fields;
-    for (auto field = fields.lower_bound(tableOf(m_question.kind).firstOutput); field != fields.end();
-         ++field) {
-        if (!field->second) {
+    for (const ReadLog::Field& field : permission.record->fields) {
+        if (field.number < tableOf(m_question.kind).firstOutput || !field.text) {
             continue;
         }
-        const std::string& word = field->second->text;
+        const std::string& word = field.text->text;
         const OUTPUT_TYPE output = ConstraintsManager::cableString2Type(word.c_str());
-        const Match place{permission.value, &*field->second};
+        const Match place{permission.value, &*field.text};
         if (output == OUTPUT_TYPE::NONE) {
             add("note", fmt::format("\"{}\" is no output, and allows nothing", word), place);
         } else if (output > OUTPUT_TYPE::STAPL) {

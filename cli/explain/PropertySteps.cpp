@@ -1,6 +1,7 @@
 // Properties: of the device itself or its family, and of flashes or their classes.
 #include "explain/ExplanationBuilder.h"
 
+#include "model/Schema.h"
 #include "model/Vocabulary.h"
 #include "text/Suggest.h"
 
@@ -13,16 +14,15 @@ namespace why {
 
 namespace {
 
-constexpr const char* SINGLE = "PROPERTY";
-constexpr const char* MULTIPLE = "PROPERTIES";
-
 std::string upperCase(const std::string& text) { return plain(UT_STR::Upper(text.c_str())); }
 
 /// The values that were read of a record, a missing one being the empty text.
 std::set<std::string> valuesOf(const ReadLog::Item& record, int first) {
     std::set<std::string> values;
-    for (auto field = record.fields.lower_bound(first); field != record.fields.end(); ++field) {
-        values.insert(field->second ? field->second->text : "");
+    for (const ReadLog::Field& field : record.fields) {
+        if (field.number >= first) {
+            values.insert(field.text ? field.text->text : "");
+        }
     }
     return values;
 }
@@ -53,7 +53,7 @@ bool ExplanationBuilder::property() {
         return holds(*found, key, m_question.value);
     }
     add("absent", fmt::format("neither \"{}\" nor its family has a value for {}", device, key));
-    for (const char* const records : {SINGLE, MULTIPLE}) {
+    for (const char* const records : {schema::PROPERTY, schema::PROPERTIES}) {
         addShadowedRecords(device, records, key);
     }
     return false;
@@ -75,28 +75,29 @@ std::optional<ExplanationBuilder::Property> ExplanationBuilder::findProperty(con
 
 /// What the reads for a device have left as the values of a property: each record of the same name replaces the former
 /// one, and so does one whose owner and name are the same text when they are joined.
-std::optional<ExplanationBuilder::Property>
-ExplanationBuilder::storedProperty(const std::string& device, const std::string& wanted,
-                                   const std::string& key) const {
+std::optional<ExplanationBuilder::Property> ExplanationBuilder::storedProperty(const std::string& device,
+                                                                               const std::string& wanted,
+                                                                               const std::string& key) const {
     std::optional<Property> stored;
     std::string owner;
     for (const ReadLog::Value& value : m_asked.reads.values()) {
-        if (value.key == SINGLE) {
+        if (value.key == schema::PROPERTY) {
             // The device's own data comes first, then that of families.
             owner = owner.empty() ? device : value.device.empty() ? value.family : m_asked.familyOf(device);
-        } else if (value.key != MULTIPLE) {
+        } else if (value.key != schema::PROPERTIES) {
             continue;
         }
         for (const ReadLog::Item& record : value.items) {
-            const SourceText* const name = record.field(0);
+            const ReadLog::Text* const name = record.field(0);
             if (name == nullptr || owner + '_' + name->text != wanted + '_' + key) {
                 continue;
             }
-            Property next{valuesOf(record, value.key == SINGLE ? 1 : 2), {&value, &record.whole}, {}};
-            if (stored && stored->record.text->origin.layer != record.whole.origin.layer) {
+            Property next{
+                valuesOf(record, value.key == schema::PROPERTY ? 1 : 2), {&value, &record.whole}, {}};
+            if (stored && stored->record.text->location.layer != record.whole.location.layer) {
                 next.shadows = std::move(stored->shadows);
-                next.shadows.insert(next.shadows.begin(),
-                                    {stored->record.text->origin, stored->record.text->text});
+                const SourceText replaced = stored->record.sourceText();
+                next.shadows.insert(next.shadows.begin(), {replaced.origin, replaced.text});
             }
             stored = std::move(next);
         }
@@ -110,8 +111,8 @@ bool ExplanationBuilder::holds(const Property& found, const std::string& key,
     const bool isYes = value ? found.values.count(*value) != 0 : !found.values.empty();
     const std::string values = found.values.empty() ? "no value" : listed(found.values);
     add(isYes ? "record" : "absent",
-        fmt::format("{} of the {} is {}{}", key, found.record.value->fromSection ? "device" : "family", values,
-                    isYes || !value ? "" : fmt::format(", not {}", *value)),
+        fmt::format("{} of the {} is {}{}", key, found.record.value->fromSection ? "device" : "family",
+                    values, isYes || !value ? "" : fmt::format(", not {}", *value)),
         found.record);
     catalogue::Shadows& shadows = m_steps.back().shadows;
     shadows.insert(shadows.begin(), found.shadows.begin(), found.shadows.end());
@@ -122,16 +123,15 @@ bool ExplanationBuilder::holds(const Property& found, const std::string& key,
 /// between them, and looked up in upper case.
 std::optional<ExplanationBuilder::Property>
 ExplanationBuilder::storedFlashProperty(const std::string& wanted) const {
-    constexpr std::string_view SUFFIX = "_PROPERTY";
     const std::string joined = upperCase(wanted + m_question.property);
     std::optional<Property> stored;
     for (const ReadLog::Value& value : m_asked.startUp.values()) {
-        if (!value.key.ends_with(SUFFIX)) {
+        if (!value.key.ends_with(schema::PROPERTY_SUFFIX)) {
             continue;
         }
-        const std::string name = value.key.substr(0, value.key.size() - SUFFIX.size());
+        const std::string name = value.key.substr(0, value.key.size() - schema::PROPERTY_SUFFIX.size());
         for (const ReadLog::Item& record : value.items) {
-            if (name + record.fields.at(0)->text == joined && m_asked.manager->isSpiDevice(name.c_str())) {
+            if (name + record.field(0)->text == joined && m_asked.manager->isSpiDevice(name.c_str())) {
                 stored = Property{valuesOf(record, 1), {&value, &record.whole}, {}};
             }
         }
@@ -146,8 +146,8 @@ bool ExplanationBuilder::flashProperty() {
     if (!found) {
         std::string flashClass;
         Match listing;
-        for (const char* const name : {"AT1", "ST1", "ST2", "BPI1", "BPI2", "BPI3"}) {
-            if (const ReadLog::Value* const members = m_asked.startUp.find(name + std::string("_DEVICES"))) {
+        for (const char* const name : schema::FLASH_CLASSES) {
+            if (const ReadLog::Value* const members = m_asked.startUp.find(schema::devicesKey(name))) {
                 for (const ReadLog::Item& member : members->items) {
                     if (sameWithoutCase(member.whole.text, m_question.device)) {
                         flashClass = name;
@@ -157,7 +157,8 @@ bool ExplanationBuilder::flashProperty() {
             }
         }
         if (listing) {
-            add("table", fmt::format("the flash itself has no {}; its class is {}", key, flashClass), listing);
+            add("table", fmt::format("the flash itself has no {}; its class is {}", key, flashClass),
+                listing);
         }
         from = "class " + flashClass;
         found = storedFlashProperty(flashClass);

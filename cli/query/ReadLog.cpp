@@ -6,16 +6,32 @@
 
 namespace {
 
-catalogue::SourceText sourceText(std::string_view text, const AcdStore::SourceLocation& location) {
-    return {std::string(text),
-            {std::string(location.file), location.line, location.column, std::string(location.layer)}};
+/// The element of this number in a list by numbers, which is made if it is not there. Most reads are about the last one.
+template <typename Element>
+Element& findOrInsert(std::vector<Element>& list, int Element::*number, Element&& element) {
+    auto place = std::find_if(list.rbegin(), list.rend(),
+                              [&](const Element& known) { return known.*number <= element.*number; });
+    if (place == list.rend() || (*place).*number != element.*number) {
+        return *list.insert(place.base(), std::move(element));
+    }
+    return *place;
 }
 
 } // namespace
 
-const ReadLog::SourceText* ReadLog::Item::field(int number) const {
-    const auto found = fields.find(number);
-    return found != fields.end() && found->second ? &*found->second : nullptr;
+const ReadLog::Text* ReadLog::Item::field(int number) const {
+    for (const Field& field : fields) {
+        if (field.number == number) {
+            return field.text ? &*field.text : nullptr;
+        }
+    }
+    return nullptr;
+}
+
+catalogue::SourceText ReadLog::Match::sourceText() const {
+    const AcdStore::SourceLocation& location = text->location;
+    return {text->text,
+            {std::string(location.file), location.line, location.column, std::string(location.layer)}};
 }
 
 const ReadLog::Item* ReadLog::Value::item(int index) const {
@@ -63,31 +79,27 @@ const ReadLog::Value* ReadLog::findWithItem(const std::string& key, int index) c
     return found == m_values.end() ? nullptr : &*found;
 }
 
-ReadLog::Match ReadLog::last() const {
-    return m_last == nullptr ? Match() : Match{&m_values.back(), m_last};
-}
+ReadLog::Match ReadLog::last() const { return m_last == nullptr ? Match() : Match{&m_values.back(), m_last}; }
 
 void ReadLog::add(const AcdStore::Read& read) {
     m_last = nullptr;
     if (m_values.empty() || m_values.back().key != read.key || m_values.back().family != read.family ||
         m_values.back().device != read.device) {
-        m_values.push_back({std::string(read.family), std::string(read.device), std::string(read.key),
-                            read.fromSection});
+        m_values.push_back(
+            {std::string(read.family), std::string(read.device), std::string(read.key), read.fromSection});
     }
     std::vector<Item>& items = m_values.back().items;
     if (read.itemLocation.file.empty()) {
         return;
     }
-    auto item = std::find_if(items.rbegin(), items.rend(),
-                             [&](const Item& known) { return known.index <= read.item; });
-    if (item == items.rend() || item->index != read.item) {
-        items.push_back({read.item, sourceText(read.itemText, read.itemLocation), {}});
-        item = items.rbegin();
-    }
-    m_last = &item->whole;
+    Item& item =
+        findOrInsert(items, &Item::index, {read.item, {std::string(read.itemText), read.itemLocation}});
+    m_last = &item.whole;
     if (read.subSeparator != nullptr) {
-        std::optional<SourceText>& field = item->fields[read.field];
-        field = read.text == nullptr ? std::nullopt : std::optional(sourceText(read.text, read.location));
-        m_last = field ? &*field : nullptr;
+        Field& field = findOrInsert(item.fields, &Field::number, {read.field, std::nullopt});
+        if (read.text != nullptr) {
+            field.text = Text{read.text, read.location};
+        }
+        m_last = field.text ? &*field.text : nullptr;
     }
 }

@@ -5,7 +5,6 @@
 #include <AcdStore.h>
 
 #include <functional>
-#include <map>
 #include <optional>
 #include <string>
 #include <vector>
@@ -13,16 +12,26 @@
 /// What was read from the database while some work was done, in the order of the reads.
 class ReadLog {
 public:
-    using SourceText = catalogue::SourceText;
+    /// A text that was read, and where it is written.
+    struct Text {
+        std::string text;
+        AcdStore::SourceLocation location;
+    };
+
+    /// A field that was asked for.
+    struct Field {
+        int number;
+        std::optional<Text> text; ///< nothing: the field does not exist
+    };
 
     /// A record or an item of a list, as far as it was read.
     struct Item {
         int index;
-        SourceText whole;
-        std::map<int, std::optional<SourceText>> fields; ///< those that were asked for; nothing: does not exist
+        Text whole;
+        std::vector<Field> fields{}; ///< by their numbers
 
         /// A field that was read; null when it was not, or does not exist.
-        [[nodiscard]] const SourceText* field(int number) const;
+        [[nodiscard]] const Text* field(int number) const;
     };
 
     /// Reads of one key of one accessor, one after the other. A key that does not exist has no items.
@@ -46,7 +55,9 @@ public:
     /// A text that was found in the log, and the value that contains it.
     struct Match {
         const Value* value = nullptr;
-        const SourceText* text = nullptr;
+        const Text* text = nullptr;
+
+        [[nodiscard]] catalogue::SourceText sourceText() const;
 
         explicit operator bool() const noexcept { return text != nullptr; }
     };
@@ -72,5 +83,5 @@ private:
     void add(const AcdStore::Read& read);
 
     std::vector<Value> m_values;
-    const SourceText* m_last = nullptr;
+    const Text* m_last = nullptr;
 };

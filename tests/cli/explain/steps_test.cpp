@@ -187,8 +187,7 @@ TEST(WhyAlternatives, DevicesOfTheFamilyThatDiffer) {
     Question question = about(Kind::PROPERTY, "D1");
     question.property = "A";
     question.value = "2";
-    EXPECT_EQ(stepAbout(why::alternatives(question), "differs").text,
-              "in family fam, yes for D2");
+    EXPECT_EQ(stepAbout(why::alternatives(question), "differs").text, "in family fam, yes for D2");
 }
 
 TEST(WhyAlternatives, ADeviceWithATableOfItsOwnDiffers) {
@@ -197,9 +196,7 @@ TEST(WhyAlternatives, ADeviceWithATableOfItsOwnDiffers) {
     files["fam.acd"] = "[D1]\n[D2]\nOPERATION = PROGRAM,Bscan,USB2\n";
     const Databases databases(std::move(files));
     EXPECT_EQ(
-        stepAbout(why::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)),
-                  "differs")
-            .text,
+        stepAbout(why::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "differs").text,
         "in family fam, yes for D2");
 }
 
@@ -212,8 +209,7 @@ TEST(WhyAlternatives, ThePackageThatHasTheOption) {
     question.option = PROGRAM_OPTION::VERIFY;
     question.package = "VS20";
     EXPECT_EQ(explained(question).verdict, Verdict::NO);
-    EXPECT_EQ(stepAbout(why::alternatives(question), "differs").text,
-              "yes in package PQ");
+    EXPECT_EQ(stepAbout(why::alternatives(question), "differs").text, "yes in package PQ");
 }
 
 TEST(WhyAlternatives, TheFamilyItselfMayDiffer) {
@@ -222,9 +218,7 @@ TEST(WhyAlternatives, TheFamilyItselfMayDiffer) {
     files["fam.acd"] = "OPERATION = PROGRAM,Bscan,USB2\n[D1]\nOPERATION = ERASE,Bscan,USB2\n";
     const Databases databases(std::move(files));
     EXPECT_EQ(
-        stepAbout(why::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)),
-                  "differs")
-            .text,
+        stepAbout(why::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "differs").text,
         "in family fam, yes for the family itself");
 }
 
@@ -234,9 +228,7 @@ TEST(WhyAlternatives, SpiModeAnswersWhateverTheDevice) {
     files["spi.acd"] = "OPERATION = PROGRAM,SPI,USB2\n";
     const Databases databases(std::move(files));
     EXPECT_EQ(
-        stepAbout(why::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)),
-                  "instead")
-            .text,
+        stepAbout(why::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "instead").text,
         "yes in mode SPI through USB2, whatever the device");
 }
 
@@ -244,8 +236,7 @@ TEST(WhyAlternatives, TheKeyThatWasMeant) {
     const Databases databases(family("PROPERTY = VENDOR,Korvel"));
     Question question = about(Kind::PROPERTY, "D1");
     question.property = "VENDER";
-    EXPECT_EQ(stepAbout(why::alternatives(question), "instead").text,
-              "there is a property VENDOR");
+    EXPECT_EQ(stepAbout(why::alternatives(question), "instead").text, "there is a property VENDOR");
 }
 
 TEST(WhyPresentation, StepsReadAsATableWithPlaces) {
