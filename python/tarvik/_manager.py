@@ -419,7 +419,7 @@ class Manager:
         """The IDCODE of each device, both as the database spells them, in byte order of the devices.
 
         >>> manager.get_all_device_idcodes()["KS50"]
-        '0xX30D5165'
+        '0xX4104FB7'
         """
         idcodes: Dict[str, str] = {}
         with lock:
