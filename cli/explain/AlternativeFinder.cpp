@@ -1,8 +1,10 @@
 // What comes nearest to a no: where else the same is allowed, and which relatives of the device differ.
 #include "explain/Explanation.h"
 
-#include "explain/Chain.h"
+#include "explain/ExplanationBuilder.h"
 
+#include "model/Catalogue.h"
+#include "model/Schema.h"
 #include "model/Vocabulary.h"
 #include "text/Suggest.h"
 
@@ -27,18 +29,18 @@ constexpr int TABLE_MODES = 6;
 constexpr int TABLE_OUTPUTS = 5;
 constexpr int ALL_OUTPUTS = 10;
 
-constexpr std::size_t MOST_NAMES = 8;
+constexpr std::size_t MAX_NAMES = 8;
 
 /// The names, the first of them when there are many.
 std::string some(const std::vector<std::string>& names) {
-    const std::size_t shown = std::min(names.size(), MOST_NAMES);
+    const std::size_t shown = std::min(names.size(), MAX_NAMES);
     const std::vector<std::string> first(names.begin(), names.begin() + static_cast<std::ptrdiff_t>(shown));
     return listed(first) + (shown < names.size() ? fmt::format(" and {} more", names.size() - shown) : "");
 }
 
-class Search {
+class AlternativeFinder {
 public:
-    Search(const StartUp& facts, Question question) : m_facts(facts), m_question(std::move(question)) {}
+    explicit AlternativeFinder(Question question) : m_question(std::move(question)) {}
 
     [[nodiscard]] std::vector<Step> run() {
         switch (m_question.kind) {
@@ -48,7 +50,7 @@ public:
             modes();
             break;
         case Kind::DEVICE_THROUGH:
-            modesAndOutputs(static_cast<int>(StartUp::MODES), ALL_OUTPUTS);
+            modesAndOutputs(static_cast<int>(vocabulary::modes().size()), ALL_OUTPUTS);
             break;
         case Kind::OPERATION:
         case Kind::OPTION:
@@ -64,12 +66,12 @@ public:
         if (m_steps.empty() && (m_question.kind == Kind::OPERATION || m_question.kind == Kind::BSDL)) {
             otherOperations();
         }
-        relatives();
+        siblingDevices();
         return std::move(m_steps);
     }
 
 private:
-    [[nodiscard]] bool isYes() const { return explain(m_facts, m_question).verdict == Verdict::YES; }
+    [[nodiscard]] bool isYes() const { return askFreshManager(m_question) == Verdict::YES; }
 
     /// In SPI mode the tables of all flashes answer for every device.
     [[nodiscard]] bool isAnsweredForAll() const {
@@ -77,7 +79,7 @@ private:
                (m_question.kind == Kind::OPERATION || m_question.kind == Kind::OPTION);
     }
 
-    void add(const char* topic, std::string text, std::optional<Piece> place = {}) {
+    void add(const char* topic, std::string text, std::optional<SourceText> place = {}) {
         m_steps.push_back({topic, std::move(text), std::move(place)});
     }
 
@@ -91,7 +93,7 @@ private:
 
     void modes() {
         std::vector<std::string> found;
-        for (int mode = 0; mode < static_cast<int>(StartUp::MODES); ++mode) {
+        for (int mode = 0; mode < static_cast<int>(vocabulary::modes().size()); ++mode) {
             with(&Question::mode, static_cast<MODE_TYPE>(mode), [&] {
                 if (isYes()) {
                     found.push_back(vocabulary::key(m_question.mode));
@@ -113,7 +115,7 @@ private:
     /// One step for each record that allows the same through other outputs.
     void outputs(const std::string& where, int outputCount) {
         std::vector<std::string> found;
-        std::optional<Piece> record;
+        std::optional<SourceText> record;
         const char* const whoever = isAnsweredForAll() ? ", whatever the device" : "";
         const auto flush = [&] {
             if (!found.empty()) {
@@ -123,12 +125,12 @@ private:
         };
         for (int output = 0; output < outputCount; ++output) {
             with(&Question::output, static_cast<OUTPUT_TYPE>(output), [&] {
-                const Explanation explanation = explain(m_facts, m_question);
+                const Explanation explanation = explain(m_question);
                 if (explanation.verdict != Verdict::YES) {
                     return;
                 }
                 // The mode tables name each output by itself: their places would fill the screen.
-                const Piece* const place =
+                const SourceText* const place =
                     m_question.kind == Kind::DEVICE_THROUGH ? nullptr : explanation.decidingRecord();
                 if (place != nullptr && record && !isSamePlace(*place, *record)) {
                     flush();
@@ -140,7 +142,7 @@ private:
         flush();
     }
 
-    static bool isSamePlace(const Piece& left, const Piece& right) {
+    static bool isSamePlace(const SourceText& left, const SourceText& right) {
         return left.origin.file == right.origin.file && left.origin.line == right.origin.line &&
                left.origin.column == right.origin.column;
     }
@@ -162,19 +164,19 @@ private:
     /// The property that was meant, should the key be mistyped.
     void properties() {
         std::vector<std::string> keys;
-        const auto addKeys = [&](const std::string& database, const char* key) {
-            for (const Record& record : readRecords(database, key).all) {
-                keys.push_back(record.fields.front().text);
+        const auto addKeys = [&](const ReadLog& log, const std::string& key) {
+            for (const ReadLog::Value& value : log.values()) {
+                if (value.key == key) {
+                    for (const ReadLog::Item& record : value.items) {
+                        keys.push_back(record.field(0)->text);
+                    }
+                }
             }
         };
-        if (m_facts.isFlash(m_question.device)) {
-            addKeys("spi.acd", (upperCase(m_question.device) + "_PROPERTY").c_str());
-        } else {
-            for (const std::string& owner : {m_question.device, family()}) {
-                addKeys(owner, "PROPERTY");
-                addKeys(owner, "PROPERTIES");
-            }
-        }
+        const Inquiry asked(m_question);
+        addKeys(asked.startUp, schema::propertyKey(m_question.device));
+        addKeys(asked.reads, schema::PROPERTY);
+        addKeys(asked.reads, schema::PROPERTIES);
         if (std::find(keys.begin(), keys.end(), m_question.property) != keys.end()) {
             return;
         }
@@ -183,48 +185,42 @@ private:
         }
     }
 
-    [[nodiscard]] std::string family() const {
-        Replay replay(m_facts);
-        return replay.resolve(m_question.device).family;
-    }
-
-    /// The names in the same family that may answer otherwise: those that have tables of their own, or all devices
-    /// where properties decide.
-    [[nodiscard]] std::vector<std::string> relativesOf(const std::string& family) const {
-        if (m_question.kind == Kind::OPERATION_IN_MODE || m_question.kind == Kind::PROPERTY) {
-            return AcdStore::devices(family);
-        }
-        std::vector<std::string> found;
-        for (const auto& [name, listing] :
-             m_question.kind == Kind::OPTION ? m_facts.packages : m_facts.supported) {
-            Replay replay(m_facts);
-            if (replay.resolve(name).family == family) {
-                found.push_back(name);
-            }
-        }
-        return found;
-    }
-
-    void relatives() {
+    /// The devices of the same family that have another answer.
+    void siblingDevices() {
         if (m_question.kind == Kind::OUTPUT || m_question.kind == Kind::DEVICE ||
             m_question.kind == Kind::DEVICE_THROUGH) {
             return;
         }
         packages();
-        const std::string own = family();
-        if (isAnsweredForAll() || own == "base" || own == "spi") {
+        const std::string family = Inquiry(m_question).familyOf(m_question.device);
+        if (isAnsweredForAll() || family == "base" || family == "spi") {
             return;
         }
+        const std::string asked = withoutPackage(m_question.device);
+        std::size_t siblings = 0;
         std::vector<std::string> found;
-        for (const std::string& name : relativesOf(own)) {
+        const auto addIfYes = [&](const std::string& name, const std::string& shown) {
             with(&Question::device, name, [&] {
                 if (isYes()) {
-                    found.push_back(name == own ? "the family itself" : name);
+                    found.push_back(shown);
                 }
             });
+        };
+        for (const std::string& name : AcdStore::devices(family)) {
+            if (!sameWithoutCase(name, asked)) {
+                ++siblings;
+                addIfYes(name, name);
+            }
+        }
+        if (siblings > 1 && found.size() == siblings) {
+            add("differs", fmt::format("yes for the other {} devices of {}", siblings, family));
+            return;
+        }
+        if (found.empty() && !sameWithoutCase(family, asked)) {
+            addIfYes(family, "the family itself");
         }
         if (!found.empty()) {
-            add("differs", fmt::format("in family {}, yes for {}", own, some(found)));
+            add("differs", fmt::format("in family {}, yes for {}", family, some(found)));
         }
     }
 
@@ -234,7 +230,7 @@ private:
             return;
         }
         std::vector<std::string> found;
-        for (const auto& [name, listing] : m_facts.packages) {
+        for (const std::string& name : catalogue::list(schema::BASE, schema::PROGRAM_OPTION_PACKAGE)) {
             if (name.size() > m_question.device.size() && name.starts_with(m_question.device)) {
                 with(&Question::package, std::optional(name.substr(m_question.device.size())), [&] {
                     if (isYes()) {
@@ -248,15 +244,12 @@ private:
         }
     }
 
-    const StartUp& m_facts;
     Question m_question;
     std::vector<Step> m_steps;
 };
 
 } // namespace
 
-std::vector<Step> alternatives(const StartUp& facts, const Question& question) {
-    return Search(facts, question).run();
-}
+std::vector<Step> alternatives(const Question& question) { return AlternativeFinder(question).run(); }
 
 } // namespace why
