@@ -2,6 +2,7 @@
 #include "cli/support/DatabaseDirectory.h"
 #include "model/RecordSplitter.h"
 #include "model/Records.h"
+#include "support/TarvikTestPeer.h"
 
 #include <gmock/gmock.h>
 
@@ -16,6 +17,7 @@ namespace {
 
 void useFiles(std::map<std::string, std::string> files) {
     files.emplace("base.acd", "");
+    TarvikTestPeer::reset();
     AcdStore::setMemoryFiles(std::move(files));
 }
 
@@ -76,6 +78,7 @@ TEST(Records, ShowWhatTheyShadow) {
     const DatabaseDirectory below(
         DatabaseDirectory::Files{{"base.acd", ""}, {"kestrel.acd", "PROPERTY = A,1:B,2\n"}});
     const DatabaseDirectory above(DatabaseDirectory::Files{{"kestrel.acd", "PROPERTY = A,3\n"}});
+    TarvikTestPeer::reset();
     AcdStore::setSearchPath({above.path(), below.path()});
     const Records records = readRecords("kestrel", "PROPERTY");
     ASSERT_EQ(records.all.size(), 1U);
