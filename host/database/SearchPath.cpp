@@ -1,5 +1,7 @@
 #include "database/SearchPath.h"
 
+#include <array>
+#include <climits>
 #include <cstdlib>
 #include <exception>
 #include <filesystem>
@@ -15,17 +17,18 @@ namespace acd {
 
 namespace {
 
-/// The file of this code. Never destroyed, since databases may be looked for at exit.
-[[nodiscard]] const std::string& ownFile() {
-    static const auto& file = *new std::string(findOwnFile());
-    return file;
-}
+/// The file of this code; empty while it is unknown. Memory that needs no release: the library may be unloaded, and
+/// databases may be looked for at exit.
+std::array<char, PATH_MAX> ownFile{};
 
 /// Looks for it when the library is loaded: a relative name loses its meaning when the program changes its
 /// directory.
 [[gnu::constructor]] void rememberOwnFile() {
     try {
-        static_cast<void>(ownFile());
+        const std::string file = findOwnFile();
+        if (file.size() < ownFile.size()) {
+            file.copy(ownFile.data(), file.size());
+        }
     } catch (const std::exception&) {
         // No memory: it is looked for again when it is needed.
     }
@@ -54,7 +57,10 @@ SearchPath defaultSearchPath() {
             return {std::move(directories), {}};
         }
     }
-    return installedSearchPath(ownFile());
+    if (ownFile.front() == '\0') {
+        rememberOwnFile();
+    }
+    return installedSearchPath(ownFile.data());
 }
 
 std::vector<std::string> splitDirectories(std::string_view list) {

@@ -24,7 +24,19 @@ extern "C" __attribute__((visibility("default"))) const char TARVIK_ABI;
 
 namespace {
 
+// Kept by linkers that drop unused sections, too.
+#if defined(__ELF__) && defined(__has_attribute)
+#if __has_attribute(retain)
+#define TARVIK_RETAIN __attribute__((retain))
+#endif
+#endif
+#ifndef TARVIK_RETAIN
+#define TARVIK_RETAIN
+#endif
+
 /// Asks for that name in every file that includes a host header.
-[[gnu::used]] const char* const tarvikAbi = &TARVIK_ABI;
+TARVIK_RETAIN __attribute__((used)) const char* const tarvikAbi = &TARVIK_ABI;
+
+#undef TARVIK_RETAIN
 
 } // namespace
