@@ -106,9 +106,10 @@ int main(int argc, char** argv) try {
         std::cerr << "the database has a malformed record: " << fault.what() << '\n';
         status = 2;
     } catch (const OutOfRangeException& fault) {
-        // Raised for a family that the base database does not list; other locations are those of words in records.
-        constexpr int FAMILY_NOT_SUPPORTED = 1999;
-        if (fault.line() != FAMILY_NOT_SUPPORTED) {
+        // Raised for a family that the lists of the base database lack: DEVICE_SUPPORTED, PROGRAM_OPTION_PACKAGE.
+        // Other locations are those of words in records.
+        const bool isAboutFamily = fault.line() == 1999 || fault.line() == 2024;
+        if (!isAboutFamily) {
             std::cerr << "the database has an unknown word: " << fault.what() << '\n';
         } else if (manager->getAllDeviceIdcodes().empty()) {
             std::cerr << "there is no device database in " << argv[1] << '\n';
