@@ -60,6 +60,9 @@ zero-width space. It equals no name that is typed on a keyboard. Words of anothe
 constexpr std::size_t MIN_COMMON = 5;
 constexpr std::size_t MAX_RARE = 2;
 
+/// Of names; a file full of different ones must not take forever.
+constexpr std::size_t MAX_COMPARISONS = 5'000'000;
+
 /// One property of a section.
 struct Use {
     const Token* name;
@@ -126,14 +129,25 @@ std::set<std::size_t> checkRareNames(const Domain& domain, Findings& findings) {
             users.push_back(use.section);
         }
     }
-    std::map<std::string_view, std::string_view> rare;
+    std::vector<std::string_view> common;
     for (const auto& [name, users] : sections) {
-        if (users.size() > MAX_RARE || hasMeaning(name)) {
+        if (users.size() >= MIN_COMMON) {
+            common.push_back(name);
+        }
+    }
+    std::map<std::string_view, std::string_view> rare;
+    std::size_t comparisons = MAX_COMPARISONS;
+    for (const auto& [name, users] : sections) {
+        if (users.size() > MAX_RARE || hasMeaning(name) || common.size() > comparisons) {
             continue;
         }
-        for (const auto& [other, others] : sections) {
-            if (others.size() >= MIN_COMMON && isOneEdit(name, other) &&
-                std::none_of(users.begin(), users.end(), [&others = others](std::size_t section) {
+        comparisons -= common.size();
+        for (const std::string_view other : common) {
+            if (!isOneEdit(name, other)) {
+                continue;
+            }
+            const std::vector<std::size_t>& others = sections[other];
+            if (std::none_of(users.begin(), users.end(), [&others](std::size_t section) {
                     return std::binary_search(others.begin(), others.end(), section);
                 })) {
                 rare.emplace(name, other);

@@ -2,6 +2,7 @@
 #include "lint/Findings.h"
 #include "lint/rules/RuleSets.h"
 
+#include <algorithm>
 #include <set>
 
 namespace lint {
@@ -91,7 +92,11 @@ void checkTexts(const std::vector<Token>& tokens, Findings& findings) {
             findings.add(BLANK_AROUND_SEPARATOR, token, "the blanks of {} are part of the text",
                          quoted(text));
         }
-        if (hasComment(text)) {
+        // A "#" at the start of a continuation line is found as such.
+        const std::string_view line = token.location.file->source(token.location.line);
+        const bool isOnItsLine =
+            line.find('#', std::min<std::size_t>(token.location.column - 1, line.size())) != line.npos;
+        if (isOnItsLine && hasComment(text)) {
             findings.add(COMMENT_AFTER_VALUE, token, "the comment is part of the text {}", quoted(text));
         }
     }

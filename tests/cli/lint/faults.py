@@ -88,7 +88,7 @@ FAULTS = [
     Fault("a misspelt family", "base.acd", "kestrel,linnet,merlin, \\\n                         osprey,pipit,plover,siskin,spi\nPROGRAM",
           "kestral,linnet,merlin, \\\n                         osprey,pipit,plover,siskin,spi\nPROGRAM", "B101"),
     Fault("a layer's list without a comma at the front", "base.acd", "\nPROGRAM_OPTION_PACKAGE",
-          "\nDEVICE_SUPPORTED += KS100\nPROGRAM_OPTION_PACKAGE", "B101", at="plover,siskin,spi\n"),
+          "\nDEVICE_SUPPORTED += KS100\nPROGRAM_OPTION_PACKAGE", "R104", at="DEVICE_SUPPORTED += KS100"),
     Fault("a package behind _", "base.acd", "KS50,KS50PQ208", "KS50,KS50_PQ208", "B102"),
     Fault("a package that the device does not have", "base.acd", "KS50,KS50PQ208", "KS50,KS50PQ280", "B103"),
     Fault("a new family that no list names", "sparrow.acd", None, "PROPERTY = VENDOR,Korvel\n", "B104"),
