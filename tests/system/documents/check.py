@@ -10,7 +10,7 @@ Other blocks are not looked at. A block of any language whose first line is a co
 written to that file, for the commands to find.
 
 The commands run in a folder of their own in which `build/demo` is the build tree and `tarvik` is the tool in it. Their
-home is empty at first.
+home is empty at first. Each command has a shell of its own, in which the block's exports were made before.
 """
 
 import argparse
@@ -94,8 +94,11 @@ class Checker:
             raise Failure(f"{shlex.join(command)}\nends with {result.returncode}:\n{result.stdout}")
 
     def converse(self, line, body):
+        exports = ""
         for offset, command, expected in commands(body):
-            result = self.run(["bash", "-c", command])
+            if command.startswith("export "):
+                exports += command + "\n"
+            result = self.run(["bash", "-c", exports + command])
             if not expected and result.returncode != 0:
                 raise Failure(f"line {line + offset}: {command}\nends with {result.returncode}:\n{result.stdout}")
             if expected and result.stdout != expected:
@@ -147,7 +150,7 @@ def main():
     parser.add_argument("--compiler", required=True)
     parser.add_argument("--flags", default="")
     parser.add_argument("--expect", nargs=2, type=int, required=True, metavar=("CODE", "CONSOLE"),
-                        help="the least numbers of blocks, lest the document loses them unnoticed")
+                        help="the least numbers of blocks, so that the document does not lose them unnoticed")
     arguments = parser.parse_args()
     try:
         counts = Checker(arguments).check()
