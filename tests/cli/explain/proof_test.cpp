@@ -257,13 +257,9 @@ bool addWhatIsMissing(EditableDatabase& database, const Question& question, cons
                                                                   : "OPERATION";
             if (says(".*: there is no section \\[(.*)\\]")) {
                 database.addSection("Mir.acd", match.str(1), std::string(key) + " = " + record);
-                return true;
+            } else if (says(".*: (.*\\.acd) has no (.*)")) {
+                database.append(match.str(1), match.str(2), ':', record);
             }
-            const std::string family =
-                question.mode == TARVIKNS::MODE_TYPE::SPI && question.kind != Kind::BSDL
-                    ? "spi"
-                    : database.familyOf(question.device);
-            database.append(family + ".acd", key, ':', record);
         }
     } else if (says("neither the flash nor its class has a property .*")) {
         database.append("spi.acd", upper(question.device) + "_PROPERTY", ':',
