@@ -7,12 +7,8 @@
 #include "model/Catalogue.h"
 #include "model/Vocabulary.h"
 #include "query/Tool.h"
-#include "term/Table.h"
-#include "text/Suggest.h"
 
 #include <tarvik/ConstraintsManager.h>
-
-#include <fmt/format.h>
 
 #include <algorithm>
 #include <memory>
@@ -97,17 +93,6 @@ Question::Kind kindOf(const Arguments& arguments) {
     throw CommandError(ExitCode::FAULT, usage);
 }
 
-TARVIKNS::PROGRAM_OPTION readOption(const std::string& text) {
-    const std::vector<std::string>& keys = vocabulary::options();
-    const auto found = std::find(keys.begin(), keys.end(), text);
-    if (found == keys.end()) {
-        throw CommandError(ExitCode::FAULT,
-                           fmt::format("unknown option \"{}\"{}\noptions, in upper case:\n{}", text,
-                                       didYouMean(text, keys), wrapped(keys, 2)));
-    }
-    return static_cast<TARVIKNS::PROGRAM_OPTION>(found - keys.begin());
-}
-
 Question read(const Arguments& arguments) {
     Question question;
     question.kind = kindOf(arguments);
@@ -126,7 +111,7 @@ Question read(const Arguments& arguments) {
             vocabulary::readOperation(arguments.operation ? *arguments.operation : *arguments.bsdl);
     }
     if (arguments.option) {
-        question.option = readOption(*arguments.option);
+        question.option = vocabulary::readOption(*arguments.option);
     }
     return question;
 }

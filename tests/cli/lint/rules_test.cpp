@@ -48,7 +48,7 @@ std::string readFile(const std::string& path) {
 std::string onOneLine(const std::string& text) { return std::regex_replace(text, std::regex("\\s+"), " "); }
 
 /// The finding lines of a text report, without the directory.
-std::string findingLines(const Outcome& outcome, const std::string& directory) {
+std::string findingLines(const ProcessResult& outcome, const std::string& directory) {
     std::istringstream lines(outcome.output);
     std::string found;
     for (std::string line; std::getline(lines, line);) {
@@ -77,7 +77,7 @@ TEST(Rules, GiveExactlyTheirFindingInTheirBadDatabase) {
             continue;
         }
         const std::string directory = SOURCE + "/tests/data/bad/" + rule.code;
-        const Outcome outcome = runLint({directory, "--strict"});
+        const ProcessResult outcome = runLint({directory, "--strict"});
         const std::string found = findingLines(outcome, directory);
         EXPECT_EQ(outcome.status, 1) << rule.code;
         EXPECT_EQ(std::count(found.begin(), found.end(), '\n'), 1) << found;
@@ -128,7 +128,7 @@ TEST(Rules, StandInTheDocumentOnlyWhenTheyExist) {
 }
 
 TEST(Rules, AreExplainedByCode) {
-    const Outcome outcome = runLint({"--explain", "T105"});
+    const ProcessResult outcome = runLint({"--explain", "T105"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.output.rfind("accidental-mode (T105), warning: mode BS\n", 0), 0U);
     EXPECT_EQ(runLint({"--explain", "t105"}).output, outcome.output);
@@ -227,7 +227,7 @@ TEST(Layers, HaveTheirFindingsInTheirOwnFiles) {
 TEST(Layers, LookAtListsAsAWhole) {
     const DatabaseDirectory below(cleanDatabase());
     const DatabaseDirectory above(Files{{"base.acd", "DEVICE_SUPPORTED += ,sparow\n"}});
-    const Outcome outcome = runLint({above.path(), below.path()});
+    const ProcessResult outcome = runLint({above.path(), below.path()});
     EXPECT_EQ(findingLines(outcome, above.path()),
               "base.acd:1:22: error: \"sparow\" is neither a family nor a device [B101]\n");
 }

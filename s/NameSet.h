@@ -8,15 +8,15 @@
 #include <utility>
 #include <vector>
 
-/// An ordered set of names that is filled at once and then only read: a sorted vector, so that the position
-/// of a name, which numbers the blocks of the permission tables, is a subtraction.
+/// An ordered set of names that is filled once and then only read: a sorted vector, so that the position of a name,
+/// which numbers the blocks of the permission tables, is a subtraction.
 class NameSet {
 public:
     /// No names.
     NameSet() = default;
 
-    /// Takes names.
-    /// @param names in any order; a name given twice counts once
+    /// Sorts names.
+    /// @param names in any order; repeated ones are stored once
     explicit NameSet(std::vector<StringBase> names) : m_names(std::move(names)) {
         std::sort(m_names.begin(), m_names.end(), ltptstr());
         m_names.erase(std::unique(m_names.begin(), m_names.end()), m_names.end());

@@ -7,7 +7,7 @@
 #include <string_view>
 
 /// Hashes texts for containers whose look-ups take a `std::string_view` without copying it. Not `noexcept` on
-/// purpose: the standard library then keeps each entry's hash, and need not take it again while it searches.
+/// purpose: the standard library then stores each entry's hash instead of computing it again while it searches.
 struct TextHash {
     using is_transparent = void; ///< takes any kind of text
 

@@ -1,16 +1,16 @@
 #pragma once
 
-// Reads the fields that the three kinds of permission entries share, and reports what is wrong with them.
+// Parses the fields that the three kinds of permission records share, and reports what is wrong with them.
 
-#include "Lists.h"
-#include "Reporting.h"
+#include "Diagnostics.h"
+#include "RecordReader.h"
 
 #include <tarvik/ConstraintsManager.h>
 
 #include <Port_MsgManData.h>
 
-/// The locations at which one kind of entry raises.
-struct EntryLocations {
+/// The locations at which one kind of record raises.
+struct RecordLocations {
     int unknownOperation;
     int absentMode;
     int unknownMode;
@@ -18,12 +18,14 @@ struct EntryLocations {
     int unknownOutput;
 };
 
-/// Reads the fields of one kind of entry. A fault gives a debug message; while exceptions are on it raises,
-/// else the reader goes on with a value that has no cell.
-class EntryReader {
+/// Parses the fields of one kind of record. A fault issues a debug message. While exceptions are on it also raises;
+/// otherwise parsing continues with a value that has no cell.
+class PermissionRecordParser {
 public:
     /// @param family named in the messages only
-    EntryReader(const EntryLocations& locations, const char* family, bool exceptions) noexcept
+    /// @param exceptions the manager's switch itself, as a message sink may turn it while a record is parsed
+    PermissionRecordParser(const RecordLocations& locations, const char* family,
+                           const bool& exceptions) noexcept
         : m_locations(locations), m_family(family), m_exceptions(exceptions) {}
 
     [[nodiscard]] TARVIKNS::OP_TYPE operation(const StringBase& name) const {
@@ -40,19 +42,19 @@ public:
         if (name == nullptr) {
             fault<DataMismatchException>("%s mode =   %s\n", ABSENT, m_locations.absentMode);
         }
-        return known(ConstraintsManager::modeString2Type(name));
+        return checkedMode(ConstraintsManager::modeString2Type(name));
     }
 
-    /// Refuses the value that stands for no mode. An unknown text converts to Boundary Scan, so nothing that
-    /// can be written in a database gets here; the test stands in case the vocabulary ever grows that value.
-    [[nodiscard]] TARVIKNS::MODE_TYPE known(TARVIKNS::MODE_TYPE mode) const {
-        if (mode == NO_MODE) {
-            reporting::raiseIf<DataMismatchException>(m_exceptions, m_locations.unknownMode);
+    /// Rejects the value 9. An unknown text converts to Boundary Scan, so no database can cause this; the check is for
+    /// a vocabulary that has such a value one day.
+    [[nodiscard]] TARVIKNS::MODE_TYPE checkedMode(TARVIKNS::MODE_TYPE mode) const {
+        if (mode == UNKNOWN_MODE) {
+            diagnostics::raiseIf<DataMismatchException>(m_exceptions, m_locations.unknownMode);
         }
         return mode;
     }
 
-    /// Hands the outputs from field number `first` on to `action`; there has to be one.
+    /// Calls `action` for each output from field number `first`, of which there has to be one.
     template <typename Action>
     void forEachOutput(const Record& record, long first, Action action) const {
         if (record.field(first) == nullptr) {
@@ -68,18 +70,18 @@ public:
     }
 
 private:
-    static constexpr TARVIKNS::MODE_TYPE NO_MODE{9};
+    static constexpr TARVIKNS::MODE_TYPE UNKNOWN_MODE{9};
 
-    /// A field that is not there, as messages show it.
+    /// How messages show a missing field.
     static constexpr const char* ABSENT = "(null)";
 
     template <typename Exception>
     void fault(const char* format, const char* text, int location) const {
         Port_MsgManData::debugStub(format, m_family, text);
-        reporting::raiseIf<Exception>(m_exceptions, location);
+        diagnostics::raiseIf<Exception>(m_exceptions, location);
     }
 
-    const EntryLocations& m_locations;
+    const RecordLocations& m_locations;
     const char* m_family;
-    bool m_exceptions;
+    const bool& m_exceptions;
 };

@@ -1,6 +1,6 @@
 #pragma once
 
-// The one way in which keyed values are read: lists of items, and records of fields.
+// How keyed values are read: lists of items, and records of fields.
 
 #include <PM_DEVKEY.h>
 #include <StringBase.h>
@@ -19,13 +19,13 @@ public:
 
     /// A field, valid until the next read; null when it, or the whole record, does not exist.
     [[nodiscard]] const char* field(long index) const {
-        return isWithinReach(m_index) && isWithinReach(index)
+        return isIndex(m_index) && isIndex(index)
                    ? m_accessor.getstringbykey(m_key, ":", static_cast<short>(m_index), ",",
                                                static_cast<short>(index))
                    : nullptr;
     }
 
-    /// Hands the fields from number `first` on to `action`, up to the first missing one.
+    /// Calls `action` for each field from number `first`, up to the first missing one.
     template <typename Action>
     void forEachFieldFrom(long first, Action action) const {
         for (long index = first; const char* const text = field(index); ++index) {
@@ -34,7 +34,8 @@ public:
     }
 
 private:
-    [[nodiscard]] static bool isWithinReach(long index) noexcept {
+    /// Readers take 16 bits.
+    [[nodiscard]] static bool isIndex(long index) noexcept {
         return index <= std::numeric_limits<short>::max();
     }
 
@@ -43,7 +44,7 @@ private:
     int m_index;
 };
 
-/// Hands each record and its first field to `action`, up to the first record that does not exist.
+/// Calls `action` for each record and its first field, up to the first record that does not exist.
 template <typename Action>
 void forEachRecord(PM_DEVKEY& accessor, const char* key, Action action) {
     for (int index = 0;; ++index) {
@@ -69,16 +70,12 @@ void forEachRecord(PM_DEVKEY& accessor, const char* key, Action action) {
     return items;
 }
 
-/// Sets the value of a key in a map. Lists keep what is alike together, so most keys belong right behind the one that
-/// was set before, `latest`, which makes the search for their place short.
+/// Sets the value of a key in a map, with a hint: database lists are nearly sorted, so most keys belong right after
+/// `last`, the one that was set before.
 /// @return the entry
 template <typename Map>
-typename Map::iterator setBehind(Map& map, typename Map::iterator latest, StringBase key, const char* value) {
-    const std::size_t former = map.size();
-    const auto place = latest == map.end() ? latest : std::next(latest);
-    const auto entry = map.emplace_hint(place, std::move(key), value);
-    if (map.size() == former) {
-        entry->second = value;
-    }
-    return entry;
+typename Map::iterator insertWithHint(Map& map, typename Map::iterator last, StringBase key,
+                                      const char* value) {
+    const auto place = last == map.end() ? last : std::next(last);
+    return map.insert_or_assign(place, std::move(key), value);
 }

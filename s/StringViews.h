@@ -15,12 +15,9 @@
     return {text.c_str(), text.GetLength()};
 }
 
-/// What stands before the first "_": the device without its package.
+[[nodiscard]] inline StringBase toStringBase(std::string_view text) { return {text.data(), text.size()}; }
+
+/// The part before the first "_": the device without its package.
 [[nodiscard]] inline std::string_view baseName(std::string_view device) noexcept {
     return device.substr(0, device.find('_'));
-}
-
-[[nodiscard]] inline StringBase baseNameOf(std::string_view device) {
-    const std::string_view base = baseName(device);
-    return {base.data(), base.size()};
 }

@@ -1,20 +1,20 @@
 #pragma once
 
-// How the manager speaks: the one place for raising, for messages, and for the locations that both carry.
+// Exceptions and messages of the manager, and the locations that both carry.
 
 #include <Port_MsgManData.h>
 #include <TarvikException.h>
 
 #include <utility>
 
-namespace reporting {
+namespace diagnostics {
 
 inline constexpr const char* PRODUCT = "Tarvik";
 inline constexpr const char* SOURCE = "../s/ConstraintsManager";
 inline constexpr const char* REVISION = "1.0";
 
-/// Where a report comes from. Reports show these numbers and hosts know them, so they never change, however
-/// the code moves.
+/// Where a report comes from. Reports show these numbers and hosts know them, so they never change, even if the code
+/// moves. `docs/embedding.md` lists those that raise.
 namespace location {
 
 inline constexpr int OUTPUT_REFUSED = 201;
@@ -23,6 +23,7 @@ inline constexpr int OUTPUT_REFUSED_WITH_DEVICE = 249;
 inline constexpr int DEVICE_REFUSED_WITH_OUTPUT = 256;
 
 inline constexpr int PROPERTY_NOT_FOUND = 437;
+inline constexpr int DUMPED_MODE_UNKNOWN = 583;
 inline constexpr int CHECKED_MODE_UNKNOWN = 644;
 
 inline constexpr int PROPERTY_WITHOUT_VALUE = 1011;
@@ -63,7 +64,7 @@ template <typename Exception>
     throw Exception(PRODUCT, SOURCE, REVISION, location);
 }
 
-/// Raises only while `exceptions` is on; otherwise the caller goes on with its neutral value.
+/// Raises only while `exceptions` is on; otherwise the caller continues with its neutral value.
 template <typename Exception>
 void raiseIf(bool exceptions, int location) {
     if (exceptions) {
@@ -71,9 +72,22 @@ void raiseIf(bool exceptions, int location) {
     }
 }
 
-/// The message object through which a location speaks.
+/// The message object of a location.
 [[nodiscard]] inline Port_MsgManData message(int location) {
     return Port_MsgManData::createObject(PRODUCT, SOURCE, location, REVISION);
 }
 
-} // namespace reporting
+inline constexpr const char* MODE_OUT_OF_RANGE = "Mode is out of range -- %d.\n";
+
+/// Is a value outside 0 to `bound` - 1? Then it issues the debug message `format`, which takes the value.
+template <typename Value>
+[[nodiscard]] bool rejectOutOfRange(Value value, int bound, const char* format) {
+    const int number = static_cast<int>(value);
+    const bool isOutside = number < 0 || number >= bound;
+    if (isOutside) {
+        Port_MsgManData::debugStub(format, number);
+    }
+    return isOutside;
+}
+
+} // namespace diagnostics

@@ -1,6 +1,8 @@
 #pragma once
 
-#include <tarvik/TextHash.h>
+#include "TextHash.h"
+
+#include <StringBase.h>
 
 #include <cstddef>
 #include <string_view>
@@ -8,11 +10,10 @@
 #include <utility>
 #include <vector>
 
-/// Names in the order in which they were added, repeated ones included, and an index beside them that tells
-/// whether a name is among them.
+/// Names in the order in which they were added, repeated ones included, with an index for membership.
 class NameSequence {
 public:
-    /// Adds a name behind all others. Changes nothing when memory runs out.
+    /// Adds a name at the end. Changes nothing if memory runs out.
     /// @param name to be added, whether it is among them or not
     void push_back(StringBase name) {
         m_names.push_back(std::move(name));
@@ -26,17 +27,17 @@ public:
 
     /// @param name compared byte by byte
     /// @return whether it is among them; takes the same time however many there are
-    [[nodiscard]] bool contains(std::string_view name) const;
+    [[nodiscard]] bool contains(std::string_view name) const { return m_index.find(name) != m_index.end(); }
 
     /// @return whether there are none
     [[nodiscard]] bool empty() const noexcept { return m_names.empty(); }
     /// @return how many there are, repeated ones included
     [[nodiscard]] std::size_t size() const noexcept { return m_names.size(); }
-    /// @return the name added latest, of one at least
+    /// @return the last name, of at least one
     [[nodiscard]] const StringBase& back() const noexcept { return m_names.back(); }
-    /// @return the name added first
+    /// @return the first name
     [[nodiscard]] auto begin() const noexcept { return m_names.begin(); }
-    /// @return the end behind the name added latest
+    /// @return the end
     [[nodiscard]] auto end() const noexcept { return m_names.end(); }
 
 private:

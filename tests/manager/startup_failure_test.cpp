@@ -1,7 +1,6 @@
 // What the queries answer when the start-up ended early, so that lists are empty or tables were never built.
-#include "QueryFixture.h"
+#include "Members.h"
 
-#include <PermissionTable.h>
 #include <TarvikSmokeMgr.h>
 
 #include <gmock/gmock.h>
@@ -38,7 +37,7 @@ public:
     UnreadableBase(const UnreadableBase&) = delete;
     UnreadableBase& operator=(const UnreadableBase&) = delete;
 
-    [[nodiscard]] std::vector<std::string> searchPath() const { return {m_directory.string()}; }
+    [[nodiscard]] std::string path() const { return m_directory.string(); }
 
 private:
     std::filesystem::path m_directory =
@@ -46,14 +45,14 @@ private:
 };
 
 // Puts the tables back to how they are before the start-up gives them their size.
-void unbuildTables(const ManagerOver& manager) {
-    *manager.peer().operationTable() = PermissionTable();
-    *manager.peer().bsdlOperationTable() = PermissionTable();
-    *manager.peer().programOptionTable() = PermissionTable();
+void unbuildTables(const ManagerFixture& manager) {
+    manager.members().m_operationTable = PermissionTable();
+    manager.members().m_bsdlOperationTable = PermissionTable();
+    manager.members().m_programOptionTable = PermissionTable();
 }
 
 // Expects 0 or false of every query of the permission tables, for every value of every argument.
-void expectNothingAllowed(const ManagerOver& manager) {
+void expectNothingAllowed(const ManagerFixture& manager) {
     for (const char* device : {"dev1", "fam1", "spi", "nobody", "", static_cast<const char*>(nullptr)}) {
         for (const int output : BOUNDARY_VALUES) {
             EXPECT_EQ(manager->getBsdlOperations(device, OUTPUT_TYPE{output}), 0);
@@ -70,14 +69,14 @@ void expectNothingAllowed(const ManagerOver& manager) {
 
 } // namespace
 
-TEST(EarlyEnd, WithoutABaseDatabaseNothingIsAllowed) {
-    ManagerOver manager(WITHOUT_BASE);
+TEST(StartupFailure, WithoutABaseDatabaseNothingIsAllowed) {
+    ManagerFixture manager(WITHOUT_BASE);
     manager->setExceptions(false);
     expectNothingAllowed(manager);
 }
 
-TEST(EarlyEnd, WithoutABaseDatabaseUnknownNamesAreRaised) {
-    ManagerOver manager(WITHOUT_BASE);
+TEST(StartupFailure, WithoutABaseDatabaseUnknownNamesAreRaised) {
+    ManagerFixture manager(WITHOUT_BASE);
     expectRaises<OutOfRangeException>(
         1999, [&] { return manager->getDeviceOperations("dev1", MODE_TYPE::SPI, OUTPUT_TYPE::PARALLEL); });
     expectRaises<OutOfRangeException>(2024, [&] {
@@ -87,8 +86,8 @@ TEST(EarlyEnd, WithoutABaseDatabaseUnknownNamesAreRaised) {
         2024, [&] { return manager->getDeviceOperations("dev1", MODE_TYPE::BS, OUTPUT_TYPE::PARALLEL); });
 }
 
-TEST(EarlyEnd, WithoutABaseDatabaseOnlyTheFormatterModeAcceptsAnything) {
-    ManagerOver manager(WITHOUT_BASE);
+TEST(StartupFailure, WithoutABaseDatabaseOnlyTheFormatterModeAcceptsAnything) {
+    ManagerFixture manager(WITHOUT_BASE);
     for (int mode = 0; mode < 9; ++mode) {
         EXPECT_EQ(manager->checkConstraints(MODE_TYPE{mode}, OUTPUT_TYPE::PARALLEL), mode == 8);
         EXPECT_EQ(manager->checkConstraints(MODE_TYPE{mode}, "dev1", nullptr), mode == 5 || mode == 8);
@@ -96,18 +95,18 @@ TEST(EarlyEnd, WithoutABaseDatabaseOnlyTheFormatterModeAcceptsAnything) {
     }
 }
 
-TEST(EarlyEnd, WithoutABaseDatabasePropertiesAreStillFound) {
-    ManagerOver manager(WITHOUT_BASE);
+TEST(StartupFailure, WithoutABaseDatabasePropertiesAreStillFound) {
+    ManagerFixture manager(WITHOUT_BASE);
     manager->setExceptions(false);
     EXPECT_STREQ(manager->getDeviceStringProperty("dev1", "K"), "theirs");
     EXPECT_TRUE(manager->checkConstraints("dev1", MODE_TYPE::BS, OP_TYPE::VERIFY, nullptr));
-    EXPECT_THAT(textsOf(manager->getDeviceOperationOptions("dev1", "VERIFY", MODE_TYPE::BS)),
+    EXPECT_THAT(texts(manager->getDeviceOperationOptions("dev1", "VERIFY", MODE_TYPE::BS)),
                 ElementsAre("fast"));
     EXPECT_EQ(manager->getDeviceLongProperty("dev1", "NONE"), -1);
 }
 
-TEST(EarlyEnd, WithoutAnyDatabaseEveryQueryAnswers) {
-    ManagerOver manager(Files{});
+TEST(StartupFailure, WithoutAnyDatabaseEveryQueryAnswers) {
+    ManagerFixture manager(Files{});
     manager->setExceptions(false);
     expectNothingAllowed(manager);
     EXPECT_EQ(manager->getDeviceStringProperty("dev1", "K"), nullptr);
@@ -115,19 +114,19 @@ TEST(EarlyEnd, WithoutAnyDatabaseEveryQueryAnswers) {
     EXPECT_TRUE(manager->getDeviceOperationOptions("dev1", "VERIFY", MODE_TYPE::BS).empty());
 }
 
-TEST(EarlyEnd, WithAnUnreadableBaseDatabaseNothingIsAllowed) {
+TEST(StartupFailure, WithAnUnreadableBaseDatabaseNothingIsAllowed) {
     const UnreadableBase directory;
-    ManagerOver manager(directory.searchPath());
+    ManagerFixture manager(SearchPath(directory.path()));
     manager->setExceptions(false);
     EXPECT_EQ(manager->getDeviceOperations("dev1", MODE_TYPE::SPI, OUTPUT_TYPE::PARALLEL), 0);
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::BS, OUTPUT_TYPE::PARALLEL));
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::BS, "dev1", nullptr));
 }
 
-TEST(EarlyEnd, AnUnreadableBaseDatabaseIsRaisedForEachUnknownDevice) {
+TEST(StartupFailure, AnUnreadableBaseDatabaseIsRaisedForEachUnknownDevice) {
     // Its family would be "base". A failure to read is no gated one.
     const UnreadableBase directory;
-    ManagerOver manager(directory.searchPath());
+    ManagerFixture manager(SearchPath(directory.path()));
     manager->setExceptions(false);
     for (const char* device : {"dev1", "dev2", "dev1"}) {
         EXPECT_THROW(
@@ -138,25 +137,25 @@ TEST(EarlyEnd, AnUnreadableBaseDatabaseIsRaisedForEachUnknownDevice) {
     }
 }
 
-TEST(EarlyEnd, AnSpiDatabaseThatFailsAtItsOptionsLeavesTheTablesUsable) {
+TEST(StartupFailure, AnSpiDatabaseThatFailsAtItsOptionsLeavesTheTablesUsable) {
     auto files = withBase();
     files["spi.acd"] += "PROGRAM_OPTION = NOSUCH,SPI,PARALLEL\n";
-    ManagerOver manager(files);
+    ManagerFixture manager(files);
     EXPECT_EQ(manager->getDeviceOperations("x", MODE_TYPE::SPI, OUTPUT_TYPE::PARALLEL), maskOf(3));
     EXPECT_EQ(manager->getProgramOptions("x", MODE_TYPE::SPI, OUTPUT_TYPE::PARALLEL, nullptr), 0);
     EXPECT_EQ(manager->getDeviceOperations("dev1", MODE_TYPE::BS, OUTPUT_TYPE::PARALLEL), maskOf(3));
-    EXPECT_FALSE(holds(manager.peer().programOptionsLoaded(), "spi"));
+    EXPECT_FALSE(holds(manager.members().m_programOptionsLoaded, "spi"));
 }
 
-TEST(EarlyEnd, TablesThatWereNeverBuiltAllowNothing) {
-    ManagerOver manager(withBase());
+TEST(StartupFailure, TablesThatWereNeverBuiltAllowNothing) {
+    ManagerFixture manager(withBase());
     unbuildTables(manager);
     manager->setExceptions(false);
     expectNothingAllowed(manager);
 }
 
-TEST(EarlyEnd, TablesThatWereNeverBuiltAllowNothingWhileExceptionsAreOn) {
-    ManagerOver manager(withBase());
+TEST(StartupFailure, TablesThatWereNeverBuiltAllowNothingWhileExceptionsAreOn) {
+    ManagerFixture manager(withBase());
     unbuildTables(manager);
     const auto PARALLEL = OUTPUT_TYPE::PARALLEL;
     EXPECT_EQ(manager->getDeviceOperations("dev1", MODE_TYPE::BS, PARALLEL), 0);
@@ -166,8 +165,8 @@ TEST(EarlyEnd, TablesThatWereNeverBuiltAllowNothingWhileExceptionsAreOn) {
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
-TEST(EarlyEnd, TablesThatWereNeverBuiltDumpAsZeros) {
-    ManagerOver manager(withBase());
+TEST(StartupFailure, TablesThatWereNeverBuiltDumpAsZeros) {
+    ManagerFixture manager(withBase());
     unbuildTables(manager);
     const auto zeros = [](int cells) {
         std::string text;
