@@ -229,10 +229,11 @@ TEST(WhySteps, ACountOfZeroHidesTheValuesOfTheFamily) {
 
 TEST(WhySteps, APropertyOfTheFamilyMayReplaceThatOfTheDevice) {
     // "zor" and "x_PINS" are joined to the same text as "zor_x" and "PINS".
-    const Databases databases(Files{{"base.acd", "DEVICE_SUPPORTED = zor\nPROGRAM_OPTION_PACKAGE = zor\n"},
+    const Databases databases(Files{{"base.acd", "DEVICE_SUPPORTED = other\nPROGRAM_OPTION_PACKAGE = zor\n"},
                                     {"zor.acd", "PROPERTY = x_PINS,7\n[zor_x]\nPROPERTY = PINS,5\n"}});
     Question question = about(Kind::PROPERTY, "zor_x");
     question.property = "PINS";
+    question.value = "7";
     const why::Explanation found = explained(question);
     EXPECT_EQ(why::ask(Databases::freshManager(), question), Verdict::YES);
     EXPECT_EQ(place(stepAbout(found.steps, "record")), "zor.acd:1:12: x_PINS,7");
