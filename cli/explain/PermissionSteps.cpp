@@ -154,7 +154,7 @@ bool ExplanationBuilder::hasTable(std::string& owner) {
                       ? fmt::format("{} lists \"{}\", but what is looked up is the whole name \"{}\", which "
                                     "has no table",
                                     table.list, base, owner)
-                      : fmt::format("{} does not list \"{}\", so it has no table", table.list, owner));
+                      : fmt::format("{} does not list \"{}\", so it has no table", table.list, name));
     return false;
 }
 
@@ -250,10 +250,10 @@ void ExplanationBuilder::addNoRecord(const std::string& table, const std::string
     const std::string text = fmt::format("no record of {} names {}", table, word);
     if (value != nullptr && !value->items.empty()) {
         add("absent", text, {value, &value->items.front().whole});
-    } else if (value != nullptr && value->family.empty()) {
-        add("absent", fmt::format("{}: there is no section [{}]", text, table));
+    } else if (value != nullptr && !value->family.empty()) {
+        add("absent", fmt::format("{}: {}.acd has no {}", text, value->family, value->key));
     } else {
-        add("absent", fmt::format("{}: there is no {}", text, tableOf(m_question.kind).key));
+        add("absent", fmt::format("{}: there is no section [{}]", text, table));
     }
     if (value != nullptr) {
         addShadowedRecords(value->accessorName(), value->key, word);
@@ -263,10 +263,13 @@ void ExplanationBuilder::addNoRecord(const std::string& table, const std::string
 /// Notes the records that a layer on top removed by setting their key.
 void ExplanationBuilder::addShadowedRecords(const std::string& database, const std::string& key,
                                             const std::string& word) {
-    for (const catalogue::Record& record : catalogue::readRecords(database, key).shadowed) {
+    const catalogue::Records records = catalogue::readRecords(database, key);
+    for (const catalogue::Record& record : records.shadowed) {
         if (sameWithoutCase(record.fields.front().text, word)) {
+            const std::string where =
+                records.all.empty() ? "a layer on top" : catalogue::asText(records.all.front().whole.origin);
             m_steps.push_back(
-                {"note", fmt::format("a layer on top sets {} anew, without this record", key), record.whole});
+                {"note", fmt::format("{} replaces {}, without this record", where, key), record.whole});
         }
     }
 }

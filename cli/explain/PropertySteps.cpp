@@ -50,7 +50,13 @@ bool ExplanationBuilder::property() {
     }
     const std::optional<Property> found = findProperty(device, key);
     if (found) {
-        return holds(*found, key, m_question.value);
+        const bool isYes = holds(*found, key, m_question.value);
+        const char* const single = m_asked.manager->getDeviceStringProperty(device.c_str(), key.c_str());
+        if (single != nullptr && found->values.count(single) == 0) {
+            add("note",
+                fmt::format("getDeviceStringProperty answers \"{}\": it asks the family once more", single));
+        }
+        return isYes;
     }
     add("absent", fmt::format("neither \"{}\" nor its family has a value for {}", device, key));
     for (const char* const records : {schema::PROPERTY, schema::PROPERTIES}) {

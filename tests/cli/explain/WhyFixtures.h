@@ -7,6 +7,7 @@
 #include <AcdStore.h>
 #include <tarvik/ConstraintsManager.h>
 
+#include <cstdlib>
 #include <map>
 #include <string>
 #include <vector>
@@ -54,8 +55,9 @@ private:
     return why::explain(question);
 }
 
-/// The answer as a pipe would get it.
+/// The answer without colours, in 80 columns.
 [[nodiscard]] inline std::string asPlainText(const why::Answer& answer) {
+    ::setenv("COLUMNS", "80", 1);
     return why::asText(answer, Terminal(-1, Terminal::Colours::NEVER));
 }
 

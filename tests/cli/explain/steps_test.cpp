@@ -163,6 +163,92 @@ TEST(WhySteps, APropertyOfTheFamilyIsToldAsSuch) {
     EXPECT_EQ(stepAbout(found.steps, "absent").text, "COLOURS of the family is blue, red, not green");
 }
 
+TEST(WhySteps, ANoLeadsToTheKeyThatWasConsulted) {
+    const Databases databases(family("# first\nOPERATION = ERASE,Bscan,USB2:VERIFY,Bscan,USB2"));
+    const why::Step absent =
+        stepAbout(explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)).steps, "absent");
+    EXPECT_EQ(absent.text, "no record of fam names PROGRAM");
+    EXPECT_EQ(place(absent), "fam.acd:2:13: ERASE,Bscan,USB2");
+}
+
+TEST(WhySteps, AMissingKeyIsNamed) {
+    const Databases databases(family(""));
+    EXPECT_EQ(stepAbout(explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)).steps, "absent").text,
+              "no record of fam names PROGRAM: fam.acd has no OPERATION");
+}
+
+TEST(WhySteps, AMissingSectionIsNamed) {
+    const Databases databases(Files{{"base.acd", "DEVICE_SUPPORTED = D9\n"}});
+    EXPECT_EQ(stepAbout(explained(programming("D9", MODE_TYPE::BS, OUTPUT_TYPE::USB2)).steps, "absent").text,
+              "no record of D9 names PROGRAM: there is no section [D9]");
+}
+
+TEST(WhySteps, ThePackageTableIsReadFromTheSectionOfTheDevice) {
+    const Databases databases(
+        Files{{"base.acd", "DEVICE_SUPPORTED = fam\nPROGRAM_OPTION_PACKAGE = D1PQ,fam\n"},
+              {"fam.acd", "[D1]\nPROGRAM_OPTION = VERIFY,Bscan,PARALLEL\n"}});
+    Question question = about(Kind::OPTION, "D1");
+    question.option = PROGRAM_OPTION::VERIFY;
+    question.package = "PQ";
+    const why::Explanation found = explained(question);
+    EXPECT_EQ(found.verdict, Verdict::YES);
+    EXPECT_EQ(stepAbout(found.steps, "table").text, "PROGRAM_OPTION of D1PQ, read from [D1]");
+}
+
+TEST(WhySteps, AListedDeviceHidesTheOptionsOfItsPackage) {
+    const Databases databases(
+        Files{{"base.acd", "DEVICE_SUPPORTED = D1,fam\nPROGRAM_OPTION_PACKAGE = D1PQ,fam\n"},
+              {"fam.acd", "[D1]\nPROGRAM_OPTION = VERIFY,Bscan,PARALLEL\n"}});
+    Question question = about(Kind::OPTION, "D1");
+    question.option = PROGRAM_OPTION::VERIFY;
+    question.package = "PQ";
+    const why::Explanation found = explained(question);
+    EXPECT_EQ(found.verdict, Verdict::NO);
+    EXPECT_EQ(stepAbout(found.steps, "rule").text,
+              "DEVICE_SUPPORTED lists \"D1\", so options are read for \"D1\" alone, and \"D1PQ\" has none");
+    EXPECT_EQ(why::ask(Databases::freshManager(), question), Verdict::NO);
+}
+
+TEST(WhySteps, ACountOfZeroHidesTheValuesOfTheFamily) {
+    const Databases databases(
+        Files{{"base.acd", "DEVICE_SUPPORTED = fam\nPROGRAM_OPTION_PACKAGE = fam\n"},
+              {"fam.acd", "PROPERTIES = PROGRAM,2,BS,SS\n[D1]\nPROPERTIES = PROGRAM,0\n"}});
+    Question question = about(Kind::PROPERTY, "D1");
+    question.property = "PROGRAM";
+    for (const std::optional<std::string>& value :
+         {std::optional<std::string>(), std::optional<std::string>("BS")}) {
+        question.value = value;
+        const why::Explanation found = explained(question);
+        EXPECT_EQ(found.verdict, Verdict::NO);
+        EXPECT_EQ(why::ask(Databases::freshManager(), question), Verdict::NO);
+        EXPECT_EQ(place(stepAbout(found.steps, "absent")), "fam.acd:3:14: PROGRAM,0");
+        EXPECT_EQ(stepAbout(found.steps, "note").text,
+                  "getDeviceStringProperty answers \"BS\": it asks the family once more");
+    }
+}
+
+TEST(WhySteps, APropertyOfTheFamilyMayReplaceThatOfTheDevice) {
+    // "zor" and "x_PINS" are joined to the same text as "zor_x" and "PINS".
+    const Databases databases(Files{{"base.acd", "DEVICE_SUPPORTED = other\nPROGRAM_OPTION_PACKAGE = zor\n"},
+                                    {"zor.acd", "PROPERTY = x_PINS,7\n[zor_x]\nPROPERTY = PINS,5\n"}});
+    Question question = about(Kind::PROPERTY, "zor_x");
+    question.property = "PINS";
+    question.value = "7";
+    const why::Explanation found = explained(question);
+    EXPECT_EQ(why::ask(Databases::freshManager(), question), Verdict::YES);
+    EXPECT_EQ(place(stepAbout(found.steps, "record")), "zor.acd:1:12: x_PINS,7");
+}
+
+TEST(WhyAlternatives, AllOtherDevicesOfTheFamilyAreCounted) {
+    const Databases databases(
+        Files{{"base.acd", "DEVICE_SUPPORTED = D1,fam\n"},
+              {"fam.acd", "OPERATION = PROGRAM,Bscan,USB2\n[D1]\nOPERATION = ERASE,Bscan,USB2\n"
+                          "[D2]\n[D3]\n"}});
+    EXPECT_EQ(
+        stepAbout(why::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "differs").text,
+        "yes for the other 2 devices of fam");
+}
+
 TEST(WhyAlternatives, TheRecordsThatAllowItElsewhere) {
     const Databases databases(family("OPERATION = PROGRAM,Bscan,PARALLEL,USB2:PROGRAM,SS,SVF"));
     const std::vector<why::Step> steps =
