@@ -2,8 +2,15 @@
 #include "commands/Commands.h"
 
 #include "diff/Presentation.h"
+#include "diff/Subprocess.h"
+#include "query/Database.h"
+#include "query/DeviceTables.h"
 #include "query/Tool.h"
+#include "term/Progress.h"
 
+#include <fmt/format.h>
+
+#include <exception>
 #include <memory>
 #include <sstream>
 
@@ -40,11 +47,75 @@ std::string asText(const ReleaseNotes& notes, const Terminal& /*any*/) {
 }
 Json asJson(const ReleaseNotes& notes) { return diff::asJson(notes.comparison); }
 
+/// The format in which a process writes the answers of one database for the process that compares them. It is not
+/// offered to people.
+constexpr const char* SNAPSHOT = "snapshot";
+
+/// A snapshot, or why there is none.
+struct Written {
+    std::string snapshot;
+};
+
+std::string asText(const Written& written, const Terminal& /*any*/) { return written.snapshot; }
+Json asJson(const Written& /*written*/) { return {}; }
+
+/// What begins a text that is no snapshot, but says why there is none.
+constexpr char FAULT = '!';
+
+std::string snapshotOrFault(Tool& tool, const std::string& database) {
+    try {
+        openDatabase(layers(database));
+        Progress progress("asking about each device");
+        const std::string snapshot = diff::takeSnapshot(
+            [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
+        static_cast<void>(tool.messages().take());
+        return snapshot;
+    } catch (const std::exception& fault) {
+        std::string reason(1, FAULT);
+        for (const Messages::Message& message : tool.messages().take()) {
+            reason += message.channel == Port_MsgManData::Channel::INFO ? message.text : "";
+        }
+        return reason +
+               (dynamic_cast<const CommandError*>(&fault) != nullptr ? fault.what() : faultText(fault));
+    }
+}
+
+std::string outputOf(diff::Subprocess& process) {
+    std::string text = process.output();
+    if (text.starts_with(FAULT)) {
+        throw CommandError(ExitCode::FAULT, text.substr(1));
+    }
+    return text;
+}
+
+diff::Comparison compare(const Arguments& arguments) {
+    const auto snapshotOf = [](const std::string& database) {
+        return std::vector<std::string>{"diff", "--format", SNAPSHOT, "--", database, database};
+    };
+    // Both take about the same time, so one of them shows the progress.
+    diff::Subprocess oldProcess(snapshotOf(arguments.oldDatabase), false);
+    diff::Subprocess newProcess(snapshotOf(arguments.newDatabase), true);
+    const diff::Snapshot before(outputOf(oldProcess));
+    const diff::Snapshot after(outputOf(newProcess));
+    return diff::compare(before, after);
+}
+
 ExitCode run(Tool& tool, const Arguments& arguments) {
-    const auto [oldFacts, newFacts] =
-        diff::factsOf(layers(arguments.oldDatabase), layers(arguments.newDatabase));
-    const diff::Comparison comparison = diff::compare(oldFacts, newFacts);
-    const ExitCode status = comparison.isEmpty() ? ExitCode::YES : ExitCode::NO;
+    if (arguments.format == SNAPSHOT) {
+        return tool.answer(Written{snapshotOrFault(tool, arguments.oldDatabase)});
+    }
+    if (arguments.format != "text" && arguments.format != "markdown") {
+        throw CommandError(ExitCode::FAULT,
+                           fmt::format("unknown format \"{}\"\nformats: text, markdown", arguments.format));
+    }
+    const diff::Comparison comparison = compare(arguments);
+    ExitCode status = comparison.isEmpty() ? ExitCode::YES : ExitCode::NO;
+    if (!comparison.unanswered.empty()) {
+        tool.note(fmt::format(
+            "answers about {} devices are missing in both databases, the first \"{}\": see tarvik why",
+            comparison.unanswered.size(), comparison.unanswered.front()));
+        status = ExitCode::FAULT;
+    }
     return arguments.format == "markdown" ? tool.answer(ReleaseNotes{comparison}, status)
                                           : tool.answer(comparison, status);
 }
@@ -65,7 +136,6 @@ Action declare(ArgumentList& list) {
         {.name = "--format",
          .value = "FORMAT",
          .description = "The form of the result; markdown is for release notes",
-         .kind = ValueKind::CHOICE,
          .choices = {"text", "markdown"},
          .target = &arguments->format},
     };

@@ -1,9 +1,11 @@
 // `report`: a page about all devices, to look at in a browser.
 #include "commands/Commands.h"
 
+#include "query/DeviceSurvey.h"
 #include "query/Tool.h"
 #include "report/AtomicFile.h"
 #include "report/Page.h"
+#include "term/Progress.h"
 
 #include <fmt/format.h>
 
@@ -44,7 +46,10 @@ Json asJson(const Shown& /*shown*/) {
 ExitCode run(Tool& tool, const std::string& file) {
     tool.openDatabase();
     report::Page page;
-    report::survey(tool, [&](const report::Subject& subject) { page.add(subject); });
+    Progress progress("asking about each device");
+    DeviceSurvey({.operations = true, .options = true, .facts = true})
+        .run([&page](const DeviceDetails& details) { page.add(details); },
+             [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
     if (file == STANDARD_OUTPUT) {
         return tool.answer(Shown{page});
     }

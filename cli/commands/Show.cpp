@@ -1,4 +1,4 @@
-// `show`: everything about one device, to read or to process.
+// `show`: everything about one device.
 #include "commands/Commands.h"
 
 #include "commands/CommonArguments.h"
@@ -14,12 +14,12 @@
 
 namespace {
 
-struct Sheet {
-    DeviceSheet facts;
+struct Shown {
+    DeviceDetails details;
 };
 
 /// "P-U--", or "-" for none.
-std::string cell(DeviceSheet::Outputs outputs, const std::string& letters) {
+std::string cell(DeviceTable::Outputs outputs, const std::string& letters) {
     if (outputs == 0) {
         return "-";
     }
@@ -40,24 +40,24 @@ std::string legend(const std::string& letters) {
     return fmt::format("  through  {}\n", fmt::join(words, "  "));
 }
 
-/// Rows by modes; the cells tell the outputs.
-std::string matrix(const char* title, const std::vector<DeviceSheet::Row>& rows, bool withBsdl,
+/// Rows by modes; the cells show the outputs.
+std::string matrix(const char* title, const std::vector<DeviceTable::Row>& rows, bool withBsdl,
                    const Terminal& terminal) {
     if (rows.empty()) {
         return {};
     }
     const std::string letters = outputLetters();
     Table::Row headings{""};
-    for (std::size_t mode = 0; mode < DeviceSheet::MODES; ++mode) {
+    for (std::size_t mode = 0; mode < DeviceTable::MODES; ++mode) {
         headings.push_back(vocabulary::modes().at(mode));
     }
     if (withBsdl) {
         headings.emplace_back("BSDL");
     }
     Table table(std::move(headings));
-    for (const DeviceSheet::Row& row : rows) {
+    for (const DeviceTable::Row& row : rows) {
         Table::Row cells{row.key};
-        for (const DeviceSheet::Outputs outputs : row.outputs) {
+        for (const DeviceTable::Outputs outputs : row.outputs) {
             cells.push_back(cell(outputs, letters));
         }
         if (withBsdl) {
@@ -74,45 +74,47 @@ std::string section(const char* title, const Properties& properties, const Termi
                : fmt::format("\n{}\n{}", terminal.heading(title), asText(properties, terminal, 2));
 }
 
-std::string multibootText(const std::vector<DeviceSheet::Arrangement>& arrangements,
+std::string multibootText(const std::vector<DeviceDetails::Arrangement>& arrangements,
                           const Terminal& terminal) {
     if (arrangements.empty()) {
         return {};
     }
     Table table;
-    for (const DeviceSheet::Arrangement& arrangement : arrangements) {
+    for (const DeviceDetails::Arrangement& arrangement : arrangements) {
         table.add({arrangement.type, arrangement.width, arrangement.position});
     }
     return fmt::format("\n{}\n{}", terminal.heading("Multiboot"), table.text(terminal, 2));
 }
 
-std::string heading(const DeviceSheet& sheet, const Terminal& terminal) {
+std::string heading(const DeviceDetails& details, const Terminal& terminal) {
     Table table;
-    const bool asWritten = sheet.name == sheet.spelling;
-    table.add({"Device",
-               asWritten ? sheet.name : fmt::format("{} (in the database: {})", sheet.name, sheet.spelling)});
-    table.add({"Family", sheet.flash ? sheet.family + " (a flash)" : sheet.family});
-    if (sheet.idcode) {
-        table.add({"IDCODE", sheet.idcode->value + "  " + catalogue::asText(sheet.idcode->origin)});
-        for (const catalogue::Shadow& shadow : sheet.idcode->shadows) {
+    const bool asWritten = details.name == details.spelling;
+    table.add({"Device", asWritten
+                             ? details.name
+                             : fmt::format("{} (in the database: {})", details.name, details.spelling)});
+    table.add({"Family", details.flash ? details.family + " (a flash)" : details.family});
+    if (details.idcode) {
+        table.add({"IDCODE", details.idcode->value + "  " + catalogue::asText(details.idcode->origin)});
+        for (const catalogue::Shadow& shadow : details.idcode->shadows) {
             table.add({"", fmt::format("shadows {}: {}", catalogue::asText(shadow.origin), shadow.text)});
         }
     }
-    table.add({"Modes", fmt::format("{}", fmt::join(sheet.modes, " "))});
+    table.add({"Modes", fmt::format("{}", fmt::join(details.modes, " "))});
     return table.text(terminal);
 }
 
-std::string asText(const Sheet& sheet, const Terminal& terminal) {
-    const DeviceSheet& facts = sheet.facts;
-    return heading(facts, terminal) + section("Properties", facts.properties, terminal) +
-           section("Flash properties", facts.flashProperties, terminal) +
-           multibootText(facts.multiboot, terminal) + matrix("Operations", facts.operations, true, terminal) +
-           matrix("Programming options", facts.options, false, terminal);
+std::string asText(const Shown& shown, const Terminal& terminal) {
+    const DeviceDetails& details = shown.details;
+    return heading(details, terminal) + section("Properties", details.properties, terminal) +
+           section("Flash properties", details.flashProperties, terminal) +
+           multibootText(details.multiboot, terminal) +
+           matrix("Operations", details.operations->rows, true, terminal) +
+           matrix("Programming options", details.options->rows, false, terminal);
 }
 
-Json outputKeys(DeviceSheet::Outputs outputs) {
+Json outputKeys(DeviceTable::Outputs outputs) {
     Json keys = Json::array();
-    for (std::size_t output = 0; output < DeviceSheet::OUTPUTS; ++output) {
+    for (std::size_t output = 0; output < DeviceTable::OUTPUTS; ++output) {
         if ((outputs >> output & 1U) != 0) {
             keys.push_back(vocabulary::outputs().at(output));
         }
@@ -121,11 +123,11 @@ Json outputKeys(DeviceSheet::Outputs outputs) {
 }
 
 /// Outputs by key and mode, without the modes that have none.
-Json asJson(const std::vector<DeviceSheet::Row>& rows) {
+Json asJson(const std::vector<DeviceTable::Row>& rows) {
     Json object = Json::object();
-    for (const DeviceSheet::Row& row : rows) {
+    for (const DeviceTable::Row& row : rows) {
         Json modes = Json::object();
-        for (std::size_t mode = 0; mode < DeviceSheet::MODES; ++mode) {
+        for (std::size_t mode = 0; mode < DeviceTable::MODES; ++mode) {
             if (row.outputs.at(mode) != 0) {
                 modes[vocabulary::modes().at(mode)] = outputKeys(row.outputs.at(mode));
             }
@@ -137,9 +139,9 @@ Json asJson(const std::vector<DeviceSheet::Row>& rows) {
     return object;
 }
 
-Json bsdlJson(const std::vector<DeviceSheet::Row>& rows) {
+Json bsdlJson(const std::vector<DeviceTable::Row>& rows) {
     Json object = Json::object();
-    for (const DeviceSheet::Row& row : rows) {
+    for (const DeviceTable::Row& row : rows) {
         if (row.bsdl != 0) {
             object[row.key] = outputKeys(row.bsdl);
         }
@@ -147,7 +149,7 @@ Json bsdlJson(const std::vector<DeviceSheet::Row>& rows) {
     return object;
 }
 
-Json asJson(const DeviceSheet::Idcode& idcode) {
+Json asJson(const DeviceDetails::Idcode& idcode) {
     Json object{{"value", idcode.value}};
     object.update(catalogue::asJson(idcode.origin));
     if (!idcode.shadows.empty()) {
@@ -156,32 +158,35 @@ Json asJson(const DeviceSheet::Idcode& idcode) {
     return object;
 }
 
-Json asJson(const std::vector<DeviceSheet::Arrangement>& arrangements) {
+Json asJson(const std::vector<DeviceDetails::Arrangement>& arrangements) {
     Json list = Json::array();
-    for (const DeviceSheet::Arrangement& arrangement : arrangements) {
+    for (const DeviceDetails::Arrangement& arrangement : arrangements) {
         list.push_back(
             {{"type", arrangement.type}, {"width", arrangement.width}, {"position", arrangement.position}});
     }
     return list;
 }
 
-Json asJson(const Sheet& sheet) {
-    const DeviceSheet& facts = sheet.facts;
-    return {{"device", facts.name},
-            {"spelling", facts.spelling},
-            {"family", facts.family},
-            {"idcode", facts.idcode ? asJson(*facts.idcode) : Json()},
-            {"modes", facts.modes},
-            {"properties", asJson(facts.properties)},
-            {"flash", facts.flash},
-            {"flashProperties", asJson(facts.flashProperties)},
-            {"multiboot", asJson(facts.multiboot)},
-            {"operations", asJson(facts.operations)},
-            {"bsdl", bsdlJson(facts.operations)},
-            {"options", asJson(facts.options)}};
+Json asJson(const Shown& shown) {
+    const DeviceDetails& details = shown.details;
+    return {{"device", details.name},
+            {"spelling", details.spelling},
+            {"family", details.family},
+            {"idcode", details.idcode ? asJson(*details.idcode) : Json()},
+            {"modes", details.modes},
+            {"properties", asJson(details.properties)},
+            {"flash", details.flash},
+            {"flashProperties", asJson(details.flashProperties)},
+            {"multiboot", asJson(details.multiboot)},
+            {"operations", asJson(details.operations->rows)},
+            {"bsdl", bsdlJson(details.operations->rows)},
+            {"options", asJson(details.options->rows)}};
 }
 
-ExitCode run(Tool& tool, const std::string& device) { return tool.answer(Sheet{deviceSheet(tool, device)}); }
+ExitCode run(Tool& tool, const std::string& device) {
+    tool.openDatabase();
+    return tool.answer(Shown{deviceDetails(device)});
+}
 
 Action declare(ArgumentList& list) {
     auto device = std::make_shared<std::string>();

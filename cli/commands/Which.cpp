@@ -3,147 +3,202 @@
 
 #include "commands/CommonArguments.h"
 #include "model/Vocabulary.h"
-#include "query/Census.h"
+#include "query/DeviceSurvey.h"
 #include "query/Tool.h"
 #include "term/Progress.h"
 #include "term/Table.h"
 
-#include <TarvikException.h>
 #include <tarvik/ConstraintsManager.h>
 
 #include <fmt/format.h>
 
+#include <algorithm>
 #include <memory>
 #include <optional>
 
 namespace {
 
-using why::Question;
-using why::Verdict;
-
 struct Arguments {
     std::optional<std::string> operation;
     std::optional<std::string> mode;
     std::optional<std::string> output;
-    std::optional<std::string> property;
+    std::vector<std::string> properties;
 };
 
-struct Holders {
-    Json asked; ///< the arguments, as the JSON object shows them
-    std::vector<why::Entry> devices;
+/// What a device must answer to be listed.
+struct Filter {
+    struct Property {
+        std::string key;
+        std::string value;
+    };
+
+    std::optional<TARVIKNS::OP_TYPE> operation;
+    std::optional<TARVIKNS::MODE_TYPE> mode;
+    std::optional<TARVIKNS::OUTPUT_TYPE> output;
+    std::vector<Property> properties;
+};
+
+struct NamedDevice {
+    std::string name;
+    std::string family;
+};
+
+struct Matches {
+    const Filter& filter;
+    std::vector<NamedDevice> devices;
     std::vector<std::string> faults; ///< devices at which the manager raises
 };
 
-std::string asText(const Holders& holders, const Terminal& terminal) {
-    if (holders.devices.empty()) {
+std::string asText(const Matches& matches, const Terminal& terminal) {
+    if (matches.devices.empty()) {
         return {};
     }
     Table table({"DEVICE", "FAMILY"});
-    for (const why::Entry& device : holders.devices) {
+    for (const NamedDevice& device : matches.devices) {
         table.add({device.name, device.family});
     }
     return table.text(terminal);
 }
 
-Json asJson(const Holders& holders) {
-    Json object = holders.asked;
+Json asJson(const Filter& filter) {
+    Json object;
+    if (filter.mode) {
+        object["mode"] = vocabulary::key(*filter.mode);
+    }
+    if (filter.output) {
+        object["output"] = vocabulary::key(*filter.output);
+    }
+    if (filter.operation) {
+        object["operation"] = vocabulary::key(*filter.operation);
+    }
+    if (filter.properties.size() == 1) {
+        object["property"] = filter.properties.front().key;
+        object["value"] = filter.properties.front().value;
+    } else if (!filter.properties.empty()) {
+        object["properties"] = Json::array();
+        for (const auto& [key, value] : filter.properties) {
+            object["properties"].push_back({{"property", key}, {"value", value}});
+        }
+    }
+    return object;
+}
+
+Json asJson(const Matches& matches) {
+    Json object = asJson(matches.filter);
     Json list = Json::array();
-    for (const why::Entry& device : holders.devices) {
+    for (const NamedDevice& device : matches.devices) {
         list.push_back({{"name", device.name}, {"family", device.family}});
     }
     object["devices"] = std::move(list);
-    object["faults"] = holders.faults;
+    object["faults"] = matches.faults;
     return object;
 }
 
 CommandError usage() {
-    return {ExitCode::FAULT, "which takes one of\n"
-                             "  --operation OP --mode M --output O\n"
-                             "  --operation OP --mode M\n"
-                             "  --property KEY=VALUE"};
+    return {ExitCode::FAULT,
+            "give --operation with --mode and --output as you like, or --property KEY=VALUE, or both"
+            "\nsee: tarvik which --help"};
 }
 
-Question readProperty(const Arguments& arguments) {
-    if (arguments.operation || arguments.mode || arguments.output) {
-        throw usage();
+Filter read(const Arguments& arguments) {
+    Filter filter;
+    if (arguments.operation) {
+        filter.operation = vocabulary::readOperation(*arguments.operation);
     }
-    const std::string& text = *arguments.property;
-    const std::size_t equals = text.find('=');
-    if (equals == std::string::npos || equals == 0) {
-        throw usage();
+    if (arguments.mode) {
+        filter.mode = vocabulary::readMode(*arguments.mode);
     }
-    Question question;
-    question.kind = Question::Kind::PROPERTY;
-    question.property = text.substr(0, equals);
-    question.value = text.substr(equals + 1);
-    return question;
-}
-
-Question read(const Arguments& arguments) {
-    if (arguments.property) {
-        return readProperty(arguments);
-    }
-    if (!arguments.operation || !arguments.mode) {
-        throw usage();
-    }
-    Question question;
-    question.kind = Question::Kind::OPERATION_IN_MODE;
-    question.operation = vocabulary::readOperation(*arguments.operation);
-    question.mode = vocabulary::readMode(*arguments.mode);
     if (arguments.output) {
-        question.kind = Question::Kind::OPERATION;
-        question.output = vocabulary::readOutput(*arguments.output);
+        filter.output = vocabulary::readOutput(*arguments.output);
     }
-    return question;
-}
-
-Json asked(const Question& question) {
-    Json object = why::inJson(question);
-    object.erase("device");
-    return object;
-}
-
-/// Asks without the message that a device lacks the property: who asks for all devices knows that some do.
-/// What the host layer says when it reads the device is kept.
-Verdict askForProperty(Tool& tool, ConstraintsManager& manager, const Question& question) {
-    try {
-        static_cast<void>(
-            manager.getDeviceStringProperties(question.device.c_str(), question.property.c_str()));
-    } catch (const DataMismatchException&) {
-        return Verdict::FAULT;
+    for (const std::string& text : arguments.properties) {
+        const std::size_t equals = text.find('=');
+        if (equals == std::string::npos || equals == 0) {
+            throw usage();
+        }
+        filter.properties.push_back({text.substr(0, equals), text.substr(equals + 1)});
     }
-    const std::size_t issued = tool.messages().count();
-    const Verdict verdict = why::ask(manager, question);
-    tool.messages().truncate(issued);
-    return verdict;
+    if (filter.operation ? filter.output && !filter.mode
+                         : filter.mode || filter.output || filter.properties.empty()) {
+        throw usage();
+    }
+    return filter;
 }
 
-std::vector<why::Entry> askAll(Tool& tool, const Question& question) {
-    Progress progress("asking for each device");
-    const auto ask = [&tool](ConstraintsManager& manager, const Question& one) {
-        return one.kind == Question::Kind::PROPERTY ? askForProperty(tool, manager, one)
-                                                    : why::ask(manager, one);
-    };
-    return why::askForAll(tool.manager(), question, ask,
-                          [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
+/// Does the table allow the operation in the mode through the output, or anywhere?
+bool allows(const DeviceTable& table, const Filter& filter) {
+    const auto row =
+        std::ranges::find(table.rows, vocabulary::key(*filter.operation), &DeviceTable::Row::key);
+    if (row == table.rows.end()) {
+        return false;
+    }
+    if (!filter.mode) {
+        return std::ranges::any_of(row->outputs, [](DeviceTable::Outputs outputs) { return outputs != 0; });
+    }
+    const auto mode = static_cast<std::size_t>(*filter.mode);
+    return mode < DeviceTable::MODES &&
+           (row->outputs.at(mode) >> static_cast<unsigned>(*filter.output) & 1U) != 0;
+}
+
+/// Is the value among those of the device's property? For a flash, its flash property is the one value.
+bool hasValue(ConstraintsManager& manager, const std::string& device, const Filter::Property& property) {
+    const char* const name = device.c_str();
+    const char* const key = property.key.c_str();
+    // Asked in any case: it loads the device, which may fail.
+    const bool isListed = manager.getDeviceStringProperties(name, key).count(property.value) != 0;
+    if (!manager.isSpiDevice(name)) {
+        return isListed;
+    }
+    const std::string value = manager.getSpiDeviceStringProperty(name, key);
+    return !value.empty() && value == property.value;
+}
+
+/// The questions of a filter, put to a survey.
+DeviceSurvey::Topics topics(const Filter& filter) {
+    const bool isInMode = filter.operation && filter.mode && !filter.output;
+    DeviceSurvey::Topics topics;
+    topics.operations = filter.operation && !isInMode;
+    if (isInMode || !filter.properties.empty()) {
+        topics.question = [&filter, isInMode](ConstraintsManager& manager, const std::string& device) {
+            return std::ranges::all_of(
+                       filter.properties,
+                       [&](const Filter::Property& one) { return hasValue(manager, device, one); }) &&
+                   (!isInMode ||
+                    manager.checkConstraints(device.c_str(), *filter.mode, *filter.operation, nullptr));
+        };
+    }
+    return topics;
+}
+
+Matches find(const Filter& filter) {
+    Matches matches{filter, {}, {}};
+    Progress progress("asking about each device");
+    const DeviceSurvey::Topics asked = topics(filter);
+    DeviceSurvey(asked).run(
+        [&](const DeviceDetails& device) {
+            if (asked.operations && !device.operations->fault.empty()) {
+                matches.faults.push_back(device.name);
+            } else if (!device.fault.empty()) {
+                matches.faults.push_back(device.name);
+            } else if ((!asked.operations || allows(*device.operations, filter)) &&
+                       (!asked.question || device.answer)) {
+                matches.devices.push_back({device.name, device.family});
+            }
+        },
+        [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
+    return matches;
 }
 
 ExitCode run(Tool& tool, const Arguments& arguments) {
-    const Question question = read(arguments);
-    Holders holders{asked(question), {}, {}};
-    for (why::Entry& entry : askAll(tool, question)) {
-        if (entry.verdict == Verdict::YES) {
-            holders.devices.push_back(std::move(entry));
-        } else if (entry.verdict == Verdict::FAULT) {
-            holders.faults.push_back(std::move(entry.name));
-        }
-    }
-    const ExitCode status = tool.answer(holders, holders.devices.empty() ? ExitCode::NO : ExitCode::YES);
-    if (!holders.faults.empty()) {
+    const Filter filter = read(arguments);
+    tool.openDatabase();
+    const Matches matches = find(filter);
+    const ExitCode status = tool.answer(matches, matches.devices.empty() ? ExitCode::NO : ExitCode::YES);
+    if (!matches.faults.empty()) {
         tool.note(fmt::format("no answer for {} devices, the first \"{}\": see tarvik why",
-                              holders.faults.size(), holders.faults.front()));
+                              matches.faults.size(), matches.faults.front()));
     }
-    if (holders.devices.empty()) {
+    if (matches.devices.empty()) {
         tool.note("there is no such device");
     }
     return status;
@@ -157,9 +212,9 @@ Action declare(ArgumentList& list) {
         argument::output(&arguments->output, false),
         {.name = "--property",
          .value = "KEY=VALUE",
-         .description = "The property that the devices have",
+         .description = "A property that the devices have; repeat it for several",
          .kind = ValueKind::PROPERTY_VALUE,
-         .target = &arguments->property},
+         .target = &arguments->properties},
     };
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }

@@ -1,9 +1,5 @@
-// Holds the answers of two databases against each other, and tells what devices have in common once.
+// Compares the answers of two databases, and names once what devices have in common.
 #include "diff/Comparison.h"
-
-#include "diff/Serialization.h"
-
-#include <fmt/format.h>
 
 #include <algorithm>
 #include <iterator>
@@ -13,22 +9,22 @@ namespace diff {
 
 namespace {
 
-Texts without(const Texts& left, const Texts& right) {
-    Texts rest;
-    std::set_difference(left.begin(), left.end(), right.begin(), right.end(),
-                        std::inserter(rest, rest.end()));
+/// What the other set lacks.
+StringSet missingFrom(const StringSet& other, const StringSet& set) {
+    StringSet rest;
+    std::ranges::set_difference(set, other, std::inserter(rest, rest.end()));
     return rest;
 }
 
-/// What changed for one question. Names come and go one by one, so that devices that share a part of a change stand
-/// together in that part.
-std::vector<Change> changesOf(const Question& question, const Texts& before, const Texts& after) {
+/// What changed for one question. Each name is a change of its own, so that devices which share a part of a change can
+/// be grouped by that part.
+std::vector<Change> changesOf(const Question& question, const StringSet& before, const StringSet& after) {
     std::vector<Change> changes;
     if (before == after) {
         return changes;
     }
-    const Texts lost = without(before, after);
-    const Texts gained = without(after, before);
+    const StringSet lost = missingFrom(after, before);
+    const StringSet gained = missingFrom(before, after);
     if (question.kind == Question::Kind::VALUE) {
         changes.push_back({question, lost, gained});
         return changes;
@@ -59,69 +55,115 @@ std::vector<Change> joined(const std::vector<Change>& changes) {
     return sorted;
 }
 
-Question ofPackage(const std::string& package, Question question) {
-    question.topic = fmt::format("package {}: {}", package, question.topic);
-    return question;
+/// The answers about one device in one database.
+struct DeviceAnswers {
+    Answers own;
+    const Answers& shared;
+
+    /// A package without an answer of its own has that of the device without a package.
+    [[nodiscard]] const StringSet& to(const Question& question) const {
+        static const StringSet none;
+        for (const Answers* const answers : {&own, &shared}) {
+            if (const auto found = answers->find(question); found != answers->end()) {
+                return found->second;
+            }
+        }
+        return question.package.empty() ? none : to(withoutPackage(question));
+    }
+
+    [[nodiscard]] static Question withoutPackage(Question question) {
+        question.package.clear();
+        return question;
+    }
+};
+
+std::set<Question> questions(const Answers& before, const Answers& after) {
+    std::set<Question> questions;
+    for (const Answers* const answers : {&before, &after}) {
+        for (const auto& [question, answer] : *answers) {
+            questions.insert(question);
+        }
+    }
+    return questions;
+}
+
+/// The changes of these questions.
+std::vector<Change> changesOf(const std::set<Question>& questions, const DeviceAnswers& before,
+                              const DeviceAnswers& after) {
+    std::vector<Change> all;
+    for (const Question& question : questions) {
+        std::vector<Change> changes = changesOf(question, before.to(question), after.to(question));
+        if (!question.package.empty()) {
+            // What changes just so without the package is listed there.
+            const Question general = DeviceAnswers::withoutPackage(question);
+            const std::vector<Change> known = changesOf(general, before.to(general), after.to(general));
+            std::erase_if(changes, [&](const Change& change) {
+                return std::ranges::find(known, Change{general, change.lost, change.gained}) != known.end();
+            });
+        }
+        std::ranges::move(changes, std::back_inserter(all));
+    }
+    return all;
 }
 
 /// Compares device by device. Changes are known by number: most devices share theirs.
 class Comparer {
 public:
-    Comparer(const Facts& before, const Facts& after) : m_before(before), m_after(after) {}
+    Comparer(const Snapshot& before, const Snapshot& after) : m_before(before), m_after(after) {}
 
     [[nodiscard]] Comparison compare() {
-        Comparison comparison{onlyIn(m_before, m_after), onlyIn(m_after, m_before), general(), {}};
-        std::map<std::string, Family> families;
-        for (const auto& [name, after] : m_after.devices) {
-            const auto before = m_before.devices.find(name);
-            if (before != m_before.devices.end()) {
-                families[after.family].push_back({name, changesOfDevice(before->second, after)});
+        Comparison comparison{
+            missingDevices(m_after, m_before), missingDevices(m_before, m_after), general(), {}, {}};
+        std::map<std::string_view, Family, NaturalLess> families;
+        std::map<std::string_view, Family> familyNames; ///< what families answer by their own names
+        for (const auto& [name, after] : m_after.devices()) {
+            const auto before = m_before.devices().find(name);
+            if (before != m_before.devices().end()) {
+                Family& family = after.isFamily ? familyNames[after.family] : families[after.family];
+                family.push_back({name, changesOfDevice(before->second, after)});
+                if (hasFault(before->second) && hasFault(after)) {
+                    comparison.unanswered.emplace_back(name);
+                }
             }
         }
+        for (const auto& [name, names] : familyNames) {
+            families.try_emplace(name);
+        }
         for (const auto& [name, family] : families) {
-            addGroups(comparison.groups, name, family);
+            addGroups(comparison.groups, std::string(name), family);
+            addGroups(comparison.groups, std::string(name), whatNoDeviceShows(family, familyNames[name]));
         }
         return comparison;
     }
 
 private:
     using Numbers = std::vector<std::size_t>;
-    using Family = std::vector<std::pair<std::string, Numbers>>; ///< devices with their changes
+    using Family = std::vector<std::pair<std::string_view, Numbers>>; ///< devices with their changes
 
-    [[nodiscard]] static Devices onlyIn(const Facts& facts, const Facts& others) {
+    /// The devices that the other database lacks.
+    [[nodiscard]] static Devices missingDevices(const Snapshot& other, const Snapshot& snapshot) {
         Devices devices;
-        for (const auto& [name, device] : facts.devices) {
-            // What stands for a family without devices is no device itself.
-            if (others.devices.count(name) == 0 && name != device.family) {
-                devices[device.family].push_back(name);
+        for (const auto& [name, device] : snapshot.devices()) {
+            if (other.devices().count(name) == 0 && !device.isFamily) {
+                devices[std::string(device.family)].emplace_back(name);
             }
         }
         return devices;
     }
 
     [[nodiscard]] std::vector<Change> general() const {
-        std::vector<Change> all;
-        for (const Question& question : questions({&m_before.general, &m_after.general})) {
-            const std::vector<Change> changes =
-                diff::changesOf(question, m_before.answer(m_before.general, {}, question),
-                                m_after.answer(m_after.general, {}, question));
-            all.insert(all.end(), changes.begin(), changes.end());
-        }
-        return joined(all);
+        const Answers none;
+        return joined(changesOf(questions(m_before.general(), m_after.general()), {m_before.general(), none},
+                                {m_after.general(), none}));
     }
 
-    [[nodiscard]] static std::set<Question> questions(const std::vector<const Answers*>& all) {
-        std::set<Question> questions;
-        for (const Answers* const answers : all) {
-            for (const auto& [question, texts] : *answers) {
-                questions.insert(question);
-            }
-        }
-        return questions;
+    [[nodiscard]] static bool hasFault(const Snapshot::Device& device) {
+        return device.own.find(FAULTS) != device.own.npos &&
+               deserialized(device.own).count({"", FAULTS, Question::Kind::VALUE}) != 0;
     }
 
-    void add(Numbers& numbers, const Question& question, const Texts& before, const Texts& after) {
-        for (Change& change : diff::changesOf(question, before, after)) {
+    void add(Numbers& numbers, std::vector<Change> changes) {
+        for (Change& change : changes) {
             const auto [known, isNew] = m_numbers.try_emplace(std::move(change), m_changes.size());
             if (isNew) {
                 m_changes.push_back(&known->first);
@@ -131,90 +173,37 @@ private:
     }
 
     /// What changed in answers that devices have in common.
-    const Numbers& sharedChanges(const DeviceFacts& before, const DeviceFacts& after) {
-        const auto [known, isNew] = m_shared.try_emplace({before.shared, after.shared});
-        if (!isNew) {
-            return known->second;
-        }
-        std::vector<const Answers*> all;
-        for (const std::size_t index : before.shared) {
-            all.push_back(&m_before.shared[index]);
-        }
-        for (const std::size_t index : after.shared) {
-            all.push_back(&m_after.shared[index]);
-        }
-        for (const Question& question : questions(all)) {
-            add(known->second, question, m_before.answer({}, before.shared, question),
-                m_after.answer({}, after.shared, question));
+    const Numbers& sharedChanges(const Answers& before, const Answers& after) {
+        const auto [known, isNew] = m_shared.try_emplace({&before, &after});
+        if (isNew) {
+            add(known->second, changesOf(questions(before, after), {{}, before}, {{}, after}));
         }
         return known->second;
     }
 
-    [[nodiscard]] Numbers changesOfDevice(const DeviceFacts& before, const DeviceFacts& after) {
-        Numbers numbers = sharedChanges(before, after);
+    [[nodiscard]] Numbers changesOfDevice(const Snapshot::Device& before, const Snapshot::Device& after) {
+        Numbers numbers = sharedChanges(*before.shared, *after.shared);
         if (!numbers.empty() || before.own != after.own) {
-            const Answers oldOwn = unpackedAnswers(before.own);
-            const Answers newOwn = unpackedAnswers(after.own);
-            const std::set<Question> own = questions({&oldOwn, &newOwn});
-            std::erase_if(numbers,
-                          [&](std::size_t number) { return own.count(m_changes[number]->question) != 0; });
-            for (const Question& question : own) {
-                add(numbers, question, m_before.answer(oldOwn, before.shared, question),
-                    m_after.answer(newOwn, after.shared, question));
-            }
+            const DeviceAnswers oldAnswers{deserialized(before.own), *before.shared};
+            const DeviceAnswers newAnswers{deserialized(after.own), *after.shared};
+            add(numbers, changesOf(questions(oldAnswers.own, newAnswers.own), oldAnswers, newAnswers));
         }
-        addPackages(numbers, before, after);
         return numbers;
     }
 
-    void addPackages(Numbers& numbers, const DeviceFacts& before, const DeviceFacts& after) {
-        std::set<std::string> packages;
-        for (const DeviceFacts* const facts : {&before, &after}) {
-            for (const auto& [package, answers] : facts->packages) {
-                packages.insert(package);
-            }
+    /// The changes of a family's names that none of its devices shows.
+    [[nodiscard]] static Family whatNoDeviceShows(const Family& family, const Family& names) {
+        std::set<std::size_t> shown;
+        for (const auto& [device, numbers] : family) {
+            shown.insert(numbers.begin(), numbers.end());
         }
-        const Numbers general = numbers;
-        for (const std::string& package : packages) {
-            const Answers oldPackage = inPackage(m_before, before, package);
-            const Answers newPackage = inPackage(m_after, after, package);
-            for (const Question& question : questions({&oldPackage, &newPackage})) {
-                const Texts& oldTexts = m_before.answer(oldPackage, before.shared, question);
-                const Texts& newTexts = m_after.answer(newPackage, after.shared, question);
-                for (const Change& change : diff::changesOf(question, oldTexts, newTexts)) {
-                    // What changed for the package just as it did without one is told already.
-                    const bool isTold = std::any_of(general.begin(), general.end(), [&](std::size_t number) {
-                        return *m_changes[number] == change;
-                    });
-                    if (!isTold) {
-                        // One name at a time, which either was there or is there.
-                        add(numbers, ofPackage(package, question), change.lost, change.gained);
-                    }
-                }
-            }
+        Family rest;
+        for (const auto& [name, numbers] : names) {
+            Numbers own = numbers;
+            std::erase_if(own, [&](std::size_t number) { return shown.count(number) != 0; });
+            rest.push_back({name, std::move(own)});
         }
-    }
-
-    /// The answers that the package changes, and those that stand for it otherwise.
-    [[nodiscard]] static Answers inPackage(const Facts& facts, const DeviceFacts& device,
-                                           const std::string& package) {
-        Answers answers;
-        const auto found = device.packages.find(package);
-        if (found != device.packages.end()) {
-            if (found->second.options) {
-                answers = facts.shared[*found->second.options];
-            }
-            if (found->second.modes) {
-                answers[{MODES}] = *found->second.modes;
-            }
-        }
-        // Those of a device that was asked for apart.
-        for (const auto& [question, texts] : unpackedAnswers(device.own)) {
-            if (question.topic == MODES || question.topic == OPTIONS) {
-                answers.try_emplace(question, texts);
-            }
-        }
-        return answers;
+        return rest;
     }
 
     /// The changes of one family: devices that share a change stand together.
@@ -234,7 +223,7 @@ private:
             Group& group = added.emplace_back(Group{name, {}, {}, joined(changes)});
             for (std::size_t device = 0; device < family.size(); ++device) {
                 const bool isIn = std::binary_search(devices.begin(), devices.end(), device);
-                (isIn ? group.devices : group.others).push_back(family[device].first);
+                (isIn ? group.devices : group.others).emplace_back(family[device].first);
             }
         }
         std::stable_sort(added.begin(), added.end(), [](const Group& left, const Group& right) {
@@ -244,11 +233,11 @@ private:
                       std::make_move_iterator(added.end()));
     }
 
-    const Facts& m_before;
-    const Facts& m_after;
+    const Snapshot& m_before;
+    const Snapshot& m_after;
     std::map<Change, std::size_t> m_numbers;
     std::vector<const Change*> m_changes; ///< by number
-    std::map<std::pair<Numbers, Numbers>, Numbers> m_shared;
+    std::map<std::pair<const Answers*, const Answers*>, Numbers> m_shared;
 };
 
 } // namespace
@@ -257,8 +246,8 @@ bool Comparison::isEmpty() const {
     return onlyInOld.empty() && onlyInNew.empty() && general.empty() && groups.empty();
 }
 
-Comparison compare(const Facts& oldFacts, const Facts& newFacts) {
-    return Comparer(oldFacts, newFacts).compare();
+Comparison compare(const Snapshot& before, const Snapshot& after) {
+    return Comparer(before, after).compare();
 }
 
 } // namespace diff

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "diff/NaturalLess.h"
 #include "diff/Snapshot.h"
 
 #include <cstddef>
@@ -12,8 +13,8 @@ namespace diff {
 /// A question that two databases answer differently.
 struct Change {
     Question question;
-    Texts lost;
-    Texts gained;
+    StringSet lost;
+    StringSet gained;
 
     friend auto operator<=>(const Change&, const Change&) = default;
 };
@@ -22,15 +23,15 @@ struct Change {
 struct Group {
     std::string family; ///< in the new database
     std::vector<std::string> devices;
-    std::vector<std::string> others; ///< that the family has in both databases and that don't change so
+    std::vector<std::string> others; ///< of the family in both databases, without these changes
     std::vector<Change> changes;
 
-    /// Does the whole family change so, and does it have several devices?
+    /// Are these several devices, and all of the family?
     [[nodiscard]] bool isWhole() const { return devices.size() > 1 && others.empty(); }
 };
 
 /// Devices by their families.
-using Devices = std::map<std::string, std::vector<std::string>>;
+using Devices = std::map<std::string, std::vector<std::string>, NaturalLess>;
 
 /// How two databases differ.
 struct Comparison {
@@ -39,9 +40,12 @@ struct Comparison {
     std::vector<Change> general;
     std::vector<Group> groups; ///< by family; in it the largest ones first
 
+    /// Devices for which answers are missing in both databases, because the manager raises.
+    std::vector<std::string> unanswered;
+
     [[nodiscard]] bool isEmpty() const;
 };
 
-[[nodiscard]] Comparison compare(const Facts& oldFacts, const Facts& newFacts);
+[[nodiscard]] Comparison compare(const Snapshot& before, const Snapshot& after);
 
 } // namespace diff

@@ -1,4 +1,4 @@
-// How a comparison reads: what is alike for several cells of the tables is one line.
+// Shows a comparison: what several cells of the tables have in common is one line.
 #include "diff/Presentation.h"
 
 #include "model/Vocabulary.h"
@@ -24,8 +24,8 @@ using Cells = std::vector<Cell>;
 struct Line {
     std::string question;
     bool isValue;
-    Texts lost;
-    Texts gained;
+    StringSet lost;
+    StringSet gained;
 };
 
 template <typename Keys>
@@ -65,8 +65,13 @@ std::string inWords(const Cells& cells) {
     return text;
 }
 
+std::string topicOf(const Question& question) {
+    return question.package.empty() ? question.topic
+                                    : fmt::format("package {}: {}", question.package, question.topic);
+}
+
 std::string inWords(const Question& question) {
-    return question.topic + inWords(Cells{{question.mode, question.output}});
+    return topicOf(question) + inWords(Cells{{question.mode, question.output}});
 }
 
 /// The changes of one topic, which are next to each other: names that come and go in the same cells are one line.
@@ -88,7 +93,7 @@ void addLines(std::vector<Line>& lines, const std::vector<Change>& changes) {
         (name.second ? line.gained : line.lost).insert(name.first);
     }
     for (auto& [cells, line] : byCells) {
-        line.question = first.topic + inWords(cells);
+        line.question = topicOf(first) + inWords(cells);
         line.isValue = first.kind == Question::Kind::VALUE;
         lines.push_back(std::move(line));
     }
@@ -98,7 +103,8 @@ std::vector<Line> linesOf(const std::vector<Change>& changes) {
     std::vector<Line> lines;
     for (auto first = changes.begin(); first != changes.end();) {
         const auto last = std::find_if(first, changes.end(), [first](const Change& change) {
-            return change.question.topic != first->question.topic;
+            return change.question.topic != first->question.topic ||
+                   change.question.package != first->question.package;
         });
         addLines(lines, {first, last});
         first = last;
@@ -121,6 +127,22 @@ std::string asText(const Line& line, const Terminal& terminal) {
         text.append(text.empty() ? INDENT / 2 : INDENT, ' ').append(part).append(1, '\n');
     }
     return text;
+}
+
+/// Families that change alike as a whole, or a group of some other kind.
+using Section = std::vector<const Group*>;
+
+std::vector<Section> sectionsOf(const std::vector<Group>& groups) {
+    std::vector<Section> sections;
+    std::map<std::vector<Change>, std::size_t> wholeFamilies;
+    for (const Group& group : groups) {
+        const auto position = group.others.empty()
+                                  ? wholeFamilies.try_emplace(group.changes, sections.size()).first->second
+                                  : sections.size();
+        sections.resize(std::max(sections.size(), position + 1));
+        sections[position].push_back(&group);
+    }
+    return sections;
 }
 
 /// Few enough to be named as exceptions.
@@ -147,6 +169,15 @@ std::string heading(const Group& group) {
     return fmt::format("{} ({})", group.family, count(group));
 }
 
+/// The families of a section, and for those with one device that device.
+std::vector<std::string> familiesOf(const Section& section) {
+    std::vector<std::string> names;
+    for (const Group* const group : section) {
+        names.push_back(group->devices.size() == 1 ? heading(*group) : group->family);
+    }
+    return names;
+}
+
 Json asJson(const std::vector<Change>& changes) {
     Json list = Json::array();
     for (const Change& change : changes) {
@@ -157,7 +188,7 @@ Json asJson(const std::vector<Change>& changes) {
 }
 
 Json names(const Devices& devices) {
-    Texts all;
+    StringSet all;
     for (const auto& [family, members] : devices) {
         all.insert(members.begin(), members.end());
     }
@@ -231,9 +262,15 @@ std::string asText(const Comparison& comparison, const Terminal& terminal) {
     for (const Line& line : linesOf(comparison.general)) {
         text += asText(line, terminal);
     }
-    for (const Group& group : comparison.groups) {
-        addHeading(heading(group));
-        if (group.devices.size() > 1 && !group.isWhole() && !areExceptions(group)) {
+    for (const Section& section : sectionsOf(comparison.groups)) {
+        const Group& group = *section.front();
+        if (section.size() > 1) {
+            addHeading(fmt::format("{} families", section.size()));
+            text += wrapped(familiesOf(section), 4, terminal.width());
+        } else {
+            addHeading(heading(group));
+        }
+        if (section.size() == 1 && group.devices.size() > 1 && !group.isWhole() && !areExceptions(group)) {
             text += wrapped(group.devices, 4, terminal.width());
         }
         for (const Line& line : linesOf(group.changes)) {
@@ -257,7 +294,8 @@ Json asJson(const Comparison& comparison) {
             {"lost", byFamily(comparison.onlyInOld)},
             {"gained", byFamily(comparison.onlyInNew)},
             {"general", asJson(comparison.general)},
-            {"groups", groups}};
+            {"groups", groups},
+            {"unanswered", comparison.unanswered}};
 }
 
 std::string asMarkdown(const Comparison& comparison) {
@@ -282,14 +320,19 @@ std::string asMarkdown(const Comparison& comparison) {
         text += asMarkdown(line);
     }
     std::string family;
-    for (const Group& group : comparison.groups) {
-        if (group.family != family) {
+    for (const Section& section : sectionsOf(comparison.groups)) {
+        const Group& group = *section.front();
+        if (section.size() > 1) {
+            addSection(fmt::format("{} families", section.size()));
+            text += codes(familiesOf(section)) + ":\n\n";
+            family.clear();
+        } else if (group.family != family) {
             family = group.family;
             addSection(family == "spi" ? "spi (flashes)" : family);
         } else {
             text += '\n';
         }
-        text += markdownHeading(group);
+        text += section.size() > 1 ? "" : markdownHeading(group);
         for (const Line& line : linesOf(group.changes)) {
             text += asMarkdown(line);
         }

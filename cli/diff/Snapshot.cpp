@@ -1,88 +1,48 @@
-// A manager can't be made twice, so each database is asked in a process of its own.
+// A snapshot is a series of blocks: the general answers; then for each device its name, its family, whether it is
+// one, the device with which it shares answers, those answers if it is the first one, and its other answers.
 #include "diff/Snapshot.h"
 
-#include "diff/Serialization.h"
-#include "diff/SnapshotCollector.h"
-#include "query/Apart.h"
-#include "query/Database.h"
 #include "term/ExitCode.h"
-#include "term/Progress.h"
 
-#include <Port_MsgManData.h>
-#include <TarvikException.h>
-#include <tarvik/ConstraintsManager.h>
+#include <charconv>
+#include <utility>
 
 namespace diff {
 
+void putBlock(std::string& text, std::string_view block) {
+    text.append(std::to_string(block.size()) + ':').append(block);
+}
+
 namespace {
 
-// What the bytes from the other process are: the last one tells.
-constexpr char FACTS = 'f';
-constexpr char FAULT = 'x';
-
-ConstraintsManager& manager() {
-    ConstraintsManager* const made = ConstraintsManager::getConstraintsManager();
-    if (made == nullptr) {
-        throw std::bad_alloc();
+std::string_view takeBlock(std::string_view& rest) {
+    std::size_t size = 0;
+    const auto [end, fault] = std::from_chars(rest.data(), rest.data() + rest.size(), size);
+    const auto start = static_cast<std::size_t>(end - rest.data()) + 1;
+    if (fault != std::errc() || start > rest.size() || size > rest.size() - start) {
+        throw CommandError(ExitCode::FAULT, "the answers of a database can't be read");
     }
-    made->setExceptions(false);
-    return *made;
-}
-
-std::string work(const std::vector<std::string>& layers, const Interview::Reached& reached) {
-    std::string said;
-    Port_MsgManData::setSink([&said](const Port_MsgManData::Message& message) {
-        if (message.channel == Port_MsgManData::Channel::INFO) {
-            said += message.text;
-        }
-    });
-    try {
-        openDatabase(layers);
-        return packed(Interview(manager()).facts(reached)) + FACTS;
-    } catch (const CommandError& failure) {
-        return said + failure.what() + FAULT;
-    } catch (const TarvikException& fault) {
-        return said + "the database can't be read: " + fault.typeName() + FAULT;
-    }
-}
-
-Facts result(why::Apart& apart) {
-    const std::string bytes = apart.result();
-    const std::string_view rest = std::string_view(bytes).substr(0, bytes.size() - 1);
-    if (bytes.back() == FAULT) {
-        throw CommandError(ExitCode::FAULT, std::string(rest));
-    }
-    return unpackedFacts(rest);
+    const std::string_view block = rest.substr(start, size);
+    rest.remove_prefix(start + size);
+    return block;
 }
 
 } // namespace
 
-const Texts& Facts::answer(const Answers& own, const std::vector<std::size_t>& commonOnes,
-                           const Question& question) const {
-    static const Texts none;
-    if (const auto found = own.find(question); found != own.end()) {
-        return found->second;
-    }
-    for (const std::size_t index : commonOnes) {
-        const Answers& answers = shared[index];
-        if (const auto found = answers.find(question); found != answers.end()) {
-            return found->second;
+Snapshot::Snapshot(std::string text) : m_text(std::move(text)) {
+    std::string_view rest = m_text;
+    m_general = deserialized(takeBlock(rest));
+    while (!rest.empty()) {
+        const std::string_view name = takeBlock(rest);
+        const std::string_view family = takeBlock(rest);
+        const bool isFamily = !takeBlock(rest).empty();
+        const std::string_view first = takeBlock(rest);
+        const std::string_view shared = takeBlock(rest);
+        if (first == name) {
+            m_shared.emplace(name, deserialized(shared));
         }
+        m_devices.emplace(name, Device{family, isFamily, &m_shared.at(first), takeBlock(rest)});
     }
-    return none;
-}
-
-std::pair<Facts, Facts> factsOf(const std::vector<std::string>& oldLayers,
-                                const std::vector<std::string>& newLayers) {
-    // Both go on side by side and take about the same: one of them tells how far they are.
-    why::Apart oldWork([&] {
-        Progress progress("asking for each device");
-        return work(oldLayers,
-                    [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
-    });
-    why::Apart newWork([&] { return work(newLayers, [](std::size_t /*done*/, std::size_t /*total*/) {}); });
-    Facts oldFacts = result(oldWork);
-    return {std::move(oldFacts), result(newWork)};
 }
 
 } // namespace diff

@@ -1,23 +1,26 @@
 #pragma once
 
+#include "diff/NaturalLess.h"
+#include "query/DeviceSurvey.h"
+
 #include <tarvik/TARVIKNS.h>
 
-#include <cstddef>
 #include <map>
 #include <optional>
 #include <set>
 #include <string>
-#include <vector>
+#include <string_view>
 
 namespace diff {
 
-/// What is asked of a database, of a device or without one.
+/// What is asked of a database, about a device or in general.
 struct Question {
     enum class Kind {
-        NAMES, ///< the answer is a set of names: each comes and goes by itself
-        VALUE, ///< the answer is replaced as a whole
+        NAMES, ///< the answer is a set of names: each is lost or gained by itself
+        VALUE, ///< the answer changes as a whole
     };
 
+    std::string package; ///< empty: without one
     std::string topic;
     Kind kind = Kind::NAMES;
     std::optional<TARVIKNS::MODE_TYPE> mode{};     ///< of questions about a cell of a table
@@ -26,44 +29,50 @@ struct Question {
     friend auto operator<=>(const Question&, const Question&) = default;
 };
 
-/// What one database answers to one question: names, or values. No answer is the same as an empty one.
-using Texts = std::set<std::string>;
+using StringSet = std::set<std::string>;
 
-using Answers = std::map<Question, Texts>;
+/// The answers of one database. No answer is the same as an empty one.
+using Answers = std::map<Question, StringSet>;
 
-/// What a package changes for a device; what it does not change is as without a package.
-struct PackageFacts {
-    std::optional<Texts> modes;         ///< when a part of this package is excluded from a mode
-    std::optional<std::size_t> options; ///< among the shared answers, when the package has options of its own
+/// The topic of answers that are missing because the manager raises.
+inline constexpr const char* FAULTS = "faults";
+
+/// All that a database answers, read from its serialised form.
+class Snapshot {
+public:
+    struct Device {
+        std::string_view family;
+        bool isFamily;         ///< a family asked about by its own name
+        const Answers* shared; ///< the answers that several devices have in common
+        std::string_view own;  ///< its other answers, as `serialized` writes them
+    };
+
+    /// @param text as `takeSnapshot` returns it
+    explicit Snapshot(std::string text);
+    Snapshot(const Snapshot&) = delete;
+    Snapshot& operator=(const Snapshot&) = delete;
+
+    [[nodiscard]] const Answers& general() const { return m_general; }
+
+    /// The devices and flashes, and the families as names of their own.
+    [[nodiscard]] const std::map<std::string_view, Device, NaturalLess>& devices() const { return m_devices; }
+
+private:
+    std::string m_text;
+    Answers m_general;
+    std::map<std::string_view, Answers> m_shared; ///< by the first device that has them
+    std::map<std::string_view, Device, NaturalLess> m_devices;
 };
 
-struct DeviceFacts {
-    std::string family;
-    std::string own; ///< its answers, packed: most devices answer alike in both databases, and stay so
-    std::vector<std::size_t> shared; ///< further answers, for questions that it has no answer of its own to
-    std::map<std::string, PackageFacts> packages;
-};
+/// Asks the open database everything.
+/// @return the answers in a form that another process can read
+[[nodiscard]] std::string takeSnapshot(const ProgressCallback& progress);
 
-/// All that a database answers. Answers that devices have in common are kept once.
-struct Facts {
-    Answers general; ///< without a device
-    std::vector<Answers> shared;
-    std::map<std::string, DeviceFacts> devices; ///< and flashes; a family without devices stands for itself
+/// Appends a part of a snapshot, with its size before it.
+void putBlock(std::string& text, std::string_view block);
 
-    /// The answer of a device: its own, or else one that is shared.
-    [[nodiscard]] const Texts& answer(const Answers& own, const std::vector<std::size_t>& commonOnes,
-                                      const Question& question) const;
-};
-
-// The topics of the questions about a device.
-inline constexpr const char* FAMILY = "family";
-inline constexpr const char* MODES = "modes";
-inline constexpr const char* OPTIONS = "options";
-
-/// Asks two databases everything, each in a process of its own.
-/// @param oldLayers,newLayers their directories, the first one on top
-/// @throw CommandError (FAULT) when one is missing or can't be read
-[[nodiscard]] std::pair<Facts, Facts> factsOf(const std::vector<std::string>& oldLayers,
-                                              const std::vector<std::string>& newLayers);
+/// Answers as lines of fields. Both ends are bytes that no text of a database holds.
+[[nodiscard]] std::string serialized(const Answers& answers);
+[[nodiscard]] Answers deserialized(std::string_view text);
 
 } // namespace diff

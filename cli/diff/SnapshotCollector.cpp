@@ -1,228 +1,183 @@
-// Who is asked about, in which order, and which devices share an answer. What is asked stands in Questions.cpp.
-#include "diff/SnapshotCollector.h"
+// Turns the answers of a manager into a snapshot.
+#include "diff/Snapshot.h"
 
-#include "diff/Serialization.h"
 #include "model/Catalogue.h"
-#include "model/Multiboot.h"
-#include "query/Apart.h"
-#include "text/Suggest.h"
+#include "model/Vocabulary.h"
+#include "query/FreshManager.h"
+#include "query/ManagerQueries.h"
+#include "query/Properties.h"
 
-#include <AcdStore.h>
-#include <TarvikException.h>
+#include <tarvik/ConstraintsManager.h>
 
-#include <algorithm>
+#include <tuple>
+#include <utility>
 
 namespace diff {
 
 namespace {
 
-constexpr const char* BASE = "base";
-constexpr const char* SPI = "spi";
+using TARVIKNS::MODE_TYPE;
+using TARVIKNS::OUTPUT_TYPE;
 
-/// KS5000 is no package of KS500.
-bool mayBePackage(const std::string& device, const std::string& owner) {
-    return owner[device.size()] < '0' || owner[device.size()] > '9';
-}
+constexpr const char* MODES = "modes";
+constexpr const char* MODES_WITHOUT_OUTPUT = "modes (if no output is given)";
+constexpr const char* OPERATIONS = "operations";
+constexpr const char* OPTIONS = "options";
+constexpr const char* SPI_MODE = "SPI";
 
-} // namespace
+Question value(std::string topic) { return {"", std::move(topic), Question::Kind::VALUE}; }
+Question names(std::string topic) { return {"", std::move(topic)}; }
 
-Interview::Interview(ConstraintsManager& manager) : m_manager(manager), m_idcodes(manager) {
-    const auto fill = [](Set& set, const std::vector<std::string>& names) {
-        set.insert(names.begin(), names.end());
-    };
-    fill(m_supported, catalogue::list(BASE, "DEVICE_SUPPORTED"));
-    fill(m_optionOwners, catalogue::list(BASE, "PROGRAM_OPTION_PACKAGE"));
-    for (const std::string& key : multiboot::keys()) {
-        for (const std::string& name : catalogue::list("spi.acd", key)) {
-            m_inMultiboot.insert(lowerCase(name));
+class SnapshotCollector {
+public:
+    [[nodiscard]] std::string collect(const ProgressCallback& progress) {
+        DeviceSurvey survey(
+            {.operations = true, .options = true, .packages = true, .facts = true, .families = true});
+        std::string devices;
+        survey.run([&](const DeviceDetails& details) { add(devices, details); }, progress);
+        std::string text;
+        putBlock(text, serialized(general(survey)));
+        return text + devices;
+    }
+
+private:
+    /// What devices have in common: their operations, their options, and their modes in two forms.
+    using Common = std::tuple<SharedTable, SharedTable, std::vector<std::string>, std::vector<std::string>>;
+
+    void add(std::string& text, const DeviceDetails& details) {
+        const auto [first, isNew] = m_common.try_emplace(
+            {details.operations, details.options, details.modes, details.modesWithoutOutput}, details.name);
+        putBlock(text, details.name);
+        putBlock(text, details.family);
+        putBlock(text, details.isFamily ? "family" : "");
+        putBlock(text, first->second);
+        putBlock(text, isNew ? serialized(common(details)) : std::string());
+        putBlock(text, serialized(own(details)));
+    }
+
+    [[nodiscard]] static Answers common(const DeviceDetails& details) {
+        Answers answers;
+        addTable(answers, "", OPERATIONS, *details.operations, false);
+        addTable(answers, "", OPTIONS, *details.options, false);
+        addModes(answers, "", details.modes, details.modesWithoutOutput);
+        return answers;
+    }
+
+    [[nodiscard]] static Answers own(const DeviceDetails& details) {
+        Answers answers;
+        answers[value("family")] = {details.family};
+        if (details.idcode) {
+            answers[value("IDCODE")] = {details.idcode->value};
         }
-    }
-}
-
-Facts Interview::facts(const Reached& reached) {
-    collect();
-    findPackages();
-    // First, as long as the manager was asked nothing.
-    for (const Member& member : m_oddMembers) {
-        askApart(member);
-    }
-    for (const Member& member : m_members) {
-        if (!member.hasTables) {
-            askTables(member);
+        for (const DeviceDetails::Arrangement& one : details.multiboot) {
+            answers[names("multiboot")].insert(one.type + '_' + one.width +
+                                               (one.position == "lead" ? "_LEAD" : "_CHAIN"));
         }
-    }
-    // Tables before properties: the options of a device that has no table of its own must not fill its family's.
-    for (const Member& member : m_members) {
-        if (member.hasTables) {
-            askTables(member);
+        addProperties(answers, "property ", details.properties);
+        addProperties(answers, "flash property ", details.flashProperties);
+        for (const auto& [package, changes] : details.packages) {
+            if (changes.options) {
+                addTable(answers, package, OPTIONS, *changes.options, false);
+            }
+            addModes(answers, package, changes.modes, changes.modesWithoutOutput);
         }
-        askPackages(member);
-    }
-    std::size_t done = 0;
-    for (const Member& member : m_members) {
-        askRest(member);
-        reached(++done, m_members.size());
-    }
-    m_facts.general = general();
-    return std::move(m_facts);
-}
-
-void Interview::collect() {
-    const bool commonFault = why::hasUnknownOption(BASE, false) || why::hasUnknownOption(SPI, false);
-    // What stands for all devices that nobody knows.
-    add({BASE, BASE, false, true, nullptr}, true);
-    const std::vector<catalogue::Flash> flashes = catalogue::flashes();
-    Set flashNames;
-    for (const catalogue::Flash& flash : flashes) {
-        flashNames.insert(lowerCase(flash.name));
-    }
-    Set inFiles;
-    for (const std::string& family : catalogue::families()) {
-        const bool isOdd =
-            commonFault || why::hasUnknownOption(family, false) || family.find('_') != family.npos;
-        const std::vector<std::string> devices = AcdStore::devices(family);
-        for (const std::string& name : devices) {
-            const bool isFlash = flashNames.count(lowerCase(name)) != 0;
-            inFiles.insert(lowerCase(name));
-            add({name, family, isFlash, hasTables(family), nullptr},
-                isOdd || isFlash || why::hasUnknownOption(name, true));
+        for (const std::string& fault : {details.operations->fault, details.options->fault, details.fault}) {
+            if (!fault.empty()) {
+                answers[value(FAULTS)].insert(fault);
+            }
         }
-        if (devices.empty()) {
-            add({family, family, false, true, nullptr}, true);
-        }
+        return answers;
     }
-    for (const catalogue::Flash& flash : flashes) {
-        // A name that is no flash to the manager is not in upper case.
-        add({flash.name, SPI, true, hasTables(SPI), nullptr}, commonFault ||
-                                                                  inFiles.count(lowerCase(flash.name)) != 0 ||
-                                                                  !m_manager.isSpiDevice(flash.name.c_str()));
-    }
-}
 
-/// A family without tables may leave its records in those of another one.
-bool Interview::hasTables(const std::string& family) const {
-    return m_supported.count(family) != 0 && m_optionOwners.count(family) != 0;
-}
-
-/// @param isOdd a question about the name may meet what another question left behind
-void Interview::add(Member member, bool isOdd) {
-    const auto [known, isNew] = m_facts.devices.try_emplace(member.name);
-    if (isNew) {
-        member.facts = &known->second;
-        (isOdd || m_oddities.isEntangled(member.name) ? m_oddMembers : m_members)
-            .push_back(std::move(member));
-    }
-}
-
-DeviceFacts* Interview::device(const std::string& name) {
-    const auto found = m_facts.devices.find(name);
-    return found == m_facts.devices.end() ? nullptr : &found->second;
-}
-
-/// The packages that make a difference for a device: others answer as no package does.
-void Interview::findPackages() {
-    for (const std::string& owner : m_optionOwners) {
-        for (std::size_t length = 1; length < owner.size(); ++length) {
-            DeviceFacts* const facts = device(owner.substr(0, length));
-            if (facts != nullptr && mayBePackage(owner.substr(0, length), owner)) {
-                facts->packages.try_emplace(owner.substr(length));
+    /// @param ofSpi whether to add the rows of SPI mode, which all devices have in common, or the others
+    static void addTable(Answers& answers, const std::string& package, const char* topic,
+                         const DeviceTable& table, bool ofSpi) {
+        for (std::size_t output = 0; output < DeviceTable::OUTPUTS; ++output) {
+            const auto through = static_cast<OUTPUT_TYPE>(output);
+            for (std::size_t mode = 0; mode < DeviceTable::MODES; ++mode) {
+                const auto in = static_cast<MODE_TYPE>(mode);
+                if ((in == MODE_TYPE::SPI) != ofSpi) {
+                    continue;
+                }
+                // Empty, too: what a package lacks may be there without it.
+                StringSet& cell = answers[{package, topic, Question::Kind::NAMES, in, through}];
+                for (const DeviceTable::Row& row : table.rows) {
+                    if ((row.outputs.at(mode) >> output & 1U) != 0) {
+                        cell.insert(row.key);
+                    }
+                }
+            }
+            for (const DeviceTable::Row& row : table.rows) {
+                if (!ofSpi && (row.bsdl >> output & 1U) != 0) {
+                    answers[{package, "boundary-scan operations", Question::Kind::NAMES, {}, through}].insert(
+                        row.key);
+                }
             }
         }
     }
-    for (const std::string& part : catalogue::list(BASE, "NOT_SUPPORTED_PART_IN_MODE")) {
-        const std::size_t begin = part.find('_');
-        const std::size_t end = begin == part.npos ? begin : part.find('_', begin + 1);
-        if (end == part.npos) {
-            continue;
-        }
-        if (DeviceFacts* const facts = device(part.substr(begin + 1, end - begin - 1))) {
-            facts->packages[part.substr(end + 1)].modes.emplace();
+
+    /// SPI mode, which is the same for all devices, is among the general answers.
+    static void addModes(Answers& answers, const std::string& package, const std::vector<std::string>& modes,
+                         const std::vector<std::string>& modesWithoutOutput) {
+        StringSet& all = answers[{package, MODES}] = {modes.begin(), modes.end()};
+        all.erase(SPI_MODE);
+        answers[{package, MODES_WITHOUT_OUTPUT}] = {modesWithoutOutput.begin(), modesWithoutOutput.end()};
+    }
+
+    static void addProperties(Answers& answers, const std::string& topic, const Properties& properties) {
+        for (const Property& property : properties) {
+            answers[value(topic + property.key)] = {property.values.begin(), property.values.end()};
         }
     }
-}
 
-/// Asks in a copy of this process. A manager that raises gives that for an answer.
-Answers Interview::answersApart(const Asking& ask) {
-    return unpackedAnswers(why::apart([&] {
-        try {
-            return packed(ask());
-        } catch (const TarvikException& fault) {
-            return packed(Answers{{{"faults"}, {fault.typeName()}}});
+    [[nodiscard]] static Answers general(const DeviceSurvey& survey) {
+        const MutedMessages muted;
+        const ManagerFactory::Manager manager = freshManager();
+        Answers answers;
+        for (const std::string& mode : vocabulary::modes()) {
+            StringSet& outputs = answers[names("outputs of mode " + mode)];
+            for (const std::string& output : vocabulary::outputs()) {
+                if (manager->checkConstraints(vocabulary::readMode(mode), vocabulary::readOutput(output))) {
+                    outputs.insert(output);
+                }
+            }
         }
-    }));
-}
-
-/// Asks each kind of question of a manager of its own.
-void Interview::askApart(const Member& member) {
-    const std::vector<Asking> kinds{[&] { return whatItIs(member); }, [&] { return modes(member.name); },
-                                    [&] { return operations(member.name); },
-                                    [&] { return options(member.name, nullptr); },
-                                    [&] { return allProperties(member); }};
-    Answers own;
-    for (const Asking& kind : kinds) {
-        for (auto& [question, texts] : answersApart(kind)) {
-            own[question].merge(Texts(texts));
+        for (const std::string& package : spiPackages()) {
+            StringSet& modes = answers[{package, "modes of every device"}];
+            for (const std::string& mode :
+                 questions::modes(*manager, "spi", package.empty() ? nullptr : package.c_str())) {
+                if (mode == SPI_MODE) {
+                    modes.insert(mode);
+                }
+            }
         }
-    }
-    const Texts& family = own[{FAMILY, Question::Kind::VALUE}];
-    member.facts->family = family.empty() ? member.family : *family.begin();
-    member.facts->own = packed(own);
-    for (auto& [package, facts] : member.facts->packages) {
-        if (facts.modes) {
-            facts.modes = answersApart([&, name = &package] {
-                return Answers{{{MODES}, modes(member.name, name->c_str())}};
-            })[{MODES}];
+        addTable(answers, "", OPERATIONS, survey.spiOperations(), true);
+        addTable(answers, "", OPTIONS, survey.spiOptions(), true);
+        const std::vector<std::string> families = catalogue::families();
+        answers[names("families")] = {families.begin(), families.end()};
+        for (const std::string& family : catalogue::list("spi.acd", "DEVICE_FAMILY")) {
+            answers[names("families of flashes")].insert(family);
         }
-        facts.options = m_facts.shared.size();
-        m_facts.shared.push_back(
-            answersApart([&, name = &package] { return options(member.name, name->c_str()); }));
+        return answers;
     }
-}
 
-void Interview::askTables(const Member& member) {
-    std::vector<std::size_t>& shared = member.facts->shared;
-    const auto askFor = [&](const char* topic, const Set& owners, const Asking& ask) {
-        const std::string& owner = owners.count(member.name) != 0 ? member.name : member.family;
-        return share(topic + owner, [&] { return member.hasTables ? ask() : answersApart(ask); });
-    };
-    shared.push_back(askFor("operations ", m_supported, [&] { return operations(member.name); }));
-    shared.push_back(askFor("options ", m_optionOwners, [&] { return options(member.name, nullptr); }));
-}
-
-void Interview::askPackages(const Member& member) {
-    for (auto& [package, facts] : member.facts->packages) {
-        if (m_optionOwners.count(member.name + package) != 0) {
-            facts.options = share("options " + member.name + ' ' + package,
-                                  [&, name = &package] { return options(member.name, name->c_str()); });
+    /// The packages in which SPI mode is refused, and none.
+    [[nodiscard]] static StringSet spiPackages() {
+        constexpr std::string_view PREFIX = "SPI_spi_";
+        StringSet packages{""};
+        for (const std::string& part : catalogue::list("base.acd", "NOT_SUPPORTED_PART_IN_MODE")) {
+            if (part.starts_with(PREFIX)) {
+                packages.insert(part.substr(PREFIX.size()));
+            }
         }
-        if (facts.modes) {
-            facts.modes = modes(member.name, package.c_str());
-        }
+        return packages;
     }
-}
 
-void Interview::askRest(const Member& member) {
-    DeviceFacts& facts = *member.facts;
-    Answers own = whatItIs(member);
-    facts.family = *own.at({FAMILY, Question::Kind::VALUE}).begin();
-    own.merge(sectionProperties(member.name));
-    if (member.isFlash) {
-        addFlashProperties(own, member.name, "flash property ");
-    }
-    facts.own = packed(own);
-    facts.shared.push_back(share("modes " + facts.family, [&] { return modes(member.name); }));
-    facts.shared.push_back(
-        share("properties " + facts.family, [&] { return familyProperties(facts.family); }));
-}
+    std::map<Common, std::string> m_common; ///< with the first device that has it
+};
 
-/// Asks once for the devices of a group.
-/// @return where the answers are among those that are shared
-std::size_t Interview::share(const std::string& group, const Asking& ask) {
-    const auto [known, isNew] = m_groups.try_emplace(group, m_facts.shared.size());
-    if (isNew) {
-        m_facts.shared.push_back(ask());
-    }
-    return known->second;
-}
+} // namespace
+
+std::string takeSnapshot(const ProgressCallback& progress) { return SnapshotCollector().collect(progress); }
 
 } // namespace diff

@@ -1,22 +1,12 @@
-// Gathers everything about one device, apart from how it is shown.
+// Gathers everything about one device.
 #include "query/DeviceDetails.h"
 
 #include "model/Multiboot.h"
-#include "model/Vocabulary.h"
-#include "query/Apart.h"
-#include "query/ManagerQueries.h"
-#include "query/Tool.h"
+#include "query/DeviceSurvey.h"
 #include "text/Suggest.h"
 
+#include <TarvikException.h>
 #include <tarvik/ConstraintsManager.h>
-
-#include <fmt/format.h>
-
-#include <algorithm>
-#include <functional>
-
-using TARVIKNS::MODE_TYPE;
-using TARVIKNS::OUTPUT_TYPE;
 
 namespace {
 
@@ -33,73 +23,6 @@ std::string spelling(const std::string& device, const std::string& family) {
     return device;
 }
 
-/// The answers to one kind of question: numbers, or masks.
-using Numbers = std::vector<int>;
-
-Numbers asked(Asking asking, const std::function<Numbers()>& ask) {
-    if (asking == Asking::HERE) {
-        return ask();
-    }
-    return Json::parse(why::apart([&] { return Json(ask()).dump(); }));
-}
-
-/// The masks of a table, mode by mode and in them output by output.
-template <typename Query>
-Numbers masks(Query query) {
-    Numbers answers;
-    for (std::size_t mode = 0; mode < DeviceSheet::MODES; ++mode) {
-        for (std::size_t output = 0; output < DeviceSheet::OUTPUTS; ++output) {
-            answers.push_back(query(static_cast<MODE_TYPE>(mode), static_cast<OUTPUT_TYPE>(output)));
-        }
-    }
-    return answers;
-}
-
-bool contains(int mask, std::size_t value) { return (static_cast<unsigned>(mask) >> value & 1U) != 0; }
-
-/// The outputs whose masks contain a value.
-DeviceSheet::Outputs outputs(const std::vector<int>& masks, std::size_t first, std::size_t value) {
-    DeviceSheet::Outputs found = 0;
-    for (std::size_t output = 0; output < DeviceSheet::OUTPUTS && first + output < masks.size(); ++output) {
-        if (contains(masks[first + output], value)) {
-            found |= 1U << output;
-        }
-    }
-    return found;
-}
-
-/// Turns masks into rows by key, those that allow something.
-std::vector<DeviceSheet::Row> rows(const std::vector<std::string>& keys, const std::vector<int>& byMode,
-                                   const std::vector<int>& bsdl) {
-    std::vector<DeviceSheet::Row> all;
-    for (std::size_t value = 0; value < keys.size(); ++value) {
-        DeviceSheet::Row row{keys[value], {}, outputs(bsdl, 0, value)};
-        for (std::size_t mode = 0; mode < DeviceSheet::MODES; ++mode) {
-            row.outputs.at(mode) = outputs(byMode, mode * DeviceSheet::OUTPUTS, value);
-        }
-        if (row.bsdl != 0 || row.outputs != decltype(row.outputs){}) {
-            all.push_back(std::move(row));
-        }
-    }
-    return all;
-}
-
-Numbers bsdlMasks(ConstraintsManager& manager, const char* device) {
-    Numbers answers;
-    for (std::size_t output = 0; output < DeviceSheet::OUTPUTS; ++output) {
-        answers.push_back(manager.getBsdlOperations(device, static_cast<OUTPUT_TYPE>(output)));
-    }
-    return answers;
-}
-
-Numbers modeNumbers(Tool& tool, const std::string& device) {
-    Numbers answers;
-    for (const std::string& key : questions::modes(tool, device)) {
-        answers.push_back(static_cast<int>(vocabulary::readMode(key)));
-    }
-    return answers;
-}
-
 /// All names that the lists of multiboot arrangements hold, in lower case.
 std::unordered_set<std::string> multibootNames() {
     std::unordered_set<std::string> names;
@@ -111,57 +34,57 @@ std::unordered_set<std::string> multibootNames() {
     return names;
 }
 
+std::vector<DeviceDetails::Arrangement> arrangements(const ConstraintsManager& manager,
+                                                     const std::string& device) {
+    std::vector<DeviceDetails::Arrangement> found;
+    multiboot::forEachArrangement([&](const std::string& type, const std::string& width, bool lead) {
+        if (manager.isMbBpiSpiSupport(device.c_str(), type.c_str(), width.c_str(), lead)) {
+            found.push_back({type, width, lead ? "lead" : "chain"});
+        }
+    });
+    return found;
+}
+
 } // namespace
 
-std::string outputLetters() {
-    std::string letters;
-    for (std::size_t output = 0; output < DeviceSheet::OUTPUTS; ++output) {
-        const std::string& key = vocabulary::outputs().at(output);
-        letters += key.at(key.find_first_not_of(letters));
+std::string DeviceDetails::whyIncomplete() const {
+    if (!isKnown()) {
+        return catalogue::unknownDevice(name).what();
     }
-    return letters;
+    for (const SharedTable* const table : {&operations, &options}) {
+        if (*table && !(*table)->fault.empty()) {
+            return (*table)->fault;
+        }
+    }
+    return fault;
 }
 
-void addTables(DeviceSheet& sheet, Tool& tool, Asking asking) {
-    ConstraintsManager& manager = tool.manager();
-    const char* const device = sheet.name.c_str();
-    const Numbers operations = asked(asking, [&] {
-        return masks([&](MODE_TYPE mode, OUTPUT_TYPE output) {
-            return manager.getDeviceOperations(device, mode, output);
-        });
-    });
-    const Numbers options = asked(asking, [&] {
-        return masks([&](MODE_TYPE mode, OUTPUT_TYPE output) {
-            return manager.getProgramOptions(device, mode, output, nullptr);
-        });
-    });
-    const Numbers bsdl = asked(asking, [&] { return bsdlMasks(manager, device); });
-    sheet.operations = rows(vocabulary::operations(), operations, bsdl);
-    sheet.options = rows(vocabulary::options(), options, {});
-    for (const int mode : asked(asking, [&] { return modeNumbers(tool, sheet.name); })) {
-        sheet.modes.push_back(vocabulary::key(static_cast<MODE_TYPE>(mode)));
+DeviceFactsReader::DeviceFactsReader(const ConstraintsManager& manager)
+    : m_idcodes(manager), m_idcodeEntries(catalogue::entries("base.acd", "IDCODE")),
+      m_multiboot(multibootNames()) {}
+
+void DeviceFactsReader::addFacts(ConstraintsManager& manager, DeviceDetails& details, bool isOrderDependent) {
+    const std::string& device = details.name;
+    details.flash = manager.isSpiDevice(device.c_str());
+    details.idcode = idcode(device);
+    if (m_multiboot.count(lowerCase(device)) != 0) {
+        details.multiboot = arrangements(manager, device);
+    }
+    if (details.flash) {
+        details.flashProperties = flashProperties(manager, device);
+    }
+    try {
+        if (details.fault.empty()) {
+            // Loads all records, properties or none.
+            static_cast<void>(manager.getDeviceStringProperties(device.c_str(), ""));
+            details.properties = m_properties.read(manager, device, isOrderDependent);
+        }
+    } catch (const TarvikException& fault) {
+        details.fault = faultText(fault);
     }
 }
 
-FactReader::FactReader(ConstraintsManager& manager)
-    : m_manager(manager), m_idcodes(manager), m_idcodeEntries(catalogue::entries("base.acd", "IDCODE")),
-      m_properties(manager), m_multiboot(multibootNames()) {}
-
-void FactReader::addFacts(DeviceSheet& sheet) {
-    const char* const device = sheet.name.c_str();
-    // Loads all records, properties or none.
-    static_cast<void>(m_manager.getDeviceStringProperties(device, ""));
-    sheet.family = plain(m_manager.getPartFamily(device));
-    sheet.properties = m_properties.read(sheet.name);
-    sheet.idcode = idcode(sheet.name);
-    sheet.flash = m_manager.isSpiDevice(device);
-    if (sheet.flash) {
-        sheet.flashProperties = flashProperties(m_manager, sheet.name);
-    }
-    sheet.multiboot = arrangements(sheet.name);
-}
-
-std::optional<DeviceSheet::Idcode> FactReader::idcode(const std::string& device) const {
+std::optional<DeviceDetails::Idcode> DeviceFactsReader::idcode(const std::string& device) const {
     std::optional<IdcodeFinder::Idcode> found = m_idcodes.find(device);
     if (!found) {
         // A package does not change the IDCODE.
@@ -173,33 +96,16 @@ std::optional<DeviceSheet::Idcode> FactReader::idcode(const std::string& device)
         return std::nullopt;
     }
     const catalogue::Entry& entry = m_idcodeEntries.at(found->name);
-    return DeviceSheet::Idcode{found->value, entry.origin, entry.shadows};
+    return DeviceDetails::Idcode{found->value, entry.origin, entry.shadows};
 }
 
-std::vector<DeviceSheet::Arrangement> FactReader::arrangements(const std::string& device) const {
-    std::vector<DeviceSheet::Arrangement> found;
-    if (m_multiboot.count(lowerCase(device)) == 0) {
-        return found;
-    }
-    multiboot::forEachArrangement([&](const std::string& type, const std::string& width, bool lead) {
-        if (m_manager.isMbBpiSpiSupport(device.c_str(), type.c_str(), width.c_str(), lead)) {
-            found.push_back({type, width, lead ? "lead" : "chain"});
-        }
-    });
-    return found;
-}
-
-DeviceSheet deviceSheet(Tool& tool, const std::string& device) {
-    ConstraintsManager& manager = tool.manager();
-    DeviceSheet sheet{};
-    sheet.name = device;
-    // Read here first, so that what the host layer says about the files is said where it can be heard.
+DeviceDetails deviceDetails(const std::string& device) {
+    // Read first, so that what the host layer reports about the files is heard.
     static_cast<void>(AcdStore::value(device.c_str(), ""));
-    addTables(sheet, tool, Asking::APART);
-    // Nothing was asked so far but of copies of this manager.
-    questions::requireKnown(manager, device);
-    // What the manager says about the records was said to its copies only.
-    FactReader(manager).addFacts(sheet);
-    sheet.spelling = spelling(device, sheet.family);
-    return sheet;
+    DeviceDetails details = DeviceSurvey({.operations = true, .options = true, .facts = true}).ask(device);
+    if (const std::string reason = details.whyIncomplete(); !reason.empty()) {
+        throw CommandError(details.isKnown() ? ExitCode::FAULT : ExitCode::NO, reason);
+    }
+    details.spelling = spelling(device, details.family);
+    return details;
 }

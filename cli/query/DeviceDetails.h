@@ -2,24 +2,20 @@
 
 #include "model/Catalogue.h"
 #include "model/Idcodes.h"
+#include "query/DeviceTables.h"
 #include "query/Properties.h"
 
-#include <array>
 #include <map>
+#include <memory>
 #include <optional>
 #include <string>
 #include <unordered_set>
 #include <vector>
 
 class ConstraintsManager;
-class Tool;
 
 /// Everything about one device.
-struct DeviceSheet {
-    /// The permission tables have rows for the modes up to `SPI`, and cells for the outputs up to `STAPL`.
-    static constexpr std::size_t MODES = 6;
-    static constexpr std::size_t OUTPUTS = 5;
-
+struct DeviceDetails {
     struct Idcode {
         std::string value;
         catalogue::Origin origin;
@@ -32,59 +28,55 @@ struct DeviceSheet {
         std::string position; ///< "lead" or "chain"
     };
 
-    /// A set of outputs: bit i stands for output i.
-    using Outputs = unsigned;
-
-    /// One operation or option. Those that are allowed nowhere have no row.
-    struct Row {
-        std::string key;
-        std::array<Outputs, MODES> outputs; ///< by mode
-        Outputs bsdl;                       ///< as a boundary-scan operation; none for options
+    /// What a package changes.
+    struct Package {
+        std::vector<std::string> modes; ///< in which the device may be configured in this package
+        std::vector<std::string> modesWithoutOutput;
+        SharedTable options; ///< null: those of the device without a package
     };
 
     std::string name;
-    std::string spelling; ///< the name as the database writes it, where it has a section; else the name
+    bool isFamily = false; ///< a family asked about by its own name
+    std::string spelling;  ///< the name as the database writes it, if it has a section; otherwise the name
     std::string family;
     std::optional<Idcode> idcode;
-    std::vector<std::string> modes; ///< in which it may be configured
+    std::vector<std::string> modes;              ///< in which it may be configured through some output
+    std::vector<std::string> modesWithoutOutput; ///< others that are allowed as long as no output is given
     Properties properties;
-    bool flash;
+    bool flash = false;
     Properties flashProperties;
     std::vector<Arrangement> multiboot;
-    std::vector<Row> operations;
-    std::vector<Row> options;
+    SharedTable operations;
+    SharedTable options;                     ///< without a package
+    std::map<std::string, Package> packages; ///< those that change an answer
+    bool answer = false;                     ///< to the question that a survey asks besides
+    std::string fault; ///< why the properties, or that answer, are missing; empty if they are not
+
+    /// Does the manager know the device?
+    [[nodiscard]] bool isKnown() const { return family != "base"; }
+
+    /// Why some answer is missing: the manager raises, or does not know the device. Empty if none is.
+    [[nodiscard]] std::string whyIncomplete() const;
 };
 
-/// A letter for each output of the tables: the first of its key that no earlier output has.
-[[nodiscard]] std::string outputLetters();
+/// Asks for everything about a device: each kind of question is asked of a manager that was asked nothing before.
+/// @throw CommandError (NO) for a device that the manager does not know; (FAULT) if the manager raises
+[[nodiscard]] DeviceDetails deviceDetails(const std::string& device);
 
-/// Asks the manager everything about a device: each kind of question of a manager that was asked nothing before.
-/// The tool's manager must not have been asked anything yet either.
-/// @throw CommandError (NO) for a device that the manager does not know
-[[nodiscard]] DeviceSheet deviceSheet(Tool& tool, const std::string& device);
-
-/// How a kind of question is asked: what the manager loads for one can change its answer to another.
-enum class Asking {
-    HERE, ///< of the manager as it stands
-    APART ///< of a copy of it, which leaves no trace
-};
-
-/// Asks for the modes, operations and options of a device, each kind of question `asking`.
-void addTables(DeviceSheet& sheet, Tool& tool, Asking asking);
-
-/// Asks the manager, as it stands, for all but the tables. What many devices have in common is looked up once.
-class FactReader {
+/// Asks for all but the tables. What many devices have in common is looked up once.
+class DeviceFactsReader {
 public:
-    explicit FactReader(ConstraintsManager& manager);
+    /// @param manager any one, which must live longer
+    explicit DeviceFactsReader(const ConstraintsManager& manager);
 
-    /// Fills in the facts about the device that the sheet names.
-    void addFacts(DeviceSheet& sheet);
+    /// Fills in the facts about the device that the details name. If they have a fault, the properties are left out.
+    /// @param manager is asked
+    /// @param isOrderDependent asks for each property of a manager of its own
+    void addFacts(ConstraintsManager& manager, DeviceDetails& details, bool isOrderDependent);
 
 private:
-    [[nodiscard]] std::optional<DeviceSheet::Idcode> idcode(const std::string& device) const;
-    [[nodiscard]] std::vector<DeviceSheet::Arrangement> arrangements(const std::string& device) const;
+    [[nodiscard]] std::optional<DeviceDetails::Idcode> idcode(const std::string& device) const;
 
-    ConstraintsManager& m_manager;
     IdcodeFinder m_idcodes;
     std::map<std::string, catalogue::Entry> m_idcodeEntries;
     PropertyReader m_properties;

@@ -1,4 +1,4 @@
-// Which devices there are, and which of them can't be asked for one after the other.
+// Which names there are to ask about, and which of them need a manager of their own.
 #include "query/DeviceList.h"
 
 #include "model/Catalogue.h"
@@ -10,62 +10,81 @@
 
 #include <unordered_set>
 
-namespace why {
-
 namespace {
 
 using Set = std::unordered_set<std::string>;
 
+bool hasPackage(const std::string& name) { return name.find('_') != std::string::npos; }
+
 class Collection {
 public:
-    Collection() {
+    Collection() : m_flashes(catalogue::flashes()) {
         for (const std::string& family : catalogue::list("spi.acd", "DEVICE_FAMILY")) {
-            m_flashes.insert(family);
+            m_flashNames.insert(family);
         }
-        for (const catalogue::Flash& flash : catalogue::flashes()) {
-            m_flashes.insert(flash.name);
+        for (const catalogue::Flash& flash : m_flashes) {
+            m_flashNames.insert(flash.name);
         }
     }
 
-    [[nodiscard]] std::vector<Member> collect() {
-        const bool commonFault = hasUnknownOption("base", false) || hasUnknownOption("spi", false);
+    [[nodiscard]] std::vector<ListedName> collect() {
         for (const std::string& family : catalogue::families()) {
-            const bool familyFault = commonFault || hasUnknownOption(family, false);
-            // A question about a device of it may meet what another question left behind.
-            const bool isOdd = family.find('_') != std::string::npos;
             for (std::string& name : AcdStore::devices(family)) {
-                add(std::move(name), family, isOdd, familyFault);
+                add(std::move(name), family, hasPackage(family));
             }
         }
-        for (catalogue::Flash& flash : catalogue::flashes()) {
-            const bool isOdd = !isFlash(flash.name);
-            add(std::move(flash.name), "spi", isOdd, commonFault);
+        for (catalogue::Flash& flash : m_flashes) {
+            // The manager knows a flash by its name in upper case only.
+            const bool isUnknown = !isFlash(flash.name);
+            add(std::move(flash.name), "spi", isUnknown);
         }
-        return std::move(m_members);
+        return std::move(m_names);
     }
 
 private:
-    void add(std::string name, const std::string& family, bool isOdd, bool isFaulty) {
+    void add(std::string name, const std::string& file, bool isOrderDependent) {
         if (m_seen.insert(lowerCase(name)).second) {
-            Member member{"", isFlash(name) ? "spi" : family, isOdd || m_oddities.isEntangled(name),
-                          isFaulty};
-            member.name = std::move(name);
-            m_members.push_back(std::move(member));
+            const bool flash = isFlash(name);
+            isOrderDependent = isOrderDependent || (flash && file != "spi") || m_dependent.contains(name);
+            m_names.push_back({std::move(name), file, flash ? "spi" : file, isOrderDependent});
         }
     }
 
     [[nodiscard]] bool isFlash(const std::string& name) const {
-        return m_flashes.count(plain(UT_STR::Upper(name.c_str()))) != 0;
+        return m_flashNames.count(plain(UT_STR::Upper(name.c_str()))) != 0;
     }
 
-    Set m_flashes; ///< as listed, families of flashes too
-    Oddities m_oddities;
+    std::vector<catalogue::Flash> m_flashes;
+    Set m_flashNames; ///< as listed, with the families of flashes
+    OrderDependentNames m_dependent;
     Set m_seen; ///< in lower case
-    std::vector<Member> m_members;
+    std::vector<ListedName> m_names;
 };
 
 } // namespace
 
-std::vector<Member> members() { return Collection().collect(); }
+std::vector<ListedName> deviceList() { return Collection().collect(); }
 
-} // namespace why
+std::vector<ListedName> familyList(const std::vector<ListedName>& devices) {
+    Set taken;
+    for (const ListedName& device : devices) {
+        taken.insert(lowerCase(device.name));
+    }
+    const OrderDependentNames dependent;
+    std::vector<ListedName> families;
+    const auto add = [&](const std::string& name, const std::string& file, bool isOrderDependent) {
+        if (taken.insert(lowerCase(name)).second) {
+            families.push_back({name, file, file, isOrderDependent});
+        }
+    };
+    for (const std::string& family : catalogue::list("spi.acd", "DEVICE_FAMILY")) {
+        const bool isUnknown = plain(UT_STR::Upper(family.c_str())) != family;
+        add(family, "spi", isUnknown || dependent.contains(family));
+    }
+    for (const std::string& family : catalogue::families()) {
+        add(family, family, hasPackage(family));
+    }
+    add("base", "base", true);
+    add("spi", "spi", true);
+    return families;
+}

@@ -3,17 +3,20 @@
 #include <string>
 #include <vector>
 
-namespace why {
-
-/// A device of the database, a flash included, and what asking for it may do to the answers for others.
-struct Member {
+/// A name that questions are asked about: a device, a flash or a family.
+struct ListedName {
     std::string name;
-    std::string family; ///< whose tables answer unless the device has tables of its own; "spi" for a flash
-    bool isEntangled;   ///< what it leaves behind in the manager may change the answer for another one
-    bool isFaulty;      ///< the manager may raise when it reads the options of the family
+    std::string file;   ///< the family whose file has its section; "spi" for a flash without one
+    std::string family; ///< whose tables answer unless the device has its own; "spi" for a flash
+
+    /// Questions about it may change the answers for other names, or the other way round.
+    bool isOrderDependent;
 };
 
-/// All devices, each once: the first family that has a device is the one that answers for it.
-[[nodiscard]] std::vector<Member> members();
+/// All devices and flashes, each once: the first family that has a device is the one that answers for it.
+[[nodiscard]] std::vector<ListedName> deviceList();
 
-} // namespace why
+/// The families, and those of flashes, as names of their own; with "base", which answers for every unknown name, and
+/// "spi".
+/// @param devices the list of all devices
+[[nodiscard]] std::vector<ListedName> familyList(const std::vector<ListedName>& devices);

@@ -11,16 +11,25 @@ class Tool;
 /// Questions that several commands ask the manager.
 namespace questions {
 
-/// The keys of the modes in which the device, or family, may be configured. What the manager says about the
-/// others is no news to who asked for all, and is dropped.
+/// The keys of the modes in which the device, or family, may be configured through some output.
+/// @param package may be null
+[[nodiscard]] std::vector<std::string> modes(ConstraintsManager& manager, const std::string& device,
+                                             const char* package);
+
+/// The keys of other modes, in which it may be configured as long as no output is given. SPI and PFF, which accept
+/// every device then, are not among them.
+[[nodiscard]] std::vector<std::string> modesWithoutOutput(ConstraintsManager& manager,
+                                                          const std::string& device, const char* package);
+
+/// The modes through some output, asked of the tool's manager. The manager's messages about the other modes are dropped.
 [[nodiscard]] std::vector<std::string> modes(Tool& tool, const std::string& device);
 
-/// The operations, or options, that a mask stands for, in the order in which they are presented.
+/// The operations, or options, that a mask contains, in the order in which they are presented.
 [[nodiscard]] std::vector<TARVIKNS::OP_TYPE> operations(const ConstraintsManager& manager, int mask);
 [[nodiscard]] std::vector<TARVIKNS::PROGRAM_OPTION> options(const ConstraintsManager& manager, int mask);
 
-/// Call it behind the question proper: the manager remembers what a name resolved to, so asking it whether it
-/// knows a device must not come first.
+/// Call it after the question proper: the manager remembers what a name resolved to, so whether it knows a device
+/// must not be asked first.
 /// @throw CommandError (NO) for a device that the manager does not know
 void requireKnown(ConstraintsManager& manager, const std::string& device);
 

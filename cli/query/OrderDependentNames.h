@@ -3,26 +3,23 @@
 #include <string>
 #include <unordered_set>
 
-namespace why {
-
-/// The names that a question can't be asked about in one go with others: what the manager learns from one question
-/// could change its answer to the next.
-class Oddities {
+/// The names for which a manager's answers depend on what it was asked before.
+class OrderDependentNames {
 public:
-    Oddities();
+    OrderDependentNames();
 
-    /// A name that others resolve to, or that resolves like others.
-    [[nodiscard]] bool isEntangled(const std::string& name) const;
+    /// Is it a name that others resolve to, or that resolves as another one does?
+    [[nodiscard]] bool contains(const std::string& name) const;
 
 private:
-    /// Names of files, and of devices that stand in files without a family, in lower case.
+    /// In lower case: the names of files, and of devices with a section in base.acd or spi.acd.
     std::unordered_set<std::string> m_names;
 };
 
-/// Does a record of PROGRAM_OPTION name an option that the manager can't read? It raises then, but only when it
-/// reads the record first.
+/// Does a record of PROGRAM_OPTION name an unknown option? The manager raises when it reads that record, which it
+/// does only once.
 /// @param name a family or a device
-/// @param sectionOnly whether only the device's own section counts
-[[nodiscard]] bool hasUnknownOption(const std::string& name, bool sectionOnly);
+[[nodiscard]] bool hasUnknownOption(const std::string& name);
 
-} // namespace why
+/// Does the device's section have a PROGRAM_OPTION, in place of its family's?
+[[nodiscard]] bool hasOwnOptions(const std::string& device);

@@ -1,6 +1,7 @@
 // Lists properties: the names come from the database, the values from the manager.
 #include "query/Properties.h"
 
+#include "query/FreshManager.h"
 #include "query/Tool.h"
 #include "term/Table.h"
 #include "text/Suggest.h"
@@ -68,16 +69,25 @@ const PropertyReader::Entries& PropertyReader::entriesOfFamily(const std::string
     return known->second;
 }
 
-Properties PropertyReader::read(const std::string& device) {
+Properties PropertyReader::read(ConstraintsManager& manager, const std::string& device,
+                                bool isOrderDependent) {
     Entries own = propertyEntries(device);
-    const Entries& inherited = entriesOfFamily(plain(m_manager.getPartFamily(device.c_str())));
+    const Entries& inherited = entriesOfFamily(plain(manager.getPartFamily(device.c_str())));
     Properties properties;
     properties.reserve(own.size() + inherited.size());
     const auto add = [&](const std::string& key, catalogue::Entry entry) {
         Property property{
             key, {}, entry.ofDevice ? "device" : "family", std::move(entry.origin), std::move(entry.shadows)};
-        for (const StringBase& value : m_manager.getDeviceStringProperties(device.c_str(), key.c_str())) {
-            property.values.push_back(plain(value));
+        const auto ask = [&](ConstraintsManager& asked) {
+            for (const StringBase& value : asked.getDeviceStringProperties(device.c_str(), key.c_str())) {
+                property.values.push_back(plain(value));
+            }
+        };
+        if (isOrderDependent) {
+            const MutedMessages muted;
+            ask(*freshManager());
+        } else {
+            ask(manager);
         }
         properties.push_back(std::move(property));
     };

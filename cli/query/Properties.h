@@ -24,23 +24,22 @@ using Properties = std::vector<Property>;
 /// Reads the properties of devices; what devices of a family share is looked up once.
 class PropertyReader {
 public:
-    explicit PropertyReader(ConstraintsManager& manager) : m_manager(manager) {}
-
     /// The properties of a device and of its family.
-    [[nodiscard]] Properties read(const std::string& device);
+    /// @param isOrderDependent asks for each property of a manager of its own
+    [[nodiscard]] Properties read(ConstraintsManager& manager, const std::string& device,
+                                  bool isOrderDependent = false);
 
 private:
     using Entries = std::map<std::string, catalogue::Entry>;
 
     const Entries& entriesOfFamily(const std::string& family);
 
-    ConstraintsManager& m_manager;
     std::map<std::string, Entries> m_families;
 };
 
 /// The properties of a device and of its family.
 [[nodiscard]] inline Properties deviceProperties(ConstraintsManager& manager, const std::string& device) {
-    return PropertyReader(manager).read(device);
+    return PropertyReader().read(manager, device);
 }
 
 /// The properties of an SPI flash and of its class.

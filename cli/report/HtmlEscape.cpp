@@ -131,7 +131,7 @@ std::string jsonString(std::string_view text) {
     return json + '"';
 }
 
-std::string fragment(std::string_view text) {
+std::string urlFragment(std::string_view text) {
     // As encodeURIComponent.
     constexpr std::string_view UNRESERVED = "-_.!~*'()";
     std::string encoded;

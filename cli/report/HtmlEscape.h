@@ -16,6 +16,6 @@ namespace report {
 [[nodiscard]] std::string jsonString(std::string_view text);
 
 /// A displayable text as the fragment of a link.
-[[nodiscard]] std::string fragment(std::string_view text);
+[[nodiscard]] std::string urlFragment(std::string_view text);
 
 } // namespace report

@@ -18,7 +18,7 @@ namespace {
 std::string place(const catalogue::Origin& origin) { return escaped(catalogue::asText(origin)); }
 
 /// The outputs as letters, each in its place.
-std::string cell(DeviceSheet::Outputs outputs) {
+std::string cell(DeviceTable::Outputs outputs) {
     if (outputs == 0) {
         return "<td class=\"none\">–</td>";
     }
@@ -52,22 +52,22 @@ std::string headings(const std::vector<std::string>& texts) {
     return html + "</tr></thead>";
 }
 
-std::string matrix(const std::string& title, const std::vector<DeviceSheet::Row>& rows, bool withBsdl,
+std::string matrix(const std::string& title, const std::vector<DeviceTable::Row>& rows, bool withBsdl,
                    const std::string& device) {
     if (rows.empty()) {
         return {};
     }
     std::vector<std::string> columns{""};
     columns.insert(columns.end(), vocabulary::modes().begin(),
-                   vocabulary::modes().begin() + DeviceSheet::MODES);
+                   vocabulary::modes().begin() + DeviceTable::MODES);
     if (withBsdl) {
         columns.emplace_back("BSDL");
     }
     std::string html =
         fmt::format("<table class=\"matrix\"><caption>{}</caption>{}<tbody>", title, headings(columns));
-    for (const DeviceSheet::Row& row : rows) {
+    for (const DeviceTable::Row& row : rows) {
         html += fmt::format("<tr><th scope=\"row\">{}</th>", escaped(row.key));
-        for (const DeviceSheet::Outputs outputs : row.outputs) {
+        for (const DeviceTable::Outputs outputs : row.outputs) {
             html += cell(outputs);
         }
         html += (withBsdl ? cell(row.bsdl) : "") + "</tr>";
@@ -112,16 +112,16 @@ std::string fact(const std::string& term, const std::string& html) {
     return fmt::format("<div><dt>{}</dt><dd>{}</dd></div>", term, html);
 }
 
-std::string facts(const DeviceSheet& sheet) {
-    std::string html = fact("Family", escaped(sheet.family));
-    if (sheet.idcode) {
+std::string facts(const DeviceDetails& details) {
+    std::string html = fact("Family", escaped(details.family));
+    if (details.idcode) {
         html += fact("IDCODE", fmt::format("<code>{}</code> <span class=\"origin\">{}</span>",
-                                           escaped(sheet.idcode->value), place(sheet.idcode->origin)));
+                                           escaped(details.idcode->value), place(details.idcode->origin)));
     }
-    html += fact("Modes", fmt::format("{}", fmt::join(sheet.modes, " ")));
-    if (!sheet.multiboot.empty()) {
+    html += fact("Modes", fmt::format("{}", fmt::join(details.modes, " ")));
+    if (!details.multiboot.empty()) {
         std::vector<std::string> arrangements;
-        for (const DeviceSheet::Arrangement& one : sheet.multiboot) {
+        for (const DeviceDetails::Arrangement& one : details.multiboot) {
             arrangements.push_back(fmt::format("{} {} {}", one.type, one.width, one.position));
         }
         html += fact("Multiboot", fmt::format("{}", fmt::join(arrangements, ", ")));
@@ -129,26 +129,24 @@ std::string facts(const DeviceSheet& sheet) {
     return "<dl class=\"facts\">" + html + "</dl>";
 }
 
-std::string sheetOf(const Subject& subject) {
-    const DeviceSheet& sheet = subject.sheet;
-    if (!subject.fault.empty()) {
-        return fmt::format("<p class=\"fault\">No answer: {}</p>", escaped(subject.fault));
+std::string bodyOf(const DeviceDetails& details) {
+    if (const std::string reason = details.whyIncomplete(); !reason.empty()) {
+        return fmt::format("<p class=\"fault\">No answer: {}</p>", escaped(reason));
     }
-    return facts(sheet) + matrix("Operations", sheet.operations, true, sheet.name) +
-           matrix("Programming options", sheet.options, false, sheet.name) +
-           propertyTable("Properties", sheet.properties, sheet.name) +
-           propertyTable("Properties of the flash", sheet.flashProperties, sheet.name);
+    return facts(details) + matrix("Operations", details.operations->rows, true, details.name) +
+           matrix("Programming options", details.options->rows, false, details.name) +
+           propertyTable("Properties", details.properties, details.name) +
+           propertyTable("Properties of the flash", details.flashProperties, details.name);
 }
 
 } // namespace
 
-std::string partOf(const Subject& subject) {
-    const DeviceSheet& sheet = subject.sheet;
+std::string deviceHtml(const DeviceDetails& details) {
     return fmt::format("<details class=\"device\"><summary><h4>{0}</h4> <span class=\"idcode\">{1}</span> "
                        "<span class=\"modes\">{2}</span></summary><div class=\"sheet\" "
                        "id=\"device-{0}\">{3}</div></details>\n",
-                       escaped(sheet.name), escaped(sheet.idcode ? sheet.idcode->value : ""),
-                       fmt::join(sheet.modes, " "), sheetOf(subject));
+                       escaped(details.name), escaped(details.idcode ? details.idcode->value : ""),
+                       fmt::join(details.modes, " "), bodyOf(details));
 }
 
 std::string familyHeading(const std::string& family) {
@@ -156,7 +154,7 @@ std::string familyHeading(const std::string& family) {
 }
 
 std::string linkTo(const std::string& device) {
-    return fmt::format("<a href=\"#device-{}\">{}</a>", fragment(device), escaped(device));
+    return fmt::format("<a href=\"#device-{}\">{}</a>", urlFragment(device), escaped(device));
 }
 
 FlashTable::FlashTable() {
@@ -165,11 +163,10 @@ FlashTable::FlashTable() {
     }
 }
 
-void FlashTable::add(const Subject& subject) {
-    const DeviceSheet& sheet = subject.sheet;
-    if (sheet.flash) {
-        Row row{sheet.name, {}};
-        for (const Property& property : sheet.flashProperties) {
+void FlashTable::add(const DeviceDetails& details) {
+    if (details.flash) {
+        Row row{details.name, {}};
+        for (const Property& property : details.flashProperties) {
             row.values[property.key] = values(property);
         }
         m_rows.push_back(std::move(row));
@@ -203,9 +200,9 @@ std::string FlashTable::html() const {
     return html + "</tbody></table>\n";
 }
 
-void MultibootTable::add(const Subject& subject) {
-    for (const DeviceSheet::Arrangement& one : subject.sheet.multiboot) {
-        m_devices[{one.type, one.width, one.position}].push_back(subject.sheet.name);
+void MultibootTable::add(const DeviceDetails& details) {
+    for (const DeviceDetails::Arrangement& one : details.multiboot) {
+        m_devices[{one.type, one.width, one.position}].push_back(details.name);
     }
 }
 

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "report/Survey.h"
+#include "query/DeviceDetails.h"
 
 #include <map>
 #include <string>
@@ -9,7 +9,7 @@
 namespace report {
 
 /// The part of the page about one device, as page.js makes it from the data too: change both together.
-[[nodiscard]] std::string partOf(const Subject& subject);
+[[nodiscard]] std::string deviceHtml(const DeviceDetails& details);
 
 /// The heading above the devices of a family, likewise.
 [[nodiscard]] std::string familyHeading(const std::string& family);
@@ -22,7 +22,7 @@ class FlashTable {
 public:
     FlashTable();
 
-    void add(const Subject& subject);
+    void add(const DeviceDetails& details);
     [[nodiscard]] std::size_t size() const { return m_rows.size(); }
 
     /// The table element; empty without flashes.
@@ -41,7 +41,7 @@ private:
 /// The table of multiboot arrangements and of the devices that support them.
 class MultibootTable {
 public:
-    void add(const Subject& subject);
+    void add(const DeviceDetails& details);
 
     /// The table element; empty when no device supports any.
     /// @param withLinks lists the devices; else the table says how many there are

@@ -19,23 +19,22 @@ constexpr unsigned SHADES = 5;
 template <typename Pairs>
 unsigned count(const Pairs& pairs) {
     std::size_t all = 0;
-    for (const DeviceSheet::Outputs outputs : pairs) {
-        all += std::bitset<DeviceSheet::OUTPUTS>(outputs).count();
+    for (const DeviceTable::Outputs outputs : pairs) {
+        all += std::bitset<DeviceTable::OUTPUTS>(outputs).count();
     }
     return static_cast<unsigned>(all);
 }
 
 } // namespace
 
-void Overview::add(const Subject& subject) {
-    const DeviceSheet& sheet = subject.sheet;
-    const auto [known, isNew] = m_positions.try_emplace(sheet.family, m_families.size());
+void Overview::add(const DeviceDetails& details) {
+    const auto [known, isNew] = m_positions.try_emplace(details.family, m_families.size());
     if (isNew) {
-        m_families.push_back({sheet.family, 0, {}});
+        m_families.push_back({details.family, 0, {}});
     }
     Family& family = m_families[known->second];
     ++family.devices;
-    for (const DeviceSheet::Row& row : sheet.operations) {
+    for (const DeviceTable::Row& row : details.operations->rows) {
         Pairs& pairs = family.operations[row.key];
         for (std::size_t mode = 0; mode < pairs.size(); ++mode) {
             pairs.at(mode) |= row.outputs.at(mode);
@@ -81,7 +80,7 @@ std::string Overview::html() const {
     for (const Family& family : m_families) {
         html +=
             fmt::format("<tr><th scope=\"row\"><a href=\"#in-{}\">{}</a></th><td class=\"number\">{}</td>",
-                        fragment(family.name), escaped(family.name), family.devices);
+                        urlFragment(family.name), escaped(family.name), family.devices);
         for (const std::string& key : columns) {
             const auto found = family.operations.find(key);
             const unsigned pairs = found == family.operations.end() ? 0 : count(found->second);

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "report/Survey.h"
+#include "query/DeviceDetails.h"
 
 #include <array>
 #include <map>
@@ -12,7 +12,7 @@ namespace report {
 /// The table of families by operations: through how many pairs of mode and output some device allows it.
 class Overview {
 public:
-    void add(const Subject& subject);
+    void add(const DeviceDetails& details);
 
     [[nodiscard]] std::size_t families() const { return m_families.size(); }
 
@@ -20,7 +20,7 @@ public:
     [[nodiscard]] std::string html() const;
 
 private:
-    using Pairs = std::array<DeviceSheet::Outputs, DeviceSheet::MODES>;
+    using Pairs = std::array<DeviceTable::Outputs, DeviceTable::MODES>;
 
     struct Family {
         std::string name;

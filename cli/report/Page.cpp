@@ -40,22 +40,22 @@ std::string orNone(const std::string& html) { return html.empty() ? "<p>There ar
 
 } // namespace
 
-void Page::add(const Subject& subject) {
+void Page::add(const DeviceDetails& details) {
     ++m_count;
-    m_data.add(subject);
-    m_overview.add(subject);
-    m_flashes.add(subject);
-    m_multiboot.add(subject);
-    const bool isNewFamily = m_count == 1 || m_family != subject.sheet.family;
-    m_family = subject.sheet.family;
+    m_data.add(details);
+    m_overview.add(details);
+    m_flashes.add(details);
+    m_multiboot.add(details);
+    const bool isNewFamily = m_count == 1 || m_family != details.family;
+    m_family = details.family;
     if (isNewFamily) {
         m_names += (m_count == 1 ? "" : "</p>\n") + familyHeading(m_family) + "<p>";
     } else {
         m_names += ", ";
     }
-    m_names += escaped(subject.sheet.name);
+    m_names += escaped(details.name);
     if (isSmall()) {
-        m_parts += (isNewFamily ? familyHeading(m_family) : "") + partOf(subject);
+        m_parts += (isNewFamily ? familyHeading(m_family) : "") + deviceHtml(details);
     } else {
         m_parts.clear();
     }

@@ -17,7 +17,7 @@ class Page {
 public:
     static constexpr std::size_t STATIC_DEVICES = 400;
 
-    void add(const Subject& subject);
+    void add(const DeviceDetails& details);
 
     [[nodiscard]] std::size_t devices() const { return m_count; }
     [[nodiscard]] std::size_t families() const { return m_overview.families(); }
@@ -31,7 +31,7 @@ private:
 
     std::size_t m_count = 0;
     std::string m_family; ///< of the latest device
-    Data m_data;
+    PageData m_data;
     Overview m_overview;
     FlashTable m_flashes;
     MultibootTable m_multiboot;

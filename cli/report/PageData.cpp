@@ -35,11 +35,11 @@ std::string jsonList(const std::vector<std::string>& texts, std::size_t count) {
 
 std::string jsonList(const std::vector<std::string>& texts) { return jsonList(texts, texts.size()); }
 
-std::string rowsJson(const std::vector<DeviceSheet::Row>& rows, bool withBsdl) {
+std::string rowsJson(const std::vector<DeviceTable::Row>& rows, bool withBsdl) {
     std::string list;
-    for (const DeviceSheet::Row& row : rows) {
+    for (const DeviceTable::Row& row : rows) {
         std::string fields = jsonString(row.key);
-        for (const DeviceSheet::Outputs outputs : row.outputs) {
+        for (const DeviceTable::Outputs outputs : row.outputs) {
             appendNumber(fields, outputs);
         }
         if (withBsdl) {
@@ -50,9 +50,9 @@ std::string rowsJson(const std::vector<DeviceSheet::Row>& rows, bool withBsdl) {
     return '[' + list + ']';
 }
 
-std::string tablesJson(const DeviceSheet& sheet) {
-    return fmt::format(R"({{"modes":{},"operations":{},"options":{}}})", jsonList(sheet.modes),
-                       rowsJson(sheet.operations, true), rowsJson(sheet.options, false));
+std::string tablesJson(const DeviceDetails& details) {
+    return fmt::format(R"({{"modes":{},"operations":{},"options":{}}})", jsonList(details.modes),
+                       rowsJson(details.operations->rows, true), rowsJson(details.options->rows, false));
 }
 
 std::string nameOf(const std::string& type, const std::string& width, const std::string& position) {
@@ -121,7 +121,7 @@ std::size_t Dictionary::add(std::string_view key, std::string_view json) {
     return m_positions.emplace(key, m_positions.size()).first->second;
 }
 
-Data::Chunk& Data::chunk(const std::string& family) {
+PageData::Chunk& PageData::chunk(const std::string& family) {
     const auto [known, isNew] = m_familyPositions.try_emplace(family, m_chunks.size());
     if (isNew) {
         m_chunks.emplace_back();
@@ -131,31 +131,35 @@ Data::Chunk& Data::chunk(const std::string& family) {
     return m_chunks[known->second];
 }
 
-void Data::add(const Subject& subject) {
-    const DeviceSheet& sheet = subject.sheet;
-    Chunk& own = chunk(sheet.family);
-    appendItem(m_names, jsonString(sheet.name));
-    appendNumber(m_tableOf, m_tables.ofJson(tablesJson(sheet)));
-    appendItem(m_idcodes, jsonString(sheet.idcode ? sheet.idcode->value : ""));
-    if (!subject.fault.empty()) {
-        appendItem(m_faults, fmt::format("\"{}\":{}", m_count, jsonString(subject.fault)));
+void PageData::add(const DeviceDetails& details) {
+    Chunk& own = chunk(details.family);
+    appendItem(m_names, jsonString(details.name));
+    const auto [table, isNew] =
+        m_tablePositions.try_emplace({details.operations, details.options, details.modes});
+    if (isNew) {
+        table->second = m_tables.ofJson(tablesJson(details));
     }
-    for (const DeviceSheet::Arrangement& one : sheet.multiboot) {
+    appendNumber(m_tableOf, table->second);
+    appendItem(m_idcodes, jsonString(details.idcode ? details.idcode->value : ""));
+    if (const std::string reason = details.whyIncomplete(); !reason.empty()) {
+        appendItem(m_faults, fmt::format("\"{}\":{}", m_count, jsonString(reason)));
+    }
+    for (const DeviceDetails::Arrangement& one : details.multiboot) {
         appendNumber(m_multiboot[nameOf(one.type, one.width, one.position)], m_count);
     }
     Encoder encoder(own);
     std::string idcodeOrigin;
-    if (sheet.idcode) {
-        encoder.append(idcodeOrigin, sheet.idcode->origin);
+    if (details.idcode) {
+        encoder.append(idcodeOrigin, details.idcode->origin);
     }
-    std::string fields = sheet.idcode ? '[' + idcodeOrigin + ']' : "0";
-    appendItem(fields, encoder.properties(sheet.properties));
-    appendItem(fields, encoder.properties(sheet.flashProperties));
+    std::string fields = details.idcode ? '[' + idcodeOrigin + ']' : "0";
+    appendItem(fields, encoder.properties(details.properties));
+    appendItem(fields, encoder.properties(details.flashProperties));
     appendItem(own.devices, '[' + fields + ']');
     ++m_count;
 }
 
-std::string Data::index() const {
+std::string PageData::index() const {
     std::string arrangements;
     multiboot::forEachArrangement([&](const std::string& type, const std::string& width, bool lead) {
         const std::string arrangement = nameOf(type, width, lead ? "lead" : "chain");
@@ -166,13 +170,13 @@ std::string Data::index() const {
     return fmt::format(R"({{"modes":{},"outputs":{},"letters":{},"families":{},"tables":{},)"
                        R"("names":[{}],"family":[{}],"table":[{}],"idcode":[{}],"faults":{{{}}},)"
                        R"("multiboot":[{}]}})",
-                       jsonList(vocabulary::modes(), DeviceSheet::MODES),
-                       jsonList(vocabulary::outputs(), DeviceSheet::OUTPUTS), jsonString(outputLetters()),
+                       jsonList(vocabulary::modes(), DeviceTable::MODES),
+                       jsonList(vocabulary::outputs(), DeviceTable::OUTPUTS), jsonString(outputLetters()),
                        jsonList(m_familyNames), m_tables.list(), m_names, m_families, m_tableOf, m_idcodes,
                        m_faults, arrangements);
 }
 
-void Data::appendTo(std::string& html) const {
+void PageData::appendTo(std::string& html) const {
     html += R"(<script type="application/json" id="index">)" + index() + "</script>\n";
     for (std::size_t family = 0; family < m_chunks.size(); ++family) {
         const Chunk& chunk = m_chunks[family];

@@ -1,11 +1,12 @@
 #pragma once
 
-#include "report/Survey.h"
+#include "query/DeviceDetails.h"
 
 #include <functional>
 #include <map>
 #include <string>
 #include <string_view>
+#include <tuple>
 #include <unordered_map>
 #include <vector>
 
@@ -56,9 +57,9 @@ private:
 ///
 /// ORIGIN is three numbers: file, line, column. PROPERTIES is 0, or [ROWs of its own..., set]: the set names the
 /// rows that it shares with others. ROW is [word of the key, word of where from, ORIGIN..., values...].
-class Data {
+class PageData {
 public:
-    void add(const Subject& subject);
+    void add(const DeviceDetails& details);
 
     /// The script elements.
     void appendTo(std::string& html) const;
@@ -77,6 +78,7 @@ private:
 
     std::size_t m_count = 0;
     Dictionary m_tables;
+    std::map<std::tuple<SharedTable, SharedTable, std::vector<std::string>>, std::size_t> m_tablePositions;
     std::string m_names;
     std::string m_families;
     std::string m_tableOf;

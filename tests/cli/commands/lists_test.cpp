@@ -88,7 +88,7 @@ TEST(Families, DevicesAreCountedAndModesNamed) {
 TEST(Families, SameInJson) {
     const SmallDatabase database;
     EXPECT_EQ(database.json({"families"})["families"][0],
-              json::parse(R"({"name": "finch", "devices": 2, "modes": ["BS", "SS", "SPI", "PFF"]})"));
+              json::parse(R"({"name": "finch", "devices": 2, "modes": ["BS", "SS", "SPI"]})"));
 }
 
 TEST(Vocabulary, ModesComeWithTheirOtherTexts) {

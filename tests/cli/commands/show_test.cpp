@@ -21,7 +21,7 @@ TEST(Show, WholeSheetOfADevice) {
                               "IDCODE  0x0010  " +
                                   database.path("base.acd") +
                                   ":7:10\n"
-                                  "Modes   BS SS SPI PFF\n"
+                                  "Modes   BS SS SPI\n"
                                   "\n"
                                   "Properties\n"
                                   "  PROPERTY    VALUE          FROM    WHERE\n"
@@ -67,7 +67,7 @@ TEST(Show, WholeSheetInJson) {
     EXPECT_EQ(answer["family"], "finch");
     EXPECT_EQ(answer["idcode"],
               json({{"value", "0x0010"}, {"file", database.path("base.acd")}, {"line", 7}, {"column", 10}}));
-    EXPECT_EQ(answer["modes"], json::parse(R"(["BS", "SS", "SPI", "PFF"])"));
+    EXPECT_EQ(answer["modes"], json::parse(R"(["BS", "SS", "SPI"])"));
     EXPECT_EQ(answer["properties"].size(), 5U);
     EXPECT_EQ(answer["properties"][1], json({{"key", "OP_PROGRAM"},
                                              {"values", {"ERASE", "VERIFY"}},
@@ -108,7 +108,7 @@ TEST(Show, PackageDoesNotChangeTheIdcode) {
 TEST(Show, FlashHasFlashProperties) {
     const SmallDatabase database;
     const ProcessResult outcome = database.run({"show", "FLB"});
-    EXPECT_THAT(outcome.output, StartsWith("Device  FLB\nFamily  spi (a flash)\nModes   SPI PFF\n"));
+    EXPECT_THAT(outcome.output, StartsWith("Device  FLB\nFamily  spi (a flash)\nModes   SPI\n"));
     EXPECT_THAT(outcome.output,
                 HasSubstr("\nFlash properties\n  PROPERTY  VALUE  FROM  WHERE\n  BUS       SPI    ST1 "));
     EXPECT_THAT(outcome.output, Not(HasSubstr("IDCODE")));

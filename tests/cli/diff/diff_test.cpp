@@ -209,8 +209,7 @@ TEST(Diff, TellsPropertiesOfAFamilyOfFlashesThatIsNoClass) {
     before["spi.acd"] += "DEVICE_FAMILY += ,NV1\nNV1_DEVICES = MRS1M\nNV1_PROPERTY = VENDOR,Marso\n";
     Files after = before;
     replace(after.at("spi.acd"), "Marso", "Merso");
-    EXPECT_EQ(diff(before, after).output,
-              "for all devices\n  flash family NV1: property VENDOR: -Marso +Merso\n");
+    EXPECT_EQ(diff(before, after).output, "NV1 (spi)\n  flash property VENDOR: -Marso +Merso\n");
 }
 
 TEST(Diff, TellsWhatUnknownDevicesAreOffered) {
@@ -254,10 +253,10 @@ TEST(Diff, WritesReleaseNotesInMarkdown) {
                               "### kestrel\n\n"
                               "All 3 devices:\n\n"
                               "- boundary-scan operations through SVF: gained `BYPASS`\n\n"
-                              "`KS100`:\n\n"
-                              "- IDCODE: `0xX4108FB7` becomes `0xX4148FB7`\n\n"
                               "`KS50`:\n\n"
-                              "- options in BS through USB2: lost `VERIFY`; gained `ERASE`\n");
+                              "- options in BS through USB2: lost `VERIFY`; gained `ERASE`\n\n"
+                              "`KS100`:\n\n"
+                              "- IDCODE: `0xX4108FB7` becomes `0xX4148FB7`\n");
     EXPECT_EQ(diff(database(), database(), {"--format", "markdown"}).output, "");
 }
 
@@ -278,10 +277,96 @@ TEST(Diff, TellsTheSameInJson) {
     EXPECT_EQ(answer.at("lost"), nlohmann::json::array());
     const nlohmann::json& group = answer.at("groups").at(0);
     EXPECT_EQ(group.at("family"), "kestrel");
-    EXPECT_EQ(group.at("devices"), nlohmann::json({"KS100", "KS150", "KS50"}));
+    EXPECT_EQ(group.at("devices"), nlohmann::json({"KS50", "KS100", "KS150"}));
     EXPECT_EQ(group.at("whole"), true);
     EXPECT_EQ(group.at("changes").at(0).at("lost"), nlohmann::json({"BYPASS"}));
 }
+
+namespace {
+
+/// The database with further lines in one file.
+Files with(const std::string& file, const std::string& lines) {
+    Files files = database();
+    files.at(file) += lines;
+    return files;
+}
+
+} // namespace
+
+TEST(Diff, ListsModesThatAreCheckedOnlyIfAnOutputIsGiven) {
+    EXPECT_EQ(diff(with("base.acd", "PFF = outputs,SVF:families,kestrel\n"),
+                   with("base.acd", "PFF = outputs,SVF:families,osprey\n"))
+                  .output,
+              "kestrel (all 3 devices)\n  modes: -PFF\nOS150 (osprey)\n  modes: +PFF\n");
+    EXPECT_EQ(diff(with("base.acd", "SPI = outputs,USB2:families,spi\n"),
+                   with("base.acd", "SPI = outputs,USB2:families\n"))
+                  .output,
+              "for all devices\n  modes of every device: -SPI\n");
+}
+
+TEST(Diff, ListsModesThatHaveNoOutput) {
+    EXPECT_EQ(diff(database(), with("base.acd", "SS = outputs:families,kestrel\n")).output,
+              "kestrel (all 3 devices)\n  modes (if no output is given): +SS\n");
+}
+
+TEST(Diff, ListsPartsExcludedFromModesThatAreCheckedOnlyIfAnOutputIsGiven) {
+    const Files before =
+        with("base.acd", "PFF = outputs,SVF:families,kestrel\nSPI = outputs,USB2:families,spi\n");
+    Files after = before;
+    replace(after.at("base.acd"), "BS_KS50_TQ144", "BS_KS50_TQ144,PFF_KS100_CB48,SPI_spi_SO8");
+    EXPECT_EQ(diff(before, after).output, "for all devices\n  package SO8: modes of every device: -SPI\n"
+                                          "KS100 (kestrel)\n  package CB48: modes: -PFF\n");
+}
+
+TEST(Diff, ListsOptionsOfAPackageThatBeginsWithADigit) {
+    Files before = changed("base.acd", "DEVICE_SUPPORTED = ", "DEVICE_SUPPORTED = KS50,");
+    Files after = before;
+    replace(after.at("base.acd"), "PROGRAM_OPTION_PACKAGE = ", "PROGRAM_OPTION_PACKAGE = KS5048,");
+    EXPECT_EQ(diff(before, after).output,
+              "KS50 (kestrel)\n  package 48: options in BS through USB2: -VERIFY\n");
+}
+
+TEST(Diff, ListsARecordOfSpiModeOnce) {
+    EXPECT_EQ(diff(database(), with("spi.acd", "OPERATION = ERASE,SPI,USB2\n")).output,
+              "for all devices\n  operations in SPI through USB2: +ERASE\n");
+}
+
+TEST(Diff, ListsAChangeOfSeveralFamiliesOnce) {
+    Files after = database();
+    for (const char* const file : {"kestrel.acd", "osprey.acd"}) {
+        after.at(file) = "PROPERTIES = KIND,1,FPGA\n" + after.at(file);
+    }
+    EXPECT_EQ(diff(database(), after).output,
+              "2 families\n    kestrel, OS150 (osprey)\n  property KIND: +FPGA\n");
+    EXPECT_EQ(diff(database(), after, {"--format", "markdown"}).output,
+              "### 2 families\n\n`kestrel`, `OS150 (osprey)`:\n\n- property KIND: gained `FPGA`\n");
+}
+
+TEST(Diff, ListsWhatOnlyTheNameOfAFamilyShows) {
+    // All devices of the family have tables of their own.
+    Files before = changed("base.acd", "DEVICE_SUPPORTED = ", "DEVICE_SUPPORTED = OS150,");
+    before.at("osprey.acd") = "OPERATION = ERASE,Bscan,USB2\n[OS150]\nOPERATION = VERIFY,Bscan,USB2\n";
+    Files after = before;
+    replace(after.at("osprey.acd"), "ERASE", "BYPASS");
+    EXPECT_EQ(diff(before, after).output, "osprey\n  operations in BS through USB2: -ERASE +BYPASS\n");
+}
+
+TEST(Diff, ComparesWhatCanBeComparedAndCountsTheRest) {
+    // The second record can't be read, in either database.
+    const Files before = changed("kestrel.acd", "PROGRAM_OPTION = VERIFY,Bscan,USB2\nPROPERTY",
+                                 "PROGRAM_OPTION = VERIFY,Bscan,USB2:NONSENSE,Bscan,USB2\nPROPERTY");
+    Files after = before;
+    replace(after.at("base.acd"), "KS100,0xX4108FB7", "KS100,0xX4148FB7");
+    const ProcessResult outcome = diff(before, after);
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_EQ(outcome.output, "KS100 (kestrel)\n  IDCODE: -0xX4108FB7 +0xX4148FB7\n");
+    EXPECT_THAT(outcome.error, HasSubstr("are missing in both databases, the first \"KS"));
+    const nlohmann::json answer = nlohmann::json::parse(diff(before, before, {"--json"}).output);
+    EXPECT_EQ(answer.at("same"), true);
+    EXPECT_THAT(answer.at("unanswered").get<std::vector<std::string>>(), testing::Contains("KS100"));
+}
+
+TEST(Diff, RefusesAnUnknownFormat) { EXPECT_EQ(diff(database(), database(), {"--format", "pdf"}).status, 2); }
 
 TEST(Diff, EndsWithTwoWhenADatabaseCantBeRead) {
     const DatabaseDirectory readable(database());
