@@ -1,6 +1,7 @@
 // Puts the same calls to the manager and to the reference, and compares what comes of them.
 #include "CallRunner.h"
 
+#include "HeldResults.h"
 #include "Reference.h"
 #include "support/TarvikTestPeer.h"
 
@@ -25,6 +26,7 @@ struct Terms;
 template <>
 struct Terms<ConstraintsManager> {
     using Recorder = TarvikSmokeMgr;
+    using Held = HeldResults;
     static StringBase text(const std::string& text) { return {text.data(), text.size()}; }
     static std::string recorded(const TarvikSmokeMgr& recorder) { return show(recorder.text()); }
     static bool isTheOne(const ConstraintsManager& manager) {
@@ -35,6 +37,7 @@ struct Terms<ConstraintsManager> {
 template <>
 struct Terms<Reference> {
     using Recorder = std::string;
+    using Held = NothingHeld;
     static std::string text(const std::string& text) { return text; }
     static std::string recorded(const std::string& recorder) { return show(recorder); }
     static bool isTheOne(const Reference&) { return true; }
@@ -43,9 +46,14 @@ struct Terms<Reference> {
 /// The arguments of a call, as what the methods take.
 class Arguments {
 public:
-    explicit Arguments(const Call& call) : m_arguments(call.arguments) {}
+    /// @param held takes the place of an argument where it is not null
+    Arguments(const Call& call, const std::vector<const char*>& held)
+        : m_arguments(call.arguments), m_held(held) {}
 
     [[nodiscard]] const char* text(std::size_t number) const {
+        if (number < m_held.size() && m_held[number] != nullptr) {
+            return m_held[number];
+        }
         const auto* text = std::get_if<std::string>(&m_arguments.at(number));
         return text == nullptr ? nullptr : text->c_str();
     }
@@ -65,6 +73,7 @@ public:
 
 private:
     const std::vector<Argument>& m_arguments;
+    const std::vector<const char*>& m_held;
 };
 
 /// What a dump writes into a recorder; with none, its messages tell.
@@ -76,8 +85,9 @@ std::string dumped(bool recorded, Dump dump) {
 }
 
 template <typename Target>
-std::string invoke(Target& target, const Call& call) {
-    const Arguments a(call);
+std::string invoke(Target& target, const Call& call, const std::vector<const char*>& heldArguments,
+                   typename Terms<Target>::Held& held) {
+    const Arguments a(call, heldArguments);
     switch (call.method) {
         using enum Method;
     case GET_CONSTRAINTS_MANAGER:
@@ -86,9 +96,9 @@ std::string invoke(Target& target, const Call& call) {
         target.setExceptions(a.flag(0));
         return "";
     case GET_OPERATION_ORDERS:
-        return show(target.getOperationOrders());
+        return show(held.hold(target.getOperationOrders()));
     case GET_PROGRAM_OPTION_ORDERS:
-        return show(target.getProgramOptionOrders());
+        return show(held.hold(target.getProgramOptionOrders()));
     case MODE_STRING_2_TYPE:
         return show(target.modeString2Type(a.text(0)));
     case MODE_TYPE_2_STRING:
@@ -131,11 +141,11 @@ std::string invoke(Target& target, const Call& call) {
     case GET_BSDL_OPERATIONS:
         return show(target.getBsdlOperations(a.text(0), a.output(1)));
     case GET_DEVICE_OPERATION_OPTIONS:
-        return show(target.getDeviceOperationOptions(a.text(0), a.text(1), a.mode(2)));
+        return show(held.hold(target.getDeviceOperationOptions(a.text(0), a.text(1), a.mode(2))));
     case GET_DEVICE_STRING_PROPERTIES:
-        return show(target.getDeviceStringProperties(a.text(0), a.text(1)));
+        return show(held.hold(target.getDeviceStringProperties(a.text(0), a.text(1))));
     case GET_DEVICE_STRING_PROPERTY:
-        return show(target.getDeviceStringProperty(a.text(0), a.text(1)));
+        return show(held.hold(target.getDeviceStringProperty(a.text(0), a.text(1))));
     case GET_DEVICE_BOOL_PROPERTY:
         return show(target.getDeviceBoolProperty(a.text(0), a.text(1)));
     case GET_DEVICE_LONG_PROPERTY:
@@ -148,11 +158,11 @@ std::string invoke(Target& target, const Call& call) {
     case IS_KORVEL_DEVICE:
         return show(target.isKorvelDevice(a.text(0)));
     case GET_ALL_DEVICE_IDCODES:
-        return show(target.getAllDeviceIdcodes());
+        return show(held.hold(target.getAllDeviceIdcodes()));
     case IS_SPI_DEVICE:
         return show(target.isSpiDevice(Terms<Target>::text(a.bytes(0))));
     case GET_SPI_DEVICE_STRING_PROPERTY:
-        return show(target.getSpiDeviceStringProperty(a.text(0), a.text(1)));
+        return show(held.hold(target.getSpiDeviceStringProperty(a.text(0), a.text(1))));
     case GET_SPI_DEVICE_BOOL_PROPERTY:
         return show(target.getSpiDeviceBoolProperty(a.text(0), a.text(1)));
     case GET_SPI_DEVICE_LONG_PROPERTY:
@@ -172,6 +182,18 @@ std::string invoke(Target& target, const Call& call) {
         return "";
     }
     return "no such method";
+}
+
+Outcome outcomeOf(ConstraintsManager& manager, ManagerMessages& messages, const Call& call,
+                  const std::vector<const char*>& heldArguments, HeldResults& held) {
+    Outcome outcome;
+    try {
+        outcome.result = invoke(manager, call, heldArguments, held);
+    } catch (const TarvikException& exception) {
+        outcome.result = showRaised(exception);
+    }
+    outcome.messages = messages.take();
+    return outcome;
 }
 
 /// Both, alive over the same databases.
@@ -198,8 +220,19 @@ public:
     [[nodiscard]] std::string callDifference(const Call& call) {
         std::ostringstream name;
         name << call;
-        return compare(name.str(), ask(m_reference, call), ask(*m_manager, m_messages, call));
+        Call plain = call;
+        std::vector<const char*> held(call.arguments.size(), nullptr);
+        for (std::size_t number = 0; number < held.size(); ++number) {
+            if (const auto* wanted = std::get_if<HeldText>(&call.arguments[number])) {
+                held[number] = m_held.text(wanted->number);
+                plain.arguments[number] = std::string(held[number]);
+            }
+        }
+        return compare(name.str(), ask(m_reference, plain), askHolding(plain, held));
     }
+
+    /// All that the manager returned is still what it was.
+    [[nodiscard]] std::string heldDifference() const { return m_held.difference(); }
 
     [[nodiscard]] std::string memberDifference() {
         const std::vector<Member> expected = members(m_reference);
@@ -225,30 +258,30 @@ public:
     }
 
 private:
+    [[nodiscard]] Outcome askHolding(const Call& call, const std::vector<const char*>& heldArguments) {
+        return outcomeOf(*m_manager, m_messages, call, heldArguments, m_held);
+    }
+
     [[nodiscard]] bool isBaseMissing() const { return !m_reference.databases().has("base.acd"); }
 
     Reference m_reference;
     ManagerMessages m_messages;
+    HeldResults m_held;
     ConstraintsManager* m_manager = nullptr;
 };
 
 } // namespace
 
 Outcome ask(ConstraintsManager& manager, ManagerMessages& messages, const Call& call) {
-    Outcome outcome;
-    try {
-        outcome.result = invoke(manager, call);
-    } catch (const TarvikException& exception) {
-        outcome.result = showRaised(exception);
-    }
-    outcome.messages = messages.take();
-    return outcome;
+    HeldResults held;
+    return outcomeOf(manager, messages, call, {}, held);
 }
 
 Outcome ask(Reference& reference, const Call& call) {
     Outcome outcome;
     try {
-        outcome.result = invoke(reference, call);
+        NothingHeld held;
+        outcome.result = invoke(reference, call, {}, held);
     } catch (const Raised& raised) {
         outcome.result = showRaised(raised.type, raised.line);
     }
@@ -269,7 +302,7 @@ std::string difference(const Scenario& scenario, Ending ending) {
         }
     }
     if (found.empty()) {
-        found = pair.memberDifference() + pair.databaseMessageDifference();
+        found = pair.heldDifference() + pair.memberDifference() + pair.databaseMessageDifference();
     }
     return found;
 }
