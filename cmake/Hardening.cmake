@@ -1,8 +1,9 @@
-# What an attacker who got hold of a fault would meet, in all code that is optimised, as what ships is: no address that
-# is the same twice, nothing to overwrite in the tables that the loader fills, checked stacks and library calls. (The
+# Hardening flags for optimised builds: position-independent programs, RELRO, stack protector, _FORTIFY_SOURCE. (The
 # sanitizers replace these checks by stricter ones of their own.)
-include(CheckPIESupported)
-check_pie_supported(LANGUAGES CXX)
+if(PROJECT_IS_TOP_LEVEL)
+  include(CheckPIESupported)
+  check_pie_supported(LANGUAGES CXX)
+endif()
 
 if(NOT CMAKE_CXX_FLAGS MATCHES "-fsanitize")
   set(optimised $<CONFIG:Release,RelWithDebInfo,MinSizeRel>)

@@ -1,4 +1,4 @@
-# The warnings that all of our own code is compiled with.
+# The warnings with which all code of this project is compiled.
 add_library(tarvik_warnings INTERFACE)
 target_compile_options(tarvik_warnings INTERFACE
   -Wall -Wextra -Wpedantic -Wshadow -Wconversion -Wsign-conversion -Wold-style-cast -Wnon-virtual-dtor

@@ -2,12 +2,10 @@
 // must get one answer, in a form that can be read, and no fault may end the run.
 #include "Input.h"
 
-#include "commands/Commands.h"
+#include "batch/Batch.h"
 #include "query/Tool.h"
 #include "support/TarvikTestPeer.h"
 #include "text/Json.h"
-
-#include <CLI/CLI.hpp>
 
 #include <sys/mman.h>
 #include <unistd.h>
@@ -83,9 +81,8 @@ void expectAnswer(const std::string& line) {
 
 void run() {
     TarvikTestPeer::reset();
-    CLI::App parser;
     Tool tool({{TARVIK_SOURCE_DIRECTORY "/database"}, false, false});
-    static_cast<void>(declareBatch(parser)(tool));
+    static_cast<void>(batch::run(tool, {}));
 }
 
 } // namespace

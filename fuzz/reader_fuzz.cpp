@@ -100,7 +100,7 @@ using Lines = std::map<std::string, AcdLines, std::less<>>;
 void expectOriginsHold(const Lines& lines, const std::string& name, const std::string& key) {
     const std::optional<AcdStore::Value> value = AcdStore::value(name.c_str(), key.c_str());
     for (std::size_t offset = 0; value && offset < value->text.size(); ++offset) {
-        const AcdStore::Fragment place = value->at(offset);
+        const AcdStore::SourceSpan place = value->at(offset);
         const std::string_view line = lines.find(place.file)->second.source(place.line);
         if (place.column == 0 || place.column > line.size() ||
             line[place.column - 1] != value->text[offset]) {
@@ -132,7 +132,7 @@ void expectSameFaults(const Files& files, const Lines& lines) {
     for (const auto& [file, text] : files) {
         const std::vector<AcdLines::Line>& all = lines.find(file)->second.lines();
         const auto faults = std::count_if(all.begin(), all.end(), [](const AcdLines::Line& line) {
-            return line.kind == AcdLines::Kind::FAULT;
+            return line.kind == AcdLines::Kind::INVALID;
         });
         fuzz::expectSame("the faults of " + file, std::to_string(reference::parse(text).faults),
                          std::to_string(faults));

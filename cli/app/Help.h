@@ -1,20 +1,10 @@
 #pragma once
 
-#include <CLI/CLI.hpp>
+#include "app/CommandLine.h"
 
-#include <cstddef>
-#include <string>
+/// The help of the tool, or of a command, with lines that fit standard output as far as their words allow it.
+/// @param command null for the tool
+[[nodiscard]] std::string helpText(const CommandLine& line, const DeclaredCommand* command);
 
-/// Lays out the help: descriptions are broken so that lines fit a width.
-class HelpFormatter : public CLI::Formatter {
-public:
-    explicit HelpFormatter(std::size_t width);
-
-    std::string make_option_desc(const CLI::Option* option) const override;
-    std::string make_subcommand(const CLI::App* command) const override;
-
-private:
-    [[nodiscard]] std::string broken(const std::string& description, std::size_t column) const;
-
-    std::size_t m_width;
-};
+/// How a command is called: "check [OPTIONS] --mode MODE [DEVICE]".
+[[nodiscard]] std::string usageOf(const DeclaredCommand& command);

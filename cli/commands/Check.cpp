@@ -1,14 +1,13 @@
 // `check`: may it be done? Answered by exactly the one check of the manager that takes what was given.
 #include "commands/Commands.h"
 
+#include "commands/CommonArguments.h"
 #include "model/Catalogue.h"
 #include "model/Vocabulary.h"
 #include "query/Tool.h"
 #include "term/Verdict.h"
 
 #include <tarvik/ConstraintsManager.h>
-
-#include <CLI/CLI.hpp>
 
 #include <fmt/format.h>
 
@@ -126,14 +125,26 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     return status;
 }
 
-} // namespace
-
-Action declareCheck(CLI::App& parser) {
+Action declare(ArgumentList& list) {
     auto arguments = std::make_shared<Arguments>();
-    parser.add_option("DEVICE", arguments->device, "The device, or a family")->type_name("");
-    parser.add_option("-m,--mode", arguments->mode, "The configuration mode")->type_name("MODE")->required();
-    parser.add_option("-o,--output", arguments->output, "The cable or output file type")->type_name("OUTPUT");
-    parser.add_option("-p,--package", arguments->package, "The package")->type_name("PACKAGE");
-    parser.add_option("--operation", arguments->operation, "The operation")->type_name("OPERATION");
+    list = {
+        argument::device(&arguments->device, false),
+        argument::mode(&arguments->mode),
+        argument::output(&arguments->output, false),
+        argument::package(&arguments->package),
+        argument::operation(&arguments->operation, "The operation"),
+    };
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }
+
+} // namespace
+
+const Command command::CHECK{
+    "check",
+    "Check whether something is allowed",
+    "",
+    "tarvik check --mode BS --output USB2\n"
+    "tarvik check KS50 --mode SS --package TQ144\n"
+    "tarvik check KS50 --mode BS --output USB2 --operation VERIFY",
+    declare,
+};

@@ -1,14 +1,10 @@
 #pragma once
 
+#include "commands/ArgumentList.h"
 #include "term/ExitCode.h"
 
 #include <functional>
-#include <string_view>
-#include <vector>
 
-namespace CLI {
-class App;
-}
 class Tool;
 
 /// What a command does once its arguments are read.
@@ -17,12 +13,10 @@ using Action = std::function<ExitCode(Tool&)>;
 /// One command of the tool.
 struct Command {
     const char* name;
-    const char* summary;
-    const char* examples; ///< shown under --help, one a line
+    const char* summary;  ///< one line without a full stop
+    const char* details;  ///< sentences below the summary; may be empty
+    const char* examples; ///< one a line
 
-    /// Declares the command's arguments. The action keeps them.
-    Action (*declare)(CLI::App& parser);
+    /// Appends the command's arguments. The action keeps what they are stored in.
+    Action (*declare)(ArgumentList& arguments);
 };
-
-/// All commands, in the order in which the help lists them.
-[[nodiscard]] const std::vector<Command>& commands();

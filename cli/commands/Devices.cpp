@@ -9,8 +9,6 @@
 
 #include <tarvik/ConstraintsManager.h>
 
-#include <CLI/CLI.hpp>
-
 #include <fmt/format.h>
 
 #include <fnmatch.h>
@@ -23,6 +21,7 @@ namespace {
 struct Arguments {
     std::string family;
     std::string glob;
+    bool namesOnly = false;
 };
 
 struct Device {
@@ -31,11 +30,21 @@ struct Device {
     std::optional<IdcodeFinder::Idcode> idcode;
 };
 
-using Devices = std::vector<Device>;
+struct Devices {
+    std::vector<Device> all;
+    bool namesOnly; ///< in text
+};
 
 std::string asText(const Devices& devices, const Terminal& terminal) {
+    if (devices.namesOnly) {
+        std::string names;
+        for (const Device& device : devices.all) {
+            names += terminal.sanitised(device.name) + '\n';
+        }
+        return names;
+    }
     Table table({"DEVICE", "FAMILY", "IDCODE"});
-    for (const Device& device : devices) {
+    for (const Device& device : devices.all) {
         table.add({device.name, device.family, device.idcode ? device.idcode->value : "-"});
     }
     return table.text(terminal);
@@ -43,7 +52,7 @@ std::string asText(const Devices& devices, const Terminal& terminal) {
 
 Json asJson(const Devices& devices) {
     Json list = Json::array();
-    for (const Device& device : devices) {
+    for (const Device& device : devices.all) {
         list.push_back({{"name", device.name},
                         {"family", device.family},
                         {"idcode", device.idcode ? Json(device.idcode->value) : Json()}});
@@ -81,13 +90,14 @@ std::vector<std::string> deviceNames(const std::string& wantedFamily) {
 ExitCode run(Tool& tool, const Arguments& arguments) {
     ConstraintsManager& manager = tool.manager();
     const IdcodeFinder idcodes(manager);
-    Devices devices;
+    Devices devices{{}, arguments.namesOnly};
     for (const std::string& name : deviceNames(arguments.family)) {
         if (matches(arguments.glob, name)) {
-            devices.push_back({name, plain(manager.getPartFamily(name.c_str())), idcodes.find(name)});
+            devices.all.push_back(
+                {name, toStdString(manager.getPartFamily(name.c_str())), idcodes.find(name)});
         }
     }
-    if (devices.empty()) {
+    if (devices.all.empty()) {
         throw CommandError(ExitCode::NO, arguments.glob.empty()
                                              ? "there is no such device"
                                              : fmt::format("no device matches \"{}\"{}", arguments.glob,
@@ -96,12 +106,32 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     return tool.answer(devices);
 }
 
-} // namespace
-
-Action declareDevices(CLI::App& parser) {
+Action declare(ArgumentList& list) {
     auto arguments = std::make_shared<Arguments>();
-    parser.add_option("--family", arguments->family, "Only the devices of this family")->type_name("FAMILY");
-    parser.add_option("GLOB", arguments->glob, "Only the names that match, in any case: * and ? and [...]")
-        ->type_name("");
+    list = {
+        {.name = "--family",
+         .value = "FAMILY",
+         .description = "List only the devices of this family",
+         .kind = ValueKind::FAMILY,
+         .target = &arguments->family},
+        {.name = "--names",
+         .description = "Show only the names, one a line",
+         .target = &arguments->namesOnly},
+        {.name = "GLOB",
+         .description = "List only the devices whose name matches, in any case; *, ? and [...] are wildcards",
+         .kind = ValueKind::DEVICE,
+         .target = &arguments->glob},
+    };
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }
+
+} // namespace
+
+const Command command::DEVICES{
+    "devices",
+    "List devices with family and IDCODE",
+    "",
+    "tarvik devices --family kestrel\n"
+    "tarvik devices 'ks*'",
+    declare,
+};

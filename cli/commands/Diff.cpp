@@ -4,8 +4,6 @@
 #include "diff/Presentation.h"
 #include "query/Tool.h"
 
-#include <CLI/CLI.hpp>
-
 #include <memory>
 #include <sstream>
 
@@ -51,20 +49,37 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
                                           : tool.answer(comparison, status);
 }
 
-} // namespace
-
-Action declareDiff(CLI::App& parser) {
+Action declare(ArgumentList& list) {
     auto arguments = std::make_shared<Arguments>();
-    parser
-        .add_option("OLD", arguments->oldDatabase,
-                    "A database: its directory, or its layers with \":\" between")
-        ->required()
-        ->type_name("");
-    parser.add_option("NEW", arguments->newDatabase, "The database to hold against it")
-        ->required()
-        ->type_name("");
-    parser.add_option("--format", arguments->format, "How to tell it: text, or markdown for release notes")
-        ->check(CLI::IsMember({"text", "markdown"}))
-        ->type_name("FORMAT");
+    list = {
+        {.name = "OLD",
+         .description = "The old database: its directory, or its layers separated by \":\"",
+         .kind = ValueKind::PATH,
+         .required = true,
+         .target = &arguments->oldDatabase},
+        {.name = "NEW",
+         .description = "The new database",
+         .kind = ValueKind::PATH,
+         .required = true,
+         .target = &arguments->newDatabase},
+        {.name = "--format",
+         .value = "FORMAT",
+         .description = "The form of the result; markdown is for release notes",
+         .kind = ValueKind::CHOICE,
+         .choices = {"text", "markdown"},
+         .target = &arguments->format},
+    };
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }
+
+} // namespace
+
+const Command command::DIFF{
+    "diff",
+    "Compare the answers of two databases",
+    "Lists the answers that differ. The layers of a database are separated by \":\".",
+    "tarvik diff database changed\n"
+    "tarvik diff company site:company --json\n"
+    "tarvik diff released database --format markdown",
+    declare,
+};

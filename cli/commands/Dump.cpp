@@ -3,16 +3,11 @@
 
 #include "model/Catalogue.h"
 #include "query/Tool.h"
-#include "term/Table.h"
-#include "text/Suggest.h"
 
 #include <TarvikSmokeMgr.h>
 #include <tarvik/ConstraintsManager.h>
 
-#include <CLI/CLI.hpp>
-
-#include <fmt/format.h>
-
+#include <map>
 #include <memory>
 
 namespace {
@@ -59,13 +54,6 @@ void load(ConstraintsManager& manager, const std::string& device) {
 }
 
 ExitCode run(Tool& tool, const Arguments& arguments) {
-    const auto recorded = RECORDED.find(arguments.table);
-    if (recorded == RECORDED.end() && arguments.table != MULTIBOOT) {
-        const std::vector<std::string> names = tableNames();
-        throw CommandError(ExitCode::FAULT,
-                           fmt::format("unknown table \"{}\"{}\ntables:\n{}", arguments.table,
-                                       didYouMean(arguments.table, names), wrapped(names, 2)));
-    }
     ConstraintsManager& manager = tool.manager();
     for (const std::string& device : arguments.devices) {
         load(manager, device);
@@ -73,25 +61,39 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
             throw catalogue::unknownDevice(device);
         }
     }
-    if (recorded == RECORDED.end()) {
+    if (arguments.table == MULTIBOOT) {
         manager.dumpMbBpiSpi();
         return tool.answer(Dump{MULTIBOOT, tool.messages().takeStatus()});
     }
     TarvikSmokeMgr recorder;
-    (manager.*recorded->second)(&recorder);
-    return tool.answer(Dump{arguments.table, plain(recorder.text())});
+    (manager.*RECORDED.at(arguments.table))(&recorder);
+    return tool.answer(Dump{arguments.table, toStdString(recorder.text())});
+}
+
+Action declare(ArgumentList& list) {
+    auto arguments = std::make_shared<Arguments>();
+    list = {
+        {.name = "TABLE",
+         .description = "The table",
+         .kind = ValueKind::CHOICE,
+         .choices = tableNames(),
+         .required = true,
+         .target = &arguments->table},
+        {.name = "DEVICE",
+         .description = "Devices or families to load first",
+         .kind = ValueKind::DEVICE,
+         .target = &arguments->devices},
+    };
+    return [arguments](Tool& tool) { return run(tool, *arguments); };
 }
 
 } // namespace
 
-Action declareDump(CLI::App& parser) {
-    auto arguments = std::make_shared<Arguments>();
-    parser.add_option("TABLE", arguments->table, "operations, bsdl, options, families or multiboot")
-        ->type_name("")
-        ->required();
-    parser
-        .add_option("DEVICE", arguments->devices,
-                    "Devices or families to load first: the manager shows what it has loaded")
-        ->type_name("");
-    return [arguments](Tool& tool) { return run(tool, *arguments); };
-}
+const Command command::DUMP{
+    "dump",
+    "Write a table of the manager as smoke tests record it",
+    "The manager writes what it has loaded: name the devices or families to load first.",
+    "tarvik dump multiboot\n"
+    "tarvik dump operations KS50",
+    declare,
+};

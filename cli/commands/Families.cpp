@@ -6,8 +6,6 @@
 #include "query/Tool.h"
 #include "term/Table.h"
 
-#include <CLI/CLI.hpp>
-
 #include <fmt/ranges.h>
 
 namespace {
@@ -51,4 +49,10 @@ ExitCode run(Tool& tool) {
 
 } // namespace
 
-Action declareFamilies(CLI::App&) { return run; }
+const Command command::FAMILIES{
+    "families",
+    "List the part families and their modes",
+    "",
+    "tarvik families",
+    [](ArgumentList& /*none*/) -> Action { return run; },
+};

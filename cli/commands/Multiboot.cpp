@@ -10,8 +10,6 @@
 
 #include <tarvik/ConstraintsManager.h>
 
-#include <CLI/CLI.hpp>
-
 #include <fmt/format.h>
 
 #include <algorithm>
@@ -56,9 +54,9 @@ const std::string& readType(const std::string& text) {
 }
 
 ExitCode run(Tool& tool, const Arguments& arguments) {
-    if (!arguments.lead && !arguments.chain) {
+    if (arguments.lead == arguments.chain) {
         throw CommandError(ExitCode::FAULT,
-                           "multiboot takes --lead or --chain\nsee: tarvik multiboot --help");
+                           "multiboot takes either --lead or --chain\nsee: tarvik multiboot --help");
     }
     const std::string& type = readType(arguments.type);
     const std::string& width = readWord("width", multiboot::WIDTHS, arguments.width);
@@ -78,18 +76,38 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     return status;
 }
 
-} // namespace
-
-Action declareMultiboot(CLI::App& parser) {
+Action declare(ArgumentList& list) {
     auto arguments = std::make_shared<Arguments>();
-    parser.add_option("DEVICE", arguments->device, "The device")->type_name("")->required();
-    parser.add_option("--type", arguments->type, "BPI, MB_SPI, MB_BPI or MB_QPRM, with or without TYPE_")
-        ->type_name("TYPE")
-        ->required();
-    parser.add_option("--width", arguments->width, "SERIAL, PARALLEL or NONE")
-        ->type_name("WIDTH")
-        ->required();
-    CLI::Option* const lead = parser.add_flag("--lead", arguments->lead, "The device leads the chain");
-    parser.add_flag("--chain", arguments->chain, "The device stands further down the chain")->excludes(lead);
+    list = {
+        {.name = "DEVICE",
+         .description = "The device",
+         .kind = ValueKind::DEVICE,
+         .required = true,
+         .target = &arguments->device},
+        {.name = "--type",
+         .value = "TYPE",
+         .description = "The arrangement, with or without TYPE_",
+         .choices = multiboot::TYPES,
+         .required = true,
+         .target = &arguments->type},
+        {.name = "--width",
+         .value = "WIDTH",
+         .description = "The data width",
+         .choices = multiboot::WIDTHS,
+         .required = true,
+         .target = &arguments->width},
+        {.name = "--lead", .description = "The device is the first of the chain", .target = &arguments->lead},
+        {.name = "--chain",
+         .description = "The device is a later one of the chain",
+         .target = &arguments->chain},
+    };
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }
+
+} // namespace
+
+const Command command::MULTIBOOT{
+    "multiboot", "Check whether a device supports a multiboot arrangement",
+    "",          "tarvik multiboot OVD16 --type MB_SPI --width NONE --lead",
+    declare,
+};

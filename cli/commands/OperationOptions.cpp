@@ -1,13 +1,12 @@
-// `operation-options`: the options that an operation of a device carries in a mode.
+// `operation-options`: the options that an operation of a device has in a mode.
 #include "commands/Commands.h"
 
+#include "commands/CommonArguments.h"
 #include "model/Vocabulary.h"
 #include "query/ManagerQueries.h"
 #include "query/Tool.h"
 
 #include <tarvik/ConstraintsManager.h>
-
-#include <CLI/CLI.hpp>
 
 #include <fmt/format.h>
 
@@ -31,7 +30,7 @@ struct OperationOptions {
 std::string asText(const OperationOptions& answer, const Terminal& terminal) {
     std::string text;
     for (const std::string& option : answer.options) {
-        text += terminal.shown(option) + '\n';
+        text += terminal.sanitised(option) + '\n';
     }
     return text;
 }
@@ -51,23 +50,37 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     OperationOptions answer{arguments.device, operation, vocabulary::key(mode), {}};
     for (const StringBase& option :
          manager.getDeviceOperationOptions(arguments.device.c_str(), operation.c_str(), mode)) {
-        answer.options.push_back(plain(option));
+        answer.options.push_back(toStdString(option));
     }
     questions::requireKnown(manager, arguments.device);
-    const ExitCode status = tool.answer(answer);
+    const ExitCode status = tool.answer(answer, answer.options.empty() ? ExitCode::NO : ExitCode::YES);
     if (answer.options.empty()) {
-        tool.note(fmt::format("{} of \"{}\" carries no options in mode {}", operation, arguments.device,
-                              answer.mode));
+        tool.note(
+            fmt::format("{} of {} has no options in mode {}", operation, arguments.device, answer.mode));
     }
     return status;
 }
 
-} // namespace
-
-Action declareOperationOptions(CLI::App& parser) {
+Action declare(ArgumentList& list) {
     auto arguments = std::make_shared<Arguments>();
-    parser.add_option("DEVICE", arguments->device, "The device, or a family")->type_name("")->required();
-    parser.add_option("OPERATION", arguments->operation, "The operation")->type_name("")->required();
-    parser.add_option("-m,--mode", arguments->mode, "The configuration mode")->type_name("MODE")->required();
+    list = {
+        argument::device(&arguments->device),
+        {.name = "OPERATION",
+         .description = "The operation",
+         .kind = ValueKind::OPERATION,
+         .required = true,
+         .target = &arguments->operation},
+        argument::mode(&arguments->mode),
+    };
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }
+
+} // namespace
+
+const Command command::OPERATION_OPTIONS{
+    "operation-options",
+    "List the options of an operation",
+    "",
+    "tarvik operation-options KS50 PROGRAM --mode BS",
+    declare,
+};

@@ -1,13 +1,12 @@
 // `property`: the values of a property of a device.
 #include "commands/Commands.h"
 
+#include "commands/CommonArguments.h"
 #include "query/ManagerQueries.h"
 #include "query/Properties.h"
 #include "query/Tool.h"
 
 #include <tarvik/ConstraintsManager.h>
-
-#include <CLI/CLI.hpp>
 
 #include <memory>
 
@@ -29,7 +28,7 @@ std::vector<std::string> values(ConstraintsManager& manager, const char* device,
     std::vector<std::string> all;
     if (!flash) {
         for (const StringBase& one : manager.getDeviceStringProperties(device, key)) {
-            all.push_back(plain(one));
+            all.push_back(toStdString(one));
         }
     }
     return all.empty() ? std::vector<std::string>{value} : all;
@@ -46,11 +45,21 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
                                                             : deviceProperties(manager, device));
 }
 
-} // namespace
-
-Action declareProperty(CLI::App& parser) {
+Action declare(ArgumentList& list) {
     auto arguments = std::make_shared<Arguments>();
-    parser.add_option("DEVICE", arguments->device, "The device, or a family")->type_name("")->required();
-    parser.add_option("KEY", arguments->key, "The property's name, case included")->type_name("")->required();
+    list = {
+        argument::device(&arguments->device),
+        {.name = "KEY",
+         .description = "The property's name, case included",
+         .kind = ValueKind::PROPERTY,
+         .required = true,
+         .target = &arguments->key},
+    };
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }
+
+} // namespace
+
+const Command command::PROPERTY{
+    "property", "Show the values of a property of a device", "", "tarvik property KS50 VENDOR", declare,
+};

@@ -5,8 +5,6 @@
 #include "report/AtomicFile.h"
 #include "report/Page.h"
 
-#include <CLI/CLI.hpp>
-
 #include <fmt/format.h>
 
 #include <memory>
@@ -54,12 +52,22 @@ ExitCode run(Tool& tool, const std::string& file) {
     return tool.answer(Written{file, page.devices(), page.families()});
 }
 
-} // namespace
-
-Action declareReport(CLI::App& parser) {
+Action declare(ArgumentList& list) {
     auto file = std::make_shared<std::string>();
-    parser.add_option("-o,--file", *file, "The HTML file to write; - is standard output")
-        ->type_name("FILE")
-        ->required();
+    list = {
+        {.name = "--file",
+         .letter = 'o',
+         .value = "FILE",
+         .description = "The file to write; - is standard output",
+         .kind = ValueKind::PATH,
+         .required = true,
+         .target = file.get()},
+    };
     return [file](Tool& tool) { return run(tool, *file); };
 }
+
+} // namespace
+
+const Command command::REPORT{
+    "report", "Write an HTML page about all devices", "", "tarvik report --file report.html", declare,
+};

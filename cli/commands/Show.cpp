@@ -1,12 +1,11 @@
 // `show`: everything about one device, to read or to process.
 #include "commands/Commands.h"
 
+#include "commands/CommonArguments.h"
 #include "model/Vocabulary.h"
 #include "query/DeviceDetails.h"
 #include "query/Tool.h"
 #include "term/Table.h"
-
-#include <CLI/CLI.hpp>
 
 #include <fmt/format.h>
 #include <fmt/ranges.h>
@@ -184,10 +183,16 @@ Json asJson(const Sheet& sheet) {
 
 ExitCode run(Tool& tool, const std::string& device) { return tool.answer(Sheet{deviceSheet(tool, device)}); }
 
-} // namespace
-
-Action declareShow(CLI::App& parser) {
+Action declare(ArgumentList& list) {
     auto device = std::make_shared<std::string>();
-    parser.add_option("DEVICE", *device, "The device, or a family")->type_name("")->required();
+    list = {
+        argument::device(device.get()),
+    };
     return [device](Tool& tool) { return run(tool, *device); };
 }
+
+} // namespace
+
+const Command command::SHOW{
+    "show", "Show everything about a device", "", "tarvik show KS50", declare,
+};

@@ -8,8 +8,6 @@
 
 #include <tarvik/ConstraintsManager.h>
 
-#include <CLI/CLI.hpp>
-
 #include <fmt/format.h>
 
 #include <memory>
@@ -92,14 +90,28 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     return showProperty(tool, answer, properties);
 }
 
-} // namespace
-
-Action declareSpi(CLI::App& parser) {
+Action declare(ArgumentList& list) {
     auto arguments = std::make_shared<Arguments>();
-    parser
-        .add_option("DEVICE", arguments->device,
-                    "The flash, or a family of flashes; without it all are listed")
-        ->type_name("");
-    parser.add_option("KEY", arguments->key, "One property; without it all are shown")->type_name("");
+    list = {
+        {.name = "DEVICE",
+         .description = "A flash or flash family; lists all flashes if absent",
+         .kind = ValueKind::FLASH,
+         .target = &arguments->device},
+        {.name = "KEY",
+         .description = "A property; shows all properties if absent",
+         .kind = ValueKind::PROPERTY,
+         .target = &arguments->key},
+    };
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }
+
+} // namespace
+
+const Command command::SPI{
+    "spi",
+    "List SPI and BPI flashes, or show their properties",
+    "",
+    "tarvik spi\n"
+    "tarvik spi OVD16 DENSITY",
+    declare,
+};

@@ -1,6 +1,7 @@
 // `which`: the inverse of `check` and `property`: the devices for which it holds.
 #include "commands/Commands.h"
 
+#include "commands/CommonArguments.h"
 #include "model/Vocabulary.h"
 #include "query/Census.h"
 #include "query/Tool.h"
@@ -9,8 +10,6 @@
 
 #include <TarvikException.h>
 #include <tarvik/ConstraintsManager.h>
-
-#include <CLI/CLI.hpp>
 
 #include <fmt/format.h>
 
@@ -115,7 +114,7 @@ Verdict askForProperty(Tool& tool, ConstraintsManager& manager, const Question& 
     }
     const std::size_t issued = tool.messages().count();
     const Verdict verdict = why::ask(manager, question);
-    tool.messages().forgetBehind(issued);
+    tool.messages().truncate(issued);
     return verdict;
 }
 
@@ -150,14 +149,28 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     return status;
 }
 
-} // namespace
-
-Action declareWhich(CLI::App& parser) {
+Action declare(ArgumentList& list) {
     auto arguments = std::make_shared<Arguments>();
-    parser.add_option("--operation", arguments->operation, "The operation that it allows")
-        ->type_name("OPERATION");
-    parser.add_option("-m,--mode", arguments->mode, "The configuration mode")->type_name("MODE");
-    parser.add_option("-o,--output", arguments->output, "The cable or output file type")->type_name("OUTPUT");
-    parser.add_option("--property", arguments->property, "The property that it has")->type_name("KEY=VALUE");
+    list = {
+        argument::operation(&arguments->operation, "The operation that the devices allow"),
+        argument::mode(&arguments->mode, false),
+        argument::output(&arguments->output, false),
+        {.name = "--property",
+         .value = "KEY=VALUE",
+         .description = "The property that the devices have",
+         .kind = ValueKind::PROPERTY_VALUE,
+         .target = &arguments->property},
+    };
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }
+
+} // namespace
+
+const Command command::WHICH{
+    "which",
+    "List the devices that allow an operation or have a property",
+    "",
+    "tarvik which --operation ERASE --mode BS --output USB2\n"
+    "tarvik which --property VENDOR=Korvel",
+    declare,
+};

@@ -1,18 +1,14 @@
 // `why`: the answer of `check`, `options`, `bsdl` or `property`, and the records that lead to it.
 #include "commands/Commands.h"
 
+#include "commands/CommonArguments.h"
 #include "explain/Explanation.h"
+#include "explain/Inquiry.h"
 #include "model/Catalogue.h"
 #include "model/Vocabulary.h"
 #include "query/Tool.h"
-#include "term/Table.h"
-#include "text/Suggest.h"
 
 #include <tarvik/ConstraintsManager.h>
-
-#include <CLI/CLI.hpp>
-
-#include <fmt/format.h>
 
 #include <algorithm>
 #include <memory>
@@ -97,17 +93,6 @@ Question::Kind kindOf(const Arguments& arguments) {
     throw CommandError(ExitCode::FAULT, usage);
 }
 
-TARVIKNS::PROGRAM_OPTION readOption(const std::string& text) {
-    const std::vector<std::string>& keys = vocabulary::options();
-    const auto found = std::find(keys.begin(), keys.end(), text);
-    if (found == keys.end()) {
-        throw CommandError(ExitCode::FAULT,
-                           fmt::format("unknown option \"{}\"{}\noptions, in upper case:\n{}", text,
-                                       didYouMean(text, keys), wrapped(keys, 2)));
-    }
-    return static_cast<TARVIKNS::PROGRAM_OPTION>(found - keys.begin());
-}
-
 Question read(const Arguments& arguments) {
     Question question;
     question.kind = kindOf(arguments);
@@ -126,7 +111,7 @@ Question read(const Arguments& arguments) {
             vocabulary::readOperation(arguments.operation ? *arguments.operation : *arguments.bsdl);
     }
     if (arguments.option) {
-        question.option = readOption(*arguments.option);
+        question.option = vocabulary::readOption(*arguments.option);
     }
     return question;
 }
@@ -145,19 +130,21 @@ ExitCode status(Verdict verdict) {
 
 ExitCode run(Tool& tool, const Arguments& arguments) {
     const Question question = read(arguments);
-    ConstraintsManager& manager = tool.manager();
-    const Verdict verdict = why::ask(manager, question);
-    const bool known = !arguments.device || manager.isKorvelDevice(question.device.c_str());
+    tool.openDatabase();
+    const why::Inquiry asked(question);
+    const bool isKnown = !arguments.device || asked.manager->isKorvelDevice(question.device.c_str());
 
-    const why::StartUp facts = why::readStartUp();
-    why::Answer answer{question, verdict, why::explain(facts, question)};
-    if (verdict == Verdict::NO) {
-        for (why::Step& step : why::alternatives(facts, question)) {
+    // Further questions serve the explanation: what the manager reports about them is not about the user's question.
+    const std::size_t issued = tool.messages().count();
+    why::Answer answer{question, asked.verdict, why::explain(question)};
+    if (asked.verdict == Verdict::NO) {
+        for (why::Step& step : why::alternatives(question)) {
             answer.explanation.steps.push_back(std::move(step));
         }
     }
-    const ExitCode result = tool.answer(answer, status(verdict));
-    if (!known) {
+    tool.messages().forgetBehind(issued);
+    const ExitCode result = tool.answer(answer, status(asked.verdict));
+    if (!isKnown) {
         tool.note(catalogue::unknownDevice(question.device).what());
     }
     if (!answer.agrees()) {
@@ -166,22 +153,47 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     return result;
 }
 
-} // namespace
-
-Action declareWhy(CLI::App& parser) {
+Action declare(ArgumentList& list) {
     auto arguments = std::make_shared<Arguments>();
-    parser.add_option("DEVICE", arguments->device, "The device, or a family")->type_name("");
-    parser.add_option("-m,--mode", arguments->mode, "The configuration mode")->type_name("MODE");
-    parser.add_option("-o,--output", arguments->output, "The cable or output file type")->type_name("OUTPUT");
-    parser.add_option("-p,--package", arguments->package, "The package")->type_name("PACKAGE");
-    parser.add_option("--operation", arguments->operation, "The operation, as `check` takes it")
-        ->type_name("OPERATION");
-    parser.add_option("--option", arguments->option, "The programming option, as `options` lists it")
-        ->type_name("OPTION");
-    parser.add_option("--bsdl", arguments->bsdl, "The boundary-scan operation, as `bsdl` lists it")
-        ->type_name("OPERATION");
-    parser.add_option("--property", arguments->property, "The property, as `property` takes it")
-        ->type_name("KEY");
-    parser.add_option("--value", arguments->value, "The property's value")->type_name("VALUE");
+    list = {
+        argument::device(&arguments->device, false),
+        argument::mode(&arguments->mode, false),
+        argument::output(&arguments->output, false),
+        argument::package(&arguments->package),
+        argument::operation(&arguments->operation, "The operation, as in the command check"),
+        {.name = "--option",
+         .value = "OPTION",
+         .description = "The programming option, as in the command options",
+         .kind = ValueKind::OPTION,
+         .target = &arguments->option},
+        {.name = "--bsdl",
+         .value = "OPERATION",
+         .description = "The boundary-scan operation, as in the command bsdl",
+         .kind = ValueKind::OPERATION,
+         .target = &arguments->bsdl},
+        {.name = "--property",
+         .value = "KEY",
+         .description = "The property, as in the command property",
+         .kind = ValueKind::PROPERTY,
+         .target = &arguments->property},
+        {.name = "--value",
+         .value = "VALUE",
+         .description = "The value that the property may have",
+         .target = &arguments->value},
+    };
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }
+
+} // namespace
+
+const Command command::WHY{
+    "why",
+    "Explain an answer",
+    "Shows the records that lead to the answer, or those that prevent it and what is allowed instead.",
+    "tarvik why KS50 --mode BS --output USB2 --operation VERIFY\n"
+    "tarvik why KS50 --mode SM --package TQ144\n"
+    "tarvik why KS50 --mode BS --output USB2 --option PROG --package PQ208\n"
+    "tarvik why KS50 --output STAPL --bsdl DOPRELOAD\n"
+    "tarvik why KS50 --property FLASH --value TRUE",
+    declare,
+};

@@ -27,7 +27,7 @@ struct Origin {
 /// With its layer, where there are several.
 [[nodiscard]] Json asJson(const Origin& origin);
 
-[[nodiscard]] Origin originOf(const AcdStore::Fragment& place);
+[[nodiscard]] Origin originOf(const AcdStore::SourceSpan& place);
 
 /// A text of a layer below that another one on top stands for.
 struct Shadow {

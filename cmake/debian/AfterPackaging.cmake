@@ -1,5 +1,5 @@
-# CPack gives a library scripts that call ldconfig. A trigger does so already, once for all packages of a run, and without
-# scripts a package can be installed into any root folder.
+# CPack adds scripts that call ldconfig to a library's package. A trigger does so already, once for all packages of a run,
+# and without scripts a package can be installed into any root folder.
 foreach(package ${CPACK_PACKAGE_FILES})
   set(folder ${CPACK_TEMPORARY_DIRECTORY}/unpacked)
   file(REMOVE_RECURSE ${folder})

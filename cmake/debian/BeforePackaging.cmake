@@ -1,4 +1,4 @@
-# What Debian asks of the installed files and `cmake --install` does not do. Run by CPack on what it has installed.
+# Does what Debian requires of the installed files and `cmake --install` does not do. CPack runs it after installing.
 set(installed ${CPACK_TEMPORARY_DIRECTORY}/*/usr)
 file(GLOB_RECURSE texts ${installed}/share/man/*.[1-9] ${installed}/share/doc/changelog ${installed}/share/doc/*.Debian)
 foreach(text ${texts})

@@ -5,6 +5,8 @@
 
 #include <algorithm>
 #include <array>
+#include <functional>
+#include <iterator>
 #include <memory>
 #include <utility>
 
@@ -13,55 +15,55 @@
 namespace {
 
 constexpr std::array KINDS{AcdLines::Kind::HEADER, AcdLines::Kind::ASSIGNMENT, AcdLines::Kind::APPEND,
-                           AcdLines::Kind::FAULT};
+                           AcdLines::Kind::INVALID};
 
-[[nodiscard]] AcdLines::Fault publicFault(acd::FaultKind kind) noexcept {
-    using acd::FaultKind;
-    using Fault = AcdLines::Fault;
+[[nodiscard]] AcdLines::ParseError publicError(acd::ParseErrorKind kind) noexcept {
+    using acd::ParseErrorKind;
+    using ParseError = AcdLines::ParseError;
     switch (kind) {
-    case FaultKind::NO_EQUALS_SIGN:
-        return Fault::NO_EQUALS_SIGN;
-    case FaultKind::EMPTY_KEY:
-        return Fault::EMPTY_KEY;
-    case FaultKind::BLANK_IN_KEY:
-        return Fault::BLANK_IN_KEY;
-    case FaultKind::NUL_BYTE:
-        return Fault::NUL_BYTE;
-    case FaultKind::CONTINUED_AT_END:
-        return Fault::CONTINUED_AT_END;
-    case FaultKind::UNCLOSED_HEADER:
-        return Fault::UNCLOSED_HEADER;
-    case FaultKind::EMPTY_NAME:
-        return Fault::EMPTY_NAME;
-    case FaultKind::BLANK_IN_NAME:
-        return Fault::BLANK_IN_NAME;
-    case FaultKind::TEXT_BEHIND_HEADER:
-        return Fault::TEXT_BEHIND_HEADER;
-    case FaultKind::LINE_TOO_LONG:
-    case FaultKind::VALUE_TOO_LONG: // never of a single line
+    case ParseErrorKind::NO_EQUALS_SIGN:
+        return ParseError::NO_EQUALS_SIGN;
+    case ParseErrorKind::EMPTY_KEY:
+        return ParseError::EMPTY_KEY;
+    case ParseErrorKind::BLANK_IN_KEY:
+        return ParseError::BLANK_IN_KEY;
+    case ParseErrorKind::NUL_BYTE:
+        return ParseError::NUL_BYTE;
+    case ParseErrorKind::CONTINUED_AT_END:
+        return ParseError::CONTINUED_AT_END;
+    case ParseErrorKind::UNCLOSED_HEADER:
+        return ParseError::UNCLOSED_HEADER;
+    case ParseErrorKind::EMPTY_NAME:
+        return ParseError::EMPTY_NAME;
+    case ParseErrorKind::BLANK_IN_NAME:
+        return ParseError::BLANK_IN_NAME;
+    case ParseErrorKind::TEXT_BEHIND_HEADER:
+        return ParseError::TEXT_BEHIND_HEADER;
+    case ParseErrorKind::LINE_TOO_LONG:
+    case ParseErrorKind::VALUE_TOO_LONG: // never of a single line
         break;
     }
-    return Fault::LINE_TOO_LONG;
+    return ParseError::LINE_TOO_LONG;
 }
 
 [[nodiscard]] AcdLines::Line publicLine(const acd::Line& line) {
     AcdLines::Line result{};
     result.kind = KINDS[static_cast<std::size_t>(line.kind)];
-    if (line.kind == acd::Line::Kind::FAULT) {
-        result.line = line.fault.place.line;
-        result.column = line.fault.place.column;
-        result.fault = publicFault(line.fault.kind);
-        result.closesSection = line.fault.closesSection;
-        result.text = acd::describe(line.fault);
+    if (line.kind == acd::Line::Kind::INVALID) {
+        result.line = line.error.location.line;
+        result.column = line.error.location.column;
+        result.error = publicError(line.error.kind);
+        result.closesSection = line.error.closesSection;
+        result.text = acd::describe(line.error);
         return result;
     }
     result.name = line.name;
-    result.line = line.place.line;
-    result.column = line.place.column;
+    result.line = line.location.line;
+    result.column = line.location.column;
     if (line.kind != acd::Line::Kind::HEADER) {
         result.value = line.value;
-        for (const acd::Piece& piece : line.pieces) {
-            result.fragments.push_back({piece.offset, piece.place.line, piece.place.column});
+        for (const acd::SourceSpan& span : line.spans) {
+            result.spans.push_back({span.offset, span.location.line, span.location.column});
         }
     }
     return result;
@@ -76,7 +78,7 @@ std::vector<AcdLines> AcdLines::ofDatabase() {
         for (const acd::SourceFile& file : family->files) {
             const acd::Text text = store.read(file);
             all.emplace_back(std::string_view(text.bytes.get(), text.size), file.path, family->name);
-            all.back().m_namesakes = file.namesakes;
+            all.back().m_caseCollisions = file.caseCollisions;
         }
     }
     return all;
@@ -115,13 +117,30 @@ std::string_view AcdLines::source(unsigned line) const noexcept {
     return text;
 }
 
+/// The line that a name belongs to; null if it is not of this file.
+const AcdLines::Line* AcdLines::lineOfName(const char* name) const noexcept {
+    const std::less<> isBefore;
+    const char* const begin = m_joined.data();
+    if (isBefore(name, begin) || !isBefore(name, begin + m_joined.size())) {
+        return nullptr;
+    }
+    // Joined lines start where the first of them starts in the source.
+    const auto next =
+        std::upper_bound(m_starts.begin(), m_starts.end(), static_cast<std::size_t>(name - begin));
+    const auto number = static_cast<unsigned>(next - m_starts.begin());
+    const auto following =
+        std::upper_bound(m_lines.begin(), m_lines.end(), number,
+                         [](unsigned wanted, const Line& line) { return wanted < line.firstLine; });
+    return following == m_lines.begin() ? nullptr : &*std::prev(following);
+}
+
 void AcdLines::readLines() {
     acd::LineReader reader(m_joined.data(), m_joined.size());
     acd::Line line;
     unsigned taken = 0;
     while (reader.next(line)) {
         Line& added = m_lines.emplace_back(publicLine(line));
-        added.lastLine = reader.linesTaken();
+        added.lastLine = reader.lineNumber();
         added.firstLine = addComments(taken + 1, added.lastLine);
         taken = added.lastLine;
     }

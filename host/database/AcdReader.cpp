@@ -1,7 +1,7 @@
 #include <AcdReader.h>
 
 #include "database/Store.h"
-#include "text/OrEmpty.h"
+#include "text/NullToEmpty.h"
 
 // Readers are thin: a reader finds its database in the store, and leaves it there.
 
@@ -14,14 +14,14 @@ constexpr const char* NO_MODULE = "base";
 
 AcdReader::AcdReader() {
     acd::Store& store = acd::Store::instance();
-    const acd::Opened opened = store.openBase();
+    const acd::DatabaseHandle opened = store.openBase();
     m_accessor = &store.accessor(opened);
     m_module = opened.family->name.c_str();
 }
 
 AcdReader::AcdReader(const char* name) {
     acd::Store& store = acd::Store::instance();
-    const acd::Opened opened = store.open(orEmpty(name));
+    const acd::DatabaseHandle opened = store.open(nullToEmpty(name));
     m_accessor = &store.accessor(opened);
     m_module = opened.family == nullptr ? NO_MODULE : opened.family->name.c_str();
 }

@@ -1,7 +1,9 @@
 #include <AcdStore.h>
 
+#include "database/FileNames.h"
+#include "database/ReadLog.h"
 #include "database/Store.h"
-#include "text/OrEmpty.h"
+#include "text/NullToEmpty.h"
 
 #include <algorithm>
 #include <iterator>
@@ -33,7 +35,7 @@ std::vector<std::string> AcdStore::devices(const std::string& family) {
     Store& store = Store::instance();
     std::vector<std::string> names;
     if (acd::Family* const found = store.family(family)) {
-        const acd::NameTable& sections = store.database(*found).sectionNames();
+        const acd::CaseInsensitiveNameSet& sections = store.database(*found).sectionNames();
         for (std::uint32_t ordinal = 0; ordinal != sections.size(); ++ordinal) {
             names.emplace_back(sections[ordinal]);
         }
@@ -43,20 +45,13 @@ std::vector<std::string> AcdStore::devices(const std::string& family) {
 
 namespace {
 
-/// The directory that a path leads through; empty for the name of a memory file.
-[[nodiscard]] std::string_view directoryOf(std::string_view path) {
-    const std::size_t slash = path.rfind('/');
-    // The slash of the root is its name.
-    return slash == path.npos ? std::string_view() : path.substr(0, std::max<std::size_t>(slash, 1));
-}
-
-[[nodiscard]] AcdStore::Value publicValue(const acd::Opened& opened, const acd::Value& value,
+[[nodiscard]] AcdStore::Value publicValue(const acd::DatabaseHandle& opened, const acd::Value& value,
                                           bool fromSection) {
     AcdStore::Value result{value.text(), {}, fromSection, {}};
-    for (const acd::Fragment& fragment : opened.database->fragments(value)) {
-        const std::string_view path = opened.database->path(fragment.layer);
-        result.fragments.push_back(
-            {fragment.offset, path, directoryOf(path), fragment.place.line, fragment.place.column});
+    for (const acd::LayerSpan& span : opened.database->spans(value)) {
+        const std::string_view path = opened.database->path(span.layer);
+        result.spans.push_back(
+            {span.offset, path, acd::directoryOf(path), span.location.line, span.location.column});
     }
     return result;
 }
@@ -64,8 +59,8 @@ namespace {
 } // namespace
 
 std::optional<AcdStore::Value> AcdStore::value(const char* name, const char* key) {
-    const acd::Opened opened = Store::instance().open(orEmpty(name));
-    const acd::Value* const found = opened.database->find(opened.section, orEmpty(key));
+    const acd::DatabaseHandle opened = Store::instance().open(nullToEmpty(name));
+    const acd::Value* const found = opened.database->find(opened.section, nullToEmpty(key));
     if (found == nullptr) {
         return std::nullopt;
     }
@@ -77,14 +72,21 @@ std::optional<AcdStore::Value> AcdStore::value(const char* name, const char* key
     return value;
 }
 
-AcdStore::Fragment AcdStore::Value::at(std::size_t offset) const {
-    const auto behind = std::upper_bound(
-        fragments.begin(), fragments.end(), offset,
-        [](std::size_t wanted, const Fragment& fragment) { return wanted < fragment.offset; });
-    // Of fragments at the same offset all but the last are empty: the byte stands in the last.
-    Fragment fragment = *std::prev(behind);
-    fragment.column += static_cast<unsigned>(offset - fragment.offset);
-    return fragment;
+AcdStore::SourceSpan AcdStore::Value::at(std::size_t offset) const {
+    const auto behind =
+        std::upper_bound(spans.begin(), spans.end(), offset,
+                         [](std::size_t wanted, const SourceSpan& span) { return wanted < span.offset; });
+    // Of spans at the same offset all but the last are empty: the byte stands in the last.
+    SourceSpan span = *std::prev(behind);
+    span.column += static_cast<unsigned>(offset - span.offset);
+    return span;
 }
 
-void AcdStore::forget() { Store::forget(); }
+AcdStore::ReadObserver AcdStore::setReadObserver(ReadObserver observer) {
+    return acd::ReadLog::setObserver(std::move(observer));
+}
+
+void AcdStore::resetForTesting() {
+    setReadObserver({});
+    Store::resetForTesting();
+}

@@ -1,5 +1,7 @@
 #include "database/Catalogue.h"
 
+#include "database/FileNames.h"
+
 #include <algorithm>
 #include <filesystem>
 #include <system_error>
@@ -12,14 +14,6 @@ namespace acd {
 
 namespace {
 
-constexpr std::string_view ENDING = ".acd";
-
-/// The family that a file name stands for; empty when it is no database's name.
-[[nodiscard]] std::string_view familyName(std::string_view fileName) noexcept {
-    const std::size_t length = fileName.size() - std::min(fileName.size(), ENDING.size());
-    return sameName(fileName.substr(length), ENDING) ? fileName.substr(0, length) : std::string_view();
-}
-
 [[nodiscard]] std::string joinPath(const std::string& directory, const std::string& name) {
     return directory.ends_with('/') ? directory + name : directory + '/' + name;
 }
@@ -31,13 +25,13 @@ constexpr std::string_view ENDING = ".acd";
 
 /// Reads what is in a file, unless that failed before; the first failure is reported.
 template <typename Read>
-void attempt(SourceFile& file, Reports& reports, Read read) {
+void tryRead(SourceFile& file, DeferredMessages& reports, Read read) {
     if (file.isUnreadable) {
         return;
     }
     try {
         read();
-    } catch (const Unreadable& unreadable) {
+    } catch (const ReadError& unreadable) {
         reports.add(file.path, location::FILE_UNREADABLE, unreadable.what());
         file.isUnreadable = true;
     }
@@ -45,7 +39,7 @@ void attempt(SourceFile& file, Reports& reports, Read read) {
 
 } // namespace
 
-Catalogue::Catalogue(const std::vector<std::string>& directories, Reports& reports)
+Catalogue::Catalogue(const std::vector<std::string>& directories, DeferredMessages& reports)
     : m_workingDirectory(workingDirectory()) {
     std::uint32_t layer = 0;
     for (auto directory = directories.rbegin(); directory != directories.rend(); ++directory, ++layer) {
@@ -55,7 +49,7 @@ Catalogue::Catalogue(const std::vector<std::string>& directories, Reports& repor
             for (const std::string& name : names) {
                 addFile(name, {joinPath(*directory, name), layer, nullptr});
             }
-        } catch (const Unreadable& unreadable) {
+        } catch (const ReadError& unreadable) {
             reports.add(*directory, location::DIRECTORY_UNREADABLE, unreadable.what());
         }
     }
@@ -82,7 +76,7 @@ void Catalogue::addFile(std::string_view fileName, SourceFile file) {
         known->name = name;
         m_names.add(known->name);
     } else if (known->files.back().layer == file.layer) {
-        known->files.back().namesakes.push_back(std::move(file.path));
+        known->files.back().caseCollisions.push_back(std::move(file.path));
         return;
     }
     known->files.push_back(std::move(file));
@@ -99,14 +93,14 @@ void Catalogue::sort() {
 
 Family* Catalogue::family(std::string_view name) const noexcept {
     const std::uint32_t ordinal = m_names.find(name);
-    return ordinal == NameTable::NONE ? nullptr : m_families[ordinal].get();
+    return ordinal == CaseInsensitiveNameSet::NONE ? nullptr : m_families[ordinal].get();
 }
 
 Family* Catalogue::familyOfFile(std::string_view fileName) const noexcept {
     return family(familyName(fileName));
 }
 
-Family* Catalogue::familyOfDevice(std::string_view device, Reports& reports) {
+Family* Catalogue::familyOfDevice(std::string_view device, DeferredMessages& reports) {
     if (!m_devices) {
         m_devices = makeIndex(reports);
     }
@@ -114,33 +108,33 @@ Family* Catalogue::familyOfDevice(std::string_view device, Reports& reports) {
     return ordinal == DeviceIndex::NONE ? nullptr : m_families[ordinal].get();
 }
 
-DeviceIndex Catalogue::makeIndex(Reports& reports) const {
+DeviceIndex Catalogue::makeIndex(DeferredMessages& reports) const {
     DeviceIndex index;
-    HeaderScan scan;
+    SectionScanner scan;
     for (std::uint32_t ordinal = 0; ordinal != m_families.size(); ++ordinal) {
         for (SourceFile& file : m_families[ordinal]->files) {
-            attempt(file, reports, [&] { index.add(scan.names([&] { return open(file); }), ordinal); });
+            tryRead(file, reports, [&] { index.add(scan.names([&] { return open(file); }), ordinal); });
         }
     }
     return index;
 }
 
-const Database* Catalogue::database(Family& family, Reports& reports) const {
+const Database* Catalogue::database(Family& family, DeferredMessages& reports) const {
     if (family.database != nullptr) {
         return family.database.get();
     }
     std::vector<LayerText> layers;
     for (SourceFile& file : family.files) {
-        attempt(file, reports, [&] { layers.push_back({file.path, readWhole(*open(file))}); });
+        tryRead(file, reports, [&] { layers.push_back({file.path, readAll(*open(file))}); });
     }
     if (layers.size() != family.files.size()) {
         return nullptr;
     }
-    std::vector<LayerFault> faults;
-    auto database = std::make_unique<const Database>(std::move(layers), faults);
-    Reports found;
-    for (const LayerFault& fault : faults) {
-        found.add(database->path(fault.layer), fault.fault);
+    std::vector<LayerError> errors;
+    auto database = std::make_unique<const Database>(std::move(layers), errors);
+    DeferredMessages found;
+    for (const LayerError& error : errors) {
+        found.add(database->path(error.layer), error.error);
     }
     family.database = std::move(database);
     reports.add(std::move(found));

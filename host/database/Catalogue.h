@@ -1,9 +1,9 @@
 #pragma once
 
 #include "database/Database.h"
+#include "database/DeferredMessages.h"
 #include "database/DeviceIndex.h"
 #include "database/FileReading.h"
-#include "database/Reports.h"
 
 #include <PM_DEVKEY.h>
 
@@ -27,7 +27,7 @@ struct SourceFile {
     const std::string* text; ///< of a file in memory; null for one on disk
     bool isUnreadable = false;
     std::vector<std::string>
-        namesakes{}; ///< paths in the same layer that differ in case alone, and don't count
+        caseCollisions{}; ///< paths in the same layer that differ in case alone, and don't count
 };
 
 /// A family and what is known of it so far.
@@ -44,7 +44,7 @@ class Catalogue {
 public:
     /// Lists the directories, each once. One that can't be listed is reported; the others still serve.
     /// @param directories the top one first
-    Catalogue(const std::vector<std::string>& directories, Reports& reports);
+    Catalogue(const std::vector<std::string>& directories, DeferredMessages& reports);
 
     explicit Catalogue(std::shared_ptr<const MemoryFiles> files);
 
@@ -59,25 +59,25 @@ public:
 
     /// The family that a device belongs to; null when none has it. The first call looks through all files,
     /// and reports those that can't be read.
-    [[nodiscard]] Family* familyOfDevice(std::string_view device, Reports& reports);
+    [[nodiscard]] Family* familyOfDevice(std::string_view device, DeferredMessages& reports);
 
     /// The family's database, read when it is asked for first; null when a file of it can't be read. What is
     /// wrong with the files is reported once.
-    [[nodiscard]] const Database* database(Family& family, Reports& reports) const;
+    [[nodiscard]] const Database* database(Family& family, DeferredMessages& reports) const;
 
     /// Opens one of the files that were found.
-    /// @throw Unreadable
+    /// @throw ReadError
     [[nodiscard]] std::unique_ptr<ByteSource> open(const SourceFile& file) const;
 
 private:
     void addFile(std::string_view fileName, SourceFile file);
     void sort();
-    [[nodiscard]] DeviceIndex makeIndex(Reports& reports) const;
+    [[nodiscard]] DeviceIndex makeIndex(DeferredMessages& reports) const;
 
     std::string m_workingDirectory; ///< of the process when it listed the directories; hosts change it
     std::shared_ptr<const MemoryFiles> m_memoryFiles;
     std::vector<std::unique_ptr<Family>> m_families;
-    NameTable m_names; ///< of the families, with the same ordinals
+    CaseInsensitiveNameSet m_names; ///< of the families, with the same ordinals
     std::optional<DeviceIndex> m_devices;
 };
 

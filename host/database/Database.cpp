@@ -1,8 +1,10 @@
 #include "database/Database.h"
 
+#include "database/FileNames.h"
 #include "database/LineReader.h"
 
 #include <algorithm>
+#include <array>
 #include <cstring>
 #include <iterator>
 #include <tuple>
@@ -13,22 +15,38 @@
 
 namespace acd {
 
+namespace {
+
+constexpr std::array KINDS{Line::Kind::HEADER, Line::Kind::ASSIGNMENT, Line::Kind::APPEND,
+                           Line::Kind::INVALID};
+
+} // namespace
+
 /// Fills a database; what it needs for that only goes with it.
 class DatabaseBuilder {
 public:
-    DatabaseBuilder(Database& database, std::vector<LayerFault>& faults, std::size_t longestValue)
-        : m_database(database), m_faults(faults), m_longestValue(longestValue) {}
+    DatabaseBuilder(Database& database, std::vector<OversizedAppend>& oversized, std::size_t maxValueLength)
+        : m_database(database), m_oversized(oversized), m_maxValueLength(maxValueLength) {}
 
-    void read(std::uint32_t layer);
+    /// Starts the next layer.
+    void openLayer(std::uint32_t layer);
+
+    /// Takes the next line of that layer.
+    void add(const Line& line);
+
+    /// Merges what was added.
     void merge();
 
 private:
+    static constexpr std::uint32_t OWN = 0;
+    static constexpr std::uint32_t NOWHERE = 0xFFFFFFFF;
+
     struct Assignment {
         Value value;
         std::uint32_t section;
         bool appends;
 
-        [[nodiscard]] auto place() const noexcept { return std::tuple(section, value.key()); }
+        [[nodiscard]] auto sortKey() const noexcept { return std::tuple(section, value.key()); }
     };
     using Assignments = std::vector<Assignment>;
 
@@ -42,43 +60,40 @@ private:
     }
 
     [[nodiscard]] std::uint32_t openSection(std::string_view name);
-    void add(const Line& line, std::uint32_t section, std::uint32_t layer);
-    void keepReplaced(Assignments::iterator first, Assignments::iterator last);
+    void assign(const Line& line);
+    void recordShadowed(Assignments::iterator first, Assignments::iterator last);
     [[nodiscard]] Value join(Assignments::iterator first, Assignments::iterator last);
-    void dropWhatIsTooLong(Assignments::iterator first, Assignments::iterator last, bool isTold);
+    void dropOversizedAppends(Assignments::iterator first, Assignments::iterator last, bool isReported);
 
     Database& m_database;
-    std::vector<LayerFault>& m_faults;
-    std::size_t m_longestValue;
+    std::vector<OversizedAppend>& m_oversized;
+    std::size_t m_maxValueLength;
+    std::uint32_t m_layer = 0;
+    std::uint32_t m_section = OWN;
     Assignments m_assignments;
 };
 
-void DatabaseBuilder::read(std::uint32_t layer) {
-    constexpr std::uint32_t OWN = 0;
-    constexpr std::uint32_t NOWHERE = 0xFFFFFFFF;
+void DatabaseBuilder::openLayer(std::uint32_t layer) {
+    m_layer = layer;
+    m_section = OWN;
+}
 
-    const Text& text = m_database.m_layers[layer].text;
-    LineReader reader(text.bytes.get(), text.size);
-    std::uint32_t section = OWN;
-    Line line;
-    while (reader.next(line)) {
-        switch (line.kind) {
-        case Line::Kind::HEADER:
-            section = openSection(line.name);
-            break;
-        case Line::Kind::ASSIGNMENT:
-        case Line::Kind::APPEND:
-            if (section != NOWHERE) {
-                add(line, section, layer);
-            }
-            break;
-        case Line::Kind::FAULT:
-            m_faults.push_back({layer, line.fault});
-            if (line.fault.closesSection) {
-                section = NOWHERE;
-            }
-            break;
+void DatabaseBuilder::add(const Line& line) {
+    switch (line.kind) {
+    case Line::Kind::HEADER:
+        m_section = openSection(line.name);
+        break;
+    case Line::Kind::ASSIGNMENT:
+    case Line::Kind::APPEND:
+        if (m_section != NOWHERE) {
+            assign(line);
         }
+        break;
+    case Line::Kind::INVALID:
+        if (line.error.closesSection) {
+            m_section = NOWHERE;
+        }
+        break;
     }
 }
 
@@ -90,55 +105,55 @@ std::uint32_t DatabaseBuilder::openSection(std::string_view name) {
     return section;
 }
 
-void DatabaseBuilder::add(const Line& line, std::uint32_t section, std::uint32_t layer) {
+void DatabaseBuilder::assign(const Line& line) {
     Value value;
     value.m_key = line.name.data();
     value.m_keyLength = static_cast<std::uint32_t>(line.name.size());
     value.m_text = line.value.data();
     value.m_textLength = static_cast<std::uint32_t>(line.value.size());
-    value.m_firstFragment = static_cast<std::uint32_t>(m_database.m_fragments.size());
-    value.m_fragmentCount = static_cast<std::uint32_t>(line.pieces.size());
-    for (const Piece& piece : line.pieces) {
-        m_database.m_fragments.push_back({piece.offset, piece.place, layer});
+    value.m_firstSpan = static_cast<std::uint32_t>(m_database.m_spans.size());
+    value.m_spanCount = static_cast<std::uint32_t>(line.spans.size());
+    for (const SourceSpan& span : line.spans) {
+        m_database.m_spans.push_back({span.offset, span.location, m_layer});
     }
-    m_assignments.push_back({value, section, line.kind == Line::Kind::APPEND});
+    m_assignments.push_back({value, m_section, line.kind == Line::Kind::APPEND});
 }
 
 void DatabaseBuilder::merge() {
     // Stable: what is said of one key stays in the order in which it is said.
     std::stable_sort(
         m_assignments.begin(), m_assignments.end(),
-        [](const Assignment& left, const Assignment& right) { return left.place() < right.place(); });
+        [](const Assignment& left, const Assignment& right) { return left.sortKey() < right.sortKey(); });
     m_database.m_values.reserve(m_assignments.size());
     for (auto first = m_assignments.begin(); first != m_assignments.end();) {
         const auto last = std::find_if(first, m_assignments.end(), [first](const Assignment& assignment) {
-            return assignment.place() != first->place();
+            return assignment.sortKey() != first->sortKey();
         });
         Section& section = m_database.m_sections[first->section];
         if (section.m_count++ == 0) {
             section.m_first = static_cast<std::uint32_t>(m_database.m_values.size());
         }
         const auto standing = lastAssignment(first, last);
-        dropWhatIsTooLong(standing, last, true);
-        keepReplaced(first, standing);
+        dropOversizedAppends(standing, last, true);
+        recordShadowed(first, standing);
         m_database.m_values.push_back(join(standing, last));
         first = last;
     }
-    m_database.m_fragments.shrink_to_fit();
+    m_database.m_spans.shrink_to_fit();
 }
 
 /// Keeps what a layer hides of the layers below it.
 /// @param last the assignment that stands
-void DatabaseBuilder::keepReplaced(Assignments::iterator first, Assignments::iterator last) {
+void DatabaseBuilder::recordShadowed(Assignments::iterator first, Assignments::iterator last) {
     const auto owner = static_cast<std::uint32_t>(m_database.m_values.size());
     const auto layerOf = [this](const Assignment& assignment) {
-        return m_database.m_fragments[assignment.value.m_firstFragment].layer;
+        return m_database.m_spans[assignment.value.m_firstSpan].layer;
     };
     for (std::uint32_t layer = layerOf(*last); first != last;) {
         const auto standing = lastAssignment(first, last);
         if (layerOf(*standing) != layer) {
             layer = layerOf(*standing);
-            dropWhatIsTooLong(standing, last, false);
+            dropOversizedAppends(standing, last, false);
             m_database.m_replaced.push_back(join(standing, last));
             m_database.m_replacedOwners.push_back(owner);
         }
@@ -146,7 +161,7 @@ void DatabaseBuilder::keepReplaced(Assignments::iterator first, Assignments::ite
     }
 }
 
-/// Joins what stands for one key in a text and fragments of its own.
+/// Joins what stands for one key in a text and spans of its own.
 Value DatabaseBuilder::join(Assignments::iterator first, Assignments::iterator last) {
     if (std::distance(first, last) == 1) {
         return first->value;
@@ -155,62 +170,113 @@ Value DatabaseBuilder::join(Assignments::iterator first, Assignments::iterator l
     for (auto part = first; part != last; ++part) {
         length += part->value.m_textLength;
     }
-    auto& text = m_database.m_joinedTexts.emplace_back(std::make_unique_for_overwrite<char[]>(length));
-    auto& fragments = m_database.m_fragments;
+    auto& text = m_database.m_joinedTexts.emplace_back(makeBuffer(length));
+    auto& spans = m_database.m_spans;
 
     Value joined = first->value;
     joined.m_text = text.get();
     joined.m_textLength = 0;
-    joined.m_firstFragment = static_cast<std::uint32_t>(fragments.size());
+    joined.m_firstSpan = static_cast<std::uint32_t>(spans.size());
     for (auto part = first; part != last; ++part) {
-        for (std::uint32_t index = 0; index != part->value.m_fragmentCount; ++index) {
-            Fragment fragment = fragments[part->value.m_firstFragment + index];
-            fragment.offset += joined.m_textLength;
-            fragments.push_back(fragment);
+        if (part->value.m_spanCount != 0) {
+            joined.m_key = part->value.m_key;
+        }
+        for (std::uint32_t index = 0; index != part->value.m_spanCount; ++index) {
+            LayerSpan span = spans[part->value.m_firstSpan + index];
+            span.offset += joined.m_textLength;
+            spans.push_back(span);
         }
         std::memcpy(text.get() + joined.m_textLength, part->value.m_text, part->value.m_textLength);
         joined.m_textLength += part->value.m_textLength;
     }
-    joined.m_fragmentCount = static_cast<std::uint32_t>(fragments.size()) - joined.m_firstFragment;
+    joined.m_spanCount = static_cast<std::uint32_t>(spans.size()) - joined.m_firstSpan;
     return joined;
 }
 
 /// Empties the appended texts that would make the value too long.
-void DatabaseBuilder::dropWhatIsTooLong(Assignments::iterator first, Assignments::iterator last,
-                                        bool isTold) {
+void DatabaseBuilder::dropOversizedAppends(Assignments::iterator first, Assignments::iterator last,
+                                           bool isReported) {
     std::size_t length = first->value.m_textLength;
     for (auto part = std::next(first); part != last; ++part) {
-        if (length + part->value.m_textLength <= m_longestValue) {
+        if (length + part->value.m_textLength <= m_maxValueLength) {
             length += part->value.m_textLength;
             continue;
         }
-        if (isTold) {
-            const Fragment& origin = m_database.m_fragments[part->value.m_firstFragment];
-            m_faults.push_back(
-                {origin.layer,
-                 {FaultKind::VALUE_TOO_LONG, false, origin.place, excerpt(part->value.text())}});
+        if (isReported) {
+            const LayerSpan& origin = m_database.m_spans[part->value.m_firstSpan];
+            m_oversized.push_back({origin.layer, origin.location, part->value.key(), part->value.text()});
         }
         part->value.m_textLength = 0;
-        part->value.m_fragmentCount = 0;
+        part->value.m_spanCount = 0;
     }
 }
 
-Database::Database(std::vector<LayerText> layers, std::vector<LayerFault>& faults, std::size_t longestValue)
+Database::Database(std::vector<LayerText> layers, std::vector<LayerError>& errors, std::size_t maxValueLength)
     : m_layers(std::move(layers)) {
-    DatabaseBuilder builder(*this, faults, longestValue);
+    std::vector<OversizedAppend> oversized;
+    DatabaseBuilder builder(*this, oversized, maxValueLength);
+    Line line;
     for (std::uint32_t layer = 0; layer != m_layers.size(); ++layer) {
-        builder.read(layer);
+        const Text& text = m_layers[layer].text;
+        LineReader reader(text.bytes.get(), text.size);
+        builder.openLayer(layer);
+        while (reader.next(line)) {
+            builder.add(line);
+            if (line.kind == Line::Kind::INVALID) {
+                errors.push_back({layer, line.error});
+            }
+        }
+    }
+    builder.merge();
+    for (const OversizedAppend& append : oversized) {
+        errors.push_back(
+            {append.layer, {ParseErrorKind::VALUE_TOO_LONG, false, append.location, excerpt(append.text)}});
+    }
+}
+
+Database::Database(const std::vector<const AcdLines*>& layers, std::vector<OversizedAppend>& oversized,
+                   std::size_t maxValueLength) {
+    DatabaseBuilder builder(*this, oversized, maxValueLength);
+    Line line;
+    for (const AcdLines* const file : layers) {
+        builder.openLayer(static_cast<std::uint32_t>(m_layers.size()));
+        m_layers.push_back({file->path(), {}});
+        for (const AcdLines::Line& source : file->lines()) {
+            line.kind = KINDS[static_cast<std::size_t>(source.kind)];
+            line.name = source.name;
+            line.value = source.value;
+            line.error.closesSection = source.closesSection;
+            line.spans.clear();
+            for (const AcdLines::SourceSpan& span : source.spans) {
+                line.spans.push_back({static_cast<std::uint32_t>(span.offset), {span.line, span.column}});
+            }
+            builder.add(line);
+        }
     }
     builder.merge();
 }
 
 const Section* Database::section(std::string_view name) const noexcept {
     const std::uint32_t ordinal = m_sectionNames.find(name);
-    return ordinal == NameTable::NONE ? nullptr : &m_sections[ordinal + 1];
+    return ordinal == CaseInsensitiveNameSet::NONE ? nullptr : &m_sections[ordinal + 1];
 }
 
 std::size_t Database::ordinal(const Section* section) const noexcept {
     return section == nullptr ? 0 : static_cast<std::size_t>(section - m_sections.data());
+}
+
+std::string_view Database::sectionName(const Section* section) const noexcept {
+    return section == nullptr ? std::string_view()
+                              : m_sectionNames[static_cast<std::uint32_t>(ordinal(section) - 1)];
+}
+
+std::string_view Database::family() const noexcept {
+    return m_layers.empty() ? std::string_view() : familyName(fileNameOf(m_layers.front().path));
+}
+
+std::span<const Value> Database::values(const Section* section) const noexcept {
+    const Section& wanted = section == nullptr ? m_sections.front() : *section;
+    return {m_values.data() + wanted.m_first, wanted.m_count};
 }
 
 const Value* Database::find(const Section* section, std::string_view key) const noexcept {
@@ -233,8 +299,19 @@ bool Database::holds(const Section& section, const Value& value) const noexcept 
     return index >= section.m_first && index - section.m_first < section.m_count;
 }
 
-std::span<const Fragment> Database::fragments(const Value& value) const noexcept {
-    return {m_fragments.data() + value.m_firstFragment, value.m_fragmentCount};
+std::span<const LayerSpan> Database::spans(const Value& value) const noexcept {
+    return {m_spans.data() + value.m_firstSpan, value.m_spanCount};
+}
+
+LayerSpan Database::locate(const Value& value, std::size_t offset) const noexcept {
+    const std::span<const LayerSpan> spans = this->spans(value);
+    const auto next =
+        std::upper_bound(spans.begin(), spans.end(), offset,
+                         [](std::size_t wanted, const LayerSpan& span) { return wanted < span.offset; });
+    // Of spans at the same offset all but the last are empty: the byte is in the last.
+    LayerSpan span = *std::prev(next);
+    span.location.column += static_cast<std::uint32_t>(offset - span.offset);
+    return span;
 }
 
 std::span<const Value> Database::replaced(const Value& value) const noexcept {

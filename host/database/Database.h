@@ -1,8 +1,10 @@
 #pragma once
 
-#include "database/Fault.h"
+#include "database/CaseInsensitiveNameSet.h"
 #include "database/FileReading.h"
-#include "database/NameTable.h"
+#include "database/ParseError.h"
+
+#include <AcdLines.h>
 
 #include <cstddef>
 #include <cstdint>
@@ -20,16 +22,24 @@ struct LayerText {
     Text text;
 };
 
-/// A fault and the layer in whose file it is.
-struct LayerFault {
+/// An error and the layer in whose file it is.
+struct LayerError {
     std::uint32_t layer;
-    Fault fault;
+    ParseError error;
 };
 
-/// Where a piece of a value was written.
-struct Fragment {
+/// A text that was not appended, since the value would have grown too long.
+struct OversizedAppend {
+    std::uint32_t layer;
+    SourceLocation location; ///< of the text
+    std::string_view key;
+    std::string_view text;
+};
+
+/// Where a part of a value was written.
+struct LayerSpan {
     std::uint32_t offset; ///< of its first byte in the value
-    Place place;
+    SourceLocation location;
     std::uint32_t layer;
 };
 
@@ -47,8 +57,8 @@ private:
     const char* m_text;
     std::uint32_t m_keyLength;
     std::uint32_t m_textLength;
-    std::uint32_t m_firstFragment;
-    std::uint32_t m_fragmentCount;
+    std::uint32_t m_firstSpan;
+    std::uint32_t m_spanCount;
 };
 
 /// The keys of one device, or those of the family itself.
@@ -69,22 +79,32 @@ public:
 
     /// Takes the files apart.
     /// @param layers the bottom one first
-    /// @param faults what is wrong with them is added here
-    /// @param longestValue what no value may grow over by appending, at most 4 GiB
-    explicit Database(std::vector<LayerText> layers, std::vector<LayerFault>& faults,
-                      std::size_t longestValue = LARGEST_FILE);
+    /// @param errors what is wrong with them is added here
+    /// @param maxValueLength what no value may grow over by appending, at most 4 GiB
+    explicit Database(std::vector<LayerText> layers, std::vector<LayerError>& errors,
+                      std::size_t maxValueLength = MAX_FILE_SIZE);
+
+    /// Merges files that were taken apart already, and must outlive the database.
+    /// @param layers the bottom one first
+    /// @param oversized the texts that would make a value too long are added here
+    /// @param maxValueLength as above
+    Database(const std::vector<const AcdLines*>& layers, std::vector<OversizedAppend>& oversized,
+             std::size_t maxValueLength);
 
     Database(const Database&) = delete;
     Database& operator=(const Database&) = delete;
 
     /// The names of the sections, in the order in which they open first.
-    [[nodiscard]] const NameTable& sectionNames() const noexcept { return m_sectionNames; }
+    [[nodiscard]] const CaseInsensitiveNameSet& sectionNames() const noexcept { return m_sectionNames; }
 
     /// The section of a device; null when there is none.
     [[nodiscard]] const Section* section(std::string_view name) const noexcept;
 
     /// The place of a section among all, the family's own (null) being 0.
     [[nodiscard]] std::size_t ordinal(const Section* section) const noexcept;
+
+    /// The values of a section itself, or of the family's own keys (null), in byte order of their keys.
+    [[nodiscard]] std::span<const Value> values(const Section* section) const noexcept;
 
     /// The value of a key: the section's, else the family's own. Null for `section` asks the family alone.
     [[nodiscard]] const Value* find(const Section* section, std::string_view key) const noexcept;
@@ -93,10 +113,20 @@ public:
     [[nodiscard]] bool holds(const Section& section, const Value& value) const noexcept;
 
     /// The origin of a value, in order; one fragment at least.
-    [[nodiscard]] std::span<const Fragment> fragments(const Value& value) const noexcept;
+    [[nodiscard]] std::span<const LayerSpan> spans(const Value& value) const noexcept;
+
+    /// Where a byte of a value was written.
+    /// @param offset of the byte, or the size of the value
+    [[nodiscard]] LayerSpan locate(const Value& value, std::size_t offset) const noexcept;
 
     /// The values of layers below that `KEY = ...` on top replaced, the upper ones first.
     [[nodiscard]] std::span<const Value> replaced(const Value& value) const noexcept;
+
+    /// The name of a section as its first header spells it; empty for the family's own (null).
+    [[nodiscard]] std::string_view sectionName(const Section* section) const noexcept;
+
+    /// The family's name as the bottom layer's file spells it; empty without a file.
+    [[nodiscard]] std::string_view family() const noexcept;
 
     [[nodiscard]] std::string_view path(std::uint32_t layer) const noexcept { return m_layers[layer].path; }
 
@@ -106,12 +136,12 @@ private:
     [[nodiscard]] const Value* findIn(const Section& section, std::string_view key) const noexcept;
 
     std::vector<LayerText> m_layers;
-    NameTable m_sectionNames;
+    CaseInsensitiveNameSet m_sectionNames;
     std::vector<Section> m_sections{1}; ///< the family's own first
     std::vector<Value> m_values;
     std::vector<Value> m_replaced;               ///< those of one value stand together
     std::vector<std::uint32_t> m_replacedOwners; ///< of each, the place of the value that stands for it
-    std::vector<Fragment> m_fragments;
+    std::vector<LayerSpan> m_spans;
     std::vector<std::unique_ptr<char[]>> m_joinedTexts; ///< of values that were appended to
 };
 

@@ -5,7 +5,7 @@
 
 namespace acd {
 
-void DeviceIndex::add(const NameList& names, std::uint32_t family) {
+void DeviceIndex::add(const PackedStrings& names, std::uint32_t family) {
     const std::vector<char>& text = m_texts.emplace_back(names.bytes());
     std::uint32_t begin = 0;
     for (const std::uint32_t end : names.ends()) {
@@ -18,7 +18,7 @@ void DeviceIndex::add(const NameList& names, std::uint32_t family) {
 
 std::uint32_t DeviceIndex::family(std::string_view device) const noexcept {
     const std::uint32_t ordinal = m_devices.find(device);
-    return ordinal == NameTable::NONE ? NONE : m_families[ordinal];
+    return ordinal == CaseInsensitiveNameSet::NONE ? NONE : m_families[ordinal];
 }
 
 } // namespace acd

@@ -22,10 +22,10 @@ namespace {
     if (errno == ENOMEM) {
         throw std::bad_alloc();
     }
-    throw Unreadable(std::generic_category().message(errno));
+    throw ReadError(std::generic_category().message(errno));
 }
 
-[[noreturn]] void raiseTooLarge() { throw Unreadable("larger than 1 GiB"); }
+[[noreturn]] void raiseTooLarge() { throw ReadError("larger than 1 GiB"); }
 
 } // namespace
 
@@ -38,7 +38,7 @@ FileSource::FileSource(const std::string& path, ReadCall readCall)
         raiseSystemError();
     }
     try {
-        examine();
+        requireRegularFile();
     } catch (...) {
         ::close(m_descriptor);
         throw;
@@ -47,16 +47,16 @@ FileSource::FileSource(const std::string& path, ReadCall readCall)
 
 FileSource::~FileSource() { ::close(m_descriptor); }
 
-void FileSource::examine() {
+void FileSource::requireRegularFile() {
     struct stat status {};
     if (::fstat(m_descriptor, &status) != 0) {
         raiseSystemError();
     }
     if (!S_ISREG(status.st_mode)) {
-        throw Unreadable("not a regular file");
+        throw ReadError("not a regular file");
     }
     m_size = static_cast<std::size_t>(status.st_size);
-    if (m_size > LARGEST_FILE) {
+    if (m_size > MAX_FILE_SIZE) {
         raiseTooLarge();
     }
 }
@@ -70,14 +70,14 @@ std::size_t FileSource::read(char* buffer, std::size_t size) {
         raiseSystemError();
     }
     m_readSoFar += static_cast<std::size_t>(count);
-    if (m_readSoFar > LARGEST_FILE) {
+    if (m_readSoFar > MAX_FILE_SIZE) {
         raiseTooLarge(); // it has grown since it was examined
     }
     return static_cast<std::size_t>(count);
 }
 
 MemorySource::MemorySource(std::string_view text) : m_rest(text) {
-    if (m_rest.size() > LARGEST_FILE) {
+    if (m_rest.size() > MAX_FILE_SIZE) {
         raiseTooLarge();
     }
 }
@@ -107,15 +107,15 @@ std::vector<std::string> listDirectory(const std::string& path) {
     return names;
 }
 
-Text readWhole(ByteSource& source) {
+Text readAll(ByteSource& source) {
     // One byte more than expected, so that the end is met without asking for more memory.
     std::size_t capacity = source.expectedSize() + 1;
-    Text text{std::make_unique_for_overwrite<char[]>(capacity), 0};
+    Text text{makeBuffer(capacity), 0};
     while (const std::size_t count = source.read(text.bytes.get() + text.size, capacity - text.size)) {
         text.size += count;
         if (text.size == capacity) {
             capacity *= 2;
-            auto larger = std::make_unique_for_overwrite<char[]>(capacity);
+            auto larger = makeBuffer(capacity);
             std::memcpy(larger.get(), text.bytes.get(), text.size);
             text.bytes = std::move(larger);
         }

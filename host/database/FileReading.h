@@ -13,12 +13,12 @@
 namespace acd {
 
 /// The largest file that is read.
-inline constexpr std::size_t LARGEST_FILE = std::size_t{1} << 30;
+inline constexpr std::size_t MAX_FILE_SIZE = std::size_t{1} << 30;
 
 /// A file can't be read. Raised and caught inside this library only.
-class Unreadable : public std::exception {
+class ReadError : public std::exception {
 public:
-    explicit Unreadable(std::string reason) : m_reason(std::move(reason)) {}
+    explicit ReadError(std::string reason) : m_reason(std::move(reason)) {}
     [[nodiscard]] const char* what() const noexcept override { return m_reason.c_str(); }
 
 private:
@@ -35,7 +35,7 @@ public:
 
     /// Puts up to `size` bytes into `buffer`.
     /// @return how many; 0 at the end only
-    /// @throw Unreadable
+    /// @throw ReadError
     [[nodiscard]] virtual std::size_t read(char* buffer, std::size_t size) = 0;
 };
 
@@ -45,7 +45,7 @@ public:
     /// The system's `read`, or what stands in for it in a test.
     using ReadCall = ssize_t (*)(int descriptor, void* buffer, std::size_t size);
 
-    /// @throw Unreadable
+    /// @throw ReadError
     explicit FileSource(const std::string& path);
     FileSource(const std::string& path, ReadCall readCall);
     ~FileSource() override;
@@ -56,7 +56,7 @@ public:
     [[nodiscard]] std::size_t read(char* buffer, std::size_t size) override;
 
 private:
-    void examine();
+    void requireRegularFile();
 
     int m_descriptor;
     ReadCall m_readCall;
@@ -67,7 +67,7 @@ private:
 /// The bytes of a text, which must outlive the source.
 class MemorySource final : public ByteSource {
 public:
-    /// @throw Unreadable when the text is larger than a file may be
+    /// @throw ReadError when the text is larger than a file may be
     explicit MemorySource(std::string_view text);
 
     [[nodiscard]] std::size_t expectedSize() const noexcept override { return m_rest.size(); }
@@ -77,6 +77,11 @@ private:
     std::string_view m_rest;
 };
 
+/// Memory for so many bytes, which have no values yet: clearing what is read into next would take time.
+[[nodiscard]] inline std::unique_ptr<char[]> makeBuffer(std::size_t size) {
+    return std::unique_ptr<char[]>(new char[size]);
+}
+
 /// A text in memory of its own.
 struct Text {
     std::unique_ptr<char[]> bytes;
@@ -84,11 +89,11 @@ struct Text {
 };
 
 /// The names of all entries of a directory, "." and ".." included, in no particular order.
-/// @throw Unreadable
+/// @throw ReadError
 [[nodiscard]] std::vector<std::string> listDirectory(const std::string& path);
 
 /// Reads all that is left of a source.
-/// @throw Unreadable
-[[nodiscard]] Text readWhole(ByteSource& source);
+/// @throw ReadError
+[[nodiscard]] Text readAll(ByteSource& source);
 
 } // namespace acd

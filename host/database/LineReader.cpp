@@ -22,8 +22,8 @@ namespace {
     return {begin, static_cast<std::size_t>(end - begin)};
 }
 
-/// What is shown of a text for a fault that lies somewhere within it.
-[[nodiscard]] std::string_view around(std::string_view text, std::size_t offset) noexcept {
+/// What is shown of a text for an error that lies somewhere within it.
+[[nodiscard]] std::string_view contextAround(std::string_view text, std::size_t offset) noexcept {
     constexpr std::size_t BEFORE = 20;
     return text.substr(offset - std::min(offset, BEFORE));
 }
@@ -39,21 +39,21 @@ std::string_view withoutTrailingBlanks(std::string_view text) noexcept {
 
 Header parseHeader(std::string_view line) noexcept {
     if (const std::size_t nul = line.find('\0'); nul != line.npos) {
-        return {{}, FaultKind::NUL_BYTE, nul, around(line, nul)};
+        return {{}, ParseErrorKind::NUL_BYTE, nul, contextAround(line, nul)};
     }
     const std::size_t close = line.find(']');
     if (close == line.npos) {
-        return {{}, FaultKind::UNCLOSED_HEADER, 0, line};
+        return {{}, ParseErrorKind::UNCLOSED_HEADER, 0, line};
     }
     const std::string_view name = line.substr(1, close - 1);
     if (name.empty()) {
-        return {{}, FaultKind::EMPTY_NAME, 0, line};
+        return {{}, ParseErrorKind::EMPTY_NAME, 0, line};
     }
     if (const std::size_t blank = findBlank(name); blank != name.size()) {
-        return {{}, FaultKind::BLANK_IN_NAME, 1 + blank, line};
+        return {{}, ParseErrorKind::BLANK_IN_NAME, 1 + blank, line};
     }
     if (close + 1 != line.size()) {
-        return {{}, FaultKind::TEXT_BEHIND_HEADER, close + 1, line};
+        return {{}, ParseErrorKind::TEXT_BEHIND_HEADER, close + 1, line};
     }
     return {name, {}, {}, {}};
 }
@@ -73,12 +73,12 @@ bool LineReader::next(Line& line) {
         }
         const bool isHeader = *first.begin == '[';
         // A malformed header must not leave the keys behind it to the device before it.
-        line.fault.closesSection = isHeader;
+        line.error.closesSection = isHeader;
         const bool isComplete = join(first);
-        if (m_text.size() > LONGEST_LINE) {
-            fail(line, FaultKind::LINE_TOO_LONG, 0, m_text);
+        if (m_text.size() > MAX_LINE_LENGTH) {
+            fail(line, ParseErrorKind::LINE_TOO_LONG, 0, m_text);
         } else if (!isComplete) {
-            fail(line, FaultKind::CONTINUED_AT_END, m_text.size() - 1, m_text);
+            fail(line, ParseErrorKind::CONTINUED_AT_END, m_text.size() - 1, m_text);
         } else if (isHeader) {
             readHeader(line);
         } else {
@@ -112,11 +112,11 @@ LineReader::PhysicalLine LineReader::takePhysicalLine() noexcept {
 /// enough.
 /// @return false when the file ends behind a `\`, which the text then shows
 bool LineReader::join(const PhysicalLine& first) {
-    m_pieces.assign(1, {0, first.place});
+    m_spans.assign(1, {0, first.location});
     char* piece = first.begin;
     char* end = first.end;
-    bool goesOn = first.goesOn();
-    while (goesOn) {
+    bool isContinued = first.isContinued();
+    while (isContinued) {
         if (m_next == m_end) {
             m_text = between(first.begin, end);
             return false;
@@ -128,14 +128,14 @@ bool LineReader::join(const PhysicalLine& first) {
         if (more.begin == more.end) {
             break;
         }
-        goesOn = more.goesOn();
+        isContinued = more.isContinued();
         const auto offset = static_cast<std::size_t>(end - first.begin);
-        if (offset == m_pieces.back().offset) {
-            m_pieces.pop_back(); // nothing was in it
+        if (offset == m_spans.back().offset) {
+            m_spans.pop_back(); // nothing was in it
         }
-        // Of a line that is too long the pieces are no longer of interest, and could be very many.
-        if (offset <= LONGEST_LINE) {
-            m_pieces.push_back({static_cast<std::uint32_t>(offset), more.place});
+        // Of a line that is too long the spans are no longer of interest, and could be very many.
+        if (offset <= MAX_LINE_LENGTH) {
+            m_spans.push_back({static_cast<std::uint32_t>(offset), more.location});
         }
         end = std::copy(more.begin, more.end, end);
     }
@@ -146,24 +146,24 @@ bool LineReader::join(const PhysicalLine& first) {
 void LineReader::readHeader(Line& line) const {
     const Header header = parseHeader(m_text);
     if (header.name.empty()) {
-        fail(line, header.fault, header.offset, header.fragment);
+        fail(line, header.error, header.offset, header.fragment);
         return;
     }
     line.kind = Line::Kind::HEADER;
     line.name = header.name;
-    line.place = placeOf(1);
+    line.location = locationOf(1);
 }
 
 void LineReader::readAssignment(Line& line) const {
     if (m_holdsNul) {
         if (const std::size_t nul = m_text.find('\0'); nul != m_text.npos) {
-            fail(line, FaultKind::NUL_BYTE, nul, around(m_text, nul));
+            fail(line, ParseErrorKind::NUL_BYTE, nul, contextAround(m_text, nul));
             return;
         }
     }
     const std::size_t equals = m_text.find('=');
     if (equals == m_text.npos) {
-        fail(line, FaultKind::NO_EQUALS_SIGN, 0, m_text);
+        fail(line, ParseErrorKind::NO_EQUALS_SIGN, 0, m_text);
         return;
     }
     std::string_view key = m_text.substr(0, equals);
@@ -174,51 +174,51 @@ void LineReader::readAssignment(Line& line) const {
     }
     key = withoutTrailingBlanks(key);
     if (key.empty()) {
-        fail(line, FaultKind::EMPTY_KEY, 0, m_text);
+        fail(line, ParseErrorKind::EMPTY_KEY, 0, m_text);
         return;
     }
     if (const std::size_t blank = findBlank(key); blank != key.size()) {
-        fail(line, FaultKind::BLANK_IN_KEY, blank, key);
+        fail(line, ParseErrorKind::BLANK_IN_KEY, blank, key);
         return;
     }
     line.name = key;
-    line.place = placeOf(0);
+    line.location = locationOf(0);
     line.value = withoutBlanks(m_text.substr(equals + 1));
-    placeValue(line);
+    locateValue(line);
 }
 
-/// Gives the value the pieces that it consists of; an empty one stands right behind the `=`.
-void LineReader::placeValue(Line& line) const {
+/// Gives the value the spans that it consists of; an empty one stands right behind the `=`.
+void LineReader::locateValue(Line& line) const {
     const auto begin = static_cast<std::size_t>(line.value.data() - m_text.data());
-    line.pieces.clear();
+    line.spans.clear();
     if (line.value.empty()) {
-        Place place = placeOf(m_text.find('='));
-        ++place.column;
-        line.pieces.push_back({0, place});
+        SourceLocation location = locationOf(m_text.find('='));
+        ++location.column;
+        line.spans.push_back({0, location});
         return;
     }
-    line.pieces.push_back({0, placeOf(begin)});
-    for (const Piece& piece : m_pieces) {
-        if (piece.offset > begin && piece.offset < begin + line.value.size()) {
-            line.pieces.push_back({static_cast<std::uint32_t>(piece.offset - begin), piece.place});
+    line.spans.push_back({0, locationOf(begin)});
+    for (const SourceSpan& span : m_spans) {
+        if (span.offset > begin && span.offset < begin + line.value.size()) {
+            line.spans.push_back({static_cast<std::uint32_t>(span.offset - begin), span.location});
         }
     }
 }
 
-void LineReader::fail(Line& line, FaultKind kind, std::size_t offset, std::string_view fragment) const {
-    line.kind = Line::Kind::FAULT;
-    line.fault.kind = kind;
-    line.fault.place = placeOf(offset);
-    line.fault.fragment = excerpt(fragment);
+void LineReader::fail(Line& line, ParseErrorKind kind, std::size_t offset, std::string_view fragment) const {
+    line.kind = Line::Kind::INVALID;
+    line.error.kind = kind;
+    line.error.location = locationOf(offset);
+    line.error.excerpt = excerpt(fragment);
 }
 
 /// The place of a byte of the current line.
-Place LineReader::placeOf(std::size_t offset) const noexcept {
+SourceLocation LineReader::locationOf(std::size_t offset) const noexcept {
     const auto behind =
-        std::upper_bound(m_pieces.begin(), m_pieces.end(), offset,
-                         [](std::size_t wanted, const Piece& piece) { return wanted < piece.offset; });
-    const Piece& piece = *std::prev(behind);
-    return {piece.place.line, piece.place.column + static_cast<std::uint32_t>(offset - piece.offset)};
+        std::upper_bound(m_spans.begin(), m_spans.end(), offset,
+                         [](std::size_t wanted, const SourceSpan& span) { return wanted < span.offset; });
+    const SourceSpan& span = *std::prev(behind);
+    return {span.location.line, span.location.column + static_cast<std::uint32_t>(offset - span.offset)};
 }
 
 } // namespace acd

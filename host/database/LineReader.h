@@ -1,6 +1,6 @@
 #pragma once
 
-#include "database/Fault.h"
+#include "database/ParseError.h"
 
 #include <cstddef>
 #include <cstdint>
@@ -29,8 +29,8 @@ inline constexpr std::string_view BYTE_ORDER_MARK = "\xEF\xBB\xBF";
 /// What a header line says: a name, or what is wrong with it.
 struct Header {
     std::string_view name; ///< empty for a malformed header
-    FaultKind fault;       ///< of a malformed header only, as are the following
-    std::size_t offset;    ///< of the fault in the line
+    ParseErrorKind error;  ///< of a malformed header only, as are the following
+    std::size_t offset;    ///< of the error in the line
     std::string_view fragment;
 };
 
@@ -38,9 +38,9 @@ struct Header {
 [[nodiscard]] Header parseHeader(std::string_view line) noexcept;
 
 /// Where a piece of a joined text was written.
-struct Piece {
+struct SourceSpan {
     std::uint32_t offset; ///< of its first byte in the text
-    Place place;
+    SourceLocation location;
 };
 
 /// One line of a database file as it is meant: continuations joined, comments and blank lines gone.
@@ -49,15 +49,15 @@ struct Line {
         HEADER,     ///< opens the section `name`
         ASSIGNMENT, ///< `name = value`
         APPEND,     ///< `name += value`
-        FAULT,      ///< means nothing
+        INVALID,    ///< means nothing
     };
 
-    Kind kind = Kind::FAULT;
+    Kind kind = Kind::INVALID;
     std::string_view name;
-    Place place{}; ///< of the name
+    SourceLocation location{}; ///< of the name
     std::string_view value;
-    std::vector<Piece> pieces; ///< of the value, in order; one at least
-    Fault fault{};             ///< of kind `FAULT` only
+    std::vector<SourceSpan> spans; ///< of the value, in order; one at least
+    ParseError error{};            ///< of kind `INVALID` only
 };
 
 /// Walks over the text of a database file, line by line as they are meant. The one place that knows the
@@ -67,7 +67,7 @@ struct Line {
 /// does behind a `\`, and what it goes on with is neither comment nor header.
 class LineReader {
 public:
-    static constexpr std::size_t LONGEST_LINE = std::size_t{16} << 20;
+    static constexpr std::size_t MAX_LINE_LENGTH = std::size_t{16} << 20;
 
     /// The text is changed: lines that go on are joined in place, so that a value is one view into it. It
     /// must outlive the lines.
@@ -79,25 +79,25 @@ public:
     [[nodiscard]] bool next(Line& line);
 
     /// How many lines of the text were taken so far: the number of the last one of the line read last.
-    [[nodiscard]] std::uint32_t linesTaken() const noexcept { return m_lineNumber; }
+    [[nodiscard]] std::uint32_t lineNumber() const noexcept { return m_lineNumber; }
 
 private:
     struct PhysicalLine {
         char* begin; ///< its first byte that is no blank
         char* end;
-        Place place; ///< of `begin`
+        SourceLocation location; ///< of `begin`
 
         /// Of a line that holds anything.
-        [[nodiscard]] bool goesOn() const noexcept { return end[-1] == '\\'; }
+        [[nodiscard]] bool isContinued() const noexcept { return end[-1] == '\\'; }
     };
 
     [[nodiscard]] PhysicalLine takePhysicalLine() noexcept;
     [[nodiscard]] bool join(const PhysicalLine& first);
     void readHeader(Line& line) const;
     void readAssignment(Line& line) const;
-    void placeValue(Line& line) const;
-    void fail(Line& line, FaultKind kind, std::size_t offset, std::string_view fragment) const;
-    [[nodiscard]] Place placeOf(std::size_t offset) const noexcept;
+    void locateValue(Line& line) const;
+    void fail(Line& line, ParseErrorKind kind, std::size_t offset, std::string_view fragment) const;
+    [[nodiscard]] SourceLocation locationOf(std::size_t offset) const noexcept;
 
     char* m_next;
     char* m_end;
@@ -105,7 +105,7 @@ private:
     bool m_holdsNul;
 
     std::string_view m_text; ///< the current line, joined, without blanks at its ends
-    std::vector<Piece> m_pieces;
+    std::vector<SourceSpan> m_spans;
 };
 
 } // namespace acd

@@ -1,10 +1,9 @@
 #include <PM_DEVKEY.h>
 
 #include "database/Database.h"
+#include "database/ReadLog.h"
 #include "database/Store.h"
-#include "text/OrEmpty.h"
-
-#include <algorithm>
+#include "text/NullToEmpty.h"
 
 // Keyed reading with two levels of splitting. Lists are read item by item, so the accessor keeps its place:
 // the value of the latest key, the latest item and the latest field in it.
@@ -28,65 +27,45 @@ namespace {
 
 } // namespace
 
-void PM_DEVKEY::Cursor::start(std::string_view text, std::string_view separator) noexcept {
-    index = 0;
-    position = 0;
-    findEnd(text, separator);
-}
-
-bool PM_DEVKEY::Cursor::moveTo(std::size_t wanted, std::string_view text,
-                               std::string_view separator) noexcept {
-    if (wanted < index) {
-        start(text, separator);
-    }
-    while (index != wanted && end != text.size()) {
-        ++index;
-        position = end + separator.size();
-        findEnd(text, separator);
-    }
-    return index == wanted;
-}
-
-void PM_DEVKEY::Cursor::findEnd(std::string_view text, std::string_view separator) noexcept {
-    // An empty separator would be found everywhere; it separates nothing.
-    if (separator.size() == 1) {
-        end = std::min(text.find(separator.front(), position), text.size());
-    } else {
-        end = separator.empty() ? text.size() : std::min(text.find(separator, position), text.size());
-    }
-}
-
 PM_DEVKEY::PM_DEVKEY(const char* file, const PM_PIC&, unsigned char, unsigned char, unsigned char)
-    : PM_DEVKEY(acd::Store::instance().databaseOfFile(orEmpty(file)), nullptr) {}
+    : PM_DEVKEY(acd::Store::instance().databaseOfFile(nullToEmpty(file)), nullptr) {}
 
 PM_DEVKEY::PM_DEVKEY(const acd::Database& database, const acd::Section* section) noexcept
     : m_database(database), m_section(section) {}
 
+PM_DEVKEY::~PM_DEVKEY() { acd::ReadLog::forget(*this); }
+
 const char* PM_DEVKEY::getstringbykey(const char* key, const char* separator, short index,
                                       const char* subSeparator, short subIndex) {
-    if (key == nullptr) {
-        return nullptr;
-    }
+    m_request = {index, subIndex, subSeparator != nullptr, false};
+    m_request.isFound = find(nullToEmpty(key), separator, subSeparator);
+    acd::ReadLog::add(*this);
+    return m_request.isFound ? m_result.c_str() : nullptr;
+}
+
+/// Looks for what `m_request` asks for, and makes it the result.
+/// @return whether it exists
+bool PM_DEVKEY::find(const char* key, const char* separator, const char* subSeparator) {
     if (!isSame(m_key, key) || !isSame(m_separator, separator)) {
-        select(key, orEmpty(separator));
+        select(key, nullToEmpty(separator));
     }
     // A negative index becomes one that is larger than any list.
-    if (m_value.empty() || !moveToItem(static_cast<std::size_t>(index))) {
-        return nullptr;
+    if (m_value.empty() || !moveToItem(static_cast<std::size_t>(m_request.index))) {
+        return false;
     }
-    std::string_view piece = m_item.piece(m_value);
+    std::string_view part = m_item.part(m_value);
     if (subSeparator != nullptr) {
         if (!isSame(m_subSeparator, subSeparator)) {
             m_subSeparator = subSeparator;
-            m_field.start(piece, m_subSeparator);
+            m_field.start(part, m_subSeparator);
         }
-        if (!m_field.moveTo(static_cast<std::size_t>(subIndex), piece, m_subSeparator)) {
-            return nullptr;
+        if (!m_field.moveTo(static_cast<std::size_t>(m_request.subIndex), part, m_subSeparator)) {
+            return false;
         }
-        piece = m_field.piece(piece);
+        part = m_field.part(part);
     }
-    m_result = piece;
-    return m_result.c_str();
+    m_result = part;
+    return true;
 }
 
 /// Makes the value of `key` the current one, split at `separator`.
@@ -99,15 +78,15 @@ void PM_DEVKEY::select(std::string_view key, std::string_view separator) {
     if (const acd::Value* const value = m_database.find(m_section, key)) {
         m_value = value->text();
         m_item.start(m_value, m_separator);
-        m_field.start(m_item.piece(m_value), m_subSeparator);
+        m_field.start(m_item.part(m_value), m_subSeparator);
     }
 }
 
 bool PM_DEVKEY::moveToItem(std::size_t index) noexcept {
-    const std::size_t former = m_item.index;
+    const std::size_t former = m_item.index();
     const bool found = m_item.moveTo(index, m_value, m_separator);
-    if (m_item.index != former) {
-        m_field.start(m_item.piece(m_value), m_subSeparator);
+    if (m_item.index() != former) {
+        m_field.start(m_item.part(m_value), m_subSeparator);
     }
     return found;
 }

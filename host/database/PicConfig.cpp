@@ -1,7 +1,7 @@
 #include <PicConfig.h>
 
 #include "database/Store.h"
-#include "text/OrEmpty.h"
+#include "text/NullToEmpty.h"
 
 // Finds the family of a part. Its database stays closed: a part's family is often asked for when nothing else
 // is.
@@ -9,7 +9,7 @@
 namespace {
 
 [[nodiscard]] const char* moduleOf(const char* name) {
-    const acd::Family* const family = acd::Store::instance().resolve(orEmpty(name)).family;
+    const acd::Family* const family = acd::Store::instance().resolve(nullToEmpty(name)).family;
     return family == nullptr ? nullptr : family->name.c_str();
 }
 

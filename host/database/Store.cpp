@@ -1,5 +1,7 @@
 #include "database/Store.h"
 
+#include "database/ReadLog.h"
+
 #include <TarvikException.h>
 
 #include <utility>
@@ -9,6 +11,16 @@
 
 namespace acd {
 
+namespace {
+
+/// No value that was read is the cause.
+[[noreturn]] void raise(int location) {
+    ReadLog::clear();
+    throw DataNotFoundException(PRODUCT, SOURCE, REVISION, location);
+}
+
+} // namespace
+
 Store*& Store::current() {
     // Never destroyed: readers may be used until the very end of the process.
     static auto* store = new Store;
@@ -17,25 +29,32 @@ Store*& Store::current() {
 
 Store& Store::instance() { return *current(); }
 
-void Store::forget() { delete std::exchange(current(), new Store); }
+void Store::resetForTesting() { delete std::exchange(current(), new Store); }
 
 void Store::setSearchPath(std::vector<std::string> directories) {
-    retire();
+    if (isSettled("the search path")) {
+        return;
+    }
     m_memoryFiles.reset();
     m_searchPath = SearchPath{std::move(directories), {}};
 }
 
 void Store::setMemoryFiles(MemoryFiles files) {
-    auto shared = std::make_shared<const MemoryFiles>(std::move(files));
-    retire();
-    m_memoryFiles = std::move(shared);
+    if (isSettled("the files in memory")) {
+        return;
+    }
+    m_memoryFiles = std::make_shared<const MemoryFiles>(std::move(files));
     m_searchPath = SearchPath();
 }
 
-void Store::retire() {
-    if (m_catalogue != nullptr) {
-        m_retired.push_back(std::move(m_catalogue));
+/// Databases never change once they have been looked for: answers of two would be mixed. Reports an attempt.
+bool Store::isSettled(const char* what) {
+    if (m_catalogue == nullptr) {
+        return false;
     }
+    m_messages.addTooLate(what);
+    m_messages.issue();
+    return true;
 }
 
 const std::vector<std::string>& Store::directories() { return searchPath().directories; }
@@ -49,15 +68,13 @@ const SearchPath& Store::searchPath() {
 
 Catalogue& Store::catalogue() {
     if (m_catalogue == nullptr) {
-        Reports found;
+        DeferredMessages found;
         m_catalogue = m_memoryFiles != nullptr ? std::make_unique<Catalogue>(m_memoryFiles)
                                                : std::make_unique<Catalogue>(directories(), found);
-        m_reports.add(std::move(found));
+        m_messages.add(std::move(found));
     }
-    // Who receives the reports may set another search path; this catalogue then lives on, retired.
-    Catalogue& catalogue = *m_catalogue;
-    m_reports.issue();
-    return catalogue;
+    m_messages.issue();
+    return *m_catalogue;
 }
 
 const std::vector<std::unique_ptr<Family>>& Store::families() { return catalogue().families(); }
@@ -65,6 +82,8 @@ const std::vector<std::unique_ptr<Family>>& Store::families() { return catalogue
 Family* Store::family(std::string_view name) { return catalogue().family(name); }
 
 Resolution Store::resolve(std::string_view name) {
+    // What was read before has nothing to do with what may be wrong with this name.
+    ReadLog::clear();
     Catalogue& catalogue = this->catalogue();
     const auto resolveWhole = [&](std::string_view whole) -> Resolution {
         if (Family* const family = catalogue.familyOfFile(whole)) {
@@ -73,17 +92,17 @@ Resolution Store::resolve(std::string_view name) {
         if (Family* const family = catalogue.family(whole)) {
             return {family, {}};
         }
-        return {catalogue.familyOfDevice(whole, m_reports), whole};
+        return {catalogue.familyOfDevice(whole, m_messages), whole};
     };
     Resolution resolution = resolveWhole(name);
     if (const std::size_t cut = name.find('_'); resolution.family == nullptr && cut != name.npos) {
         resolution = resolveWhole(name.substr(0, cut));
     }
-    m_reports.issue();
+    m_messages.issue();
     return resolution;
 }
 
-Opened Store::open(std::string_view name) {
+DatabaseHandle Store::open(std::string_view name) {
     const Resolution resolution = resolve(name);
     if (resolution.family == nullptr) {
         return {nullptr, &m_nothing, nullptr};
@@ -92,13 +111,13 @@ Opened Store::open(std::string_view name) {
     return {resolution.family, &database, database.section(resolution.device)};
 }
 
-Opened Store::openBase() {
+DatabaseHandle Store::openBase() {
     if (Family* const base = family("base")) {
         return {base, &database(*base), nullptr};
     }
-    m_reports.addMissingBase(placesSearched());
-    m_reports.issue();
-    throw DataNotFoundException(PRODUCT, SOURCE, REVISION, location::BASE_MISSING);
+    m_messages.addMissingBase(placesSearched());
+    m_messages.issue();
+    raise(location::BASE_MISSING);
 }
 
 /// Where the catalogue comes from, for the user to look there.
@@ -118,10 +137,10 @@ std::string Store::placesSearched() {
 }
 
 const Database& Store::database(Family& family) {
-    const Database* const database = catalogue().database(family, m_reports);
-    m_reports.issue();
+    const Database* const database = catalogue().database(family, m_messages);
+    m_messages.issue();
     if (database == nullptr) {
-        throw DataNotFoundException(PRODUCT, SOURCE, REVISION, location::FILE_UNREADABLE);
+        raise(location::FILE_UNREADABLE);
     }
     return *database;
 }
@@ -133,15 +152,15 @@ const Database& Store::databaseOfFile(std::string_view fileName) {
 
 Text Store::read(const SourceFile& file) {
     try {
-        return readWhole(*catalogue().open(file));
-    } catch (const Unreadable& unreadable) {
-        m_reports.add(file.path, location::FILE_UNREADABLE, unreadable.what());
+        return readAll(*catalogue().open(file));
+    } catch (const ReadError& unreadable) {
+        m_messages.add(file.path, location::FILE_UNREADABLE, unreadable.what());
     }
-    m_reports.issue();
-    throw DataNotFoundException(PRODUCT, SOURCE, REVISION, location::FILE_UNREADABLE);
+    m_messages.issue();
+    raise(location::FILE_UNREADABLE);
 }
 
-PM_DEVKEY& Store::accessor(const Opened& opened) {
+PM_DEVKEY& Store::accessor(const DatabaseHandle& opened) {
     if (opened.family == nullptr) {
         return m_nothingAccessor;
     }

@@ -20,7 +20,7 @@ struct Resolution {
 };
 
 /// A database that was opened by a name.
-struct Opened {
+struct DatabaseHandle {
     Family* family; ///< null when the name resolved to nothing; the database is then an empty one
     const Database* database;
     const Section* section; ///< null for the family itself
@@ -32,9 +32,9 @@ public:
     [[nodiscard]] static Store& instance();
 
     /// Makes the process forget all that was set and read.
-    static void forget();
+    static void resetForTesting();
 
-    /// From now on databases come from there. Those already read stay as they are, for those who use them.
+    /// Sets where databases come from. Ignored, with a message, once they have been looked for.
     void setSearchPath(std::vector<std::string> directories);
     void setMemoryFiles(MemoryFiles files);
 
@@ -51,11 +51,11 @@ public:
 
     /// Opens what a name stands for.
     /// @throw DataNotFoundException when it can't be read
-    [[nodiscard]] Opened open(std::string_view name);
+    [[nodiscard]] DatabaseHandle open(std::string_view name);
 
     /// Opens the base database.
     /// @throw DataNotFoundException when there is none or it can't be read
-    [[nodiscard]] Opened openBase();
+    [[nodiscard]] DatabaseHandle openBase();
 
     /// The database of a family.
     /// @throw DataNotFoundException when it can't be read
@@ -70,7 +70,7 @@ public:
     [[nodiscard]] Text read(const SourceFile& file);
 
     /// The one accessor of what was opened, however often that is.
-    [[nodiscard]] PM_DEVKEY& accessor(const Opened& opened);
+    [[nodiscard]] PM_DEVKEY& accessor(const DatabaseHandle& opened);
 
 private:
     Store() = default;
@@ -80,13 +80,12 @@ private:
     [[nodiscard]] const SearchPath& searchPath();
     [[nodiscard]] Catalogue& catalogue();
     [[nodiscard]] std::string placesSearched();
-    void retire();
+    [[nodiscard]] bool isSettled(const char* what);
 
     std::shared_ptr<const MemoryFiles> m_memoryFiles; ///< null while databases come from directories
     std::optional<SearchPath> m_searchPath;           ///< once it is settled
-    std::unique_ptr<Catalogue> m_catalogue;
-    std::vector<std::unique_ptr<Catalogue>> m_retired;
-    Reports m_reports;
+    std::unique_ptr<Catalogue> m_catalogue;           ///< once databases have been looked for
+    DeferredMessages m_messages;
 
     const Database m_nothing{};
     PM_DEVKEY m_nothingAccessor{m_nothing, nullptr};

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <TarvikAbi.h>
+
 #include <cstddef>
 #include <string>
 #include <string_view>
@@ -15,11 +17,11 @@ public:
         HEADER,     ///< `[name]`
         ASSIGNMENT, ///< `name = value`
         APPEND,     ///< `name += value`
-        FAULT,      ///< means nothing
+        INVALID,    ///< means nothing
     };
 
     /// What can be wrong with a line.
-    enum class Fault {
+    enum class ParseError {
         NONE,               ///< nothing
         NO_EQUALS_SIGN,     ///< neither a header nor an assignment
         EMPTY_KEY,          ///< nothing before the `=`
@@ -34,7 +36,7 @@ public:
     };
 
     /// Where a piece of a value was written; lines and columns are counted from 1, columns in bytes.
-    struct Fragment {
+    struct SourceSpan {
         std::size_t offset; ///< of its first byte in the value
         unsigned line;      ///< of the file
         unsigned column;    ///< of its first byte in that line
@@ -42,17 +44,17 @@ public:
 
     /// A line, its continuations joined.
     struct Line {
-        Kind kind;                       ///< what it is
-        unsigned firstLine;              ///< the first line of the file that it consists of
-        unsigned lastLine;               ///< and the last one
-        std::string_view name;           ///< of a section, or the key; empty for a fault
-        std::string_view value;          ///< empty for headers and faults
-        std::vector<Fragment> fragments; ///< of the value, in order; one at least, even of an empty value
-        unsigned line;                   ///< of the file, where the name or the fault stands
-        unsigned column;                 ///< of the same
-        Fault fault;                     ///< `NONE` for all other kinds
-        bool closesSection; ///< a header's fault: the keys up to the next header belong to nothing
-        std::string text;   ///< what the fault is, in words
+        Kind kind;                     ///< what it is
+        unsigned firstLine;            ///< the first line of the file that it consists of
+        unsigned lastLine;             ///< and the last one
+        std::string_view name;         ///< of a section, or the key; empty for an error
+        std::string_view value;        ///< empty for headers and errors
+        std::vector<SourceSpan> spans; ///< of the value, in order; one at least, even of an empty value
+        unsigned line;                 ///< of the file, where the name or the error stands
+        unsigned column;               ///< of the same
+        ParseError error;              ///< `NONE` for all other kinds
+        bool closesSection;            ///< a header's error: the keys up to the next header belong to nothing
+        std::string text;              ///< what the error is, in words
     };
 
     /// A comment, from its `#` on.
@@ -90,7 +92,7 @@ public:
 
     /// Files that are never read.
     /// @return the paths of files of the same directory whose names differ from this one's in case alone
-    [[nodiscard]] const std::vector<std::string>& namesakes() const noexcept { return m_namesakes; }
+    [[nodiscard]] const std::vector<std::string>& caseCollisions() const noexcept { return m_caseCollisions; }
 
     /// @return the lines in the order of the file; their texts live as long as this object, wherever it is moved
     [[nodiscard]] const std::vector<Line>& lines() const noexcept { return m_lines; }
@@ -103,13 +105,16 @@ public:
     [[nodiscard]] std::string_view source(unsigned line) const noexcept;
 
 private:
+    friend class AcdFamily;
+
+    [[nodiscard]] const Line* lineOfName(const char* name) const noexcept;
     void splitSource();
     void readLines();
     [[nodiscard]] unsigned addComments(unsigned first, unsigned last);
 
     std::string m_path;
     std::string m_family;
-    std::vector<std::string> m_namesakes;
+    std::vector<std::string> m_caseCollisions;
     std::vector<char> m_source; ///< vectors, since their texts stay where they are when they are moved
     std::vector<char> m_joined; ///< the same bytes with continuations joined: what the lines' texts are
     std::vector<std::size_t> m_starts; ///< of the lines in the source

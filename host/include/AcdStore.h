@@ -1,6 +1,9 @@
 #pragma once
 
+#include <TarvikAbi.h>
+
 #include <cstddef>
+#include <functional>
 #include <map>
 #include <optional>
 #include <string>
@@ -15,12 +18,14 @@
 /// What has been read lives as long as the process.
 class __attribute__((visibility("default"))) AcdStore {
 public:
-    /// Looks in these directories. Call it before the first reader.
+    /// Looks in these directories. To be called before the first reader: once a reader, a configuration or a
+    /// method of this class but `searchPath()` has looked for a database, so once a manager exists, the call is
+    /// ignored and an info message says so.
     /// @param directories the first one on top: where several hold a file, its keys replace or, with `+=`,
     ///        extend those of the layers below
     static void setSearchPath(std::vector<std::string> directories);
 
-    /// Holds these files in place of any directory. Call it before the first reader.
+    /// Uses these files instead of any directory. To be called before the first reader, as `setSearchPath`.
     /// @param files name ("kestrel.acd") to text
     static void setMemoryFiles(std::map<std::string, std::string> files);
 
@@ -40,7 +45,7 @@ public:
 
     /// Where a piece of a value was written. A value is one fragment, or several where lines are continued or
     /// texts appended.
-    struct Fragment {
+    struct SourceSpan {
         std::size_t offset;     ///< of its first byte in the value
         std::string_view file;  ///< the path, or the name of a memory file
         std::string_view layer; ///< the directory of the search path; empty for a memory file
@@ -50,9 +55,9 @@ public:
 
     /// A value with its origin.
     struct Value {
-        std::string_view text;           ///< lives as long as the process
-        std::vector<Fragment> fragments; ///< in order; never empty
-        bool fromSection;                ///< false: one of the family's own keys
+        std::string_view text;         ///< lives as long as the process
+        std::vector<SourceSpan> spans; ///< in order; never empty
+        bool fromSection;              ///< false: one of the family's own keys
 
         /// The values of layers below that `KEY = ...` on top replaced, the upper ones first. They have none
         /// themselves.
@@ -61,7 +66,7 @@ public:
         /// Where one byte of the text was written.
         /// @param offset of the byte
         /// @return the fragment that it stands in, its column moved to that byte
-        [[nodiscard]] Fragment at(std::size_t offset) const;
+        [[nodiscard]] SourceSpan at(std::size_t offset) const;
     };
 
     /// A value and where it comes from.
@@ -71,10 +76,51 @@ public:
     /// @throw DataNotFoundException when the family's file can't be read
     [[nodiscard]] static std::optional<Value> value(const char* name, const char* key);
 
+    /// A place in a database file.
+    struct SourceLocation {
+        std::string_view file;  ///< the path, or the name of a memory file; empty: no place
+        std::string_view layer; ///< the directory of the search path; empty for a memory file
+        unsigned line = 0;      ///< counted from 1
+        unsigned column = 0;    ///< counted from 1, in bytes
+    };
+
+    /// One call of `PM_DEVKEY::getstringbykey`. The texts `key`, `separator`, `subSeparator` and `text` are valid
+    /// during the observer's call; all others live as long as the process.
+    struct Read {
+        std::string_view family; ///< whose database was read, as its file spells it; empty: an empty database
+        std::string_view
+            device; ///< whose accessor was asked, as its section spells it; empty: the family's own
+
+        std::string_view key;
+        std::string_view separator; ///< between items; empty: the whole value is item 0
+        short item;                 ///< the index that was asked for, counted from 0
+        const char* subSeparator;   ///< between the fields of an item; null: the whole item was asked for
+        short field;                ///< the index that was asked for, counted from 0; without a meaning if
+                                    ///< `subSeparator` is null
+
+        const char* text;        ///< the result; null when the key, the item or the field does not exist
+        SourceLocation location; ///< of the first byte of `text`; no place when that is null
+
+        std::string_view value;      ///< the whole value of the key; empty when there is no such key
+        std::string_view itemText;   ///< the whole item, in `value`; empty when there is no such item
+        SourceLocation itemLocation; ///< of the first byte of the item; no place when there is no such item
+        bool fromSection; ///< whether the key is in the device's section, not the family's own keys
+    };
+
+    /// Is told of every read.
+    using ReadObserver = std::function<void(const Read&)>;
+
+    /// Calls `observer` after each read of any accessor, before the reader gets the result. Costs one branch a
+    /// read while there is no observer. What the observer throws passes through to whoever reads. Reads that
+    /// the observer makes itself are not observed, and must not be made on the accessor that is being read.
+    /// @param observer an empty one ends the observation
+    /// @return the former observer; empty when there was none
+    static ReadObserver setReadObserver(ReadObserver observer);
+
 private:
     friend class TarvikTestPeer;
 
-    /// Forgets everything, the search path included, as if nothing had been asked yet. All readers and
+    /// Forgets everything, the search path and the observer included, as if nothing had been asked yet. All readers and
     /// accessors become invalid.
-    static void forget();
+    static void resetForTesting();
 };

@@ -1,5 +1,8 @@
 #pragma once
 
+#include <AcdText.h>
+#include <TarvikAbi.h>
+
 #include <cstddef>
 #include <string>
 #include <string_view>
@@ -8,6 +11,7 @@ class PM_PIC;
 
 namespace acd {
 class Database;
+class ReadLog;
 class Section;
 } // namespace acd
 
@@ -29,6 +33,8 @@ public:
     /// @param section must outlive it, too; null: the family's own keys
     PM_DEVKEY(const acd::Database& database, const acd::Section* section) noexcept;
 
+    ~PM_DEVKEY();
+
     PM_DEVKEY(const PM_DEVKEY&) = delete;
     PM_DEVKEY& operator=(const PM_DEVKEY&) = delete;
 
@@ -48,20 +54,17 @@ public:
                                              const char* subSeparator, short subIndex);
 
 private:
-    /// Where a walk over the pieces of a text stands.
-    struct Cursor {
-        std::size_t index = 0;
-        std::size_t position = 0; ///< of the piece's first byte
-        std::size_t end = 0;      ///< behind its last one
+    friend class acd::ReadLog;
 
-        void start(std::string_view text, std::string_view separator) noexcept;
-        bool moveTo(std::size_t wanted, std::string_view text, std::string_view separator) noexcept;
-        void findEnd(std::string_view text, std::string_view separator) noexcept;
-        [[nodiscard]] std::string_view piece(std::string_view text) const noexcept {
-            return text.substr(position, end - position);
-        }
+    /// What the latest call asked for, and whether it exists.
+    struct Request {
+        short index = 0;
+        short subIndex = 0;
+        bool hasSubSeparator = false;
+        bool isFound = false;
     };
 
+    [[nodiscard]] bool find(const char* key, const char* separator, const char* subSeparator);
     void select(std::string_view key, std::string_view separator);
     bool moveToItem(std::size_t index) noexcept;
 
@@ -71,10 +74,11 @@ private:
     std::string m_key;
     std::string m_separator;
     std::string_view m_value;
-    Cursor m_item;
+    AcdText::PartCursor m_item;
 
     std::string m_subSeparator;
-    Cursor m_field;
+    AcdText::PartCursor m_field;
 
+    Request m_request;
     std::string m_result;
 };

@@ -1,7 +1,7 @@
 #include "Port_MsgManData.h"
 
 #include "text/Formatting.h"
-#include "text/OrEmpty.h"
+#include "text/NullToEmpty.h"
 
 #include <cstdarg>
 #include <cstdio>
@@ -71,43 +71,44 @@ Port_MsgManData Port_MsgManData::createObject(const char* product, const char* s
 
 Port_MsgManData::Port_MsgManData(const char* product, const char* source, int line,
                                  const char* revision) noexcept
-    : m_product(orEmpty(product)), m_source(orEmpty(source)), m_line(line), m_revision(orEmpty(revision)) {}
+    : m_product(nullToEmpty(product)), m_source(nullToEmpty(source)), m_line(line),
+      m_revision(nullToEmpty(revision)) {}
 
 void Port_MsgManData::issueInfo(const char* text) const {
-    send({Channel::INFO, m_product, m_source, m_line, m_revision, formatting::finished(text)});
+    send({Channel::INFO, m_product, m_source, m_line, m_revision, formatting::unescapePercent(text)});
 }
 
 template <typename Formatted>
 void Port_MsgManData::issueInfo(const char* format, ...) const {
     std::va_list arguments;
     va_start(arguments, format);
-    const std::string text = formatting::formatted(format, arguments);
+    const std::string text = formatting::vformat(format, arguments);
     va_end(arguments);
     send({Channel::INFO, m_product, m_source, m_line, m_revision, text});
 }
 template void Port_MsgManData::issueInfo<void>(const char* format, ...) const;
 
 void Port_MsgManData::issueStatus(const char* text) const {
-    send({Channel::STATUS, m_product, m_source, m_line, m_revision, formatting::finished(text)});
+    send({Channel::STATUS, m_product, m_source, m_line, m_revision, formatting::unescapePercent(text)});
 }
 
 template <typename Formatted>
 void Port_MsgManData::issueStatus(const char* format, ...) const {
     std::va_list arguments;
     va_start(arguments, format);
-    const std::string text = formatting::formatted(format, arguments);
+    const std::string text = formatting::vformat(format, arguments);
     va_end(arguments);
     send({Channel::STATUS, m_product, m_source, m_line, m_revision, text});
 }
 template void Port_MsgManData::issueStatus<void>(const char* format, ...) const;
 
-void Port_MsgManData::debugStub(const char* text) { sendDebug(formatting::finished(text)); }
+void Port_MsgManData::debugStub(const char* text) { sendDebug(formatting::unescapePercent(text)); }
 
 template <typename Formatted>
 void Port_MsgManData::debugStub(const char* format, ...) {
     std::va_list arguments;
     va_start(arguments, format);
-    const std::string text = formatting::formatted(format, arguments);
+    const std::string text = formatting::vformat(format, arguments);
     va_end(arguments);
     sendDebug(text);
 }

@@ -6,7 +6,7 @@
 
 // Formatting, apart from the classes that offer it: texts, messages and the recorder all format alike.
 
-std::string formatting::finished(const char* text) {
+std::string formatting::unescapePercent(const char* text) {
     std::string result;
     if (text == nullptr) {
         return result;
@@ -20,7 +20,7 @@ std::string formatting::finished(const char* text) {
     return result;
 }
 
-std::string formatting::formatted(const char* format, std::va_list arguments) {
+std::string formatting::vformat(const char* format, std::va_list arguments) {
     if (format == nullptr) {
         return {};
     }

@@ -9,10 +9,10 @@ namespace formatting {
 
 /// Finishes a text that stands in a format position without arguments: `%%` gives `%`, any other `%` stands as
 /// it is. Null is the empty text.
-[[nodiscard]] std::string finished(const char* text);
+[[nodiscard]] std::string unescapePercent(const char* text);
 
 /// What printf would print; a null text shows `(null)`, or nothing where the precision is less than that takes.
 /// Null is the empty format. A format that can't be printed (a result of over 2 GiB) stands as it is.
-[[nodiscard, gnu::format(printf, 1, 0)]] std::string formatted(const char* format, std::va_list arguments);
+[[nodiscard, gnu::format(printf, 1, 0)]] std::string vformat(const char* format, std::va_list arguments);
 
 } // namespace formatting

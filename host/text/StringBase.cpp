@@ -1,7 +1,8 @@
 #include "StringBase.h"
 
-#include "text/Ascii.h"
 #include "text/Formatting.h"
+
+#include <AcdText.h>
 
 #include <algorithm>
 #include <array>
@@ -40,54 +41,54 @@ consteval ChecksumTables makeChecksumTables() {
 
 constexpr ChecksumTables CHECKSUMS = makeChecksumTables();
 
-std::uint32_t fourBytes(const char* bytes) noexcept {
+std::uint32_t loadLe32(const char* bytes) noexcept {
     const auto byte = [bytes](int index) { return std::uint32_t{static_cast<unsigned char>(bytes[index])}; };
     return byte(0) | byte(1) << 8 | byte(2) << 16 | byte(3) << 24;
 }
 
 /// What four bytes add to the checksum of a text in which `behind` more bytes follow on them.
-std::uint32_t shareOf(std::uint32_t word, std::size_t behind) noexcept {
+std::uint32_t crcStep(std::uint32_t word, std::size_t behind) noexcept {
     return CHECKSUMS[behind + 3][word & 0xFF] ^ CHECKSUMS[behind + 2][word >> 8 & 0xFF] ^
            CHECKSUMS[behind + 1][word >> 16 & 0xFF] ^ CHECKSUMS[behind][word >> 24];
 }
 
 } // namespace
 
-void StringBase::Format(const char* text) { m_text = formatting::finished(text); }
+void StringBase::Format(const char* text) { m_text = formatting::unescapePercent(text); }
 
 template <typename Formatted>
 void StringBase::Format(const char* format, ...) {
     std::va_list arguments;
     va_start(arguments, format);
     // Into a text of its own first: an argument may be this very text.
-    std::string result = formatting::formatted(format, arguments);
+    std::string result = formatting::vformat(format, arguments);
     va_end(arguments);
     m_text = std::move(result);
 }
 template void StringBase::Format<void>(const char* format, ...);
 
 void StringBase::MakeUpper() noexcept {
-    std::transform(m_text.begin(), m_text.end(), m_text.begin(), ascii::toUpper);
+    std::transform(m_text.begin(), m_text.end(), m_text.begin(), AcdText::toUpper);
 }
 
 void StringBase::MakeLower() noexcept {
-    std::transform(m_text.begin(), m_text.end(), m_text.begin(), ascii::toLower);
+    std::transform(m_text.begin(), m_text.end(), m_text.begin(), AcdText::toLower);
 }
 
 void StringBase::Truncate(std::size_t length) noexcept { m_text.resize(std::min(length, m_text.size())); }
 
 int StringBase::ICompare(const StringBase& other) const noexcept {
-    return ascii::compareIgnoringCase(m_text, other.m_text);
+    return AcdText::compareIgnoreCase(m_text, other.m_text);
 }
 
 std::uint32_t StringBase::CRC32(const char* bytes, std::size_t length, std::uint32_t former) noexcept {
     std::uint32_t checksum = ~former;
     for (; length >= 8; length -= 8, bytes += 8) {
-        checksum = shareOf(checksum ^ fourBytes(bytes), 4) ^ shareOf(fourBytes(bytes + 4), 0);
+        checksum = crcStep(checksum ^ loadLe32(bytes), 4) ^ crcStep(loadLe32(bytes + 4), 0);
     }
     // Keys are short: much of them may be the rest that fills no eight bytes.
     if (length >= 4) {
-        checksum = shareOf(checksum ^ fourBytes(bytes), 0);
+        checksum = crcStep(checksum ^ loadLe32(bytes), 0);
         length -= 4;
         bytes += 4;
     }

@@ -1,7 +1,8 @@
 #include "UT_STR.h"
 
-#include "text/Ascii.h"
-#include "text/OrEmpty.h"
+#include "text/NullToEmpty.h"
+
+#include <AcdText.h>
 
 #include <algorithm>
 #include <cstdint>
@@ -18,19 +19,19 @@ bool isDigit(char byte) noexcept { return byte >= '0' && byte <= '9'; }
 } // namespace
 
 int UT_STR::Compare(const char* left, const char* right) noexcept {
-    return std::strcmp(orEmpty(left), orEmpty(right));
+    return std::strcmp(nullToEmpty(left), nullToEmpty(right));
 }
 
 int UT_STR::ICompare(const char* left, const char* right) noexcept {
     // Vocabularies are searched with it: most texts differ at once, long before their ends would be found.
-    left = orEmpty(left);
-    right = orEmpty(right);
-    while (*left != '\0' && ascii::toLower(*left) == ascii::toLower(*right)) {
+    left = nullToEmpty(left);
+    right = nullToEmpty(right);
+    while (*left != '\0' && AcdText::toLower(*left) == AcdText::toLower(*right)) {
         ++left;
         ++right;
     }
-    return static_cast<unsigned char>(ascii::toLower(*left)) -
-           static_cast<unsigned char>(ascii::toLower(*right));
+    return static_cast<unsigned char>(AcdText::toLower(*left)) -
+           static_cast<unsigned char>(AcdText::toLower(*right));
 }
 
 long UT_STR::AToL(const char* text) noexcept {

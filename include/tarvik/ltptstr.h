@@ -17,7 +17,15 @@ struct ltptstr {
         return {text.c_str(), text.GetLength()};
     }
 
-    /// @param text any text; must outlive the result
+    /// The bytes of a NUL-terminated text.
+    /// @param text null is the empty text; must outlive the result
+    /// @return its bytes
+    [[nodiscard]] static std::string_view view(const char* text) noexcept {
+        return text == nullptr ? std::string_view() : std::string_view(text);
+    }
+
+    /// As above, of a text that is one already.
+    /// @param text any text
     /// @return the same
     [[nodiscard]] static std::string_view view(std::string_view text) noexcept { return text; }
 

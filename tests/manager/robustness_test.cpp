@@ -56,7 +56,7 @@ std::string answers(ConstraintsManager& manager, const char* device, const char*
         try {
             out << question() << '\n';
         } catch (const TarvikException& exception) {
-            out << exception.what() << ' ' << exception.line() << '\n';
+            out << exception.typeName() << ' ' << exception.line() << '\n';
         }
     };
     const auto list = [](const ConstraintsManager::TextSet& set) {

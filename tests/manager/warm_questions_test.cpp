@@ -1,6 +1,6 @@
 #include "Members.h"
 
-#include <database/CountedAllocations.h>
+#include "host/database/CountedAllocations.h"
 
 // Questions that were asked before: they take nothing from the heap, and leave all that the first one left.
 

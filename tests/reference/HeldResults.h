@@ -59,12 +59,4 @@ private:
     std::vector<const char*> m_texts;
 };
 
-/// Holds nothing: the reference returns copies.
-struct NothingHeld {
-    template <typename Result>
-    const Result& hold(const Result& result) {
-        return result;
-    }
-};
-
 } // namespace reference

@@ -103,19 +103,21 @@ std::string compare(const std::string& what, const Outcome& expected, const Outc
 }
 
 void ManagerMessages::listen() {
-    Port_MsgManData::setSink([this](const Port_MsgManData::Message& message) {
-        const bool debug = message.channel == Port_MsgManData::Channel::DEBUG;
-        if (message.source == DATABASE_SOURCE) {
-            ++m_ofDatabase;
-            return;
-        }
-        std::string text(message.text);
-        if (!debug && (message.product != MANAGER_PRODUCT || message.source != MANAGER_SOURCE)) {
-            text += " from " + std::string(message.product) + " " + std::string(message.source);
-        }
-        const int line = hasAnyLine(text) ? ANY_LINE : message.line;
-        m_messages.push_back({static_cast<Channel>(message.channel), line, std::move(text)});
-    });
+    Port_MsgManData::setSink([this](const Port_MsgManData::Message& message) { add(message); });
+}
+
+void ManagerMessages::add(const Port_MsgManData::Message& message) {
+    const bool debug = message.channel == Port_MsgManData::Channel::DEBUG;
+    if (message.source == DATABASE_SOURCE) {
+        ++m_ofDatabase;
+        return;
+    }
+    std::string text(message.text);
+    if (!debug && (message.product != MANAGER_PRODUCT || message.source != MANAGER_SOURCE)) {
+        text += " from " + std::string(message.product) + " " + std::string(message.source);
+    }
+    const int line = hasAnyLine(text) ? ANY_LINE : message.line;
+    m_messages.push_back({static_cast<Channel>(message.channel), line, std::move(text)});
 }
 
 std::vector<Message> ManagerMessages::take() { return std::exchange(m_messages, {}); }

@@ -68,6 +68,9 @@ public:
     /// Takes all messages from now on.
     void listen();
 
+    /// Takes one message.
+    void add(const Port_MsgManData::Message& message);
+
     /// What the manager issued since the last call.
     [[nodiscard]] std::vector<Message> take();
 

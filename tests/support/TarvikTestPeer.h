@@ -26,7 +26,7 @@ public:
 
     static void reset() {
         removeManager();
-        AcdStore::forget();
+        AcdStore::resetForTesting();
         Port_MsgManData::setSink({});
     }
 

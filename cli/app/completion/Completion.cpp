@@ -1,11 +1,9 @@
-// What can stand at a place of the command line: the one vocabulary of the completions of all shells.
+// Finds the words that may continue a command line, for the completions of all shells.
 #include "app/completion/Completion.h"
 
-#include "app/LongOptions.h"
 #include "app/completion/PartialCommandLine.h"
 #include "lint/Rule.h"
 #include "model/Catalogue.h"
-#include "model/Multiboot.h"
 #include "model/Vocabulary.h"
 #include "query/Demonstration.h"
 #include "term/Messages.h"
@@ -18,8 +16,6 @@
 #include <tarvik/ConstraintsManager.h>
 
 #include <algorithm>
-#include <functional>
-#include <map>
 #include <set>
 
 namespace completion {
@@ -33,20 +29,15 @@ struct Candidate {
 
 using Words = std::vector<std::string>;
 
-Words joined(Words left, const Words& right) {
-    left.insert(left.end(), right.begin(), right.end());
-    return left;
-}
-
 Words modes() {
     Words all = vocabulary::modes();
-    for (std::size_t mode = 0; mode < vocabulary::modes().size(); ++mode) {
-        all = joined(std::move(all), vocabulary::otherModeTexts(static_cast<TARVIKNS::MODE_TYPE>(mode)));
+    for (const vocabulary::Word& word : vocabulary::words(vocabulary::Kind::MODE)) {
+        all.insert(all.end(), word.others.begin(), word.others.end());
     }
     return all;
 }
 
-std::string device(const CommandLineSoFar& line) {
+std::string device(const PartialCommandLine& line) {
     return line.operands.empty() ? std::string() : line.operands.front();
 }
 
@@ -63,20 +54,45 @@ ConstraintsManager& manager() {
 }
 
 /// The properties of a device and its family, or of all families when there is no device.
-Words properties(const CommandLineSoFar& line) {
-    const Words owners = line.operands.empty()
-                             ? catalogue::families()
-                             : Words{device(line), plain(manager().getPartFamily(device(line).c_str()))};
+Words properties(const PartialCommandLine& line) {
+    const Words owners =
+        line.operands.empty()
+            ? catalogue::families()
+            : Words{device(line), toStdString(manager().getPartFamily(device(line).c_str()))};
     std::set<std::string> keys;
     for (const std::string& owner : owners) {
         addKeys(keys, owner, "PROPERTY");
         addKeys(keys, owner, "PROPERTIES");
-        addKeys(keys, "spi.acd", plain(UT_STR::Upper(owner.c_str())) + "_PROPERTY");
+        addKeys(keys, "spi.acd", toStdString(UT_STR::Upper(owner.c_str())) + "_PROPERTY");
     }
     return {keys.begin(), keys.end()};
 }
 
-Words propertiesToSet(const CommandLineSoFar& line) {
+/// The values that any device has for a property.
+std::set<std::string> valuesOfProperty(const std::string& key) {
+    std::set<std::string> values;
+    for (const std::string& device : catalogue::names()) {
+        for (const StringBase& value : manager().getDeviceStringProperties(device.c_str(), key.c_str())) {
+            values.insert(toStdString(value));
+        }
+        if (manager().isSpiDevice(device.c_str())) {
+            values.insert(manager().getSpiDeviceStringProperty(device.c_str(), key.c_str()));
+        }
+    }
+    values.erase("");
+    return values;
+}
+
+/// "VENDOR=" for each property; after "VENDOR=" its values.
+Words assignments(const PartialCommandLine& line) {
+    const std::size_t equals = line.partialWord.find('=');
+    if (equals != std::string::npos) {
+        Words all;
+        for (const std::string& value : valuesOfProperty(line.partialWord.substr(0, equals))) {
+            all.push_back(line.partialWord.substr(0, equals + 1) + value);
+        }
+        return all;
+    }
     Words keys = properties(line);
     for (std::string& key : keys) {
         key += '=';
@@ -84,10 +100,10 @@ Words propertiesToSet(const CommandLineSoFar& line) {
     return keys;
 }
 
-Words packages(const CommandLineSoFar& line) {
+Words packages(const PartialCommandLine& line) {
     Words all;
     for (const StringBase& package : manager().getDeviceStringProperties(device(line).c_str(), "PACKAGES")) {
-        all.push_back(plain(package));
+        all.push_back(toStdString(package));
     }
     return all;
 }
@@ -108,115 +124,113 @@ Words codes() {
     return all;
 }
 
-/// What can stand for an argument, by the name under which the help shows it. Where a file can stand there is no
-/// entry.
-Words valuesOf(const CommandLineSoFar& line, const std::string& name) {
-    using Values = std::function<Words(const CommandLineSoFar&)>;
-    static const std::map<std::string, Values> all{
-        {"CODE", [](const auto&) { return codes(); }},
-        {"DEVICE",
-         [](const auto& so) { return so.command->get_name() == "spi" ? flashes() : catalogue::names(); }},
-        {"FAMILY", [](const auto&) { return catalogue::families(); }},
-        {"FORMAT",
-         [](const auto&) {
-             return Words{"text", "json", "sarif"};
-         }},
-        {"GLOB", [](const auto&) { return catalogue::names(); }},
-        {"KEY", properties},
-        {"KEY=VALUE", propertiesToSet},
-        {"MODE", [](const auto&) { return modes(); }},
-        {"OPERATION", [](const auto&) { return vocabulary::operations(); }},
-        {"OPTION", [](const auto&) { return vocabulary::options(); }},
-        {"OUTPUT", [](const auto&) { return vocabulary::outputs(); }},
-        {"PACKAGE", packages},
-        {"TABLE",
-         [](const auto&) {
-             return Words{"operations", "bsdl", "options", "families", "multiboot"};
-         }},
-        {"TYPE", [](const auto&) { return multiboot::TYPES; }},
-        {"VALUE", [](const auto&) { return Words{}; }},
-        {"WHEN",
-         [](const auto&) {
-             return Words{"auto", "always", "never"};
-         }},
-        {"WIDTH", [](const auto&) { return multiboot::WIDTHS; }},
-    };
-    const auto found = all.find(name);
-    if (found == all.end()) {
+/// The words that an argument can have.
+/// @throw CommandError (NO) where a file's name is expected
+Words valuesOf(const CommandLine& all, const PartialCommandLine& line, const Argument& argument) {
+    switch (argument.kind) {
+    case ValueKind::PATH:
         throw CommandError(ExitCode::NO, "a file's name");
+    case ValueKind::COMMAND:
+        return all.commandNames();
+    case ValueKind::DEVICE:
+        return catalogue::names();
+    case ValueKind::FLASH:
+        return flashes();
+    case ValueKind::FAMILY:
+        return catalogue::families();
+    case ValueKind::PACKAGE:
+        return packages(line);
+    case ValueKind::MODE:
+        return modes();
+    case ValueKind::OUTPUT:
+        return vocabulary::outputs();
+    case ValueKind::OPERATION:
+        return vocabulary::operations();
+    case ValueKind::OPTION:
+        return vocabulary::options();
+    case ValueKind::PROPERTY:
+        return properties(line);
+    case ValueKind::PROPERTY_VALUE:
+        return assignments(line);
+    case ValueKind::LINT_CODE:
+        return codes();
+    case ValueKind::TEXT:
+    case ValueKind::CHOICE:
+        break;
     }
-    return found->second(line);
+    return argument.choices;
 }
 
-std::vector<Candidate> commandsOf(const CLI::App& parser) {
+std::vector<Candidate> commandsOf(const CommandLine& line) {
     std::vector<Candidate> all;
-    for (const CLI::App* const command : parser.get_subcommands({})) {
-        all.push_back({command->get_name(), command->get_description()});
+    for (const CommandLine::Group& group : line.groups) {
+        for (const DeclaredCommand& declared : group.commands) {
+            all.push_back({declared.command.name, declared.command.summary});
+        }
     }
     return all;
 }
 
-std::vector<Candidate> optionsOf(const CLI::App& parser, const CLI::App* command) {
+std::vector<Candidate> optionsOf(const CommandLine& line, const DeclaredCommand* command) {
     std::vector<Candidate> all;
-    for (OptionName& option : optionNames(parser, command)) {
-        all.push_back({std::move(option.name), std::move(option.description)});
+    for (const Argument* const option : line.optionsOf(command)) {
+        all.push_back({option->name, option->description});
     }
     return all;
 }
 
-/// Opens the database without a word: this is no place to complain about it.
-void openDatabase(const CommandLineSoFar& line) {
-    if (!line.databases.empty()) {
-        AcdStore::setSearchPath(line.databases);
+/// Opens the database without a message: a mistake in it is reported when the command runs.
+void openDatabase(const PartialCommandLine& partial) {
+    if (!partial.databases.empty()) {
+        AcdStore::setSearchPath(partial.databases);
     } else if (AcdStore::searchPath().empty()) {
         AcdStore::setMemoryFiles(demonstrationFiles());
     }
 }
 
-std::vector<Candidate> argumentsOf(const CommandLineSoFar& line) {
-    const CLI::Option& option = *line.argument;
-    openDatabase(line);
+std::vector<Candidate> argumentsOf(const CommandLine& line, const PartialCommandLine& partial) {
+    openDatabase(partial);
     std::vector<Candidate> all;
-    const std::string name = option.get_positional() ? option.get_name(true) : option.get_type_name();
-    // Behind the name may stand what is accepted: "FORMAT:{text,json,sarif}".
-    for (std::string& word : valuesOf(line, name.substr(0, name.find(':')))) {
-        all.push_back({line.prefix + word, ""});
+    for (const std::string& word : valuesOf(line, partial, *partial.argument)) {
+        all.push_back({partial.prefix + word, ""});
     }
     return all;
 }
 
-std::vector<Candidate> candidates(const CLI::App& parser, const CommandLineSoFar& line) {
-    if (line.isOptionName) {
-        return optionsOf(parser, line.command);
+std::vector<Candidate> candidates(const CommandLine& line, const PartialCommandLine& partial) {
+    if (partial.isOptionName) {
+        return optionsOf(line, partial.command);
     }
-    if (line.argument != nullptr) {
-        return argumentsOf(line);
+    if (partial.argument != nullptr) {
+        return argumentsOf(line, partial);
     }
-    return line.command == nullptr && line.prefix.empty() ? commandsOf(parser) : std::vector<Candidate>{};
+    return partial.command == nullptr && partial.prefix.empty() ? commandsOf(line) : std::vector<Candidate>{};
 }
 
-bool beginsWith(const std::string& word, const std::string& begun) {
-    return word.size() >= begun.size() && sameWithoutCase(word.substr(0, begun.size()), begun);
+bool startsWith(const std::string& word, const std::string& partialWord) {
+    return word.size() >= partialWord.size() &&
+           sameWithoutCase(word.substr(0, partialWord.size()), partialWord);
 }
 
 } // namespace
 
-ExitCode complete(const CLI::App& parser, const std::vector<std::string>& words) {
-    const Messages unheard;
-    const CommandLineSoFar line(parser, words);
+ExitCode complete(const CommandLine& line, const std::vector<std::string>& words) {
+    // Messages are gathered here and dropped.
+    const Messages messages;
+    const PartialCommandLine partial(line, words);
     Output output;
     try {
         std::set<std::string> written;
-        for (const Candidate& candidate : candidates(parser, line)) {
-            if (beginsWith(candidate.word, line.prefix + line.begun) &&
+        for (const Candidate& candidate : candidates(line, partial)) {
+            if (startsWith(candidate.word, partial.prefix + partial.partialWord) &&
                 written.insert(candidate.word).second) {
                 const std::string tab = candidate.description.empty() ? "" : "\t";
                 output.write(candidate.word + tab + candidate.description + '\n');
             }
         }
         output.flush();
-    } catch (const CommandError& failure) {
-        return failure.status();
+    } catch (const CommandError& error) {
+        return error.status();
     } catch (const TarvikException&) {
         return ExitCode::FAULT;
     }

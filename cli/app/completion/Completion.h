@@ -1,19 +1,13 @@
 #pragma once
 
-#include "term/ExitCode.h"
-
-#include <CLI/CLI.hpp>
-
-#include <string>
-#include <vector>
+#include "app/CommandLine.h"
 
 namespace completion {
 
-/// Writes what may stand in place of the last of these words: one a line, with a description behind a tab where
-/// there is one. That is what the completions of all shells are made from.
-/// @param parser knows the commands and their options
-/// @param words what is typed behind "tarvik", up to where the cursor is
-/// @return NO where the name of a file may stand, which the shell knows better
-[[nodiscard]] ExitCode complete(const CLI::App& parser, const std::vector<std::string>& words);
+/// Writes the words that may replace the last of these words: one a line, with a description after a tab if there is
+/// one. The completions of all shells are made from it.
+/// @param words what is typed after "tarvik", up to the cursor
+/// @return NO where a file's name is expected, which the shell knows better
+[[nodiscard]] ExitCode complete(const CommandLine& line, const std::vector<std::string>& words);
 
 } // namespace completion

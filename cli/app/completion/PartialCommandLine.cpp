@@ -1,49 +1,59 @@
-// Reads a command line that is not finished, which the parser proper would refuse.
+// Reads a command line that is not finished, which the parser would refuse.
 #include "app/completion/PartialCommandLine.h"
+
+#include <algorithm>
 
 namespace completion {
 
 namespace {
 
-bool takesValue(const CLI::Option* option) {
-    return option != nullptr && option->get_items_expected_max() != 0;
+bool hasName(const Argument& argument, const std::string& name) {
+    return argument.isOption() && (argument.name == name || (argument.letter != '\0' && name.size() == 2 &&
+                                                             name == std::string{'-', argument.letter}));
+}
+
+const Argument* findIn(const ArgumentList& arguments, const std::string& name) {
+    const auto found = std::find_if(arguments.begin(), arguments.end(),
+                                    [&name](const Argument& argument) { return hasName(argument, name); });
+    return found == arguments.end() ? nullptr : &*found;
 }
 
 } // namespace
 
-CommandLineSoFar::CommandLineSoFar(const CLI::App& tool, const std::vector<std::string>& words) {
-    const CLI::Option* waiting = nullptr;
+PartialCommandLine::PartialCommandLine(const CommandLine& line, const std::vector<std::string>& words)
+    : m_line(line) {
+    const Argument* waiting = nullptr;
     for (std::size_t i = 0; i + 1 < words.size(); ++i) {
         if (waiting != nullptr) {
             take(*waiting, words[i]);
             waiting = nullptr;
         } else {
-            waiting = read(tool, words[i]);
+            waiting = read(words[i]);
         }
     }
-    begun = words.empty() ? "" : words.back();
+    partialWord = words.empty() ? "" : words.back();
     if (waiting != nullptr) {
         argument = waiting;
         return;
     }
-    const std::size_t equals = begun.find('=');
-    if (begun.starts_with("--") && equals != std::string::npos) {
-        argument = find(tool, begun.substr(0, equals));
-        prefix = begun.substr(0, equals + 1);
-        begun.erase(0, equals + 1);
+    const std::size_t equals = partialWord.find('=');
+    if (partialWord.starts_with("--") && equals != std::string::npos) {
+        argument = findOption(partialWord.substr(0, equals));
+        prefix = partialWord.substr(0, equals + 1);
+        partialWord.erase(0, equals + 1);
         return;
     }
-    isOptionName = begun.starts_with('-');
+    isOptionName = partialWord.starts_with('-');
     if (!isOptionName && command != nullptr) {
         argument = nextOperand();
     }
 }
 
-const CLI::Option* CommandLineSoFar::read(const CLI::App& tool, const std::string& word) {
+const Argument* PartialCommandLine::read(const std::string& word) {
     if (word.starts_with('-')) {
         const std::size_t equals = std::min(word.find('='), word.size());
-        const CLI::Option* const option = find(tool, word.substr(0, equals));
-        if (!takesValue(option)) {
+        const Argument* const option = findOption(word.substr(0, equals));
+        if (option == nullptr || option->isFlag()) {
             return nullptr;
         }
         if (equals == word.size()) {
@@ -51,38 +61,37 @@ const CLI::Option* CommandLineSoFar::read(const CLI::App& tool, const std::strin
         }
         take(*option, word.substr(equals + 1));
     } else if (command == nullptr) {
-        const std::vector<const CLI::App*> named =
-            tool.get_subcommands([&word](const CLI::App* one) { return one->get_name() == word; });
-        command = named.empty() ? nullptr : named.front();
+        command = m_line.find(word);
     } else {
         operands.push_back(word);
     }
     return nullptr;
 }
 
-void CommandLineSoFar::take(const CLI::Option& option, const std::string& value) {
-    if (option.check_name("--database")) {
+void PartialCommandLine::take(const Argument& option, const std::string& value) {
+    if (option.name == "--database") {
         databases.push_back(value);
     }
 }
 
-const CLI::Option* CommandLineSoFar::find(const CLI::App& tool, const std::string& name) const {
-    const CLI::Option* const own = command == nullptr ? nullptr : command->get_option_no_throw(name);
-    return own != nullptr ? own : tool.get_option_no_throw(name);
+const Argument* PartialCommandLine::findOption(const std::string& name) const {
+    const Argument* const own = command == nullptr ? nullptr : findIn(command->arguments, name);
+    return own != nullptr ? own : findIn(m_line.options, name);
 }
 
-const CLI::Option* CommandLineSoFar::nextOperand() const {
-    const CLI::Option* last = nullptr;
+const Argument* PartialCommandLine::nextOperand() const {
+    const Argument* last = nullptr;
     std::size_t count = 0;
-    for (const CLI::Option* const option :
-         command->get_options([](const CLI::Option* one) { return one->get_positional(); })) {
-        last = option;
+    for (const Argument& candidate : command->arguments) {
+        if (candidate.isOption()) {
+            continue;
+        }
+        last = &candidate;
         if (count++ == operands.size()) {
-            return option;
+            return last;
         }
     }
-    // The last one may take any number of words.
-    return last != nullptr && last->get_items_expected_max() > 1 ? last : nullptr;
+    return last != nullptr && last->isRepeatable() ? last : nullptr;
 }
 
 } // namespace completion

@@ -1,34 +1,36 @@
 #pragma once
 
-#include <CLI/CLI.hpp>
+#include "app/CommandLine.h"
 
-#include <optional>
 #include <string>
-#include <string_view>
 #include <vector>
 
 namespace completion {
 
-/// What an unfinished command line says, as far as completing its last word needs it.
-struct CommandLineSoFar {
-    /// @param words the last one is what is to be completed
-    CommandLineSoFar(const CLI::App& tool, const std::vector<std::string>& words);
+/// What an unfinished command line contains, as far as completing its last word needs it.
+struct PartialCommandLine {
+    /// @param words the last one is to be completed
+    PartialCommandLine(const CommandLine& line, const std::vector<std::string>& words);
 
-    const CLI::App* command = nullptr; ///< null as long as there is none
-    const CLI::Option* argument =
-        nullptr;                       ///< what the last word belongs to; null: a command, or too many words
-    bool isOptionName = false;         ///< the last word begins the name of an option
-    std::string prefix;                ///< "--mode=", where the last word goes on with its value
-    std::string begun;                 ///< the last word without that
-    std::vector<std::string> operands; ///< of the command, so far
+    const DeclaredCommand* command = nullptr; ///< null as long as there is none
+
+    /// What the last word belongs to; null for a command, or if there are too many words.
+    const Argument* argument = nullptr;
+
+    bool isOptionName = false;         ///< the last word is the beginning of an option's name
+    std::string prefix;                ///< "--mode=", if the last word continues with the option's value
+    std::string partialWord;           ///< the last word without the prefix
+    std::vector<std::string> operands; ///< the command's arguments so far that are no options
     std::vector<std::string> databases;
 
 private:
-    /// What belongs to the word behind this one; null for none.
-    [[nodiscard]] const CLI::Option* read(const CLI::App& tool, const std::string& word);
-    void take(const CLI::Option& option, const std::string& value);
-    [[nodiscard]] const CLI::Option* find(const CLI::App& tool, const std::string& name) const;
-    [[nodiscard]] const CLI::Option* nextOperand() const;
+    /// Reads one word. @return the option whose value is the next word; null if there is none
+    [[nodiscard]] const Argument* read(const std::string& word);
+    void take(const Argument& option, const std::string& value);
+    [[nodiscard]] const Argument* findOption(const std::string& name) const;
+    [[nodiscard]] const Argument* nextOperand() const;
+
+    const CommandLine& m_line;
 };
 
 } // namespace completion

@@ -22,7 +22,7 @@ TEST(Apart, LeavesNoTrace) {
 
 TEST(Apart, DoesNotTakeAFailureForAnAnswer) {
     EXPECT_THROW(static_cast<void>(why::apart([]() -> std::string { throw std::runtime_error("no"); })),
-                 Failure);
+                 CommandError);
 }
 
 TEST(Apart, EndsWhenNobodyAsksForTheResult) {

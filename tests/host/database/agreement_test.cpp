@@ -3,8 +3,8 @@
 #include "ReferenceParser.h"
 
 #include "database/Database.h"
-#include "database/HeaderScan.h"
 #include "database/LineReader.h"
+#include "database/SectionScanner.h"
 
 #include <algorithm>
 #include <cstring>
@@ -20,7 +20,7 @@ constexpr int ROUNDS = 8000;
 
 [[nodiscard]] acd::Text copyOf(std::string_view text) {
     acd::MemorySource source(text);
-    return acd::readWhole(source);
+    return acd::readAll(source);
 }
 
 [[nodiscard]] acd::LayerText layerOf(const std::string& path, std::string_view text) {
@@ -28,9 +28,9 @@ constexpr int ROUNDS = 8000;
 }
 
 /// Hands its text out in portions of random size.
-class Dripping final : public acd::ByteSource {
+class ChunkedSource final : public acd::ByteSource {
 public:
-    Dripping(std::string_view text, unsigned seed) : m_rest(text), m_random(seed) {}
+    ChunkedSource(std::string_view text, unsigned seed) : m_rest(text), m_random(seed) {}
 
     [[nodiscard]] std::size_t expectedSize() const noexcept override { return 0; }
     [[nodiscard]] std::size_t read(char* buffer, std::size_t size) override {
@@ -44,7 +44,7 @@ private:
     HostileTexts m_random;
 };
 
-[[nodiscard]] std::vector<std::string> namesOf(const acd::NameList& list) {
+[[nodiscard]] std::vector<std::string> namesOf(const acd::PackedStrings& list) {
     std::vector<std::string> names;
     std::size_t begin = 0;
     for (const std::size_t end : list.ends()) {
@@ -68,8 +68,8 @@ private:
     return names;
 }
 
-void expectScanAgrees(acd::HeaderScan& scan, std::string_view text, unsigned seed) {
-    const auto open = [&] { return std::make_unique<Dripping>(text, seed); };
+void expectScanAgrees(acd::SectionScanner& scan, std::string_view text, unsigned seed) {
+    const auto open = [&] { return std::make_unique<ChunkedSource>(text, seed); };
     ASSERT_EQ(namesOf(scan.names(open)), parsedNames(text)) << testing::PrintToString(std::string(text));
 }
 
@@ -97,10 +97,10 @@ void expectSameValue(const acd::Database& database, const acd::Section* section,
     }
     ASSERT_EQ(value->text().size(), expected->value.size());
     AcdStore::Value placed{value->text(), {}, false, {}};
-    for (const acd::Fragment& fragment : database.fragments(*value)) {
-        placed.fragments.push_back({fragment.offset, "", "", fragment.place.line, fragment.place.column});
+    for (const acd::LayerSpan& fragment : database.spans(*value)) {
+        placed.spans.push_back({fragment.offset, "", "", fragment.location.line, fragment.location.column});
     }
-    ASSERT_FALSE(placed.fragments.empty());
+    ASSERT_FALSE(placed.spans.empty());
     for (std::size_t offset = 0; offset != expected->value.size(); ++offset) {
         ASSERT_EQ(value->text()[offset], expected->value[offset].value);
         ASSERT_EQ(placed.at(offset).line, expected->value[offset].line);
@@ -115,7 +115,7 @@ void expectSameDatabase(const std::vector<std::string>& layers) {
         reference.add(layer);
         texts.push_back(layerOf("", layer));
     }
-    std::vector<acd::LayerFault> faults;
+    std::vector<acd::LayerError> faults;
     const acd::Database database(std::move(texts), faults);
 
     ASSERT_EQ(database.sectionNames().size() + 1, reference.sections.size());
@@ -137,7 +137,7 @@ void expectSameDatabase(const std::vector<std::string>& layers) {
     }
     ASSERT_EQ(faults.size(), reference.faultLines.size());
     for (std::size_t index = 0; index != faults.size(); ++index) {
-        ASSERT_GE(faults[index].fault.place.line, reference.faultLines[index]);
+        ASSERT_GE(faults[index].error.location.line, reference.faultLines[index]);
     }
 }
 
@@ -192,7 +192,7 @@ TEST(Agreement, OfScanAndReaderOnLinesThatABufferOfAnySizeCutsApart) {
                                    "[A\\\n]\n[B]",
                                    "K = [A]\n[B]\nL = [C]\n"}) {
         for (std::size_t size = 1; size != 40; ++size) {
-            acd::HeaderScan scan(size);
+            acd::SectionScanner scan(size);
             ASSERT_NO_FATAL_FAILURE(expectScanAgrees(scan, text, static_cast<unsigned>(size))) << size;
         }
     }
@@ -200,7 +200,7 @@ TEST(Agreement, OfScanAndReaderOnLinesThatABufferOfAnySizeCutsApart) {
 
 TEST(Agreement, OfScanAndReaderOnHostileTexts) {
     HostileTexts texts(4);
-    acd::HeaderScan scan;
+    acd::SectionScanner scan;
     for (unsigned round = 0; round < ROUNDS; ++round) {
         ASSERT_NO_FATAL_FAILURE(expectScanAgrees(scan, texts.next(), round));
     }
@@ -209,14 +209,14 @@ TEST(Agreement, OfScanAndReaderOnHostileTexts) {
 TEST(Agreement, OfScanAndReaderWhateverTheBufferCutsApart) {
     HostileTexts texts(5);
     for (unsigned round = 0; round < ROUNDS; ++round) {
-        acd::HeaderScan scan(1 + texts.pick(24));
+        acd::SectionScanner scan(1 + texts.pick(24));
         ASSERT_NO_FATAL_FAILURE(expectScanAgrees(scan, texts.next(), round));
     }
 }
 
 TEST(Agreement, OfScanAndReaderOnNoise) {
     HostileTexts texts(6);
-    acd::HeaderScan scan(200);
+    acd::SectionScanner scan(200);
     for (unsigned round = 0; round < 500; ++round) {
         ASSERT_NO_FATAL_FAILURE(expectScanAgrees(scan, texts.noise(texts.pick(3000)), round));
     }
@@ -225,8 +225,8 @@ TEST(Agreement, OfScanAndReaderOnNoise) {
 TEST(Agreement, OfScanAndReaderAtEveryPlaceOfTheBuffersEnd) {
     for (const std::string header : {"[A]", " \t[A] ", "[A]\\\n", "\\\n[A]", "#\\\n[A]", "x\r\n[A]\r\n"}) {
         for (std::size_t room = 0; room != 16; ++room) {
-            const std::string filler(acd::HeaderScan::BUFFER_SIZE - 2 - room, '#');
-            acd::HeaderScan scan;
+            const std::string filler(acd::SectionScanner::BUFFER_SIZE - 2 - room, '#');
+            acd::SectionScanner scan;
             ASSERT_NO_FATAL_FAILURE(expectScanAgrees(scan, filler + "\n" + header + "\n[B]", 1));
             ASSERT_NO_FATAL_FAILURE(expectScanAgrees(scan, filler + "\n" + header, 1));
         }
@@ -234,7 +234,7 @@ TEST(Agreement, OfScanAndReaderAtEveryPlaceOfTheBuffersEnd) {
 }
 
 TEST(Agreement, OfScanAndReaderOnALineLongerThanTheBuffer) {
-    acd::HeaderScan scan(16);
+    acd::SectionScanner scan(16);
     expectScanAgrees(scan, "[A]\n" + std::string(100, 'x') + "\n[B]\n", 1);
     expectScanAgrees(scan, "[A]\n[" + std::string(100, 'x') + "]\n[B]\n", 1);
 }
@@ -242,11 +242,11 @@ TEST(Agreement, OfScanAndReaderOnALineLongerThanTheBuffer) {
 TEST(Agreement, OfScanAndReaderOnFilesOfUsualForm) {
     std::string text = "# kestrel\nOPERATION = PROGRAM,Bscan,USB2: \\\n  VERIFY,Bscan,USB2\n\n";
     std::vector<std::string> devices;
-    for (int device = 0; text.size() < 3 * acd::HeaderScan::BUFFER_SIZE; ++device) {
+    for (int device = 0; text.size() < 3 * acd::SectionScanner::BUFFER_SIZE; ++device) {
         devices.push_back("KS" + std::to_string(device));
         text += "[" + devices.back() + "]\nPROPERTY = PINS,[7:0]:FLASH,TRUE\n";
     }
-    acd::HeaderScan scan;
+    acd::SectionScanner scan;
     int opened = 0;
     const auto open = [&] {
         ++opened;

@@ -26,7 +26,7 @@ const char* nameOf(AcdLines::Kind kind) {
         return "assignment";
     case AcdLines::Kind::APPEND:
         return "append";
-    case AcdLines::Kind::FAULT:
+    case AcdLines::Kind::INVALID:
         break;
     }
     return "fault";
@@ -40,13 +40,13 @@ const char* nameOf(AcdLines::Fault fault) {
 }
 
 nlohmann::json asJson(const AcdLines::Line& line) {
-    nlohmann::json fragments = nlohmann::json::array();
-    for (const AcdLines::Fragment& fragment : line.fragments) {
-        fragments.push_back({fragment.offset, fragment.line, fragment.column});
+    nlohmann::json spans = nlohmann::json::array();
+    for (const AcdLines::SourceSpan& fragment : line.spans) {
+        spans.push_back({fragment.offset, fragment.line, fragment.column});
     }
     return {{"kind", nameOf(line.kind)},   {"first", line.firstLine},    {"last", line.lastLine},
-            {"name", bytes(line.name)},    {"value", bytes(line.value)}, {"fragments", fragments},
-            {"line", line.line},           {"column", line.column},      {"fault", nameOf(line.fault)},
+            {"name", bytes(line.name)},    {"value", bytes(line.value)}, {"spans", spans},
+            {"line", line.line},           {"column", line.column},      {"fault", nameOf(line.error)},
             {"closes", line.closesSection}};
 }
 

@@ -49,7 +49,7 @@ ssize_t endlessRead(int, void*, std::size_t size) { return static_cast<ssize_t>(
 std::string reasonOf(const std::function<void()>& action) {
     try {
         action();
-    } catch (const acd::Unreadable& unreadable) {
+    } catch (const acd::ReadError& unreadable) {
         return unreadable.what();
     }
     return "none";
@@ -76,7 +76,7 @@ protected:
     [[nodiscard]] std::string readAll(std::deque<ssize_t> steps) {
         script() = std::move(steps);
         acd::FileSource source(path, scriptedRead);
-        const acd::Text text = acd::readWhole(source);
+        const acd::Text text = acd::readAll(source);
         return {text.bytes.get(), text.size};
     }
 
@@ -104,7 +104,7 @@ TEST_F(FileReading, ReadsNoMoreThanIsThereWhenTheFileShrinks) {
     acd::FileSource source(path);
     EXPECT_EQ(source.expectedSize(), 10U);
     std::filesystem::resize_file(path, 3);
-    const acd::Text text = acd::readWhole(source);
+    const acd::Text text = acd::readAll(source);
     EXPECT_EQ(std::string(text.bytes.get(), text.size), "012");
 }
 
@@ -112,7 +112,7 @@ TEST_F(FileReading, ReadsAllWhenTheFileGrows) {
     acd::FileSource source(path);
     const std::string larger(100000, 'x');
     directory.write("file", larger);
-    const acd::Text text = acd::readWhole(source);
+    const acd::Text text = acd::readAll(source);
     EXPECT_EQ(std::string(text.bytes.get(), text.size), larger);
 }
 
@@ -124,13 +124,13 @@ TEST_F(FileReading, ReadsAnEmptyFile) {
 TEST_F(FileReading, StopsWhenTheFileGrowsOverAGibibyte) {
     acd::FileSource source(path, endlessRead);
     char byte = 0;
-    EXPECT_EQ(source.read(&byte, acd::LARGEST_FILE), acd::LARGEST_FILE);
+    EXPECT_EQ(source.read(&byte, acd::MAX_FILE_SIZE), acd::MAX_FILE_SIZE);
     EXPECT_EQ(reasonOf([&] { (void)source.read(&byte, 1); }), "larger than 1 GiB");
 }
 
 TEST_F(FileReading, AcceptsAFileOfAGibibyte) {
-    std::filesystem::resize_file(path, acd::LARGEST_FILE);
-    EXPECT_EQ(acd::FileSource(path).expectedSize(), acd::LARGEST_FILE);
+    std::filesystem::resize_file(path, acd::MAX_FILE_SIZE);
+    EXPECT_EQ(acd::FileSource(path).expectedSize(), acd::MAX_FILE_SIZE);
 }
 
 TEST_F(FileReading, RefusesAMissingFile) {
@@ -148,13 +148,13 @@ TEST_F(FileReading, ReadsMemoryPortionByPortion) {
 
 TEST_F(FileReading, AcceptsATextOfAGibibyte) {
     const char byte = 0;
-    EXPECT_EQ(acd::MemorySource({&byte, acd::LARGEST_FILE}).expectedSize(), acd::LARGEST_FILE);
+    EXPECT_EQ(acd::MemorySource({&byte, acd::MAX_FILE_SIZE}).expectedSize(), acd::MAX_FILE_SIZE);
 }
 
 TEST_F(FileReading, RefusesATextOverAGibibyte) {
     const char byte = 0;
     EXPECT_EQ(reasonOf([&] {
-                  const acd::MemorySource source({&byte, acd::LARGEST_FILE + 1});
+                  const acd::MemorySource source({&byte, acd::MAX_FILE_SIZE + 1});
               }),
               "larger than 1 GiB");
 }

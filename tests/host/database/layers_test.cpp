@@ -20,7 +20,7 @@ protected:
             std::filesystem::create_directories(directory.path(layer));
             layer = directory.path(layer);
         }
-        AcdStore::setSearchPath(std::move(layers));
+        useDirectories(std::move(layers));
     }
 
     TemporaryDirectory directory;
@@ -148,7 +148,7 @@ std::vector<acd::LayerText> lowAndTop(const std::string& low, const std::string&
     std::vector<acd::LayerText> layers;
     for (const auto& [path, text] : {std::pair("low", low), std::pair("top", top)}) {
         acd::MemorySource source(text);
-        layers.push_back({path, acd::readWhole(source)});
+        layers.push_back({path, acd::readAll(source)});
     }
     return layers;
 }
@@ -158,23 +158,23 @@ std::vector<acd::LayerText> lowAndTop(const std::string& low, const std::string&
 TEST(LongestValues, AnAppendThatGrowsOverThemIsLeftOut) {
     std::vector<acd::LayerText> layers =
         lowAndTop("KEY = 1234\nKEY += 5678\n", "KEY += 9ab\nKEY += 9a\nOTHER = 12345678901\n");
-    std::vector<acd::LayerFault> faults;
+    std::vector<acd::LayerError> faults;
     const acd::Database database(std::move(layers), faults, 10);
 
     EXPECT_EQ(database.find(nullptr, "KEY")->text(), "123456789a");
-    EXPECT_EQ(database.fragments(*database.find(nullptr, "KEY")).size(), 3U);
+    EXPECT_EQ(database.spans(*database.find(nullptr, "KEY")).size(), 3U);
     EXPECT_EQ(database.find(nullptr, "OTHER")->text(), "12345678901");
     ASSERT_EQ(faults.size(), 1U);
     EXPECT_EQ(database.path(faults[0].layer), "top");
-    EXPECT_EQ(faults[0].fault.place.line, 1U);
-    EXPECT_EQ(faults[0].fault.place.column, 8U);
-    EXPECT_EQ(acd::describe(faults[0].fault), "the value would grow over 1 GiB by '9ab'");
+    EXPECT_EQ(faults[0].error.location.line, 1U);
+    EXPECT_EQ(faults[0].error.location.column, 8U);
+    EXPECT_EQ(acd::describe(faults[0].error), "the value would grow over 1 GiB by '9ab'");
 }
 
 TEST(LongestValues, AnAppendThatIsHiddenIsLeftOutWithoutAWord) {
     std::vector<acd::LayerText> layers =
         lowAndTop("KEY = 1234\nKEY += 5678901\nKEY += 567890\n", "KEY = 1\n");
-    std::vector<acd::LayerFault> faults;
+    std::vector<acd::LayerError> faults;
     const acd::Database database(std::move(layers), faults, 10);
 
     const acd::Value& standing = *database.find(nullptr, "KEY");
@@ -192,7 +192,7 @@ std::vector<std::string> hiddenBy(const char* name, const char* key) {
     const std::optional<AcdStore::Value> value = AcdStore::value(name, key);
     for (std::size_t i = 0; value && i < value->replaced.size(); ++i) {
         const AcdStore::Value& hidden = value->replaced[i];
-        const AcdStore::Fragment& place = hidden.fragments.front();
+        const AcdStore::SourceSpan& place = hidden.spans.front();
         texts.push_back(std::filesystem::path(place.layer).filename().string() + ':' +
                         std::to_string(place.line) + ':' + std::to_string(place.column) + ' ' +
                         std::string(hidden.text));
@@ -228,14 +228,14 @@ TEST_F(Layers, HideNothingOfTheirOwn) {
 TEST_F(Layers, AreNamedByTheirDirectories) {
     write("top/kestrel.acd", "A = a\n");
     search({"top"});
-    EXPECT_EQ(AcdStore::value("kestrel", "A")->fragments.front().layer, directory.path("top"));
+    EXPECT_EQ(AcdStore::value("kestrel", "A")->spans.front().layer, directory.path("top"));
     write("t/kestrel.acd", "A = a\n");
     std::filesystem::current_path(directory.path());
-    AcdStore::setSearchPath({"t"});
-    EXPECT_EQ(AcdStore::value("kestrel", "A")->fragments.front().layer, "t");
+    useDirectories({"t"});
+    EXPECT_EQ(AcdStore::value("kestrel", "A")->spans.front().layer, "t");
     std::filesystem::current_path("/");
-    AcdStore::setMemoryFiles({{"kestrel.acd", "A = a\n"}});
-    EXPECT_EQ(AcdStore::value("kestrel", "A")->fragments.front().layer, "");
-    AcdStore::setMemoryFiles({{"/kestrel.acd", "A = a\n"}});
-    EXPECT_EQ(AcdStore::value("/kestrel", "A")->fragments.front().layer, "/");
+    useFiles({{"kestrel.acd", "A = a\n"}});
+    EXPECT_EQ(AcdStore::value("kestrel", "A")->spans.front().layer, "");
+    useFiles({{"/kestrel.acd", "A = a\n"}});
+    EXPECT_EQ(AcdStore::value("/kestrel", "A")->spans.front().layer, "/");
 }

@@ -24,7 +24,7 @@ TEST(AcdLines, GiveHeadersAssignmentsAppendsAndFaultsInOrder) {
     EXPECT_EQ(lines.lines()[1].name, "KS50");
     EXPECT_EQ(lines.lines()[2].kind, Kind::APPEND);
     EXPECT_EQ(lines.lines()[2].value, "2");
-    EXPECT_EQ(lines.lines()[3].fault, AcdLines::Fault::NO_EQUALS_SIGN);
+    EXPECT_EQ(lines.lines()[3].error, AcdLines::Fault::NO_EQUALS_SIGN);
     EXPECT_EQ(lines.lines()[3].line, 4U);
     EXPECT_EQ(lines.lines()[3].text, "no '=' in 'no sense'");
 }
@@ -34,10 +34,10 @@ TEST(AcdLines, KnowWhichLinesOfTheFileALineIs) {
     ASSERT_EQ(lines.lines().size(), 2U);
     EXPECT_EQ(lines.lines()[0].firstLine, 3U);
     EXPECT_EQ(lines.lines()[0].lastLine, 4U);
-    ASSERT_EQ(lines.lines()[0].fragments.size(), 2U);
-    EXPECT_EQ(lines.lines()[0].fragments[1].offset, 2U);
-    EXPECT_EQ(lines.lines()[0].fragments[1].line, 4U);
-    EXPECT_EQ(lines.lines()[0].fragments[1].column, 3U);
+    ASSERT_EQ(lines.lines()[0].spans.size(), 2U);
+    EXPECT_EQ(lines.lines()[0].spans[1].offset, 2U);
+    EXPECT_EQ(lines.lines()[0].spans[1].line, 4U);
+    EXPECT_EQ(lines.lines()[0].spans[1].column, 3U);
     EXPECT_EQ(lines.lines()[1].firstLine, 6U);
 }
 
@@ -62,10 +62,10 @@ TEST(AcdLines, KnowWhereTheirNamesStand) {
 TEST(AcdLines, HaveNoFragmentsWithoutText) {
     const AcdLines lines("A = 1\\\n  \\\n\\\n\nB = \\\n\\\n  2\n");
     ASSERT_EQ(lines.lines().size(), 2U);
-    ASSERT_EQ(lines.lines()[0].fragments.size(), 1U);
-    EXPECT_EQ(lines.lines()[0].fragments[0].line, 1U);
-    ASSERT_EQ(lines.lines()[1].fragments.size(), 1U);
-    EXPECT_EQ(lines.lines()[1].fragments[0].line, 7U);
+    ASSERT_EQ(lines.lines()[0].spans.size(), 1U);
+    EXPECT_EQ(lines.lines()[0].spans[0].line, 1U);
+    ASSERT_EQ(lines.lines()[1].spans.size(), 1U);
+    EXPECT_EQ(lines.lines()[1].spans[0].line, 7U);
 }
 
 TEST(AcdLines, KeepComments) {
@@ -135,8 +135,8 @@ TEST(AcdLines, TellWhatIsWrongWithALine) {
     for (const auto& [text, fault] : faults) {
         const AcdLines lines(text);
         ASSERT_EQ(lines.lines().size(), 1U) << text;
-        EXPECT_EQ(lines.lines()[0].kind, Kind::FAULT) << text;
-        EXPECT_EQ(lines.lines()[0].fault, fault) << text;
+        EXPECT_EQ(lines.lines()[0].kind, Kind::INVALID) << text;
+        EXPECT_EQ(lines.lines()[0].error, fault) << text;
         EXPECT_EQ(lines.lines()[0].closesSection, text.starts_with('[')) << text;
     }
 }
@@ -144,7 +144,7 @@ TEST(AcdLines, TellWhatIsWrongWithALine) {
 TEST(AcdLines, TellOfALineThatIsTooLong) {
     const AcdLines lines("A = " + std::string(std::size_t{16} << 20, 'x') + "\nB = 1\n");
     ASSERT_EQ(lines.lines().size(), 2U);
-    EXPECT_EQ(lines.lines()[0].fault, AcdLines::Fault::LINE_TOO_LONG);
+    EXPECT_EQ(lines.lines()[0].error, AcdLines::Fault::LINE_TOO_LONG);
     EXPECT_EQ(lines.lines()[1].name, "B");
 }
 
@@ -189,5 +189,5 @@ TEST(AcdLines, KnowWhichFilesDoNotCount) {
     const std::vector<AcdLines> files = AcdLines::ofDatabase();
     ASSERT_EQ(files.size(), 1U);
     EXPECT_EQ(files.front().lines().front().name, "KS50");
-    EXPECT_THAT(files.front().namesakes(), testing::ElementsAre(directory.path("kestrel.acd")));
+    EXPECT_THAT(files.front().caseCollisions(), testing::ElementsAre(directory.path("kestrel.acd")));
 }

@@ -8,17 +8,17 @@ using namespace std::string_view_literals;
 
 namespace {
 
-[[nodiscard]] std::string shown(const AcdStore::Fragment& fragment) {
+[[nodiscard]] std::string shown(const AcdStore::SourceSpan& fragment) {
     return std::to_string(fragment.offset) + ' ' + std::string(fragment.file) + ':' +
            std::to_string(fragment.line) + ':' + std::to_string(fragment.column);
 }
 
-/// The fragments of a value, as "offset file:line:column".
+/// The spans of a value, as "offset file:line:column".
 [[nodiscard]] std::vector<std::string> originsOf(const char* name, const char* key) {
     std::vector<std::string> origins;
     const std::optional<AcdStore::Value> value = AcdStore::value(name, key);
     if (value) {
-        for (const AcdStore::Fragment& fragment : value->fragments) {
+        for (const AcdStore::SourceSpan& fragment : value->spans) {
             origins.push_back(shown(fragment));
         }
     }
@@ -29,7 +29,7 @@ namespace {
 
 class Origins : public DatabaseTest {
 protected:
-    void read(std::string_view text) { AcdStore::setMemoryFiles({{"k.acd", std::string(text)}}); }
+    void read(std::string_view text) { useFiles({{"k.acd", std::string(text)}}); }
 };
 
 TEST_F(Origins, AreTheFirstByteOfTheValue) {
@@ -98,7 +98,7 @@ TEST_F(Origins, NameTheLayer) {
     const TemporaryDirectory directory;
     directory.write("low/k.acd", "A = a\nKEY = b\n");
     directory.write("top/k.acd", "KEY += c\n");
-    AcdStore::setSearchPath({directory.path("top"), directory.path("low") + "/"});
+    useDirectories({directory.path("top"), directory.path("low") + "/"});
     const std::string low = directory.path("low/k.acd");
     const std::string top = directory.path("top/k.acd");
     EXPECT_THAT(originsOf("k", "A"), ElementsAre("0 " + low + ":1:5"));
@@ -126,7 +126,7 @@ TEST_F(Origins, OfAnySingleByteCanBeAsked) {
     EXPECT_EQ(value.text, "abcdef");
     std::vector<std::string> places;
     for (std::size_t offset = 0; offset != value.text.size(); ++offset) {
-        const AcdStore::Fragment place = value.at(offset);
+        const AcdStore::SourceSpan place = value.at(offset);
         places.push_back(std::to_string(place.line) + ":" + std::to_string(place.column));
     }
     EXPECT_THAT(places, ElementsAre("1:7", "1:8", "2:3", "2:4", "4:8", "4:9"));

@@ -15,7 +15,7 @@ const char* volatile noText = nullptr;
 std::string formatted(const char* format, ...) {
     std::va_list arguments;
     va_start(arguments, format);
-    std::string text = formatting::formatted(format, arguments);
+    std::string text = formatting::vformat(format, arguments);
     va_end(arguments);
     return text;
 }
@@ -72,27 +72,28 @@ TEST(FormattedText, ThatCannotBePrintedIsTheFormat) {
 }
 
 TEST(FinishedText, WithoutPercentSignsStays) {
-    EXPECT_EQ(formatting::finished(""), "");
-    EXPECT_EQ(formatting::finished("Device KS50 belongs to kestrel\n"), "Device KS50 belongs to kestrel\n");
-    EXPECT_EQ(formatting::finished("\xFF\x80\n"), "\xFF\x80\n");
+    EXPECT_EQ(formatting::unescapePercent(""), "");
+    EXPECT_EQ(formatting::unescapePercent("Device KS50 belongs to kestrel\n"),
+              "Device KS50 belongs to kestrel\n");
+    EXPECT_EQ(formatting::unescapePercent("\xFF\x80\n"), "\xFF\x80\n");
 }
 
 TEST(FinishedText, TakesTwoPercentSignsForOne) {
-    EXPECT_EQ(formatting::finished("100%%"), "100%");
-    EXPECT_EQ(formatting::finished("%%"), "%");
-    EXPECT_EQ(formatting::finished("%%d"), "%d");
-    EXPECT_EQ(formatting::finished("%%%%"), "%%");
+    EXPECT_EQ(formatting::unescapePercent("100%%"), "100%");
+    EXPECT_EQ(formatting::unescapePercent("%%"), "%");
+    EXPECT_EQ(formatting::unescapePercent("%%d"), "%d");
+    EXPECT_EQ(formatting::unescapePercent("%%%%"), "%%");
 }
 
 TEST(FinishedText, KeepsAnyOtherPercentSign) {
-    EXPECT_EQ(formatting::finished("%"), "%");
-    EXPECT_EQ(formatting::finished("50%"), "50%");
-    EXPECT_EQ(formatting::finished("%s %d %n %*d %99999s"), "%s %d %n %*d %99999s");
-    EXPECT_EQ(formatting::finished("% %"), "% %");
-    EXPECT_EQ(formatting::finished("%%%"), "%%");
-    EXPECT_EQ(formatting::finished("%%%s"), "%%s");
+    EXPECT_EQ(formatting::unescapePercent("%"), "%");
+    EXPECT_EQ(formatting::unescapePercent("50%"), "50%");
+    EXPECT_EQ(formatting::unescapePercent("%s %d %n %*d %99999s"), "%s %d %n %*d %99999s");
+    EXPECT_EQ(formatting::unescapePercent("% %"), "% %");
+    EXPECT_EQ(formatting::unescapePercent("%%%"), "%%");
+    EXPECT_EQ(formatting::unescapePercent("%%%s"), "%%s");
 }
 
-TEST(FinishedText, OfNullIsEmpty) { EXPECT_EQ(formatting::finished(nullptr), ""); }
+TEST(FinishedText, OfNullIsEmpty) { EXPECT_EQ(formatting::unescapePercent(nullptr), ""); }
 
 } // namespace

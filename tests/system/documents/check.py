@@ -3,6 +3,7 @@
 A block is taken by its language:
   cpp      compiled as C++17 with warnings as errors. One that holds a main function is a program: it is linked with the
            installed library and run. Any other is the inside of a function, behind Fragment.h.
+  c        the same as C99, with the C interface.
   console  lines that start with "$ " are run by the shell, the lines below each are what it prints. Without such lines
            it has only to succeed.
 Other blocks are not looked at. A block of any language whose first line is a comment that starts with a file's name is
@@ -61,28 +62,31 @@ class Checker:
         return subprocess.run(command, cwd=self.folder, env=self.environment, stdout=subprocess.PIPE,
                               stderr=subprocess.STDOUT, text=True, check=False)
 
-    def compile(self, name, text, arguments):
-        source = self.folder / f"{name}.cpp"
+    def compile(self, language, name, text, arguments):
+        source = self.folder / f"{name}.{language}"
         source.write_text(text, encoding="utf-8")
         include = self.tree / "include"
-        self.expect_success([*self.compiler, "-std=c++17", *WARNINGS, f"-I{include}", f"-I{include}/tarvik/host",
-                             str(source), *arguments])
+        options = ["-std=c++17", f"-I{include}/tarvik/host"] if language == "cpp" else ["-std=c99"]
+        self.expect_success([*self.compiler, *options, *WARNINGS, f"-I{include}", "-x",
+                             "c++" if language == "cpp" else "c", str(source), "-x", "none", *arguments])
 
     def located(self, line, body):
         """Code for which the compiler names the document."""
         return f'#line {line} "{self.document}"\n{body}'
 
-    def run_program(self, line, body):
+    def run_program(self, language, line, body):
         program = self.folder / f"program{line}"
-        self.compile(program.name, self.located(line, body),
-                     ["-o", str(program), f"-L{self.libraries}", "-lTarvikConstraintsManager", "-lTarvikHost",
-                      f"-Wl,-rpath,{self.libraries}"])
+        libraries = ["-lTarvikConstraintsManager", "-lTarvikHost"] if language == "cpp" else ["-ltarvik"]
+        self.compile(language, program.name, self.located(line, body),
+                     ["-o", str(program), f"-L{self.libraries}", *libraries, f"-Wl,-rpath,{self.libraries}"])
         self.expect_success([str(program)])
 
-    def compile_fragments(self, fragments):
-        functions = [f"void fragment{line}();\nvoid fragment{line}() {{\n{self.located(line, body)}}}\n"
+    def compile_fragments(self, language, fragments):
+        functions = [f"void fragment{line}(void);\nvoid fragment{line}(void) {{\n{self.located(line, body)}}}\n"
                      for line, body in fragments]
-        self.compile("fragments", f'#include "{self.fragment}"\n' + "".join(functions), ["-fsyntax-only"])
+        headers = {"cpp": [f'"{self.fragment}"'], "c": ["<stdio.h>", "<tarvik/tarvik.h>"]}[language]
+        self.compile(language, "fragments", "".join(f"#include {header}\n" for header in headers) + "".join(functions),
+                     ["-fsyntax-only"])
 
     def expect_success(self, command):
         result = self.run(command)
@@ -100,22 +104,23 @@ class Checker:
                 raise Failure(f"line {line + offset}: {command}\n{''.join(difference)}")
 
     def check(self):
-        counts = {"cpp": 0, "console": 0}
-        fragments = []
+        counts = {"cpp": 0, "c": 0, "console": 0}
+        fragments = {"cpp": [], "c": []}
         for language, line, body in blocks(self.document.read_text(encoding="utf-8")):
             if name := named_file(body):
                 file = self.folder / name
                 file.parent.mkdir(parents=True, exist_ok=True)
                 file.write_text(body, encoding="utf-8")
-            if language == "cpp" and "int main(" in body:
-                self.run_program(line, body)
-            elif language == "cpp":
-                fragments.append((line, body))
+            if language in fragments and "int main(" in body:
+                self.run_program(language, line, body)
+            elif language in fragments:
+                fragments[language].append((line, body))
             elif language == "console":
                 self.converse(line, body)
             if language in counts:
                 counts[language] += 1
-        self.compile_fragments(fragments)
+        for language, bodies in fragments.items():
+            self.compile_fragments(language, bodies)
         return counts
 
 
@@ -141,14 +146,14 @@ def main():
     parser.add_argument("--scratch", type=pathlib.Path, required=True)
     parser.add_argument("--compiler", required=True)
     parser.add_argument("--flags", default="")
-    parser.add_argument("--expect", nargs=2, type=int, required=True, metavar=("CPP", "CONSOLE"),
+    parser.add_argument("--expect", nargs=2, type=int, required=True, metavar=("CODE", "CONSOLE"),
                         help="the least numbers of blocks, lest the document loses them unnoticed")
     arguments = parser.parse_args()
     try:
         counts = Checker(arguments).check()
     except Failure as failure:
         sys.exit(f"{arguments.document}: {failure}")
-    if counts["cpp"] < arguments.expect[0] or counts["console"] < arguments.expect[1]:
+    if counts["cpp"] + counts["c"] < arguments.expect[0] or counts["console"] < arguments.expect[1]:
         sys.exit(f"{arguments.document}: has only these blocks: {counts}")
     print(counts)
 

@@ -1,4 +1,5 @@
-# What the scripts of this folder share. They are told, by -D, of TREE, where the installed tree is or will be.
+# What the scripts of this folder share. -DTREE=... is where the installed tree is or will be.
+cmake_minimum_required(VERSION 3.25)
 
 # run(COMMAND...): its standard output in ${output}; anything but success ends the test.
 function(run)

@@ -1,0 +1,37 @@
+// `bsdl`: the boundary-scan operations that a device allows through an output.
+#include "commands/Commands.h"
+
+#include "commands/CommonArguments.h"
+#include "commands/MaskMembers.h"
+
+#include <tarvik/ConstraintsManager.h>
+
+#include <memory>
+
+namespace {
+
+struct Arguments {
+    std::string device;
+    std::string output;
+};
+
+ExitCode run(Tool& tool, const Arguments& arguments) {
+    const TARVIKNS::OUTPUT_TYPE output = vocabulary::readOutput(arguments.output);
+    ConstraintsManager& manager = tool.manager();
+    const int mask = manager.getBsdlOperations(arguments.device.c_str(), output);
+    Json asked{{"device", arguments.device}, {"output", vocabulary::key(output)}};
+    return showMembers(tool, operationMembers(manager, arguments.device, std::move(asked), mask));
+}
+
+Action declare(ArgumentList& list) {
+    auto arguments = std::make_shared<Arguments>();
+    list = {argument::device(&arguments->device), argument::output(&arguments->output)};
+    return [arguments](Tool& tool) { return run(tool, *arguments); };
+}
+
+} // namespace
+
+const Command command::BSDL{
+    "bsdl",  "List the boundary-scan operations that a device allows", "", "tarvik bsdl KS50 --output SVF",
+    declare,
+};

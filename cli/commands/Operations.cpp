@@ -1,0 +1,45 @@
+// `operations`: the operations that a device allows in a mode through an output.
+#include "commands/Commands.h"
+
+#include "commands/CommonArguments.h"
+#include "commands/MaskMembers.h"
+
+#include <tarvik/ConstraintsManager.h>
+
+#include <memory>
+
+namespace {
+
+struct Arguments {
+    std::string device;
+    std::string mode;
+    std::string output;
+};
+
+ExitCode run(Tool& tool, const Arguments& arguments) {
+    const TARVIKNS::MODE_TYPE mode = vocabulary::readMode(arguments.mode);
+    const TARVIKNS::OUTPUT_TYPE output = vocabulary::readOutput(arguments.output);
+    ConstraintsManager& manager = tool.manager();
+    const int mask = manager.getDeviceOperations(arguments.device.c_str(), mode, output);
+    Json asked{
+        {"device", arguments.device}, {"mode", vocabulary::key(mode)}, {"output", vocabulary::key(output)}};
+    return showMembers(tool, operationMembers(manager, arguments.device, std::move(asked), mask));
+}
+
+Action declare(ArgumentList& list) {
+    auto arguments = std::make_shared<Arguments>();
+    list = {
+        argument::device(&arguments->device),
+        argument::mode(&arguments->mode),
+        argument::output(&arguments->output),
+    };
+    return [arguments](Tool& tool) { return run(tool, *arguments); };
+}
+
+} // namespace
+
+const Command command::OPERATIONS{
+    "operations", "List the operations that a device allows",
+    "",           "tarvik operations KS50 --mode BS --output USB2",
+    declare,
+};

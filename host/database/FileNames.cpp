@@ -1,0 +1,30 @@
+#include "database/FileNames.h"
+
+#include <AcdText.h>
+
+#include <algorithm>
+#include <cstddef>
+
+// How paths, file names and the names of families belong together.
+
+namespace acd {
+
+std::string_view directoryOf(std::string_view path) noexcept {
+    const std::size_t slash = path.rfind('/');
+    // The root is named by its slash.
+    return slash == path.npos ? std::string_view() : path.substr(0, std::max<std::size_t>(slash, 1));
+}
+
+std::string_view fileNameOf(std::string_view path) noexcept { return path.substr(path.rfind('/') + 1); }
+
+std::string_view familyName(std::string_view fileName) noexcept {
+    constexpr std::string_view EXTENSION = ".acd";
+    if (fileName.starts_with('.')) {
+        return {}; // a lock or a backup of an editor
+    }
+    const std::size_t length = fileName.size() - std::min(fileName.size(), EXTENSION.size());
+    return AcdText::equalsIgnoreCase(fileName.substr(length), EXTENSION) ? fileName.substr(0, length)
+                                                                         : std::string_view();
+}
+
+} // namespace acd
