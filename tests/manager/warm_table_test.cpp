@@ -2,7 +2,7 @@
 // table says why it has to. The methods come from the recorded interface, so that none is forgotten.
 #include "ManagerFixture.h"
 
-#include <database/CountedAllocations.h>
+#include "host/database/CountedAllocations.h"
 
 #include <TarvikSmokeMgr.h>
 
