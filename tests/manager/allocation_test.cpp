@@ -1,5 +1,5 @@
 #include "FailingAllocations.h"
-#include "ManagerFixture.h"
+#include "Members.h"
 
 #include <algorithm>
 #include <new>

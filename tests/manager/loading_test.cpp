@@ -242,7 +242,7 @@ TEST(OptionOwner, IsTheDeviceWithItsPackageWhereTheyAreListedTogether) {
 TEST(OptionOwner, IsTheDeviceWhereItIsListedAndNoPackageIsGiven) {
     for (const char* package : {static_cast<const char*>(nullptr), ""}) {
         LoadingSession session("kestrel", "KS50,kestrel", {{"kestrel.acd", KESTREL}});
-        session.load("KS50", package);
+        session.load("KS50", view(package));
         EXPECT_THAT(session.optionsLoaded(), ElementsAre("spi", "KS50", "kestrel"));
     }
 }

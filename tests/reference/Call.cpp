@@ -95,6 +95,7 @@ struct ArgumentWriter {
     std::string operator()(bool value) const { return value ? "true" : "false"; }
     std::string operator()(int value) const { return std::to_string(value); }
     std::string operator()(const std::string& text) const { return literal(text, ""); }
+    std::string operator()(HeldText text) const { return "HeldText{" + std::to_string(text.number) + "}"; }
 };
 
 } // namespace

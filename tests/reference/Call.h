@@ -91,8 +91,13 @@ struct Signature {
 /// One for each method, in their order.
 [[nodiscard]] const std::vector<Signature>& signatures();
 
+/// A text that the manager itself returned before: one of those that are held, or the empty text while none is.
+struct HeldText {
+    std::size_t number; ///< modulo the number of held texts
+};
+
 /// Null is a null text. Enumerations are integers.
-using Argument = std::variant<std::nullptr_t, bool, int, std::string>;
+using Argument = std::variant<std::nullptr_t, bool, int, std::string, HeldText>;
 
 struct Call {
     Method method;

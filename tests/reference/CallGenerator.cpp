@@ -64,8 +64,27 @@ Argument orNull(Picker& pick, int percent, std::string text) {
     return pick.chance(percent) ? Argument(nullptr) : Argument(std::move(text));
 }
 
+bool isText(Kind kind) {
+    switch (kind) {
+        using enum Kind;
+    case SWITCH:
+    case LEAD:
+    case RECORDER:
+    case MODE:
+    case OUTPUT:
+    case OPERATION:
+    case OPTION:
+        return false;
+    default:
+        return true;
+    }
+}
+
 Argument makeArgument(Picker& pick, Kind kind) {
     constexpr int RARELY = 2;
+    if (isText(kind) && pick.chance(6)) {
+        return HeldText{static_cast<std::size_t>(pick.below(1000))};
+    }
     switch (kind) {
         using enum Kind;
     case SWITCH:

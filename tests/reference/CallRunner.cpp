@@ -1,6 +1,7 @@
 // Puts the same calls to the manager and to the reference, and compares what comes of them.
 #include "CallRunner.h"
 
+#include "HeldResults.h"
 #include "Invocation.h"
 #include "Reference.h"
 #include "support/TarvikTestPeer.h"
@@ -38,6 +39,18 @@ struct Terms<Reference> {
 
 namespace {
 
+Outcome outcomeOf(ConstraintsManager& manager, ManagerMessages& messages, const Call& call,
+                  const std::vector<const char*>& heldArguments, HeldResults& held) {
+    Outcome outcome;
+    try {
+        outcome.result = invoke(manager, call, heldArguments, held);
+    } catch (const TarvikException& exception) {
+        outcome.result = showRaised(exception);
+    }
+    outcome.messages = messages.take();
+    return outcome;
+}
+
 /// Both, alive over the same databases.
 class Pair {
 public:
@@ -62,8 +75,19 @@ public:
     [[nodiscard]] std::string callDifference(const Call& call) {
         std::ostringstream name;
         name << call;
-        return compare(name.str(), ask(m_reference, call), ask(*m_manager, m_messages, call));
+        Call plain = call;
+        std::vector<const char*> held(call.arguments.size(), nullptr);
+        for (std::size_t number = 0; number < held.size(); ++number) {
+            if (const auto* wanted = std::get_if<HeldText>(&call.arguments[number])) {
+                held[number] = m_held.text(wanted->number);
+                plain.arguments[number] = std::string(held[number]);
+            }
+        }
+        return compare(name.str(), ask(m_reference, plain), askHolding(plain, held));
     }
+
+    /// All that the manager returned is still what it was.
+    [[nodiscard]] std::string heldDifference() const { return m_held.difference(); }
 
     [[nodiscard]] std::string memberDifference() {
         const std::vector<Member> expected = members(m_reference);
@@ -89,24 +113,23 @@ public:
     }
 
 private:
+    [[nodiscard]] Outcome askHolding(const Call& call, const std::vector<const char*>& heldArguments) {
+        return outcomeOf(*m_manager, m_messages, call, heldArguments, m_held);
+    }
+
     [[nodiscard]] bool isBaseMissing() const { return !m_reference.databases().has("base.acd"); }
 
     Reference m_reference;
     ManagerMessages m_messages;
+    HeldResults m_held;
     ConstraintsManager* m_manager = nullptr;
 };
 
 } // namespace
 
 Outcome ask(ConstraintsManager& manager, ManagerMessages& messages, const Call& call) {
-    Outcome outcome;
-    try {
-        outcome.result = invoke(manager, call);
-    } catch (const TarvikException& exception) {
-        outcome.result = showRaised(exception);
-    }
-    outcome.messages = messages.take();
-    return outcome;
+    HeldResults held;
+    return outcomeOf(manager, messages, call, {}, held);
 }
 
 Outcome ask(Reference& reference, const Call& call) {
@@ -133,7 +156,7 @@ std::string difference(const Scenario& scenario, Ending ending) {
         }
     }
     if (found.empty()) {
-        found = pair.memberDifference() + pair.databaseMessageDifference();
+        found = pair.heldDifference() + pair.memberDifference() + pair.databaseMessageDifference();
     }
     return found;
 }

@@ -21,9 +21,14 @@ struct Terms;
 /// The arguments of a call, as what the methods take.
 class Arguments {
 public:
-    explicit Arguments(const Call& call) : m_arguments(call.arguments) {}
+    /// @param held takes the place of an argument where it is not null
+    Arguments(const Call& call, const std::vector<const char*>& held)
+        : m_arguments(call.arguments), m_held(held) {}
 
     [[nodiscard]] const char* text(std::size_t number) const {
+        if (number < m_held.size() && m_held[number] != nullptr) {
+            return m_held[number];
+        }
         const auto* text = std::get_if<std::string>(&m_arguments.at(number));
         return text == nullptr ? nullptr : text->c_str();
     }
@@ -43,6 +48,7 @@ public:
 
 private:
     const std::vector<Argument>& m_arguments;
+    const std::vector<const char*>& m_held;
 };
 
 /// What a dump writes into a recorder; with none, its messages tell.
@@ -53,9 +59,20 @@ std::string dumped(bool recorded, Dump dump) {
     return Terms<Target>::recorded(recorder);
 }
 
-template <typename Target>
-std::string invoke(Target& target, const Call& call) {
-    const Arguments a(call);
+/// Holds nothing: for targets that return copies.
+struct NothingHeld {
+    template <typename Result>
+    const Result& hold(const Result& result) {
+        return result;
+    }
+};
+
+/// @param heldArguments texts that take the place of arguments where they are not null
+/// @param held is given each result that is a reference or a pointer
+template <typename Target, typename Held = NothingHeld>
+std::string invoke(Target& target, const Call& call, const std::vector<const char*>& heldArguments = {},
+                   Held&& held = Held()) {
+    const Arguments a(call, heldArguments);
     switch (call.method) {
         using enum Method;
     case GET_CONSTRAINTS_MANAGER:
@@ -64,9 +81,9 @@ std::string invoke(Target& target, const Call& call) {
         target.setExceptions(a.flag(0));
         return "";
     case GET_OPERATION_ORDERS:
-        return show(target.getOperationOrders());
+        return show(held.hold(target.getOperationOrders()));
     case GET_PROGRAM_OPTION_ORDERS:
-        return show(target.getProgramOptionOrders());
+        return show(held.hold(target.getProgramOptionOrders()));
     case MODE_STRING_2_TYPE:
         return show(target.modeString2Type(a.text(0)));
     case MODE_TYPE_2_STRING:
@@ -109,11 +126,11 @@ std::string invoke(Target& target, const Call& call) {
     case GET_BSDL_OPERATIONS:
         return show(target.getBsdlOperations(a.text(0), a.output(1)));
     case GET_DEVICE_OPERATION_OPTIONS:
-        return show(target.getDeviceOperationOptions(a.text(0), a.text(1), a.mode(2)));
+        return show(held.hold(target.getDeviceOperationOptions(a.text(0), a.text(1), a.mode(2))));
     case GET_DEVICE_STRING_PROPERTIES:
-        return show(target.getDeviceStringProperties(a.text(0), a.text(1)));
+        return show(held.hold(target.getDeviceStringProperties(a.text(0), a.text(1))));
     case GET_DEVICE_STRING_PROPERTY:
-        return show(target.getDeviceStringProperty(a.text(0), a.text(1)));
+        return show(held.hold(target.getDeviceStringProperty(a.text(0), a.text(1))));
     case GET_DEVICE_BOOL_PROPERTY:
         return show(target.getDeviceBoolProperty(a.text(0), a.text(1)));
     case GET_DEVICE_LONG_PROPERTY:
@@ -126,11 +143,11 @@ std::string invoke(Target& target, const Call& call) {
     case IS_KORVEL_DEVICE:
         return show(target.isKorvelDevice(a.text(0)));
     case GET_ALL_DEVICE_IDCODES:
-        return show(target.getAllDeviceIdcodes());
+        return show(held.hold(target.getAllDeviceIdcodes()));
     case IS_SPI_DEVICE:
         return show(target.isSpiDevice(Terms<Target>::text(a.bytes(0))));
     case GET_SPI_DEVICE_STRING_PROPERTY:
-        return show(target.getSpiDeviceStringProperty(a.text(0), a.text(1)));
+        return show(held.hold(target.getSpiDeviceStringProperty(a.text(0), a.text(1))));
     case GET_SPI_DEVICE_BOOL_PROPERTY:
         return show(target.getSpiDeviceBoolProperty(a.text(0), a.text(1)));
     case GET_SPI_DEVICE_LONG_PROPERTY:

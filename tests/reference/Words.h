@@ -13,8 +13,8 @@ inline const Words FAMILIES{"kes", "Mir", "zor_x", "quillfamilyname16", "pct%%%d
 inline const Words OTHER_FAMILIES{"base", "BASE", "spi", "SPI", "", "KES", "KS50"};
 
 /// Some are named as families are, or as what a longer name leaves when it is cut.
-inline const Words DEVICES{"KS50",    "ks100", "MX2", "zor",   "KS50_PQ",
-                           "FLASH25", "AT45",  "mir", "dev%s", "kes_x"};
+inline const Words DEVICES{"KS50",    "ks100",   "MX2",  "zor", "KS50_PQ", "KS50",
+                           "KS50_PQ", "FLASH25", "AT45", "mir", "dev%s",   "kes_x"};
 
 /// Some are named as other devices, as families or as classes are.
 inline const Words SPI_NAMES{"FLASH25", "AT45", "M25", "ST1", "BPI2", "KS50", "at45", "SPI", "N%25", "KES"};
@@ -50,8 +50,8 @@ inline const Words DISPLAY_NAMES{"Program",       "Program FPGA Only ", "Program
                                  "one step qsvf", "PROGRAM USERCODE",   "Get Device Signature/Usercode",
                                  "VERIFY"};
 
-/// Some meet a device name at its "_".
-inline const Words PROPERTIES{"VENDOR", "PINS", "pins", "x_PINS", "PQ_PINS"};
+/// Many collide: "KS50" + "PQ_PINS" is "KS50_PQ" + "PINS".
+inline const Words PROPERTIES{"VENDOR", "PINS", "pins", "x_PINS", "PQ_PINS", "PINS", "PQ_PINS"};
 
 /// Properties that hold the options of an operation, in any mode or in one.
 inline const Words OPTION_PROPERTIES{"OP_PROGRAM",   "OP_PROGRAM_BS", "OP_PROGRAM_SS", "OP_VERIFY_BS",
@@ -60,8 +60,12 @@ inline const Words OPTION_PROPERTIES{"OP_PROGRAM",   "OP_PROGRAM_BS", "OP_PROGRA
 /// Properties that list modes.
 inline const Words OPERATION_PROPERTIES{"PROGRAM", "VERIFY", "ERASE", "program"};
 
-inline const Words VALUES{"TRUE", "TRUE", "7", "-1",          "FALSE",       "true", "B",
-                          "A",    " 12x", "",  "99999999999", "-2147483649", "50%",  "+3"};
+/// Some are names that the manager can be asked about in turn.
+inline const Words VALUES{
+    "KS50",        "KS50_PQ",     "PINS", "PQ_PINS", "a value that is longer than short texts are",
+    "TRUE",        "TRUE",        "7",    "-1",      "FALSE",
+    "true",        "B",           "A",    " 12x",    "",
+    "99999999999", "-2147483649", "50%",  "+3"};
 
 inline const Words SPI_PROPERTIES{"SIZE", "ERASABLE", "WIDTH", "Size", "5SIZE"};
 inline const Words SPI_VALUES{"TRUE", "true", "yes", "16", "-4", "", "abc"};
