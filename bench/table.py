@@ -22,20 +22,26 @@ def shown(value):
     return f"{value:,.0f}" if value >= 100 else f"{value:.3g}"
 
 
+def is_of_its_own(measure, row):
+    """Is it measured with contenders of its own, or with none?"""
+    return len(row) == 1 or measure == "batch" or measure.startswith("call, ")
+
+
 def table(results):
     contenders = []
     for row in results.values():
         contenders += [name for name in row if name not in contenders]
-    side_by_side = [name for name in contenders if any(len(row) > 1 and name in row for row in results.values())]
+    side_by_side = [name for name in contenders if any(
+        name in row and not is_of_its_own(measure, row) for (measure, _), row in results.items())]
     print("| measure | size | " + " | ".join(side_by_side) + " |")
     print("|---" * (2 + len(side_by_side)) + "|")
     for (measure, size), row in results.items():
-        if len(row) > 1 and measure != "batch":
+        if not is_of_its_own(measure, row):
             cells = [shown(row[name]) if name in row else "" for name in side_by_side]
             print(f"| {measure} | {size} | " + " | ".join(cells) + " |")
     print("\n| measure | size | |\n|---|---|---|")
     for (measure, size), row in results.items():
-        if len(row) == 1 or measure == "batch":
+        if is_of_its_own(measure, row):
             print(f"| {measure} | {size} | " + ", ".join(f"{name} {shown(value)}" for name, value in row.items()) + " |")
 
 
@@ -62,6 +68,10 @@ def figures(results):
         if size in ("S", "L"):
             first = results["first question", size]["process"] - nothing
             yield "first question, ms", size, first, 1.5 if size == "S" else 12
+        for kind in ("operations", "property"):
+            row = results[f"call, {kind}", size]
+            yield f"{kind} through C: ns above 1.3 times C++", size, row["C"] - 1.3 * row["C++"], 20
+        yield "operations through Python, us", size, results["call, operations", size]["Python"] / 1000, 3
         batch = results["batch", size]["requests a second"]
         yield "batch: 200,000 requests a second, part of what it does", size, 200_000 / batch, 1
         if size == "L":

@@ -8,7 +8,8 @@ set(libraries TarvikConstraintsManager)
 
 set_target_properties(TarvikConstraintsManager PROPERTIES EXPORT_NAME ConstraintsManager INSTALL_RPATH "$ORIGIN")
 target_include_directories(TarvikConstraintsManager PUBLIC $<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>)
-install(DIRECTORY include/tarvik DESTINATION ${CMAKE_INSTALL_INCLUDEDIR} COMPONENT development)
+install(DIRECTORY include/tarvik DESTINATION ${CMAKE_INSTALL_INCLUDEDIR} COMPONENT development
+  PATTERN tarvik.h EXCLUDE)
 
 if(TARVIK_HOST)
   # Applications find somebody else's host by its own package.
@@ -21,10 +22,13 @@ if(TARVIK_HOST)
   set(host_libraries "")
 else()
   set(host_headers ${CMAKE_INSTALL_INCLUDEDIR}/tarvik/host)
-  list(APPEND libraries TarvikHost)
+  list(APPEND libraries TarvikHost TarvikC)
   set_target_properties(TarvikHost PROPERTIES EXPORT_NAME Host INSTALL_RPATH "$ORIGIN")
   target_include_directories(TarvikHost PUBLIC $<INSTALL_INTERFACE:${host_headers}>)
   install(DIRECTORY host/include/ DESTINATION ${host_headers} COMPONENT development)
+  install(FILES include/tarvik/tarvik.h DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/tarvik COMPONENT development)
+  set_target_properties(TarvikC PROPERTIES EXPORT_NAME C INSTALL_RPATH "$ORIGIN")
+  target_include_directories(TarvikC PUBLIC $<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>)
   set(find_host "")
   set(host_flags " -I\${includedir}/tarvik/host")
   set(host_libraries " -lTarvikHost")
@@ -46,6 +50,11 @@ file(RELATIVE_PATH prefix_from_pkgconfig /${CMAKE_INSTALL_LIBDIR}/pkgconfig /)
 configure_file(cmake/tarvik-constraints-manager.pc.in tarvik-constraints-manager.pc @ONLY)
 install(FILES ${CMAKE_CURRENT_BINARY_DIR}/tarvik-constraints-manager.pc
   DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig COMPONENT development)
+if(TARGET TarvikC)
+  configure_file(cmake/tarvik.pc.in tarvik.pc @ONLY)
+  install(FILES ${CMAKE_CURRENT_BINARY_DIR}/tarvik.pc
+    DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig COMPONENT development)
+endif()
 
 if(TARGET tarvik)
   install(TARGETS tarvik RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT tool)

@@ -3,11 +3,13 @@ set(library_package libtarvik-constraints-manager${PROJECT_VERSION_MAJOR})
 set(development_package libtarvik-constraints-manager-dev)
 set(tools_package tarvik-tools)
 set(database_package tarvik-database)
+set(python_package python3-tarvik)
 
 set(library_components runtime)
 set(development_components development documentation)
 set(tools_components tool)
 set(database_components data database)
+set(python_components python)
 
 set(CPACK_GENERATOR DEB)
 set(CPACK_VERBATIM_VARIABLES ON)
@@ -37,7 +39,8 @@ user for a device: an FPGA, a CPLD, a configuration PROM, an SPI or BPI flash.
 It answers from text files which operations, options and properties there are,
 and whether an operation may run in a mode through a cable.
 
-This package holds the shared libraries: the manager and its host layer.")
+This package holds the shared libraries: the manager, its host layer, and the
+interface for C.")
 
 set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_SECTION libdevel)
 set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_DEPENDS "${library_package} ${this_version}")
@@ -65,9 +68,20 @@ Text files that describe a dozen families of invented devices, and show by
 example how a device database is written. While this package is installed
 they are the database that libtarvik-constraints-manager finds by itself.")
 
+set(CPACK_DEBIAN_PYTHON_PACKAGE_SECTION python)
+set(CPACK_DEBIAN_PYTHON_PACKAGE_ARCHITECTURE all)
+set(CPACK_DEBIAN_PYTHON_PACKAGE_DEPENDS "python3 (>= 3.9), ${library_package} ${this_version}")
+set(CPACK_DEBIAN_PYTHON_PACKAGE_RECOMMENDS ${database_package})
+set(CPACK_DEBIAN_PYTHON_DESCRIPTION "device-programming constraints - Python 3 package
+The module tarvik asks a device database what a device-programming application
+can offer its user for a device: which operations, programming options and
+properties there are, and whether an operation can run in a mode.
+
+This package holds the module, with type hints.")
+
 include(CPackComponent)
 set(CPACK_COMPONENTS_ALL)
-foreach(group library development tools database)
+foreach(group library development tools database python)
   set(package ${${group}_package})
   string(TOUPPER ${group} upper_group)
   set(CPACK_DEBIAN_${upper_group}_PACKAGE_NAME ${package})

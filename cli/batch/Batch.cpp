@@ -21,7 +21,7 @@ std::pair<const char*, Json> invoke(const PreparedCall& prepared, ConstraintsMan
     try {
         return {"result", prepared.call->invoke(manager, prepared.arguments)};
     } catch (const TarvikException& exception) {
-        return {"exception", {{"type", exception.what()}, {"line", exception.line()}}};
+        return {"exception", {{"type", exception.typeName()}, {"line", exception.line()}}};
     }
 }
 

@@ -13,9 +13,15 @@
 
 #include <algorithm>
 #include <charconv>
+#include <cstddef>
+#include <filesystem>
+#include <fstream>
 #include <iterator>
 #include <memory>
+#include <optional>
 #include <set>
+#include <system_error>
+#include <utility>
 
 namespace {
 
@@ -25,6 +31,8 @@ struct Arguments {
     std::vector<std::string> ignored;
     std::vector<std::string> explained;
     std::string format = "text";
+    std::string baseline;
+    std::optional<std::string> most;
     bool strict = false;
 };
 
@@ -114,35 +122,114 @@ lint::Report examine(const lint::Model& model, const Rules& selected, const Rule
     return {lint::sorted(std::move(all), model)};
 }
 
+/// The fingerprints of a former report.
+std::set<std::string> readBaseline(const std::string& path) {
+    std::ifstream file(path, std::ios::binary);
+    const Json report = file ? Json::parse(file, nullptr, false) : Json();
+    if (!report.is_object() || !report.contains("findings") || !report["findings"].is_array()) {
+        throw CommandError(ExitCode::FAULT,
+                           fmt::format("{} is not a report of: tarvik lint --format json", printable(path)));
+    }
+    std::set<std::string> fingerprints;
+    for (const Json& finding : report["findings"]) {
+        if (finding.is_object() && finding.contains("fingerprint") && finding["fingerprint"].is_string()) {
+            fingerprints.insert(finding["fingerprint"].get<std::string>());
+        }
+    }
+    return fingerprints;
+}
+
+void dropKnown(lint::Report& report, const std::string& baseline) {
+    const std::set<std::string> known = readBaseline(baseline);
+    const std::vector<std::string> names = fingerprints(report.findings);
+    std::vector<lint::Finding> kept;
+    for (std::size_t i = 0; i < names.size(); ++i) {
+        if (!known.contains(names[i])) {
+            kept.push_back(std::move(report.findings[i]));
+        }
+    }
+    report.findings = std::move(kept);
+}
+
+std::size_t readCount(const std::string& text) {
+    std::size_t count = 0;
+    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), count);
+    if (error != std::errc() || end != text.data() + text.size()) {
+        throw CommandError(ExitCode::FAULT, fmt::format("--max needs a number, not \"{}\"", printable(text)));
+    }
+    return count;
+}
+
+/// Shows at most that many findings, and how many there are of each rule.
+ExitCode showSome(Tool& tool, lint::Report report, std::size_t most, ExitCode status) {
+    if (!report.findings.empty()) {
+        tool.note(fmt::format("{}; {} shown\n{}", summary(report), std::min(most, report.findings.size()),
+                              countsByCode(report)));
+    }
+    report.findings.erase(report.findings.begin() +
+                              static_cast<std::ptrdiff_t>(std::min(most, report.findings.size())),
+                          report.findings.end());
+    return tool.answer(report, status);
+}
+
 ExitCode show(Tool& tool, const lint::Report& report, const Arguments& arguments) {
     const bool isRefused =
         report.count(lint::Severity::ERROR) != 0 || (arguments.strict && !report.findings.empty());
     const ExitCode status = isRefused ? ExitCode::NO : ExitCode::YES;
     if (arguments.format == "text") {
+        if (arguments.most) {
+            return showSome(tool, report, readCount(*arguments.most), status);
+        }
         if (!report.findings.empty()) {
             tool.note(summary(report));
         }
         return tool.answer(report, status);
     }
-    Json document;
-    if (arguments.format == "sarif") {
-        document = asSarif(report);
+    std::string text;
+    if (arguments.format == "github") {
+        text = asGithub(report);
+    } else if (arguments.format == "sarif") {
+        text = oneLine(asSarif(report)) + '\n';
     } else {
-        document = {{"version", 1}};
+        Json document{{"version", 1}};
         document.update(asJson(report));
         document["messages"] = Json::array();
+        text = oneLine(document) + '\n';
     }
-    tool.output().write(oneLine(document) + '\n');
+    tool.output().write(text);
     tool.output().flush();
     return status;
 }
 
-ExitCode run(Tool& tool, const Arguments& arguments) {
+/// Replaces files by their directories.
+/// @return the files; empty when only directories are given
+std::set<std::string> takeFiles(std::vector<std::string>& paths) {
+    std::set<std::string> files;
+    std::vector<std::string> directories;
+    for (const std::string& path : paths) {
+        std::error_code ignored;
+        const bool isFile = std::filesystem::is_regular_file(path, ignored);
+        const std::string parent = std::filesystem::path(path).parent_path().string();
+        const std::string directory = !isFile ? path : parent.empty() ? "." : parent;
+        if (isFile) {
+            files.insert(
+                (std::filesystem::path(directory) / std::filesystem::path(path).filename()).string());
+        }
+        if (std::find(directories.begin(), directories.end(), directory) == directories.end()) {
+            directories.push_back(directory);
+        }
+    }
+    paths = std::move(directories);
+    return files;
+}
+
+ExitCode run(Tool& tool, Arguments arguments) {
     const Rules selected = rulesOf(arguments.selected);
     const Rules ignored = rulesOf(arguments.ignored);
     if (!arguments.explained.empty()) {
         return explain(tool, arguments);
     }
+    const std::set<std::string> files = takeFiles(arguments.directories);
     if (arguments.directories.empty()) {
         tool.openDatabase();
     } else {
@@ -151,7 +238,14 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     const lint::Model model(AcdLines::ofDatabase());
     // The rules report the readers' faults, too, with a code.
     static_cast<void>(tool.messages().take());
-    return show(tool, examine(model, selected, ignored), arguments);
+    lint::Report report = examine(model, selected, ignored);
+    std::erase_if(report.findings, [&files](const lint::Finding& finding) {
+        return !files.empty() && !files.contains(std::string(finding.location.file->path()));
+    });
+    if (!arguments.baseline.empty()) {
+        dropKnown(report, arguments.baseline);
+    }
+    return show(tool, report, arguments);
 }
 
 Action declare(ArgumentList& list) {

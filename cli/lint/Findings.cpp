@@ -5,7 +5,9 @@
 
 #include <algorithm>
 #include <cstdint>
+#include <iterator>
 #include <map>
+#include <set>
 #include <tuple>
 #include <utility>
 
@@ -56,12 +58,21 @@ void Findings::addText(const Rule& rule, const Token& token, std::string text) {
     m_findings.push_back({&rule, location, std::min(token.text.size(), rest), std::move(text)});
 }
 
-std::string Findings::didYouMean(std::string_view text, const std::vector<std::string>& candidates) {
-    if (candidates.size() > m_comparisonsLeft) {
+std::string Findings::didYouMean(std::string_view text, const std::vector<std::string>& candidates,
+                                 const std::vector<Token>& used) {
+    const std::size_t cost = candidates.size() + used.size();
+    if (cost > m_comparisonsLeft) {
         return {};
     }
-    m_comparisonsLeft -= candidates.size();
-    return ::didYouMean(text, candidates);
+    m_comparisonsLeft -= cost;
+    std::set<std::string_view> names;
+    for (const Token& token : used) {
+        names.insert(token.text);
+    }
+    std::vector<std::string> unused;
+    std::copy_if(candidates.begin(), candidates.end(), std::back_inserter(unused),
+                 [&names](const std::string& candidate) { return !names.contains(candidate); });
+    return ::didYouMean(text, unused);
 }
 
 std::vector<Finding> sorted(std::vector<Finding> findings, const Model& model) {

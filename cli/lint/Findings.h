@@ -32,7 +32,9 @@ public:
     void addText(const Rule& rule, const Token& token, std::string text);
 
     /// `; did you mean "..."?`, or nothing.
-    [[nodiscard]] std::string didYouMean(std::string_view text, const std::vector<std::string>& candidates);
+    /// @param used names that the place already has: they are never suggested
+    [[nodiscard]] std::string didYouMean(std::string_view text, const std::vector<std::string>& candidates,
+                                         const std::vector<Token>& used = {});
 
     [[nodiscard]] const std::vector<Finding>& all() const noexcept { return m_findings; }
 

@@ -6,6 +6,8 @@
 #include <fmt/format.h>
 
 #include <algorithm>
+#include <map>
+#include <utility>
 
 namespace lint {
 
@@ -56,6 +58,40 @@ std::size_t Report::count(Severity severity) const {
 std::string summary(const Report& report) {
     return counted(report.count(Severity::ERROR), "error") + ", " +
            counted(report.count(Severity::WARNING), "warning");
+}
+
+std::string countsByCode(const Report& report) {
+    std::map<std::string_view, std::size_t> counts;
+    for (const Finding& finding : report.findings) {
+        ++counts[finding.rule->code];
+    }
+    std::vector<std::pair<std::string_view, std::size_t>> sorted(counts.begin(), counts.end());
+    std::stable_sort(sorted.begin(), sorted.end(),
+                     [](const auto& left, const auto& right) { return left.second > right.second; });
+    std::string text;
+    for (const auto& [code, count] : sorted) {
+        text += fmt::format("{}{}: {}", text.empty() ? "" : ", ", code, count);
+    }
+    return text;
+}
+
+std::string asGithub(const Report& report) {
+    // The runner unescapes all texts, and ends a property at ":" or ",".
+    const auto escaped = [](std::string_view text, bool isProperty) {
+        std::string result;
+        for (const char byte : printable(text)) {
+            const bool isSpecial = byte == '%' || (isProperty && (byte == ':' || byte == ','));
+            result += isSpecial ? fmt::format("%{:02X}", static_cast<unsigned>(byte)) : std::string(1, byte);
+        }
+        return result;
+    };
+    std::string text;
+    for (const Finding& finding : report.findings) {
+        text += fmt::format("::{} file={},line={},col={},title={}::{}\n", nameOf(finding.rule->severity),
+                            escaped(finding.location.file->path(), true), finding.location.line,
+                            finding.location.column, finding.rule->code, escaped(finding.text, false));
+    }
+    return text;
 }
 
 std::string asText(const Report& report, const Terminal& terminal) {

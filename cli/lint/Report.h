@@ -20,6 +20,12 @@ struct Report {
 /// "2 errors, 1 warning".
 [[nodiscard]] std::string summary(const Report& report);
 
+/// "T101: 2, T112: 1", the most frequent code first.
+[[nodiscard]] std::string countsByCode(const Report& report);
+
+/// For each finding a workflow command that GitHub shows at the line.
+[[nodiscard]] std::string asGithub(const Report& report);
+
 /// For each finding `file:line:column: error: text [CODE]`, the line of the file, and a caret below.
 [[nodiscard]] std::string asText(const Report& report, const Terminal& terminal);
 

@@ -29,6 +29,8 @@
  * **Threads.** Call from one thread at a time. `tarvik_last_error` is kept for each thread.
  */
 
+/* This is C. NOLINTBEGIN(modernize-deprecated-headers,modernize-use-using) */
+
 #include <stddef.h>
 #include <stdint.h>
 
@@ -716,3 +718,5 @@ TARVIK_API const char* tarvik_text_map_next(const tarvik_text_map* map, tarvik_i
 #ifdef __cplusplus
 }
 #endif
+
+/* NOLINTEND(modernize-deprecated-headers,modernize-use-using) */

@@ -97,6 +97,12 @@ std::optional<std::size_t> position(const std::vector<std::string>& all, std::st
     return found == all.end() ? std::nullopt : std::optional(static_cast<std::size_t>(found - all.begin()));
 }
 
+bool isOperation(std::string_view name) {
+    static const std::set<std::string_view> all(vocabulary::operations().begin(),
+                                                vocabulary::operations().end());
+    return all.contains(name);
+}
+
 std::string upperCase(std::string_view text) {
     std::string upper(text);
     std::transform(upper.begin(), upper.end(), upper.begin(), AcdText::toUpper);
@@ -198,8 +204,7 @@ private:
                                 device.find(schema::PROGRAM_OPTION) != nullptr;
         const PropertyValues own(device);
         const bool hasProperties = std::any_of(own.values.begin(), own.values.end(), [](const auto& value) {
-            return value.first.starts_with(schema::OPTIONS_PREFIX) ||
-                   position(vocabulary::operations(), value.first).has_value();
+            return value.first.starts_with(schema::OPTIONS_PREFIX) || isOperation(value.first);
         });
         if (!hasOperations && !hasOptions && !hasProperties) {
             return; // its answers are those of the family
@@ -221,7 +226,7 @@ private:
         bool hasOperationProperties = false;
         std::map<std::string, Modes> offered;
         for (const auto& [name, values] : properties.values) {
-            if (position(vocabulary::operations(), name)) {
+            if (isOperation(name)) {
                 hasOperationProperties = true;
                 offered[std::string(name)] = modesOf(values);
                 checkOffered(section, std::string(name), values, operations);
@@ -278,7 +283,7 @@ private:
                       std::map<std::string, Modes>& offered) {
         for (const auto& [place, token] : operations.locations) {
             const auto& [name, mode] = place;
-            if (hasRecords(mode) && position(vocabulary::operations(), name) && !offered[name].test(mode)) {
+            if (hasRecords(mode) && isOperation(name) && !offered[name].test(mode)) {
                 report(RECORD_WITHOUT_PROPERTY, token, "the property {} of {} does not list the mode {}",
                        name, owner(section), vocabulary::modes()[mode]);
             }
@@ -293,14 +298,14 @@ private:
         std::string operation(name.substr(schema::OPTIONS_PREFIX.size()));
         Modes wanted;
         wanted.set();
-        if (!position(vocabulary::operations(), operation)) {
+        if (!isOperation(operation)) {
             const std::size_t cut = operation.rfind('_');
             const std::optional<std::size_t> mode =
                 cut == operation.npos
                     ? std::nullopt
                     : position(vocabulary::modes(), std::string_view(operation).substr(cut + 1));
             operation.resize(std::min(cut, operation.size()));
-            if (!mode || !position(vocabulary::operations(), operation)) {
+            if (!mode || !isOperation(operation)) {
                 return; // found as a name that belongs to no operation
             }
             wanted = Modes().set(*mode);
@@ -353,7 +358,8 @@ void checkModes(const Model& model, const std::map<std::string_view, Modes>& use
         for (std::size_t i = 1; items.size() > 1 && i < items[1].fields.size(); ++i) {
             const Token& family = items[1].fields[i];
             const auto found = used.find(family.text);
-            if (found != used.end() && !found->second.test(mode)) {
+            // A family that offers nothing anywhere is not finished yet.
+            if (found != used.end() && found->second.any() && !found->second.test(mode)) {
                 findings.add(IDLE_FAMILY, family, "the family {} offers nothing in mode {}",
                              quoted(family.text), modes[mode]);
             }

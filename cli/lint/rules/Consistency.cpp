@@ -72,14 +72,11 @@ struct Use {
 struct Domain {
     const char* owners;
     std::vector<Use> uses;
-    std::map<std::string_view, std::size_t> counts; ///< of the sections that use a name
 
     void add(const std::vector<Item>& items, std::size_t firstValue, std::size_t section) {
         for (const Item& item : items) {
-            const std::string_view name = item.fields.front().text;
-            if (!name.empty()) {
+            if (!item.fields.front().text.empty()) {
                 uses.push_back({&item.fields.front(), &item.fields, firstValue, section});
-                ++counts[name];
             }
         }
     }
@@ -121,9 +118,13 @@ bool hasMeaning(std::string_view name) {
 
 /// @return the sections that have such a name
 std::set<std::size_t> checkRareNames(const Domain& domain, Findings& findings) {
-    std::map<std::string_view, std::set<std::size_t>> sections;
+    // Sections come in the order of their numbers.
+    std::map<std::string_view, std::vector<std::size_t>> sections;
     for (const Use& use : domain.uses) {
-        sections[use.name->text].insert(use.section);
+        std::vector<std::size_t>& users = sections[use.name->text];
+        if (users.empty() || users.back() != use.section) {
+            users.push_back(use.section);
+        }
     }
     std::map<std::string_view, std::string_view> rare;
     for (const auto& [name, users] : sections) {
@@ -132,8 +133,9 @@ std::set<std::size_t> checkRareNames(const Domain& domain, Findings& findings) {
         }
         for (const auto& [other, others] : sections) {
             if (others.size() >= MIN_COMMON && isOneEdit(name, other) &&
-                std::none_of(users.begin(), users.end(),
-                             [&others = others](std::size_t section) { return others.contains(section); })) {
+                std::none_of(users.begin(), users.end(), [&others = others](std::size_t section) {
+                    return std::binary_search(others.begin(), others.end(), section);
+                })) {
                 rare.emplace(name, other);
             }
         }
@@ -238,7 +240,7 @@ std::set<std::string_view> namesOf(const Section& section) {
 }
 
 void checkFamilies(const Model& model, Findings& findings) {
-    Domain domain{"sections", {}, {}};
+    Domain domain{"sections", {}};
     std::map<const Section*, std::size_t> numbers;
     for (const FamilyData& family : model.families()) {
         family.forEachSection([&](const Section& section) {
@@ -262,7 +264,7 @@ void checkFamilies(const Model& model, Findings& findings) {
 }
 
 void checkFlashes(const Model& model, Findings& findings) {
-    Domain domain{"property keys", {}, {}};
+    Domain domain{"property keys", {}};
     std::map<std::string_view, std::size_t> numbers;
     for (const auto& [key, value] : model.spiKeys().values) {
         if (key.ends_with(schema::PROPERTY_SUFFIX)) {
@@ -314,16 +316,25 @@ void checkPackages(const Model& model, Findings& findings) {
         });
     }
     for (const auto& [text, spellings] : all) {
-        const auto common =
-            std::max_element(spellings.begin(), spellings.end(), [](const auto& left, const auto& right) {
-                return left.second.size() < right.second.size();
-            });
-        for (const auto& [package, uses] : spellings) {
-            for (const Token* use : uses) {
-                if (uses.size() < common->second.size() && uses.size() <= MAX_RARE) {
+        // Of two names that are equally common the one that is letters and then digits is right.
+        const auto rank = [](const auto& spelling) {
+            const std::string_view package = spelling.first;
+            const std::size_t digits = std::min(package.find_first_of("0123456789"), package.size());
+            const bool isRegular =
+                std::all_of(package.begin() + static_cast<std::ptrdiff_t>(digits), package.end(), isDigit);
+            return std::pair(spelling.second.size(), isRegular);
+        };
+        const auto common = std::max_element(
+            spellings.begin(), spellings.end(),
+            [&rank](const auto& left, const auto& right) { return rank(left) < rank(right); });
+        for (const auto& spelling : spellings) {
+            for (const Token* use : spelling.second) {
+                if (rank(spelling) < rank(*common) && spelling.second.size() <= MAX_RARE) {
                     findings.add(CONFUSABLE_PACKAGE, *use,
-                                 "{} looks like {}, which is listed {} times; did you mean that?",
-                                 quoted(package), quoted(common->first), common->second.size());
+                                 "{} looks like {}, which is listed {}; did you mean that?",
+                                 quoted(spelling.first), quoted(common->first),
+                                 common->second.size() == 1 ? std::string("once")
+                                                            : fmt::format("{} times", common->second.size()));
                 }
             }
         }

@@ -193,11 +193,12 @@ void checkMultiboot(const Model& model, Findings& findings) {
     std::vector<std::string> candidates = model.flashNames();
     candidates.insert(candidates.end(), model.deviceNames().begin(), model.deviceNames().end());
     for (const std::string& key : multiboot::keys()) {
-        for (const Token& token : model.spiKeys().list(key)) {
+        const std::vector<Token>& listed = model.spiKeys().list(key);
+        for (const Token& token : listed) {
             const std::string name(token.text);
             if (!name.empty() && !model.isFlashInAnyCase(name) && model.deviceInAnyCase(name) == nullptr) {
                 findings.add(UNKNOWN_IN_MULTIBOOT, token, "{} is neither a flash nor a device{}",
-                             quoted(name), findings.didYouMean(name, candidates));
+                             quoted(name), findings.didYouMean(name, candidates, listed));
             }
         }
     }

@@ -165,7 +165,8 @@ void checkCode(const Token& device, const Token& code, bool counts, IdcodeIndex&
     codes.add({*pattern, &device});
 }
 
-void checkDevice(const Model& model, const Token& device, Findings& findings) {
+void checkDevice(const Model& model, const Token& device, const std::vector<Token>& used,
+                 Findings& findings) {
     if (model.device(device.text) != nullptr) {
         return;
     }
@@ -174,7 +175,7 @@ void checkDevice(const Model& model, const Token& device, Findings& findings) {
                      quoted(device.text));
     } else {
         findings.add(UNKNOWN_DEVICE, device, "unknown device {}{}", quoted(device.text),
-                     findings.didYouMean(device.text, model.deviceNames()));
+                     findings.didYouMean(device.text, model.deviceNames(), used));
     }
 }
 
@@ -182,8 +183,10 @@ void check(const Model& model, Findings& findings) {
     std::map<std::string_view, const AcdLines*> withCode;
     // Only the last code of a device counts: a layer on top may give its former code to another device.
     std::map<std::string_view, const Token*> last;
+    std::vector<Token> used;
     for (const Item& item : model.baseKeys().items(schema::IDCODE)) {
         last.insert_or_assign(item.fields.front().text, &item.fields.front());
+        used.push_back(item.fields.front());
     }
     IdcodeIndex codes;
     for (const Item& item : model.baseKeys().items(schema::IDCODE)) {
@@ -192,7 +195,7 @@ void check(const Model& model, Findings& findings) {
         if (device.text.empty()) {
             continue;
         }
-        checkDevice(model, device, findings);
+        checkDevice(model, device, used, findings);
         // A layer on top may append another code on purpose.
         const AcdLines*& file = withCode[device.text];
         if (std::exchange(file, device.location.file) == device.location.file) {

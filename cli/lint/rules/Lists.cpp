@@ -69,7 +69,7 @@ bool isNumberOrFlag(std::string_view text) {
            (!text.empty() && text.find_first_not_of("0123456789.-") == text.npos);
 }
 
-/// A "#" with a blank after it begins a comment, and so does one after a number; "Kestrel #1" is a title.
+/// A "#" between blanks begins a comment, and so does one at the end or after a number; "Kestrel #1" is a title.
 bool hasComment(std::string_view text) {
     const std::size_t at = text.find('#');
     if (at == text.npos) {
@@ -77,7 +77,7 @@ bool hasComment(std::string_view text) {
     }
     const std::string_view before = text.substr(0, at);
     const std::string_view word = before.substr(0, before.find_last_not_of(" \t") + 1);
-    return at + 1 == text.size() || isBlank(text[at + 1]) || isNumberOrFlag(word);
+    return at + 1 == text.size() || text.find(" # ") != text.npos || isNumberOrFlag(word);
 }
 
 void checkTexts(const std::vector<Token>& tokens, Findings& findings) {

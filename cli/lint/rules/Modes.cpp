@@ -98,7 +98,7 @@ void checkOutputs(const std::vector<Token>& outputs, Findings& findings) {
         const std::string_view text = outputs[i].text;
         if (!text.empty() && !contains(schema::modeOutputs(), text)) {
             findings.add(UNKNOWN_MODE_OUTPUT, outputs[i], "unknown output {}{}", quoted(text),
-                         findings.didYouMean(text, schema::modeOutputs()));
+                         findings.didYouMean(text, schema::modeOutputs(), outputs));
         }
     }
 }
@@ -116,7 +116,7 @@ void checkFamilies(const Model& model, const std::vector<Token>& families, Findi
                          quoted(device->family->name));
         } else {
             findings.add(UNKNOWN_MODE_FAMILY, families[i], "unknown family {}{}", quoted(text),
-                         findings.didYouMean(text, model.familyNames()));
+                         findings.didYouMean(text, model.familyNames(), families));
         }
     }
 }

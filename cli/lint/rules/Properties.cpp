@@ -191,7 +191,7 @@ void checkMeaning(const Item& item, std::size_t firstValue, Findings& findings) 
         // The word that records use for a mode is the likeliest mistake.
         const std::string hint = !isOption && sameWithoutCase(value.text, "Bscan")
                                      ? "; did you mean \"BS\"?"
-                                     : findings.didYouMean(value.text, known);
+                                     : findings.didYouMean(value.text, known, item.fields);
         findings.add(isOption ? UNKNOWN_OPTION_VALUE : UNKNOWN_MODE_KEY, value, "unknown {} {}{}",
                      isOption ? "option" : "mode key", quoted(value.text), hint);
     }

@@ -88,10 +88,11 @@ std::vector<std::string> familiesAndDevices(const Model& model) {
 
 void checkSupported(const Model& model, Findings& findings) {
     const std::vector<std::string> candidates = familiesAndDevices(model);
-    for (const Token& name : model.baseKeys().list(schema::DEVICE_SUPPORTED)) {
+    const std::vector<Token>& listed = model.baseKeys().list(schema::DEVICE_SUPPORTED);
+    for (const Token& name : listed) {
         if (!name.text.empty() && !isKnown(model, name.text)) {
             findings.add(UNKNOWN_SUPPORTED, name, "{} is neither a family nor a device{}", quoted(name.text),
-                         findings.didYouMean(name.text, candidates));
+                         findings.didYouMean(name.text, candidates, listed));
         }
         const Device* const device = model.device(name.text);
         if (device != nullptr && device->section->find(schema::OPERATION) == nullptr &&
@@ -136,7 +137,8 @@ Part partOf(const Model& model, std::string_view name, std::vector<std::string>&
 
 void checkOptionOwners(const Model& model, Findings& findings) {
     const std::vector<std::string> candidates = familiesAndDevices(model);
-    for (const Token& name : model.baseKeys().list(schema::PROGRAM_OPTION_PACKAGE)) {
+    const std::vector<Token>& listed = model.baseKeys().list(schema::PROGRAM_OPTION_PACKAGE);
+    for (const Token& name : listed) {
         if (name.text.empty() || isKnown(model, name.text)) {
             continue;
         }
@@ -146,12 +148,12 @@ void checkOptionOwners(const Model& model, Findings& findings) {
         case Part::UNKNOWN:
             findings.add(UNKNOWN_OPTION_OWNER, name,
                          "{} is neither a family nor a device, nor a device with a package{}",
-                         quoted(name.text), findings.didYouMean(name.text, candidates));
+                         quoted(name.text), findings.didYouMean(name.text, candidates, listed));
             break;
         case Part::OTHER_PACKAGE:
             packages.insert(packages.end(), candidates.begin(), candidates.end());
             findings.add(UNKNOWN_PACKAGE, name, "no device has the package of {}{}", quoted(name.text),
-                         findings.didYouMean(name.text, packages));
+                         findings.didYouMean(name.text, packages, listed));
             break;
         case Part::KNOWN:
             if (model.supported().contains(device)) {

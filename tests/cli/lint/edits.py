@@ -64,8 +64,6 @@ TABLES_AND_LISTS = [
     Edit("a device excluded from SPI", "M206", *excluded("SPI_KS50_TQ144,SS_BZ2_PL84")),
     Edit("SPI in upper case excluded from SPI", "M206", *excluded("SPI_SPI_SO8,SS_BZ2_PL84")),
     Edit("a package that only other devices have", "M204", *excluded("SS_BZ2_FB900,SS_BZ2_PL84")),
-    *[Edit(f"the key {key} is missing", "M105", "base.acd", f"\n{key} ", f"\n# {key} ", at="DEVICE_SUPPORTED       =")
-      for key in []],
     Edit("SS renamed", "M105", "base.acd", "SS      = outputs", "SSER    = outputs", at="DEVICE_SUPPORTED       ="),
     Edit("KITECF renamed", "M105", "base.acd", "KITECF  = outputs", "KITE_CF = outputs", at="DEVICE_SUPPORTED       ="),
     Edit("PFF renamed", "M105", "base.acd", "PFF     = outputs", "PROMFF  = outputs", at="DEVICE_SUPPORTED       ="),
@@ -166,7 +164,7 @@ PROPERTIES_AND_TABLES = [
 OVERLAYS_AND_SECTIONS = [
     Edit("+= in a section without OPERATION", "R101", "osprey.acd", "[OS2000E]\n", "[OS2000E]\nBSDL_OPERATION += :CONLD,USB2\n",
          at="BSDL_OPERATION += :CONLD"),
-    Edit("+= in a section without PROGRAM_OPTION", "R101", "osprey.acd", "[OS2000E]\n", "[OS2000E]\nPROGRAM_OPTION += :PROG,Bscan,USB2\n",
+    Edit("+= in a section without PROGRAM_OPTION", "R101", "kestrel.acd", "[KS100]\n", "[KS100]\nPROGRAM_OPTION += :PROG,Bscan,USB2\n",
          at="PROGRAM_OPTION += :PROG"),
     Edit("+= in a section of a layer", "R101", "kestrel.acd", None, "[KS100]\nPROGRAM_OPTION += :ERASE,Bscan,USB2\n", at="PROGRAM_OPTION"),
     *[Edit(f"{key} = in a layer", "R102", file, None, f"{key} = {value}\n")
@@ -192,7 +190,7 @@ OVERLAYS_AND_SECTIONS = [
 
 
 def prop(file, old, new, code):
-    return Edit(f"{file}: {old} becomes {new}", code, file, old, new)
+    return Edit(f"{file}: {old!r} becomes {new!r}", code, file, old, new)
 
 
 NEAR_IDENTICAL = [
@@ -214,7 +212,7 @@ NEAR_IDENTICAL = [
         ("spi.acd", "CLOCK,33000", "CLOCK,33MHz"), ("pipit.acd", "PINS,98", "PINS,l98"), ("merlin.acd", "IRLENGTH,", "IRLENGTH,0x"),
         ("linnet.acd", "PINS,", "PINS,~")]],
     *[prop(file, old, new, "C104") for file, old, new in [
-        ("kestrel.acd", "TQ144,PQ208,BG256", "TQ144,PQ2O8,BG256"), ("kestrel.acd", "TQ100,TQ144", "TQI00,TQ144"),
+        ("kestrel.acd", "TQ144,PQ208,BG256", "TQ144,PQ2O8,BG256"), ("pipit.acd", "PACKAGES,1,VQ100", "PACKAGES,1,VQI00"),
         ("pipit.acd", "VQ44,CB48\n\n[PT48]", "VQ44,C848\n\n[PT48]"), ("osprey.acd", "BG352,FB484\n\n[OS250]", "BG3S2,FB484\n\n[OS250]")]],
     *[prop(file, old, new, "C105") for file, old, new in [
         ("kestrel.acd", "VENDOR,Korvel", "VENDOR,K\u043ervel"), ("kestrel.acd", "PINS,140", "\u0420INS,140"), ("kestrel.acd", "[KS100]", "[\u041aS100]"),

@@ -162,12 +162,15 @@ TEST(ConsistencyRules, WordsOfAnotherScriptAreTexts) {
 }
 
 TEST(CommentsAfterValues, AreFoundWithoutBlanks) {
-    for (const char* const value : {"140# in all", "140 #in all", "140#", "TRUE# yes"}) {
+    for (const char* const value : {"140# in all", "140 #in all", "140#", "TRUE# yes", "many # of them"}) {
         EXPECT_THAT(codes(withFamily(std::string("[KS50]\nPROPERTY = PINS,") + value + "\n")),
                     ElementsAre("F106"))
             << value;
     }
-    EXPECT_THAT(codes(withFamily("[KS50]\nPROPERTY = TITLE,Kestrel #1\n")), IsEmpty());
+    for (const char* const value : {"Kestrel #1", "Number# one"}) {
+        EXPECT_THAT(codes(withFamily(std::string("[KS50]\nPROPERTY = TITLE,") + value + "\n")), IsEmpty())
+            << value;
+    }
 }
 
 TEST(ExcludedParts, InSpiModeAreThoseOfSpi) {
@@ -182,6 +185,15 @@ TEST(Spi, IsAFamilyWithoutAFile) {
     EXPECT_THAT(codes(files), IsEmpty());
     EXPECT_THAT(codes(withModes("SPI = outputs,USB2:families,spi\n", "[KS50]\n")),
                 ElementsAre("B105", "B106"));
+}
+
+TEST(Suggestions, AreNamesThatThePlaceLacks) {
+    Files files = withFamily("[KS50]\n[KS51]\n");
+    files["base.acd"] = "DEVICE_SUPPORTED = base,kestrel\nPROGRAM_OPTION_PACKAGE = base,kestrel\n"
+                        "IDCODE = KS51,0xX4104FB7:KS150,0xX4108FB7\n";
+    EXPECT_THAT(lint(files).output, HasSubstr("unknown device \"KS150\"; did you mean \"KS50\"? [D104]"));
+    EXPECT_THAT(lint(withFamily("OPERATION = VERFIY,Bscan,USB2\n[KS50]\n")).output,
+                HasSubstr("did you mean \"VERIFY\"?"));
 }
 
 TEST(LintOptions, AFileIsLintedWithinItsDirectory) {

@@ -3,8 +3,8 @@
 #include "ReferenceParser.h"
 
 #include "database/Database.h"
-#include "database/SectionScanner.h"
 #include "database/LineReader.h"
+#include "database/SectionScanner.h"
 
 #include <algorithm>
 #include <cstring>

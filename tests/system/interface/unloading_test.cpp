@@ -2,11 +2,14 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <array>
+#include <filesystem>
 #include <fstream>
 #include <iterator>
-#include <malloc.h>
+#include <string>
 
 #include <dlfcn.h>
+#include <malloc.h>
 
 namespace {
 
@@ -39,6 +42,35 @@ TEST(Unloading, AThousandTimesLeavesNothingBehind) {
 TEST(Unloading, TakesTheLibraryOutOfTheProcess) {
     ASSERT_TRUE(loadAndUnload()) << dlerror();
     EXPECT_EQ(dlopen(TARVIK_MANAGER_LIBRARY, RTLD_NOW | RTLD_NOLOAD), nullptr);
+}
+
+/// Loads a plug-in, asks it for the vendor of KS50 in a database that says so, and unloads it.
+std::string vendorInPlugin(const std::string& vendor) {
+    const std::string directory = testing::TempDir() + "tarvik_plugin_" + vendor;
+    std::filesystem::create_directories(directory);
+    std::ofstream(directory + "/base.acd") << "DEVICE_SUPPORTED = kestrel\n";
+    std::ofstream(directory + "/kestrel.acd") << "[KS50]\nPROPERTY = VENDOR," << vendor << "\n";
+    void* const plugin = dlopen(TARVIK_PLUGIN, RTLD_NOW | RTLD_LOCAL);
+    if (plugin == nullptr) {
+        return dlerror();
+    }
+    using VendorOf = int (*)(const char*, const char*, char*, int);
+    std::array<char, 64> answer{};
+    // NOLINTNEXTLINE(cppcoreguidelines-pro-type-reinterpret-cast)
+    const auto vendorOf = reinterpret_cast<VendorOf>(dlsym(plugin, "vendorOf"));
+    const int messages = vendorOf("KS50", directory.c_str(), answer.data(), 63);
+    EXPECT_EQ(messages, 0);
+    dlclose(plugin);
+    std::filesystem::remove_all(directory);
+    return answer.data();
+}
+
+TEST(Unloading, OfAPluginLetsTheNextOneAnswerFromAnotherDatabase) {
+    EXPECT_EQ(vendorInPlugin("Korvel"), "Korvel");
+    for (const char* const library : {TARVIK_PLUGIN, TARVIK_MANAGER_LIBRARY, TARVIK_HOST_LIBRARY}) {
+        EXPECT_EQ(dlopen(library, RTLD_NOW | RTLD_NOLOAD), nullptr) << library;
+    }
+    EXPECT_EQ(vendorInPlugin("Zorva"), "Zorva");
 }
 
 } // namespace
