@@ -113,7 +113,7 @@ int main(int argumentCount, char** arguments) {
                                   {tool, "--database", database, "which", "--property", "VENDOR=Korvel"}});
         measureWhole(size->name, {"lint", {tool, "lint", database}});
         measureWhole(size->name, {"diff", {tool, "diff", database, database}});
-        measureWhole(size->name, {"report", {tool, "--database", database, "report", "-o", "-"}});
+        measureWhole(size->name, {"report", {tool, "--database", database, "report", "--file", "-"}});
         return EXIT_SUCCESS;
     } catch (const std::exception& exception) {
         std::fprintf(stderr, "%s\n", exception.what());

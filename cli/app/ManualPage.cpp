@@ -25,7 +25,7 @@ std::string sentences(const std::string& text) {
     std::vector<std::string> words;
     for (const std::string& word : wordsOf(text)) {
         words.push_back(word);
-        if (word.ends_with('.') || word.ends_with(':')) {
+        if (word.ends_with('.')) {
             for (const std::string& line : lines(words, WIDTH, "")) {
                 result += escaped(line);
             }

@@ -78,15 +78,16 @@ CommandError explained(const CommandLine& line, const DeclaredCommand* command, 
                        const std::vector<std::string>& words, const CLI::ParseError& fault) {
     const std::vector<std::string> rest = parser.remaining(true);
     std::string explanation = fault.what();
-    const auto end = std::find(words.begin(), words.end(), "--");
-    const auto hidden = std::find_if(end, words.end(), [](const std::string& word) {
-        return word.find_first_not_of('-') == 1 || word.find_first_not_of('-') == 2;
-    });
+    const auto hidden =
+        std::find_if(std::find(words.begin(), words.end(), "--"), words.end(), [](const std::string& word) {
+            return word.size() > 1 && word.starts_with('-') && word != "--";
+        });
+    // A mistyped option is more likely at fault than what is missing instead.
+    const bool isUnexpected = !rest.empty() && (command == nullptr || rest.front().starts_with('-') ||
+                                                dynamic_cast<const CLI::ExtrasError*>(&fault) != nullptr);
     if (hidden != words.end()) {
         explanation = fmt::format("\"{}\" comes after \"--\", so it is not read as an option", *hidden);
-        // A mistyped option is more likely at fault than what is missing instead.
-    } else if (!rest.empty() && (command == nullptr || rest.front().starts_with('-') ||
-                                 dynamic_cast<const CLI::ExtrasError*>(&fault) != nullptr)) {
+    } else if (isUnexpected) {
         explanation = unexpected(line, command, rest.front());
     } else if (command == nullptr && dynamic_cast<const CLI::RequiredError*>(&fault) != nullptr) {
         explanation = "a command is required";

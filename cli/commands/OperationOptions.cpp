@@ -44,7 +44,7 @@ Json asJson(const OperationOptions& answer) {
 
 ExitCode run(Tool& tool, const Arguments& arguments) {
     const TARVIKNS::MODE_TYPE mode = vocabulary::readMode(arguments.mode);
-    // Properties are named by the key of an operation, whatever text stood for it.
+    // Properties are named by the key of an operation, not by the text that was given.
     const std::string& operation = vocabulary::key(vocabulary::readOperation(arguments.operation));
     ConstraintsManager& manager = tool.manager();
     OperationOptions answer{arguments.device, operation, vocabulary::key(mode), {}};

@@ -17,8 +17,8 @@ struct Arguments {
     std::string key;
 };
 
-/// All values. They are asked for behind the one value that the manager gives: only that question finds an SPI
-/// flash's property, or says why there is none.
+/// All values. The single value is asked for first: only that question finds a property of an SPI flash and issues
+/// the messages about a missing one.
 std::vector<std::string> values(ConstraintsManager& manager, const char* device, const char* key) {
     const char* const value = manager.getDeviceStringProperty(device, key);
     const bool flash = manager.isSpiDevice(device);

@@ -39,7 +39,7 @@ std::string asText(const Shown& shown, const Terminal& /*any*/) { return shown.p
 
 Json asJson(const Shown& /*shown*/) {
     throw CommandError(ExitCode::FAULT,
-                       "with --json, report takes a file: -o - and the JSON object both go to "
+                       "with --json, report takes a file: --file - and the JSON object both go to "
                        "standard output\nsee: tarvik report --help");
 }
 
@@ -61,7 +61,6 @@ Action declare(ArgumentList& list) {
     auto file = std::make_shared<std::string>();
     list = {
         {.name = "--file",
-         .letter = 'o',
          .value = "FILE",
          .description = "The file to write; - is standard output",
          .kind = ValueKind::PATH,

@@ -52,7 +52,7 @@ std::string asText(const Flash& flash, const Terminal& terminal) {
 Json asJson(const Flash& flash) { return {{"device", flash.name}, {"properties", asJson(flash.properties)}}; }
 
 ExitCode listFlashes(Tool& tool) {
-    // The manager's start-up reads what is listed here, and says what is wrong with it.
+    // The manager's start-up reads the flashes that are listed here, and reports what is wrong with them.
     static_cast<void>(tool.manager());
     return tool.answer(Flashes{catalogue::flashes()});
 }

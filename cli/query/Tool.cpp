@@ -30,7 +30,29 @@ ConstraintsManager& Tool::manager() {
     return *manager;
 }
 
-void Tool::note(const std::string& text) const { writeError("tarvik: " + text); }
+void Tool::note(const std::string& text) const {
+    if (m_captured == nullptr) {
+        writeError("tarvik: " + text);
+    }
+}
+
+Json Tool::answerOf(const std::function<ExitCode(Tool&)>& command) {
+    Json answer;
+    const bool json = std::exchange(m_settings.json, true);
+    m_captured = &answer;
+    const auto restore = [&] {
+        m_captured = nullptr;
+        m_settings.json = json;
+    };
+    try {
+        static_cast<void>(command(*this));
+    } catch (...) {
+        restore();
+        throw;
+    }
+    restore();
+    return answer;
+}
 
 ExitCode Tool::fail(const CommandError& failure) {
     const std::vector<Messages::Message> messages = showMessages();
@@ -55,14 +77,20 @@ void Tool::showText(const std::string& text) {
 
 void Tool::showJson(const Json& facts) {
     writeJson(facts, showMessages());
-    m_output.flush();
+    if (m_captured == nullptr) {
+        m_output.flush();
+    }
 }
 
 void Tool::writeJson(const Json& facts, const std::vector<Messages::Message>& messages) {
     Json document{{"version", 1}};
     document.update(facts);
     document["messages"] = asJson(messages);
-    m_output.write(oneLine(document) + '\n');
+    if (m_captured != nullptr) {
+        *m_captured = std::move(document);
+    } else {
+        m_output.write(oneLine(document) + '\n');
+    }
 }
 
 std::vector<Messages::Message> Tool::showMessages() {
@@ -72,7 +100,9 @@ std::vector<Messages::Message> Tool::showMessages() {
             continue;
         }
         if (message.channel != Channel::STATUS) {
-            writeError(message.text);
+            if (m_captured == nullptr) {
+                writeError(message.text);
+            }
         } else if (!m_settings.json) {
             m_output.write(m_terminal.isTerminal() ? printableLines(message.text) : message.text);
         }

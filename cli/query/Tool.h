@@ -6,6 +6,7 @@
 #include "term/Terminal.h"
 #include "text/Json.h"
 
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -50,6 +51,11 @@ public:
     /// Shows the user something besides the answer, on standard error.
     void note(const std::string& text) const;
 
+    /// Runs a command and returns the JSON object that it would write with `--json`, instead of writing it. Its notes
+    /// are dropped.
+    /// @throw CommandError if there is no answer
+    [[nodiscard]] Json answerOf(const std::function<ExitCode(Tool&)>& command);
+
     /// Shows why there is no answer.
     /// @return the status
     [[nodiscard]] ExitCode fail(const CommandError& failure);
@@ -68,4 +74,5 @@ private:
     Output m_output;
     Terminal m_terminal;
     bool m_opened = false;
+    Json* m_captured = nullptr; ///< takes the JSON object in place of standard output
 };

@@ -54,7 +54,7 @@ void Progress::reach(std::size_t done, std::size_t total) {
 std::string Progress::line(std::size_t done, std::size_t total) const {
     const std::size_t reached = std::min(done, total);
     const std::string text = fmt::format("tarvik: {}: {:3} %", m_task, reached * 100 / total);
-    // The last column stays free: a character there makes some terminals go on to the next line.
+    // The last column stays free: some terminals continue on the next line after a character there.
     const std::size_t room = m_width - 1;
     constexpr std::size_t AROUND_BAR = 3;
     if (text.size() + AROUND_BAR >= room) {

@@ -6,26 +6,25 @@
 #include <string>
 #include <string_view>
 
-/// Tells people how far long work is: a line on the terminal that is redrawn in place, from the second second on,
-/// and wiped at the end.
+/// A progress line on the terminal for long work: shown after one second, redrawn in place, and wiped at the end.
 class Progress {
 public:
     using Clock = std::function<std::chrono::steady_clock::time_point()>;
     using Write = std::function<void(std::string_view)>;
 
-    /// On standard error; nothing where that is no terminal.
+    /// On standard error; nothing if that is no terminal.
     /// @param task what is being done: "asking for each device"
     explicit Progress(std::string task);
 
-    /// On anything else.
-    /// @param width the columns there are; 0: nothing is shown
+    /// Through `write`, for tests.
+    /// @param width the number of columns; 0: nothing is shown
     Progress(std::string task, std::size_t width, Clock clock, Write write);
 
     ~Progress();
     Progress(const Progress&) = delete;
     Progress& operator=(const Progress&) = delete;
 
-    /// Tells that so much of the work is done. Cheap enough to call for each device.
+    /// Reports how much of the work is done. Cheap enough to call for each device.
     void reach(std::size_t done, std::size_t total);
 
 private:

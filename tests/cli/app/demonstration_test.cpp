@@ -52,7 +52,7 @@ TEST(Demonstration, IsReadWithoutComplaint) {
 TEST(Demonstration, SheetsFit80Columns) {
     const json answer = asked({"devices"}, "");
     for (const json& device : answer["devices"]) {
-        std::istringstream lines(runTool({"show", device["name"]}).output);
+        std::istringstream lines(runTool({{"show", device["name"]}, {}, {{"COLUMNS", "80"}}, {}, 0}).output);
         for (std::string line; std::getline(lines, line);) {
             EXPECT_LE(line.size(), 80U) << line;
         }

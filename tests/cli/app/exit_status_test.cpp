@@ -105,7 +105,7 @@ std::vector<Endings> endings(const std::string& database) {
          {{database, database}},
          {{GOOD, database}},
          {{database}, {database, "/nowhere"}, {"/nowhere", database}}},
-        {"report", {{"-o", "/dev/null"}}, {}, {{}, {"-o", "/nowhere/page.html"}}},
+        {"report", {{"--file", "/dev/null"}}, {}, {{}, {"--file", "/nowhere/page.html"}}},
         {"batch", {{}}, {}, {{"zz"}}},
         {"help", {{}, {"check"}}, {}, {{"zz"}}},
     };

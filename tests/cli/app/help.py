@@ -46,7 +46,7 @@ def prepare(folder, database):
     for name in ("database", "company", "changed", "released"):
         shutil.copytree(database, Path(folder, name))
     Path(folder, "site").mkdir()
-    overlay = "PROPERTY = VENDOR,Someone\n"
+    overlay = "PROPERTY += :VENDOR,Someone\n"
     Path(folder, "site", "kestrel.acd").write_text(overlay)
     for name in ("changed", "released"):
         with Path(folder, name, "kestrel.acd").open("a") as family:

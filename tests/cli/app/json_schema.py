@@ -95,9 +95,9 @@ lint --explain ZZ
 lint nowhere
 diff nowhere nowhere
 report
-report -o page.html
-report -o -
-report -o nowhere/page.html
+report --file page.html
+report --file -
+report --file nowhere/page.html
 --database site:database show KS50
 --database site:database why KS50 --property PINS
 families extra

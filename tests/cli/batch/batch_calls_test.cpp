@@ -256,7 +256,7 @@ TEST(BatchCalls, HelpListsEveryCallWithItsArguments) {
     std::size_t checks = 0;
     for (const json& call : calls) {
         checks += call["call"] == "checkConstraints" ? 1U : 0U;
-        if (call["call"] == "help") {
+        if (call["call"] == "help" || call["call"] == "show" || call["call"] == "why") {
             continue;
         }
         // With one argument too many a call names what it takes: exactly the arguments that the help lists.
@@ -274,6 +274,27 @@ TEST(BatchCalls, HelpListsEveryCallWithItsArguments) {
               json::parse(R"({"call": "cableString2Type", "args": [{"name": "text", "type": "text or null"}],
                                             "result": "integer"})"));
     EXPECT_EQ(error("help", R"(["getPartFamily"])"), "help takes ()");
+}
+
+TEST(BatchCalls, ShowAndWhyAnswerAsTheCommands) {
+    const SmallDatabase database;
+    EXPECT_EQ(result("show", R"({"device": "FN10"})"), database.json({"show", "FN10"}));
+    EXPECT_EQ(result("why", R"({"device": "FN10", "mode": "slave serial", "package": "P48"})"),
+              database.json({"why", "FN10", "--mode", "SS", "--package", "P48"}));
+    EXPECT_EQ(error("show", R"({"device": "FN11"})"),
+              "the database has no device \"FN11\"; did you mean \"FN10\"?");
+    for (const char* const arguments :
+         {"[]", R"(["FN10"])", R"({"device": 1})", R"({"device": "FN10", "x": "y"})"}) {
+        EXPECT_EQ(error("show", arguments), "show takes an object of texts: device") << arguments;
+    }
+}
+
+TEST(BatchCalls, ShowAndWhyLeaveTheManagerAsItIs) {
+    const std::vector<json> answers =
+        batch(request("getPartFamily", R"(["FN10"])") + request("show", R"({"device": "FN10"})") +
+              request("why", R"({"device": "FN10", "mode": "BS"})") +
+              request("getDeviceOperations", R"(["NONE", 0, 2])"));
+    EXPECT_TRUE(answers[3].contains("exception"));
 }
 
 TEST(BatchCalls, FaultyArgumentsCallNothing) {

@@ -21,7 +21,7 @@ REQUESTS = """
 {"id": "a", "call": "getDeviceOperations", "args": ["KS50", 0, 2]}
 {"id": [1], "call": "getDeviceOperations", "args": {"device": "KS50", "mode": "bs", "output": "usb2 cable"}}
 {"id": 2, "call": "getDeviceOperations", "args": {"device": "KS50", "mode": "zz", "output": "usb2 cable"}}
-{"id": 3, "call": "getDeviceOperations", "args": ["ZZ", 0, 2]}
+{"id": 3, "call": "optionString2Type", "args": ["zz"]}
 {"id": 4, "call": "getAllDeviceIdcodes"}
 {"id": 5, "call": "getOperationOrders"}
 {"id": 6, "call": "zz"}

@@ -23,6 +23,7 @@ def commands(block):
 
 def run(tool, command, directory):
     environment = {name: value for name, value in os.environ.items() if not name.startswith("TARVIK_")}
+    environment["COLUMNS"] = "80"
     words = shlex.split(command)
     assert words[0] == "tarvik", command
     done = subprocess.run([tool, *words[1:]], cwd=directory, env=environment, stdout=subprocess.PIPE,

@@ -42,7 +42,7 @@ json shown(const json& answer) {
 /// @return the number of devices compared
 std::size_t expectAgreement(const std::vector<std::string>& database) {
     std::vector<std::string> arguments = database;
-    arguments.insert(arguments.end(), {"report", "-o", "-"});
+    arguments.insert(arguments.end(), {"report", "--file", "-"});
     const ProcessResult outcome = runTool(arguments);
     EXPECT_EQ(outcome.status, 0) << outcome;
     const PageData page(outcome.output);

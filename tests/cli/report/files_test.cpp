@@ -27,7 +27,7 @@ TEST(ReportFiles, WritesAWholePageAndSaysSo) {
     const SmallDatabase database;
     const DatabaseDirectory place;
     const std::string file = place.path("report.html");
-    const ProcessResult outcome = database.run({"report", "-o", file});
+    const ProcessResult outcome = database.run({"report", "--file", file});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.error, "");
     EXPECT_EQ(outcome.output, file + ": 5 devices in 2 families\n");
@@ -38,12 +38,12 @@ TEST(ReportFiles, WritesAWholePageAndSaysSo) {
 
 TEST(ReportFiles, SameDatabaseGivesSamePage) {
     const SmallDatabase database;
-    EXPECT_EQ(database.run({"report", "-o", "-"}).output, database.run({"report", "-o", "-"}).output);
+    EXPECT_EQ(database.run({"report", "--file", "-"}).output, database.run({"report", "--file", "-"}).output);
 }
 
 TEST(ReportFiles, StandardOutputGetsThePageAlone) {
     const SmallDatabase database;
-    const ProcessResult outcome = database.run({"report", "-o", "-"});
+    const ProcessResult outcome = database.run({"report", "--file", "-"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.output, StartsWith("<!DOCTYPE html>"));
     EXPECT_THAT(outcome.output, EndsWith("</html>\n"));
@@ -52,7 +52,7 @@ TEST(ReportFiles, StandardOutputGetsThePageAlone) {
 TEST(ReportFiles, JsonTellsWhatWasWritten) {
     const SmallDatabase database;
     const DatabaseDirectory place;
-    const nlohmann::json answer = database.json({"report", "-o", place.path("r.html")});
+    const nlohmann::json answer = database.json({"report", "--file", place.path("r.html")});
     EXPECT_EQ(answer, nlohmann::json({{"version", 1},
                                       {"file", place.path("r.html")},
                                       {"devices", 5},
@@ -62,7 +62,7 @@ TEST(ReportFiles, JsonTellsWhatWasWritten) {
 
 TEST(ReportFiles, JsonAndThePageCantShareStandardOutput) {
     const SmallDatabase database;
-    const ProcessResult outcome = database.run({"--json", "report", "-o", "-"});
+    const ProcessResult outcome = database.run({"--json", "report", "--file", "-"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_TRUE(nlohmann::json::parse(outcome.output).contains("error"));
 }
@@ -70,7 +70,7 @@ TEST(ReportFiles, JsonAndThePageCantShareStandardOutput) {
 TEST(ReportFiles, AnUnwritableFileIsAFault) {
     const SmallDatabase database;
     const DatabaseDirectory place;
-    const ProcessResult outcome = database.run({"report", "-o", place.path("no/such/report.html")});
+    const ProcessResult outcome = database.run({"report", "--file", place.path("no/such/report.html")});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_EQ(outcome.output, "");
     EXPECT_THAT(outcome.error, HasSubstr("can't write \"" + place.path("no/such/report.html") +
@@ -80,13 +80,13 @@ TEST(ReportFiles, AnUnwritableFileIsAFault) {
 TEST(ReportFiles, ADirectoryIsAFault) {
     const SmallDatabase database;
     const DatabaseDirectory place;
-    EXPECT_EQ(database.run({"report", "-o", place.path()}).status, 2);
+    EXPECT_EQ(database.run({"report", "--file", place.path()}).status, 2);
     EXPECT_EQ(filesIn(place.path()), 0U);
 }
 
 TEST(ReportFiles, AFullDeviceIsAFault) {
     const SmallDatabase database;
-    const ProcessResult outcome = database.run({"report", "-o", "/dev/full"});
+    const ProcessResult outcome = database.run({"report", "--file", "/dev/full"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, HasSubstr("No space left on device"));
     EXPECT_TRUE(std::filesystem::is_character_file("/dev/full"));
@@ -95,7 +95,7 @@ TEST(ReportFiles, AFullDeviceIsAFault) {
 TEST(ReportFiles, AFailedRunKeepsTheFormerPage) {
     const DatabaseDirectory place(DatabaseDirectory::Files{{"report.html", "former"}});
     const ProcessResult outcome =
-        runTool({"--database", place.path("missing"), "report", "-o", place.path("report.html")});
+        runTool({"--database", place.path("missing"), "report", "--file", place.path("report.html")});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_EQ(textOf(place.path("report.html")), "former");
     EXPECT_EQ(filesIn(place.path()), 1U);
@@ -105,7 +105,7 @@ TEST(ReportFiles, ReplacesTheFileBehindALink) {
     const SmallDatabase database;
     const DatabaseDirectory place(DatabaseDirectory::Files{{"page.html", "former"}});
     std::filesystem::create_symlink("page.html", place.path("latest.html"));
-    EXPECT_EQ(database.run({"report", "-o", place.path("latest.html")}).status, 0);
+    EXPECT_EQ(database.run({"report", "--file", place.path("latest.html")}).status, 0);
     EXPECT_TRUE(std::filesystem::is_symlink(place.path("latest.html")));
     EXPECT_THAT(textOf(place.path("page.html")), StartsWith("<!DOCTYPE html>"));
 }
@@ -115,7 +115,7 @@ TEST(ReportFiles, KeepsThePermissionsOfAFormerPage) {
     const DatabaseDirectory place(DatabaseDirectory::Files{{"report.html", "former"}});
     const auto permissions = std::filesystem::perms::owner_read | std::filesystem::perms::owner_write;
     std::filesystem::permissions(place.path("report.html"), permissions);
-    EXPECT_EQ(database.run({"report", "-o", place.path("report.html")}).status, 0);
+    EXPECT_EQ(database.run({"report", "--file", place.path("report.html")}).status, 0);
     EXPECT_EQ(std::filesystem::status(place.path("report.html")).permissions(), permissions);
 }
 

@@ -30,7 +30,7 @@ HOSTILE = {
 def report(directory, database, name="report.html"):
     """Writes the report of a database. @return its address"""
     path = pathlib.Path(directory) / name
-    subprocess.run([TOOL, "--database", str(database), "report", "-o", str(path)], check=True,
+    subprocess.run([TOOL, "--database", str(database), "report", "--file", str(path)], check=True,
                    stdout=subprocess.DEVNULL)
     return path.as_uri()
 

@@ -56,6 +56,7 @@ class Checker:
         home = self.folder / "home"
         home.mkdir()
         self.environment = dict(os.environ, HOME=str(home), CXX=arguments.compiler, CXXFLAGS=arguments.flags,
+                                COLUMNS="80",
                                 PATH=f"{self.folder}/build/demo/cli:{os.environ['PATH']}")
 
     def run(self, command):
