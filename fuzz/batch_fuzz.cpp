@@ -82,7 +82,7 @@ void expectAnswer(const std::string& line) {
 void run() {
     TarvikTestPeer::reset();
     Tool tool({{TARVIK_SOURCE_DIRECTORY "/database"}, false, false});
-    static_cast<void>(batch::run(tool));
+    static_cast<void>(batch::run(tool, {}));
 }
 
 } // namespace

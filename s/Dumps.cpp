@@ -1,12 +1,10 @@
-#include "PermissionTable.h"
-#include "Reporting.h"
-
-#include <tarvik/ConstraintsManager.h>
+#include "Diagnostics.h"
+#include "Implementation.h"
 
 #include <TarvikSmokeMgr.h>
 
-// The tables as fixed-width text. Every cell and every line end goes out as a piece of its own: recorders and
-// logs of the hosts are compared piece by piece.
+// The tables as fixed-width text. Every cell and every line end is a separate piece: hosts compare recordings and logs
+// piece by piece.
 
 using TARVIKNS::MODE_TYPE;
 using TARVIKNS::OP_TYPE;
@@ -26,12 +24,12 @@ class PieceWriter {
 public:
     explicit PieceWriter(TarvikSmokeMgr* recorder) noexcept : m_recorder(recorder) {}
 
-    /// The piece stands in the format position, where receivers expect it: a "%" in it is theirs to read.
+    /// Receivers expect the piece in the format position, and interpret each "%" in it.
     void write(const char* piece) const {
         if (m_recorder != nullptr) {
             m_recorder->smokeStatus(piece);
         } else {
-            reporting::message(reporting::location::DUMP).issueStatus(piece);
+            diagnostics::message(diagnostics::location::DUMP).issueStatus(piece);
         }
     }
 
@@ -60,7 +58,7 @@ void writeHeader(const PieceWriter& writer, int rows, WriteBlock writeBlock) {
 }
 
 void writeOutputs(const PieceWriter& writer) {
-    for (int output = 0; output < extent::OUTPUTS; ++output) {
+    for (int output = 0; output < tableDimensions::OUTPUTS; ++output) {
         writer.writeCell(OUTPUT_CELL, ConstraintsManager::cableType2String(static_cast<OUTPUT_TYPE>(output)));
     }
 }
@@ -73,7 +71,7 @@ void writeBlocks(const PieceWriter& writer, const PermissionTable& table, std::s
         writer.writeCell(NAME_CELL, nameAt(static_cast<int>(block)));
         for (int row = 0; row < rows; ++row) {
             for (int mode = 0; mode < modes; ++mode) {
-                for (int output = 0; output < extent::OUTPUTS; ++output) {
+                for (int output = 0; output < tableDimensions::OUTPUTS; ++output) {
                     writer.writeFlag(table.allows(block, row, mode, output));
                 }
             }
@@ -87,12 +85,12 @@ template <typename RowName>
 void writeModeHeaders(const PieceWriter& writer, int rows, RowName rowName) {
     writeHeader(writer, rows, [&](int row) { writer.writeCell(BLOCK_CELL, rowName(row)); });
     writeHeader(writer, rows, [&](int) {
-        for (int mode = 0; mode < extent::MODES; ++mode) {
+        for (int mode = 0; mode < tableDimensions::MODES; ++mode) {
             writer.writeCell(MODE_CELL, ConstraintsManager::modeType2String(static_cast<MODE_TYPE>(mode)));
         }
     });
     writeHeader(writer, rows, [&](int) {
-        for (int mode = 0; mode < extent::MODES; ++mode) {
+        for (int mode = 0; mode < tableDimensions::MODES; ++mode) {
             writeOutputs(writer);
         }
     });
@@ -106,11 +104,11 @@ StringBase optionName(int row) {
     return ConstraintsManager::optionType2String(static_cast<PROGRAM_OPTION>(row));
 }
 
-/// The name at a position of a set. Behind its end: raises from `location`, or the empty text.
+/// The name at a position of a set. After its end: raises from `location`, or the empty text.
 StringBase nameAt(const NameSet& names, int position, bool exceptions, int location) {
     const auto index = static_cast<std::size_t>(position);
     if (index >= names.size()) {
-        reporting::raiseIf<OutOfRangeException>(exceptions, location);
+        diagnostics::raiseIf<OutOfRangeException>(exceptions, location);
         return {};
     }
     return names[index];
@@ -118,39 +116,40 @@ StringBase nameAt(const NameSet& names, int position, bool exceptions, int locat
 
 } // namespace
 
-StringBase ConstraintsManager::supportedDeviceNameAt(int position) const {
-    return nameAt(m_supportedDevices, position, m_exceptions, reporting::location::SUPPORTED_DEVICE_POSITION);
+StringBase ConstraintsManager::Implementation::supportedDeviceNameAt(int position) const {
+    return nameAt(m_supportedDevices, position, m_exceptions,
+                  diagnostics::location::SUPPORTED_DEVICE_POSITION);
 }
 
-StringBase ConstraintsManager::programOptionPackageNameAt(int position) const {
+StringBase ConstraintsManager::Implementation::programOptionPackageNameAt(int position) const {
     return nameAt(m_programOptionPackages, position, m_exceptions,
-                  reporting::location::PROGRAM_OPTION_PACKAGE_POSITION);
+                  diagnostics::location::PROGRAM_OPTION_PACKAGE_POSITION);
 }
 
-void ConstraintsManager::dumpOperationsTable(TarvikSmokeMgr* recorder) {
+void ConstraintsManager::Implementation::dumpOperationsTable(TarvikSmokeMgr* recorder) const {
     const PieceWriter writer(recorder);
-    writeModeHeaders(writer, extent::OPERATIONS, operationName);
-    writeBlocks(writer, *m_operationTable, m_supportedDevices.size(), extent::OPERATIONS, extent::MODES,
-                [this](int block) { return supportedDeviceNameAt(block); });
+    writeModeHeaders(writer, tableDimensions::OPERATIONS, operationName);
+    writeBlocks(writer, m_operationTable, m_supportedDevices.size(), tableDimensions::OPERATIONS,
+                tableDimensions::MODES, [this](int block) { return supportedDeviceNameAt(block); });
 }
 
-void ConstraintsManager::dumpBsdlOperationsTable(TarvikSmokeMgr* recorder) {
+void ConstraintsManager::Implementation::dumpBsdlOperationsTable(TarvikSmokeMgr* recorder) const {
     const PieceWriter writer(recorder);
-    writeHeader(writer, extent::OPERATIONS,
+    writeHeader(writer, tableDimensions::OPERATIONS,
                 [&](int row) { writer.writeCell(BSDL_CELL, operationName(row)); });
-    writeHeader(writer, extent::OPERATIONS, [&](int) { writeOutputs(writer); });
-    writeBlocks(writer, *m_bsdlOperationTable, m_supportedDevices.size(), extent::OPERATIONS, 1,
+    writeHeader(writer, tableDimensions::OPERATIONS, [&](int) { writeOutputs(writer); });
+    writeBlocks(writer, m_bsdlOperationTable, m_supportedDevices.size(), tableDimensions::OPERATIONS, 1,
                 [this](int block) { return supportedDeviceNameAt(block); });
 }
 
-void ConstraintsManager::dumpProgramOptionsTable(TarvikSmokeMgr* recorder) {
+void ConstraintsManager::Implementation::dumpProgramOptionsTable(TarvikSmokeMgr* recorder) const {
     const PieceWriter writer(recorder);
-    writeModeHeaders(writer, extent::OPTIONS, optionName);
-    writeBlocks(writer, *m_programOptionTable, m_programOptionPackages.size(), extent::OPTIONS, extent::MODES,
-                [this](int block) { return programOptionPackageNameAt(block); });
+    writeModeHeaders(writer, tableDimensions::OPTIONS, optionName);
+    writeBlocks(writer, m_programOptionTable, m_programOptionPackages.size(), tableDimensions::OPTIONS,
+                tableDimensions::MODES, [this](int block) { return programOptionPackageNameAt(block); });
 }
 
-void ConstraintsManager::dumpCachedDeviceFamilies(TarvikSmokeMgr* recorder) {
+void ConstraintsManager::Implementation::dumpCachedDeviceFamilies(TarvikSmokeMgr* recorder) const {
     const PieceWriter writer(recorder);
     for (const auto& [device, family] : m_deviceFamilyCache) {
         StringBase piece;

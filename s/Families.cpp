@@ -1,19 +1,17 @@
+#include "Diagnostics.h"
 #include "FamilyNames.h"
-#include "Reporting.h"
-#include "Text.h"
-
-#include <tarvik/ConstraintsManager.h>
+#include "Implementation.h"
+#include "StringViews.h"
 
 #include <PicConfig.h>
 #include <UT_STR.h>
 
-// Which family a device belongs to: resolution with its cache, the seeding of that cache, and what follows
-// from a family's name.
+// Which family a device belongs to: resolution with its cache, and the seeding of that cache.
 
-StringBase ConstraintsManager::getPartFamily(const char* device) {
-    // A copy: the text may be that of m_partFamily itself.
-    const StringBase name(device);
-    const StringBase base = baseNameOf(view(name));
+StringBase ConstraintsManager::Implementation::getPartFamily(std::string_view device) {
+    // Copies: the text may be that of m_partFamily itself.
+    const StringBase name = toStringBase(device);
+    const StringBase base = toStringBase(baseName(device));
     m_partFamily = base;
     m_partFamily.MakeLower();
     const auto cached = m_deviceFamilyCache.find(view(m_partFamily));
@@ -28,9 +26,10 @@ StringBase ConstraintsManager::getPartFamily(const char* device) {
     return m_partFamily;
 }
 
-/// The family of a device that the cache does not hold. SPI flash goes before what the database says; that
-/// looks at the whole name, the database at the base name.
-StringBase ConstraintsManager::resolveFamily(const StringBase& device, const StringBase& base) const {
+/// The family of a device that the cache does not hold. SPI flash takes precedence over the database, and is found by
+/// the whole name, while the database is asked for the base name.
+StringBase ConstraintsManager::Implementation::resolveFamily(const StringBase& device,
+                                                             const StringBase& base) const {
     const PicConfig configuration(base.c_str(), 1, static_cast<PM_PARTNAME_BINDING>(1));
     const bool isSpi = isSpiDevice(device);
     const char* const module = configuration.get_pm();
@@ -41,36 +40,31 @@ StringBase ConstraintsManager::resolveFamily(const StringBase& device, const Str
                                                                             : familyNames::BASE;
 }
 
-void ConstraintsManager::addCachedDeviceFamily(const char* device, const char* family) {
+void ConstraintsManager::Implementation::addCachedDeviceFamily(std::string_view device, const char* family) {
     // Looks up the latest resolution, not this device: hosts rely on a seed being refused while that one is
-    // cached. Seeded names keep their case: callers look them up in lower case.
+    // cached. The name keeps its case, although devices are looked up in lower case.
     const auto latest = m_deviceFamilyCache.find(view(m_partFamily));
     if (latest == m_deviceFamilyCache.end() || latest->second.GetLength() == 0) {
-        m_deviceFamilyCache.insert_or_assign(baseNameOf(view(device)), family);
-        m_operationShortcuts.clear();
-        m_optionShortcuts.clear();
+        m_deviceFamilyCache.insert_or_assign(toStringBase(baseName(device)), family);
+        m_operationLookups.clear();
+        m_optionLookups.clear();
     }
 }
 
-bool ConstraintsManager::isKorvelDevice(const char* device) {
-    return getPartFamily(device) != familyNames::BASE;
-}
-
-/// The position of a family, or of a device's family, among the supported ones; behind the last for a name
-/// that is none.
-unsigned ConstraintsManager::familyIndex(const char* name) {
+/// The position of a family, or of a device's family, among the supported ones; one past the last for a family that is
+/// not supported.
+unsigned ConstraintsManager::Implementation::familyIndex(std::string_view name) {
     // The base name decides whether to resolve, the whole name is what is looked up: "fam_x" is not "fam".
-    const bool isFamily = m_supportedDevices.contains(baseName(view(name)));
-    const std::size_t position =
-        m_supportedDevices.position(isFamily ? view(name) : view(getPartFamily(name)));
+    const bool isFamily = m_supportedDevices.contains(baseName(name));
+    const std::size_t position = m_supportedDevices.position(isFamily ? name : view(getPartFamily(name)));
     if (position == m_supportedDevices.size()) {
-        reporting::raiseIf<OutOfRangeException>(m_exceptions, reporting::location::SUPPORTED_DEVICE_UNKNOWN);
+        diagnostics::raiseIf<OutOfRangeException>(m_exceptions,
+                                                  diagnostics::location::SUPPORTED_DEVICE_UNKNOWN);
     }
     return static_cast<unsigned>(position);
 }
 
-bool ConstraintsManager::isFamilyName(const StringBase& name) { return getPartFamily(name.c_str()) == name; }
-
-const ConstraintsManager::Texts& ConstraintsManager::getAllDeviceIdcodes() const noexcept {
-    return m_deviceIdcodes;
+/// No question needs it; it is part of what the manager can do.
+bool ConstraintsManager::Implementation::isFamilyName(const StringBase& name) {
+    return getPartFamily(view(name)) == name;
 }

@@ -4,7 +4,7 @@
 
 namespace familyNames {
 
-/// The family of every device that nobody knows.
+/// The family of every unknown device.
 inline constexpr const char* BASE = "base";
 
 /// The family of every SPI flash, and the name that answers in SPI mode.

@@ -1,49 +1,66 @@
-#include "Lists.h"
-#include "PermissionTable.h"
-#include "PropertyTable.h"
-#include "Reporting.h"
+#include "Implementation.h"
 #include "Vocabulary.h"
 
-#include <tarvik/ConstraintsManager.h>
-
 #include <AcdReader.h>
+#include <TarvikException.h>
 
 #include <new>
+#include <optional>
 
-// How the one manager comes and goes, and the order in which its start-up fills it.
+// How the manager of the process comes and goes, and the order in which the start-up fills a manager.
+
+namespace {
+
+/// True as long as the manager of the process starts up.
+bool g_isStarting = false;
+
+/// Sets a flag as long as it lives.
+class FlagSetter {
+public:
+    explicit FlagSetter(bool& flag) noexcept : m_flag(flag) { m_flag = true; }
+    ~FlagSetter() { m_flag = false; }
+    FlagSetter(const FlagSetter&) = delete;
+    FlagSetter& operator=(const FlagSetter&) = delete;
+
+private:
+    bool& m_flag;
+};
+
+} // namespace
 
 ConstraintsManager* ConstraintsManager::s_instance = nullptr;
 
 ConstraintsManager* ConstraintsManager::getConstraintsManager() {
-    if (s_instance == nullptr) {
-        // Raw, as it lives until the host removes it; without memory for it the answer is null.
+    // A message sink may ask for the manager that is just starting: it is not ready, and there is no second one.
+    if (s_instance == nullptr && !g_isStarting) {
+        const FlagSetter starting(g_isStarting);
         s_instance = new (std::nothrow) ConstraintsManager;
     }
     return s_instance;
 }
 
 void ConstraintsManager::RemoveConstraintsManager() {
-    // The pointer deliberately stays: a removed manager is not replaced by a fresh one.
+    // The pointer deliberately stays: a removed manager is not replaced by a new one.
     delete s_instance;
 }
 
-ConstraintsManager::ConstraintsManager()
-    : m_deviceProperties(std::make_unique<PropertyTable>()),
-      m_operationTable(std::make_unique<PermissionTable>()),
-      m_programOptionTable(std::make_unique<PermissionTable>()),
-      m_bsdlOperationTable(std::make_unique<PermissionTable>()) {
+ConstraintsManager::ConstraintsManager() : m_implementation(new Implementation) {}
+
+ConstraintsManager::~ConstraintsManager() { delete m_implementation; }
+
+ConstraintsManager::Implementation::Implementation() {
     initialise();
-    // Not before: faults of the start-up are tolerated where a fault of a question would raise.
+    // Not earlier: the start-up tolerates faults that raise in a question.
     m_exceptions = true;
 }
 
-ConstraintsManager::~ConstraintsManager() = default;
-
-/// Fills the tables. The first fault ends it, and leaves what it has filled by then.
-void ConstraintsManager::initialise() {
+/// Fills the tables. The first fault ends it, and what is filled by then stays.
+void ConstraintsManager::Implementation::initialise() {
+    // Outlives the handler: a fault reports itself before the reader is closed.
+    std::optional<AcdReader> base;
     try {
-        const AcdReader base;
-        m_devKey = base.getDevkey();
+        base.emplace();
+        m_devKey = base->getDevkey();
         loadSupportedLists();
         loadModeOutputSets();
         loadModeDeviceSets();
@@ -60,14 +77,4 @@ void ConstraintsManager::initialise() {
     } catch (const TarvikException& exception) {
         exception.report();
     }
-}
-
-void ConstraintsManager::setExceptions(bool exceptions) noexcept { m_exceptions = exceptions; }
-
-const std::vector<TARVIKNS::OP_TYPE>& ConstraintsManager::getOperationOrders() const noexcept {
-    return m_operationOrders;
-}
-
-const std::vector<TARVIKNS::PROGRAM_OPTION>& ConstraintsManager::getProgramOptionOrders() const noexcept {
-    return m_programOptionOrders;
 }

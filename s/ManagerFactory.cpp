@@ -1,8 +1,5 @@
 #include "ManagerFactory.h"
 
-#include "PermissionTable.h"
-#include "PropertyTable.h"
-
 ManagerFactory::Manager ManagerFactory::make() { return Manager(new ConstraintsManager); }
 
 void ManagerFactory::Deleter::operator()(ConstraintsManager* manager) const noexcept { delete manager; }

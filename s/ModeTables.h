@@ -2,10 +2,10 @@
 
 // Which members hold what a configuration mode allows.
 
-#include <tarvik/ConstraintsManager.h>
+#include "Implementation.h"
 
 /// The outputs and the device families of one mode.
-struct ConstraintsManager::ModeTable {
-    std::set<TARVIKNS::OUTPUT_TYPE> ConstraintsManager::*outputs;
-    NameSet ConstraintsManager::*devices;
+struct ConstraintsManager::Implementation::ModeTable {
+    std::set<OUTPUT_TYPE> Implementation::*outputs;
+    NameSet Implementation::*devices;
 };

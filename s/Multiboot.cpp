@@ -1,8 +1,9 @@
-#include "Lists.h"
-#include "Reporting.h"
+#include "Diagnostics.h"
+#include "Implementation.h"
+#include "JoinedText.h"
+#include "RecordReader.h"
 #include "SpiClasses.h"
-
-#include <tarvik/ConstraintsManager.h>
+#include "StringViews.h"
 
 #include <array>
 
@@ -20,26 +21,26 @@ constexpr std::array<const char*, 12> TYPES{
 
 } // namespace
 
-void ConstraintsManager::readMultibootTypes(PM_DEVKEY* accessor) {
+void ConstraintsManager::Implementation::readMultibootTypes(PM_DEVKEY* accessor) {
     for (const char* const type : TYPES) {
         m_multibootTypes[type] = readList(*accessor, type);
     }
 }
 
-bool ConstraintsManager::isMbBpiSpiSupport(const char* device, const char* typePrefix, const char* width,
-                                           bool lead) const {
-    StringBase type(typePrefix);
-    type += "_";
-    type += width;
-    type += lead ? "_LEAD" : "_CHAIN";
-    type.MakeUpper();
-    const auto found = m_multibootTypes.find(type);
-    return found != m_multibootTypes.end() && holdsIgnoringCase(found->second, device);
+bool ConstraintsManager::Implementation::isMbBpiSpiSupport(const char* device, std::string_view typePrefix,
+                                                           std::string_view width, bool lead) const {
+    StringBase upperPrefix = toStringBase(typePrefix);
+    upperPrefix.MakeUpper();
+    StringBase upperWidth = toStringBase(width);
+    upperWidth.MakeUpper();
+    const JoinedText type{view(upperPrefix), "_", view(upperWidth), lead ? "_LEAD" : "_CHAIN"};
+    const auto found = m_multibootTypes.find(type.view());
+    return found != m_multibootTypes.end() && containsIgnoreCase(found->second, device);
 }
 
-void ConstraintsManager::dumpMbBpiSpi() const {
-    using reporting::message;
-    using reporting::location::DUMP;
+void ConstraintsManager::Implementation::dumpMbBpiSpi() const {
+    using diagnostics::message;
+    using diagnostics::location::DUMP;
     for (const auto& [type, devices] : m_multibootTypes) {
         message(DUMP).issueStatus("%s:", type.c_str());
         for (const StringBase& device : devices) {

@@ -3,42 +3,45 @@
 // The permission table: which rows (operations, options) are allowed in which mode through which output, in a
 // block for each family or package.
 
-#include <algorithm>
+#include <cassert>
 #include <cstddef>
 #include <cstdint>
 #include <vector>
 
-/// How far the tables reach. They are deliberately narrower than the vocabulary: no cell for the modes behind
-/// SPI, nor for the outputs behind STAPL.
-namespace extent {
+/// The sizes of the tables. They are deliberately smaller than the vocabulary: there is no cell for the modes after
+/// SPI, nor for the outputs after STAPL.
+namespace tableDimensions {
 inline constexpr int OPERATIONS = 32;
 inline constexpr int OPTIONS = 24;
 inline constexpr int MODES = 6;
 inline constexpr int OUTPUTS = 5;
-} // namespace extent
+} // namespace tableDimensions
 
-/// Cells that start out forbidden. All rows of a (block, mode, output) stand in one mask, so that a question
-/// for all of them is one load. A cell that the table does not have is not written, and reads as forbidden.
+/// Cells start as forbidden. All rows of a (block, mode, output) are in one mask, so that a question for all of them is
+/// one load. A cell outside the table is not written, and reads as forbidden.
 class PermissionTable {
 public:
     /// A table without a block: every answer is no.
     PermissionTable() = default;
 
+    /// @param rows at most 32, as many as a mask has bits
     PermissionTable(std::size_t blocks, int rows, int modes, int outputs)
-        : m_blocks(blocks), m_rows(std::min(rows, MOST_ROWS)), m_modes(modes), m_outputs(outputs),
-          m_masks(blocks * static_cast<std::size_t>(modes) * static_cast<std::size_t>(outputs)) {}
+        : m_blocks(blocks), m_rows(rows), m_modes(modes), m_outputs(outputs),
+          m_masks(blocks * static_cast<std::size_t>(modes) * static_cast<std::size_t>(outputs)) {
+        assert(rows <= MAX_ROWS);
+    }
 
     void allow(std::size_t block, int row, int mode, int output) {
         if (isCell(block, mode, output) && isRow(row)) {
-            m_masks[position(block, mode, output)] |= bit(row);
+            m_masks[position(block, mode, output)] |= std::uint32_t{1} << row;
         }
     }
 
     [[nodiscard]] bool allows(std::size_t block, int row, int mode, int output) const noexcept {
-        return isRow(row) && (mask(block, mode, output) & bit(row)) != 0;
+        return isRow(row) && (mask(block, mode, output) >> row & 1U) != 0;
     }
 
-    /// Bit i stands for row i.
+    /// Bit i is set when row i is allowed.
     [[nodiscard]] std::uint32_t mask(std::size_t block, int mode, int output) const noexcept {
         return isCell(block, mode, output) ? m_masks[position(block, mode, output)] : 0;
     }
@@ -46,15 +49,9 @@ public:
     [[nodiscard]] std::size_t blocks() const noexcept { return m_blocks; }
 
 private:
-    /// As many as a mask has bits.
-    static constexpr int MOST_ROWS = 32;
+    static constexpr int MAX_ROWS = 32;
 
     [[nodiscard]] static bool isWithin(int value, int bound) noexcept { return value >= 0 && value < bound; }
-
-    /// Defined for any number, so that nobody has to prove that the row was tested.
-    [[nodiscard]] static std::uint32_t bit(int row) noexcept {
-        return std::uint32_t{1} << (static_cast<unsigned>(row) % unsigned{MOST_ROWS});
-    }
 
     [[nodiscard]] bool isRow(int row) const noexcept { return isWithin(row, m_rows); }
 

@@ -5,15 +5,22 @@
 #include <cstddef>
 #include <cstdint>
 #include <deque>
-#include <memory_resource>
+#include <memory>
 #include <string_view>
 #include <vector>
 
-/// The properties that were loaded, by "owner_property": a hash table whose buckets are numbered by the CRC-32 of that
-/// text modulo their count, of which there are never fewer than properties.
+/// A property of an owner that was read and not stored yet.
+struct ParsedProperty {
+    StringBase name;
+    PropertyValues values;
+};
+
+/// The loaded properties by "owner_property". A hash table: bucket = CRC-32 of the key % bucket count; load factor at
+/// most 1.
 ///
-/// Callers hold on to texts and sets within, so an entry never moves. Beside the entries stands the little of each that a
-/// search goes through: in a large database that stays near the processor, while each entry is a wait for memory.
+/// Callers keep texts and sets from it, so an entry neither moves nor changes. A key whose values are replaced leads to
+/// a new entry, and the old one stays. Links (checksum, next, pointer) are in a separate compact array, so that probes
+/// stay in the processor's cache.
 class PropertyTable {
 public:
     /// A property and its values.
@@ -29,52 +36,65 @@ public:
     [[nodiscard]] const PropertyValues* find(std::string_view owner,
                                              std::string_view property) const noexcept;
 
-    /// A property of an owner on its way into the table.
-    struct Found {
-        StringBase name;
-        PropertyValues values;
-    };
+    /// Adds properties of one owner, or replaces their values, in order. If memory runs out, those before the failing one
+    /// are in the table.
+    void assign(std::string_view owner, std::vector<ParsedProperty> parsed);
 
-    /// Adds properties of one owner, or replaces their values, in order. Those that stand before the one for which memory
-    /// runs out are in the table.
-    void assign(std::string_view owner, std::vector<Found> found);
-
-    [[nodiscard]] std::size_t size() const noexcept { return m_entries.size(); }
-    [[nodiscard]] bool empty() const noexcept { return m_entries.empty(); }
+    [[nodiscard]] std::size_t size() const noexcept { return m_links.size(); }
+    [[nodiscard]] bool empty() const noexcept { return m_links.empty(); }
     [[nodiscard]] std::size_t bucketCount() const noexcept { return m_buckets.size(); }
 
-    /// The number of the bucket in which the property is looked for.
+    /// The number of the bucket in which the property is looked up.
     [[nodiscard]] std::size_t bucket(std::string_view owner, std::string_view property) const noexcept {
         return bucketOf(checksumOf(owner, property));
     }
-
-    // The entries, in the order in which they came.
-    [[nodiscard]] auto begin() const noexcept { return m_entries.begin(); }
-    [[nodiscard]] auto end() const noexcept { return m_entries.end(); }
 
 private:
     using Ordinal = std::uint32_t;
     static constexpr Ordinal NONE = 0xFFFFFFFF;
 
-    /// What a search goes through.
+    /// What a search reads.
     struct Link {
         std::uint32_t checksum; ///< of the entry's key
-        Ordinal next;           ///< entry in the same bucket; `NONE` for the last
-        Entry* entry;
+        Ordinal next;           ///< link in the same bucket; `NONE` for the last
+        const Entry* entry;
     };
 
+public:
+    /// Goes through the current entries.
+    class Iterator {
+    public:
+        explicit Iterator(const Link* link) noexcept : m_link(link) {}
+        const Entry& operator*() const noexcept { return *m_link->entry; }
+        Iterator& operator++() noexcept {
+            ++m_link;
+            return *this;
+        }
+        bool operator!=(const Iterator& other) const noexcept { return m_link != other.m_link; }
+
+    private:
+        const Link* m_link;
+    };
+
+    // The current entries, in the order in which their keys were added.
+    [[nodiscard]] Iterator begin() const noexcept { return Iterator(m_links.data()); }
+    [[nodiscard]] Iterator end() const noexcept { return Iterator(m_links.data() + m_links.size()); }
+
+private:
     [[nodiscard]] static std::uint32_t checksumOf(std::string_view owner, std::string_view property) noexcept;
     [[nodiscard]] std::uint32_t bucketOf(std::uint32_t checksum) const noexcept {
         return checksum % static_cast<std::uint32_t>(m_buckets.size());
     }
-    [[nodiscard]] Entry* search(std::uint32_t checksum, std::string_view owner,
-                                std::string_view property) const noexcept;
-    void assign(std::uint32_t checksum, std::string_view owner, Found& found);
-    [[nodiscard]] std::string_view keep(std::string_view owner, std::string_view property);
+    [[nodiscard]] Ordinal search(std::uint32_t checksum, std::string_view owner,
+                                 std::string_view property) const noexcept;
+    void assign(std::uint32_t checksum, std::string_view owner, ParsedProperty& parsed);
+    [[nodiscard]] std::string_view internKey(std::string_view owner, std::string_view property);
     void grow();
 
-    std::vector<Ordinal> m_buckets; ///< the first entry of each
-    std::vector<Link> m_links;      ///< of each entry; has room for one a bucket
-    std::deque<Entry> m_entries;
-    std::pmr::monotonic_buffer_resource m_keys; ///< the keys' texts, one behind the other
+    std::vector<Ordinal> m_buckets; ///< the first link of each
+    std::vector<Link> m_links;      ///< one for each key; there is room for as many as there are buckets
+    std::deque<Entry> m_entries;    ///< replaced ones included
+    std::vector<std::unique_ptr<char[]>> m_keyBlocks;
+    char* m_keyEnd = nullptr;  ///< after the last key of the last block
+    std::size_t m_keyRoom = 0; ///< bytes that are free there
 };

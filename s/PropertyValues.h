@@ -9,14 +9,14 @@
 #include <string_view>
 #include <utility>
 
-/// The values of one property, and whose they are. Nearly all properties have one value, of which nearly always only
-/// the text is asked for: its set is not made before somebody wants the set itself.
+/// The values of one property, and their owner. Nearly all properties have one value, and nearly always only its text is
+/// asked for, so its set is made when a question needs it.
 class PropertyValues {
 public:
     /// Texts, each once, in byte order.
     using TextSet = std::set<StringBase, ltptstr>;
 
-    /// Who holds a property: the length of its name (the table has its text), and whether it is a flash.
+    /// The owner of a property: the length of its name (the table has its text), and whether it is a flash.
     struct Owner {
         std::uint32_t length; ///< of the owner's name, in bytes
         bool isFlash;         ///< is the owner an SPI flash?
@@ -24,12 +24,12 @@ public:
 
     /// With one value.
     /// @param value the value
-    /// @param owner whose it is
+    /// @param owner the owner of the property
     PropertyValues(StringBase value, Owner owner) : m_owner(owner), m_first(std::move(value)) {}
 
     /// With any number of values.
     /// @param values the values
-    /// @param owner whose they are
+    /// @param owner the owner of the property
     PropertyValues(TextSet values, Owner owner)
         : m_owner(owner), m_set(std::make_unique<TextSet>(std::move(values))) {
         if (!m_set->empty()) {
@@ -37,7 +37,7 @@ public:
         }
     }
 
-    /// @return whose the values are
+    /// @return the owner of the property
     [[nodiscard]] const Owner& owner() const noexcept { return m_owner; }
 
     /// @return whether there is no value
@@ -63,11 +63,11 @@ public:
     /// @return the first value in byte order
     [[nodiscard]] auto begin() const { return set().begin(); }
 
-    /// @return the end behind the last one
+    /// @return the end
     [[nodiscard]] auto end() const { return set().end(); }
 
 private:
     Owner m_owner;
     StringBase m_first;
-    mutable std::unique_ptr<TextSet> m_set; ///< null until it is wanted
+    mutable std::unique_ptr<TextSet> m_set; ///< null until a question needs it
 };

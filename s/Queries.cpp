@@ -1,150 +1,151 @@
+#include "Diagnostics.h"
 #include "FamilyNames.h"
-#include "PermissionTable.h"
-#include "Reporting.h"
-#include "Text.h"
+#include "Implementation.h"
+#include "JoinedText.h"
+#include "StringViews.h"
 
-#include <tarvik/ConstraintsManager.h>
-
-#include <Port_MsgManData.h>
-
-// What a device offers, as masks and sets. Which values each question refuses, with which message, and
-// whether before or behind the look-up of the family, differs deliberately between them.
+// What a device offers, as masks. Which values each question rejects, with which message, and whether before or after the
+// family's block is looked up, differs deliberately between them.
 
 using TARVIKNS::MODE_TYPE;
-using TARVIKNS::OP_TYPE;
 using TARVIKNS::OUTPUT_TYPE;
 
 namespace {
 
-constexpr const char* MODE_OUT_OF_RANGE = "Mode is out of range -- %d.\n";
 constexpr const char* OUTPUT_OUT_OF_RANGE = "Outstream(Cable or file type) is out of range -- %d.\n";
-
-// The check of an operation spells two of its messages in its own way, and hosts search their logs for them.
-constexpr const char* CHECKED_OUTPUT_OUT_OF_RANGE = "Outstream(Cable or file type is out of range -- %d.\n";
-constexpr const char* CHECKED_OPERATION_OUT_OF_RANGE = "Opeartion is out of range -- %d.\n";
-
-/// Is the value outside 0 to `extent` - 1? Then it is told to developers.
-template <typename Value>
-bool isRefused(Value value, int extent, const char* message) {
-    const int number = static_cast<int>(value);
-    const bool isOutside = number < 0 || number >= extent;
-    if (isOutside) {
-        Port_MsgManData::debugStub(message, number);
-    }
-    return isOutside;
-}
 
 } // namespace
 
-/// The name whose operation tables answer for a device: its own when its base name is supported, else that of
+/// The name whose operation tables answer for a device: its own when its base name is supported, otherwise that of
 /// its family.
-StringBase ConstraintsManager::operationOwner(const StringBase& device) {
-    return m_supportedDevices.contains(baseName(view(device))) ? device : getPartFamily(device.c_str());
+StringBase ConstraintsManager::Implementation::operationOwner(const StringBase& device) {
+    return m_supportedDevices.contains(baseName(view(device))) ? device : getPartFamily(view(device));
 }
 
-/// How a question that was answered before is answered again: with a single look-up, which leaves the same latest
-/// resolution. Null for a device that was not asked for yet.
-const ConstraintsManager::Shortcut* ConstraintsManager::recall(const Shortcuts& shortcuts,
-                                                               const char* device) {
-    const auto found = shortcuts.find(view(device));
-    if (found == shortcuts.end()) {
-        return nullptr;
+/// Returns the cached look-up for this name and restores m_partFamily; null if there is none.
+const CachedLookup* ConstraintsManager::Implementation::findCachedLookup(const LookupCache& cache,
+                                                                         std::string_view device) {
+    const CachedLookup* const found = cache.find(device);
+    if (found != nullptr && found->family != nullptr) {
+        m_partFamily = *found->family;
     }
-    if (found->second.family != nullptr) {
-        m_partFamily = *found->second.family;
-    }
-    return &found->second;
+    return found;
 }
 
-/// Keeps the way to a device's operations. Only with all of its owner's data loaded, as then every question about
-/// operations goes this way; and only where the owner has the block itself, as then nothing else is resolved.
-void ConstraintsManager::keepOperationShortcut(const StringBase& device, const StringBase& owner,
-                                               std::size_t block) {
+/// How many look-ups a cache may hold: enough for each device that was resolved, under two spellings. One device can be
+/// asked for under any number of names, as in "KS50_lot1", "KS50_lot2", ...
+std::size_t ConstraintsManager::Implementation::cacheLimit() const noexcept {
+    constexpr std::size_t FEW_DEVICES = 1024;
+    return FEW_DEVICES + 2 * m_deviceFamilyCache.size();
+}
+
+/// Caches device to block, only once all of the owner's data is loaded, as then every question about operations takes
+/// the same way; and only if the owner has the block itself, as then nothing else is resolved.
+void ConstraintsManager::Implementation::cacheOperationLookup(const StringBase& device,
+                                                              const StringBase& owner, std::size_t block) {
     if (block >= m_supportedDevices.size() || m_supportedDevices[block] != owner ||
         m_loadedFamilies.find(view(owner)) == m_loadedFamilies.end() ||
         !m_operationsLoaded.contains(view(owner))) {
         return;
     }
     const bool isResolved = !m_supportedDevices.contains(baseName(view(device)));
-    m_operationShortcuts.insert_or_assign(device,
-                                          Shortcut{isResolved ? &m_supportedDevices[block] : nullptr, block});
+    m_operationLookups.add(device, {isResolved ? &m_supportedDevices[block] : nullptr, block}, cacheLimit());
 }
 
-/// Keeps the way to a device's options. The owner's are loaded if they have a block at all, and the family is always
-/// resolved.
-void ConstraintsManager::keepOptionShortcut(const StringBase& device, std::size_t block) {
+/// Caches device to block. The owner's options are loaded if they have a block at all, and the family is always resolved.
+void ConstraintsManager::Implementation::cacheOptionLookup(const StringBase& device, std::size_t block) {
     if (block >= m_programOptionPackages.size()) {
         return;
     }
-    StringBase key = baseNameOf(view(device));
+    StringBase key = toStringBase(baseName(view(device)));
     key.MakeLower();
-    // Families are few: their names in the list of supported ones stay near, those in the cache lie apart.
-    const std::size_t family = m_supportedDevices.position(view(m_deviceFamilyCache.find(view(key))->second));
+    // The list of supported families has a copy of the name that never changes, unlike the family cache. Resolving the
+    // device has left it in that cache, but what a message sink did since then may have changed it.
+    const auto resolved = m_deviceFamilyCache.find(view(key));
+    const std::size_t family = resolved == m_deviceFamilyCache.end()
+                                   ? m_supportedDevices.size()
+                                   : m_supportedDevices.position(view(resolved->second));
     if (family != m_supportedDevices.size()) {
-        m_optionShortcuts.insert_or_assign(device, Shortcut{&m_supportedDevices[family], block});
+        m_optionLookups.add(device, {&m_supportedDevices[family], block}, cacheLimit());
     }
 }
 
-int ConstraintsManager::getDeviceOperations(const char* device, MODE_TYPE mode, OUTPUT_TYPE output) {
-    // Modes and outputs that have no cell give 0 without a word, behind the look-up, which may raise.
+int ConstraintsManager::Implementation::getDeviceOperations(std::string_view device, MODE_TYPE mode,
+                                                            OUTPUT_TYPE output) {
+    // Modes and outputs without a cell give 0 silently, after the look-up, which may raise.
     const auto answer = [&](std::size_t block) {
         return static_cast<int>(
-            m_operationTable->mask(block, static_cast<int>(mode), static_cast<int>(output)));
+            m_operationTable.mask(block, static_cast<int>(mode), static_cast<int>(output)));
     };
+
     if (mode == MODE_TYPE::SPI) {
         return answer(familyIndex(familyNames::SPI));
     }
-    if (const Shortcut* const known = recall(m_operationShortcuts, device)) {
+    if (const CachedLookup* const known = findCachedLookup(m_operationLookups, device)) {
         return answer(known->block);
     }
-    const StringBase name(device);
+    const StringBase name = toStringBase(device);
     const StringBase owner = operationOwner(name);
     if (m_loadedFamilies.find(view(owner)) == m_loadedFamilies.end()) {
-        loadDeviceData(owner.c_str(), nullptr);
+        loadDeviceData(view(owner), {});
     }
-    const unsigned block = familyIndex(owner.c_str());
-    keepOperationShortcut(name, owner, block);
+    const std::size_t block = familyIndex(view(owner));
+    cacheOperationLookup(name, owner, block);
     return answer(block);
 }
 
-int ConstraintsManager::getProgramOptions(const char* device, MODE_TYPE mode, OUTPUT_TYPE output,
-                                          const char* package) {
-    // A package may lead to a block of its own.
-    const bool isPlain = mode != MODE_TYPE::SPI && view(package).empty();
-    const Shortcut* const known = isPlain ? recall(m_optionShortcuts, device) : nullptr;
-    const StringBase name(known == nullptr ? device : nullptr);
-    StringBase owner(familyNames::SPI);
-    if (mode != MODE_TYPE::SPI && known == nullptr) {
-        owner = loadedOptionOwner(name, package);
+int ConstraintsManager::Implementation::getProgramOptions(std::string_view device, MODE_TYPE mode,
+                                                          OUTPUT_TYPE output, std::string_view package) {
+    const auto isOutOfRange = [&] {
+        return diagnostics::rejectOutOfRange(mode, tableDimensions::MODES, diagnostics::MODE_OUT_OF_RANGE) ||
+               diagnostics::rejectOutOfRange(output, tableDimensions::OUTPUTS, OUTPUT_OUT_OF_RANGE);
+    };
+    const auto answer = [&](std::size_t block) {
+        return static_cast<int>(
+            m_programOptionTable.mask(block, static_cast<int>(mode), static_cast<int>(output)));
+    };
+    const auto blockOf = [&](std::string_view owner) {
+        return static_cast<std::size_t>(programOptionTableIndex(owner));
+    };
+
+    if (mode == MODE_TYPE::SPI) {
+        return isOutOfRange() ? 0 : answer(blockOf(familyNames::SPI));
     }
-    if (isRefused(mode, extent::MODES, MODE_OUT_OF_RANGE) ||
-        isRefused(output, extent::OUTPUTS, OUTPUT_OUT_OF_RANGE)) {
+    // A package may have a block of its own.
+    const bool isCacheable = package.empty();
+    if (const CachedLookup* const known = isCacheable ? findCachedLookup(m_optionLookups, device) : nullptr) {
+        const std::size_t block = known->block;
+        return isOutOfRange() ? 0 : answer(block);
+    }
+    const StringBase name = toStringBase(device);
+    StringBase buffer = name;
+    const std::string_view owner = loadedOptionOwner(buffer, package);
+    if (isOutOfRange()) {
         return 0;
     }
-    const std::size_t block =
-        known != nullptr ? known->block : static_cast<std::size_t>(programOptionTableIndex(owner.c_str()));
-    if (isPlain && known == nullptr) {
-        keepOptionShortcut(name, block);
+    const std::size_t block = blockOf(owner);
+    if (isCacheable) {
+        cacheOptionLookup(name, block);
     }
-    return static_cast<int>(
-        m_programOptionTable->mask(block, static_cast<int>(mode), static_cast<int>(output)));
+    return answer(block);
 }
 
-bool ConstraintsManager::isProgramOptionTableLoaded(const char* name) const {
-    return m_programOptionsLoaded.contains(view(name));
+bool ConstraintsManager::Implementation::isProgramOptionTableLoaded(std::string_view name) const {
+    return m_programOptionsLoaded.contains(name);
 }
 
-/// The name whose program options answer for a device in a package, its options loaded: the two joined when
-/// they are listed together, else the device when it is listed or a family, else its family.
-StringBase ConstraintsManager::loadedOptionOwner(const StringBase& device, const char* package) {
-    StringBase name = device;
-    StringBase joined = name;
-    joined += package;
-    const StringBase family = getPartFamily(name.c_str());
+/// The name whose program options answer for a device in a package, with its options loaded: the two joined if they are
+/// listed together; otherwise the device if it is listed or a family; otherwise its family.
+/// @param name the device; becomes the family if that answers. The result may be a view of it
+std::string_view ConstraintsManager::Implementation::loadedOptionOwner(StringBase& name,
+                                                                       std::string_view package) {
+    const StringBase family = getPartFamily(view(name));
     if (family != name) {
-        if (m_programOptionPackages.contains(view(joined))) {
-            if (!isProgramOptionTableLoaded(joined.c_str())) {
-                loadDeviceData(name.c_str(), package);
+        const std::size_t listed = m_programOptionPackages.position(JoinedText{view(name), package}.view());
+        if (listed != m_programOptionPackages.size()) {
+            const std::string_view joined = view(m_programOptionPackages[listed]);
+            if (!isProgramOptionTableLoaded(joined)) {
+                loadDeviceData(view(name), package);
             }
             return joined;
         }
@@ -152,80 +153,31 @@ StringBase ConstraintsManager::loadedOptionOwner(const StringBase& device, const
             name = family;
         }
     }
-    if (!isProgramOptionTableLoaded(name.c_str())) {
-        loadDeviceData(name.c_str(), nullptr);
+    if (!isProgramOptionTableLoaded(view(name))) {
+        loadDeviceData(view(name), {});
     }
-    return name;
+    return view(name);
 }
 
-int ConstraintsManager::getBsdlOperations(const char* device, OUTPUT_TYPE output) {
-    std::size_t block = 0;
-    if (const Shortcut* const known = recall(m_operationShortcuts, device)) {
-        block = known->block;
-    } else {
-        const StringBase name(device);
-        const StringBase owner = operationOwner(name);
-        if (!m_operationsLoaded.contains(view(owner))) {
-            loadDeviceData(owner.c_str(), nullptr);
+int ConstraintsManager::Implementation::getBsdlOperations(std::string_view device, OUTPUT_TYPE output) {
+    const auto answer = [&](std::size_t block) {
+        // Negative outputs pass this test, have no cell and give 0 silently.
+        if (static_cast<int>(output) >= tableDimensions::OUTPUTS) {
+            Port_MsgManData::debugStub(OUTPUT_OUT_OF_RANGE, static_cast<int>(output));
+            return 0;
         }
-        block = familyIndex(owner.c_str());
-        keepOperationShortcut(name, owner, block);
-    }
-    // Negative outputs pass this test, have no cell and give 0 without a word.
-    if (static_cast<int>(output) >= extent::OUTPUTS) {
-        Port_MsgManData::debugStub(OUTPUT_OUT_OF_RANGE, static_cast<int>(output));
-        return 0;
-    }
-    return static_cast<int>(m_bsdlOperationTable->mask(block, 0, static_cast<int>(output)));
-}
+        return static_cast<int>(m_bsdlOperationTable.mask(block, 0, static_cast<int>(output)));
+    };
 
-bool ConstraintsManager::checkConstraints(MODE_TYPE mode, OUTPUT_TYPE output, const char* device,
-                                          OP_TYPE operation, const char* /*family*/) {
-    const Shortcut* const known = mode != MODE_TYPE::SPI ? recall(m_operationShortcuts, device) : nullptr;
-    const StringBase name(known == nullptr ? device : nullptr);
-    StringBase owner(familyNames::SPI);
-    if (mode != MODE_TYPE::SPI && known == nullptr) {
-        // The base name is what is resolved here: a flash that is listed with its package is none then.
-        const StringBase base = baseNameOf(view(name));
-        owner = m_supportedDevices.contains(view(base)) ? name : getPartFamily(base.c_str());
-        if (!m_operationsLoaded.contains(view(owner))) {
-            loadDeviceData(owner.c_str(), nullptr);
-        }
+    if (const CachedLookup* const known = findCachedLookup(m_operationLookups, device)) {
+        return answer(known->block);
     }
-    if (isRefused(mode, extent::MODES, MODE_OUT_OF_RANGE) ||
-        isRefused(output, extent::OUTPUTS, CHECKED_OUTPUT_OUT_OF_RANGE) ||
-        isRefused(operation, extent::OPERATIONS, CHECKED_OPERATION_OUT_OF_RANGE)) {
-        return false;
+    const StringBase name = toStringBase(device);
+    const StringBase owner = operationOwner(name);
+    if (!m_operationsLoaded.contains(view(owner))) {
+        loadDeviceData(view(owner), {});
     }
-    const std::size_t block = known != nullptr ? known->block : familyIndex(owner.c_str());
-    if (mode != MODE_TYPE::SPI && known == nullptr) {
-        keepOperationShortcut(name, owner, block);
-    }
-    return m_operationTable->allows(block, static_cast<int>(operation), static_cast<int>(mode),
-                                    static_cast<int>(output));
-}
-
-bool ConstraintsManager::checkConstraints(const char* device, MODE_TYPE mode, OP_TYPE operation,
-                                          const char* /*family*/) {
-    const StringBase name = baseNameOf(view(device));
-    const StringBase key = operationType2String(operation);
-    return hasDevicePropertyValue(name.c_str(), key.c_str(), modeType2String(mode).c_str());
-}
-
-const ConstraintsManager::TextSet&
-ConstraintsManager::getDeviceOperationOptions(const char* device, const char* operation, MODE_TYPE mode) {
-    const StringBase modeName = modeType2String(mode);
-    if (!hasDevicePropertyValue(device, operation, modeName.c_str())) {
-        return m_operationOptions;
-    }
-    StringBase key("OP_");
-    key += operation;
-    key.MakeUpper();
-    const TextSet& options = getDeviceStringProperties(device, key.c_str());
-    if (!options.empty()) {
-        return options;
-    }
-    key += "_";
-    key += modeName;
-    return getDeviceStringProperties(device, key.c_str());
+    const std::size_t block = familyIndex(view(owner));
+    cacheOperationLookup(name, owner, block);
+    return answer(block);
 }

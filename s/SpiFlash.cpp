@@ -1,10 +1,10 @@
+#include "Diagnostics.h"
 #include "FamilyNames.h"
-#include "Lists.h"
-#include "Reporting.h"
+#include "Implementation.h"
+#include "JoinedText.h"
+#include "RecordReader.h"
 #include "SpiClasses.h"
-#include "Text.h"
-
-#include <tarvik/ConstraintsManager.h>
+#include "StringViews.h"
 
 #include <PM_DEVKEY.h>
 #include <PicConfig.h>
@@ -28,18 +28,18 @@ PM_DEVKEY* openSpiDatabase() {
     return &opened.emplace_back(std::make_unique<SpiDatabase>())->accessor;
 }
 
-StringBase upperCased(std::string_view name, std::string_view property) {
-    StringBase key(name.data(), name.size());
-    key += StringBase(property.data(), property.size());
-    key.MakeUpper();
-    return key;
+StringBase upperCased(std::string_view text) {
+    StringBase result = toStringBase(text);
+    result.MakeUpper();
+    return result;
 }
 
 } // namespace
 
 /// The classes of flash, in the order in which they are tested.
-const std::array<ConstraintsManager::SpiClass, 6>& ConstraintsManager::spiClasses() {
-    using M = ConstraintsManager;
+const std::array<ConstraintsManager::Implementation::SpiClass, 6>&
+ConstraintsManager::Implementation::spiClasses() {
+    using M = Implementation;
     static constexpr std::array<SpiClass, 6> CLASSES{{
         {"AT1", "AT1_DEVICES", &M::m_at1Devices},
         {"ST1", "ST1_DEVICES", &M::m_st1Devices},
@@ -51,13 +51,13 @@ const std::array<ConstraintsManager::SpiClass, 6>& ConstraintsManager::spiClasse
     return CLASSES;
 }
 
-void ConstraintsManager::loadSpiCatalogue() {
+void ConstraintsManager::Implementation::loadSpiCatalogue() {
     PM_DEVKEY* const accessor = openSpiDatabase();
     readSpiNames(accessor);
     readMultibootDeviceLists(accessor);
     readSpiProperties(accessor);
 
-    // The names are noted behind the parsers here, before them when a family is loaded on demand.
+    // Here the names are marked as loaded after parsing; loading on demand marks them before.
     const unsigned index = familyIndex(familyNames::SPI);
     parseOperationEntries(accessor, index, familyNames::SPI);
     m_operationsLoaded.push_back(familyNames::SPI);
@@ -68,7 +68,7 @@ void ConstraintsManager::loadSpiCatalogue() {
     readMultibootTypes(accessor);
 }
 
-void ConstraintsManager::readSpiNames(PM_DEVKEY* accessor) {
+void ConstraintsManager::Implementation::readSpiNames(PM_DEVKEY* accessor) {
     for (const StringBase& family : readList(*accessor, "DEVICE_FAMILY")) {
         m_spiNames.push_back(family);
         m_spiFamilies.push_back(family);
@@ -76,7 +76,7 @@ void ConstraintsManager::readSpiNames(PM_DEVKEY* accessor) {
         key += "_DEVICES";
         const std::vector<StringBase> devices = readList(*accessor, key.c_str());
         if (!devices.empty()) {
-            // Deliberate: the first device of every family stands twice.
+            // Deliberate: the first device of every family is listed twice.
             m_spiNames.push_back(devices.front());
         }
         for (const StringBase& device : devices) {
@@ -85,60 +85,56 @@ void ConstraintsManager::readSpiNames(PM_DEVKEY* accessor) {
     }
 }
 
-void ConstraintsManager::readMultibootDeviceLists(PM_DEVKEY* accessor) {
+void ConstraintsManager::Implementation::readMultibootDeviceLists(PM_DEVKEY* accessor) {
     for (const SpiClass& flash : spiClasses()) {
         this->*flash.devices = readList(*accessor, flash.key);
     }
 }
 
-/// Keeps properties under the name as written; they are looked for in upper case.
-void ConstraintsManager::readSpiProperties(PM_DEVKEY* accessor) {
-    auto latest = m_spiProperties.end();
+/// Stores properties under the name as written; they are looked up in upper case.
+void ConstraintsManager::Implementation::readSpiProperties(PM_DEVKEY* accessor) {
+    auto last = m_spiProperties.end();
     for (const StringBase& name : m_spiNames) {
         StringBase key = UT_STR::Upper(name.c_str());
         key += "_PROPERTY";
         forEachRecord(*accessor, key.c_str(), [&](const Record& record, const StringBase& property) {
             const char* const value = record.field(1);
             if (value == nullptr) {
-                reporting::raiseIf<DataMismatchException>(m_exceptions,
-                                                          reporting::location::SPI_PROPERTY_WITHOUT_VALUE);
+                diagnostics::raiseIf<DataMismatchException>(
+                    m_exceptions, diagnostics::location::SPI_PROPERTY_WITHOUT_VALUE);
             }
             StringBase joined = name;
             joined += property;
-            latest = setBehind(m_spiProperties, latest, std::move(joined), value);
+            last = insertWithHint(m_spiProperties, last, std::move(joined), value);
         });
     }
 }
 
-bool ConstraintsManager::isSpiDevice(StringBase device) const {
+bool ConstraintsManager::Implementation::isSpiDevice(StringBase device) const {
     device.MakeUpper();
     return m_spiNames.contains(view(device));
 }
 
-/// The class of a flash; empty when it has none. Of several classes the last one counts.
-StringBase ConstraintsManager::spiDeviceClass(const char* device) const {
+/// The class of a flash; empty when it has none. Of several classes the last one wins.
+StringBase ConstraintsManager::Implementation::spiDeviceClass(const char* device) const {
     StringBase result;
     for (const SpiClass& flash : spiClasses()) {
-        if (holdsIgnoringCase(this->*flash.devices, device)) {
+        if (containsIgnoreCase(this->*flash.devices, device)) {
             result = flash.name;
         }
     }
     return result;
 }
 
-const char* ConstraintsManager::getSpiDeviceStringProperty(const char* device, const char* property) const {
-    auto found = m_spiProperties.find(upperCased(view(device), view(property)));
+const char* ConstraintsManager::Implementation::getSpiDeviceStringProperty(const char* device,
+                                                                           std::string_view property) const {
+    const StringBase key = upperCased(property);
+    const auto find = [&](std::string_view owner) {
+        return m_spiProperties.find(JoinedText{view(upperCased(owner)), view(key)}.view());
+    };
+    auto found = find(view(device));
     if (found == m_spiProperties.end()) {
-        const StringBase flashClass = spiDeviceClass(device);
-        found = m_spiProperties.find(upperCased(view(flashClass), view(property)));
+        found = find(view(spiDeviceClass(device)));
     }
     return found == m_spiProperties.end() ? "" : found->second.c_str();
-}
-
-bool ConstraintsManager::getSpiDeviceBoolProperty(const char* device, const char* property) const {
-    return UT_STR::ICompare(getSpiDeviceStringProperty(device, property), "true") == 0;
-}
-
-long ConstraintsManager::getSpiDeviceLongProperty(const char* device, const char* property) const {
-    return UT_STR::AToL(getSpiDeviceStringProperty(device, property));
 }

@@ -1,6 +1,6 @@
 #include "Vocabulary.h"
 
-#include "Reporting.h"
+#include "Diagnostics.h"
 
 #include <tarvik/ConstraintsManager.h>
 
@@ -25,7 +25,7 @@ OP_TYPE operationWith(const char* Operation::*name, const char* text) {
         return UT_STR::ICompare(operation.*name, text) == 0;
     });
     if (found == OPERATIONS.end()) {
-        reporting::message(reporting::location::OPERATION_NOT_DEFINED)
+        diagnostics::message(diagnostics::location::OPERATION_NOT_DEFINED)
             .issueInfo("Operation %s is not defined.\n", text);
         return TARVIKNS::NO_OPERATION;
     }
@@ -33,26 +33,28 @@ OP_TYPE operationWith(const char* Operation::*name, const char* text) {
 }
 
 /// The key name, or display name, of an operation.
-StringBase nameOf(OP_TYPE operation, const char* Operation::*name) {
+const char* nameOf(OP_TYPE operation, const char* Operation::*name) {
     const Operation* const row = rowOf(OPERATIONS, operation);
     if (row == nullptr) {
-        reporting::message(reporting::location::OPERATION_NOT_DEFINED)
+        diagnostics::message(diagnostics::location::OPERATION_NOT_DEFINED)
             .issueInfo("Operation %d is not defined.\n", static_cast<int>(operation));
-        return {};
+        return "";
     }
     return row->*name;
 }
 
 } // namespace
 
+const char* vocabulary::operationKey(OP_TYPE operation) { return nameOf(operation, &Operation::key); }
+
 const char* vocabulary::modeDisplayName(MODE_TYPE mode) noexcept {
     const Mode* const row = rowOf(MODES, mode);
-    return latestModeName = (row == nullptr ? MODES.back() : *row).display;
+    return lastModeName = (row == nullptr ? MODES.back() : *row).display;
 }
 
 const char* vocabulary::outputDisplayName(OUTPUT_TYPE output) noexcept {
     const Output* const row = rowOf(OUTPUTS, output);
-    return latestOutputName = (row == nullptr ? OUTPUTS.back() : *row).display;
+    return lastOutputName = (row == nullptr ? OUTPUTS.back() : *row).display;
 }
 
 MODE_TYPE ConstraintsManager::modeString2Type(const char* text) noexcept {
@@ -66,14 +68,11 @@ MODE_TYPE ConstraintsManager::modeString2Type(const char* text) noexcept {
     return MODE_TYPE::BS;
 }
 
-StringBase ConstraintsManager::modeType2String(MODE_TYPE mode) {
-    const Mode* const row = rowOf(MODES, mode);
-    return (row == nullptr ? MODES.front() : *row).key;
-}
+StringBase ConstraintsManager::modeType2String(MODE_TYPE mode) { return modeKey(mode); }
 
 OUTPUT_TYPE ConstraintsManager::cableString2Type(const char* text) noexcept {
     for (const Output& output : OUTPUTS) {
-        if (output.isRead && UT_STR::Compare(text, output.key) == 0) {
+        if (output.isParseable && UT_STR::Compare(text, output.key) == 0) {
             return output.value;
         }
     }
@@ -93,9 +92,7 @@ OP_TYPE ConstraintsManager::operationDisplayString2Type(const char* text) {
     return operationWith(&Operation::display, text);
 }
 
-StringBase ConstraintsManager::operationType2String(OP_TYPE operation) {
-    return nameOf(operation, &Operation::key);
-}
+StringBase ConstraintsManager::operationType2String(OP_TYPE operation) { return operationKey(operation); }
 
 StringBase ConstraintsManager::operationType2DisplayString(OP_TYPE operation) {
     return nameOf(operation, &Operation::display);
@@ -103,17 +100,17 @@ StringBase ConstraintsManager::operationType2DisplayString(OP_TYPE operation) {
 
 PROGRAM_OPTION ConstraintsManager::optionString2Type(const char* text) {
     for (const Option& option : OPTIONS) {
-        if (option.isRead && UT_STR::Compare(text, option.key) == 0) {
+        if (option.isParseable && UT_STR::Compare(text, option.key) == 0) {
             return option.value;
         }
     }
-    reporting::raise<DataMismatchException>(reporting::location::OPTION_NAME_UNKNOWN);
+    diagnostics::raise<DataMismatchException>(diagnostics::location::OPTION_NAME_UNKNOWN);
 }
 
 StringBase ConstraintsManager::optionType2String(PROGRAM_OPTION option) {
     const Option* const row = rowOf(OPTIONS, option);
     if (row == nullptr) {
-        reporting::raise<DataMismatchException>(reporting::location::OPTION_WITHOUT_NAME);
+        diagnostics::raise<DataMismatchException>(diagnostics::location::OPTION_WITHOUT_NAME);
     }
     return row->key;
 }

@@ -12,14 +12,14 @@ namespace vocabulary {
 struct Mode {
     TARVIKNS::MODE_TYPE value;
     const char* key;
-    std::array<const char*, 3> names; ///< the texts that are read as this mode; null behind the last
+    std::array<const char*, 3> names; ///< the texts that are read as this mode; null after the last
     const char* display;
 };
 
 struct Output {
     TARVIKNS::OUTPUT_TYPE value;
     const char* key;
-    bool isRead; ///< false: the key is written but never read
+    bool isParseable; ///< false: the key is written but never read
     const char* display;
 };
 
@@ -32,7 +32,7 @@ struct Operation {
 struct Option {
     TARVIKNS::PROGRAM_OPTION value;
     const char* key;
-    bool isRead; ///< false: the key is written but never read
+    bool isParseable; ///< false: the key is written but never read
 };
 
 // The misspelling and the double blanks in the display names are what hosts show and compare.
@@ -147,15 +147,25 @@ template <typename Table, typename Value>
     return row < table.size() ? &table[row] : nullptr;
 }
 
-/// The display name of a mode; that of `PFF` for a value that is no mode. The result also stays in
-/// `latestModeName`, from which refusals take it.
+/// The key name of a mode; "BS" for a value that is no mode.
+[[nodiscard]] inline const char* modeKey(TARVIKNS::MODE_TYPE mode) noexcept {
+    const Mode* const row = rowOf(MODES, mode);
+    return (row == nullptr ? MODES.front() : *row).key;
+}
+
+/// The key name of an operation; empty, after an info message, for a value that is no operation.
+[[nodiscard]] const char* operationKey(TARVIKNS::OP_TYPE operation);
+
+/// The display name of a mode; that of `PFF` for a value that is no mode. The result is also kept in
+/// `lastModeName`, from which refusals take it.
 const char* modeDisplayName(TARVIKNS::MODE_TYPE mode) noexcept;
 
-/// The display name of an output; that of `NONE` for a value that is no output. Stays in `latestOutputName`.
+/// The display name of an output; that of `NONE` for a value that is no output. Also kept in
+/// `lastOutputName`.
 const char* outputDisplayName(TARVIKNS::OUTPUT_TYPE output) noexcept;
 
-// Process-wide: what the two look-ups gave latest.
-inline const char* latestModeName = "";
-inline const char* latestOutputName = "";
+// Process-wide: the last results of the two look-ups.
+inline const char* lastModeName = "";
+inline const char* lastOutputName = "";
 
 } // namespace vocabulary

@@ -15,6 +15,8 @@ namespace {
 constexpr std::array<const char*, MODES> MODE_NAMES{"Bscan", "SSerial", "Smap", "BSFILE", "DP770", "SPI"};
 constexpr std::array<const char*, 9> MODE_KEYS{"BS",  "SS",     "SM",      "BSFILE", "DP770",
                                                "SPI", "KITECF", "KITEMPM", "PFF"};
+/// The modes in which families have records: in the last one, SPI, all devices are looked up as spi.
+constexpr std::size_t FAMILY_MODES = MODES - 1;
 constexpr const char* ALL_OUTPUTS = "PARALLEL,ZORVA,USB2,SVF,STAPL";
 
 /// Records behind one another, each on a line of its own.
@@ -62,7 +64,7 @@ template <typename Name>
 [[nodiscard]] std::string tableText(const char* key, const Masks& masks, Name name) {
     Records records(key);
     for (std::size_t row = 0; row < OPERATIONS; ++row) {
-        for (std::size_t mode = 0; mode < MODES; ++mode) {
+        for (std::size_t mode = 0; mode < FAMILY_MODES; ++mode) {
             const std::string outputs = outputsWhere(
                 [&](std::size_t output) { return (masks[cellOf(mode, output)] >> row & 1U) != 0; });
             if (!outputs.empty()) {
@@ -106,12 +108,16 @@ template <typename Name>
 [[nodiscard]] std::string baseText(const Facts& facts) {
     std::string families;
     for (const Family& family : facts.families) {
-        families += family.name + ",";
+        families += "," + family.name;
     }
     std::string text =
-        "DEVICE_SUPPORTED = " + families + "base,spi\nPROGRAM_OPTION_PACKAGE = " + families + "base,spi\n";
-    for (const char* const mode : MODE_KEYS) {
-        text += std::string(mode) + " = outputs," + ALL_OUTPUTS + ":families," + families + "spi\n";
+        "DEVICE_SUPPORTED = base,spi" + families + "\nPROGRAM_OPTION_PACKAGE = base,spi" + families + "\n";
+    for (std::size_t mode = 0; mode < MODE_KEYS.size(); ++mode) {
+        text += std::string(MODE_KEYS[mode]) + " = outputs," + ALL_OUTPUTS + ":families" +
+                (mode < FAMILY_MODES    ? families
+                 : mode == FAMILY_MODES ? ",spi"
+                                        : "") +
+                "\n";
     }
     Records codes("IDCODE");
     constexpr std::string_view DIGITS = "0123456789ABCDEF";

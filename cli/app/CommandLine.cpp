@@ -1,7 +1,11 @@
 // The options of the tool and the table of its commands.
 #include "app/CommandLine.h"
 
+#include "app/Help.h"
 #include "commands/Commands.h"
+#include "text/Suggest.h"
+
+#include <fmt/format.h>
 
 namespace {
 
@@ -24,7 +28,7 @@ std::vector<DeclaredCommand> declared(std::initializer_list<const Command*> comm
 CommandLine::CommandLine() {
     options = {
         {.name = "--help", .letter = 'h', .description = "Show this help", .target = &help},
-        {.name = "--version", .description = "Show the version", .target = &version},
+        {.name = "--version", .letter = 'V', .description = "Show the version", .target = &version},
         {.name = "--database",
          .value = "DIR",
          .description =
@@ -38,7 +42,7 @@ CommandLine::CommandLine() {
          .target = &settings.verbose},
         {.name = "--color",
          .value = "WHEN",
-         .description = "When to use colours; auto: on a terminal, unless NO_COLOR is set",
+         .description = "Use colours (auto: on a terminal, unless NO_COLOR is set)",
          .kind = ValueKind::CHOICE,
          .choices = {"auto", "always", "never"},
          .target = &colours},
@@ -51,7 +55,29 @@ CommandLine::CommandLine() {
                                 &command::WHY, &command::WHICH})},
         {"Databases", declared({&command::LINT, &command::DIFF})},
         {"Programs", declared({&command::BATCH, &command::DUMP})},
+        {"Help", {declaredHelp()}},
     };
+}
+
+DeclaredCommand CommandLine::declaredHelp() {
+    DeclaredCommand result{
+        {"help", "Show the help of the tool or of a command", "", "tarvik help check", nullptr}, {}, {}};
+    result.arguments = {{.name = "COMMAND",
+                         .description = "The command",
+                         .kind = ValueKind::COMMAND,
+                         .target = &m_helpTopic}};
+    result.action = [this](Tool& tool) {
+        const DeclaredCommand* const topic = m_helpTopic.empty() ? nullptr : find(m_helpTopic);
+        if (topic == nullptr && !m_helpTopic.empty()) {
+            throw CommandError(ExitCode::FAULT,
+                               fmt::format("unknown command \"{}\"{}\nsee: tarvik help", m_helpTopic,
+                                           didYouMean(m_helpTopic, commandNames())));
+        }
+        tool.output().write(helpText(*this, topic));
+        tool.output().flush();
+        return ExitCode::YES;
+    };
+    return result;
 }
 
 const DeclaredCommand* CommandLine::find(const std::string& name) const {

@@ -41,4 +41,10 @@ struct CommandLine {
     bool version = false;
     ArgumentList options; ///< those of the tool itself
     std::vector<Group> groups;
+
+private:
+    /// The one command that needs to know all others.
+    [[nodiscard]] DeclaredCommand declaredHelp();
+
+    std::string m_helpTopic; ///< the command whose help is wanted; empty for the tool
 };

@@ -9,6 +9,7 @@
 
 #include <algorithm>
 #include <sstream>
+#include <unistd.h>
 
 namespace {
 
@@ -28,7 +29,7 @@ std::string entry(const std::string& name, const std::string& description, std::
                   std::size_t width) {
     std::string text = "  " + name;
     // A name that reaches into the column has its line to itself.
-    if (text.size() + 2 > column) {
+    if (text.size() + 1 > column) {
         text += '\n' + std::string(column, ' ');
     } else {
         text.append(column - text.size(), ' ');
@@ -131,7 +132,10 @@ std::string toolHelp(const CommandLine& line, std::size_t width) {
 
 } // namespace
 
-std::string helpText(const CommandLine& line, const DeclaredCommand* command, std::size_t width) {
+std::string helpText(const CommandLine& line, const DeclaredCommand* command) {
+    const Terminal terminal(STDOUT_FILENO, Terminal::Colours::NEVER);
+    // Prose is read by people in a pipe, too.
+    const std::size_t width = terminal.isTerminal() ? terminal.width() : LINE_WIDTH;
     return command == nullptr ? toolHelp(line, width) : commandHelp(*command, width);
 }
 

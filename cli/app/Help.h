@@ -2,12 +2,9 @@
 
 #include "app/CommandLine.h"
 
-#include <cstddef>
-
-/// The help of the tool, or of a command, with lines that fit a width as far as their words allow it.
+/// The help of the tool, or of a command, with lines that fit standard output as far as their words allow it.
 /// @param command null for the tool
-[[nodiscard]] std::string helpText(const CommandLine& line, const DeclaredCommand* command,
-                                   std::size_t width);
+[[nodiscard]] std::string helpText(const CommandLine& line, const DeclaredCommand* command);
 
 /// How a command is called: "check [OPTIONS] --mode MODE [DEVICE]".
 [[nodiscard]] std::string usageOf(const DeclaredCommand& command);

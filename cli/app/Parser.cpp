@@ -75,12 +75,18 @@ std::string unexpected(const CommandLine& line, const DeclaredCommand* command, 
 
 /// What is wrong with the command line, and which help to read.
 CommandError explained(const CommandLine& line, const DeclaredCommand* command, const CLI::App& parser,
-                       const CLI::ParseError& fault) {
+                       const std::vector<std::string>& words, const CLI::ParseError& fault) {
     const std::vector<std::string> rest = parser.remaining(true);
     std::string explanation = fault.what();
-    // A mistyped option is more likely at fault than what is missing instead.
-    if (!rest.empty() && (command == nullptr || rest.front().starts_with('-') ||
-                          dynamic_cast<const CLI::ExtrasError*>(&fault) != nullptr)) {
+    const auto end = std::find(words.begin(), words.end(), "--");
+    const auto hidden = std::find_if(end, words.end(), [](const std::string& word) {
+        return word.find_first_not_of('-') == 1 || word.find_first_not_of('-') == 2;
+    });
+    if (hidden != words.end()) {
+        explanation = fmt::format("\"{}\" comes after \"--\", so it is not read as an option", *hidden);
+        // A mistyped option is more likely at fault than what is missing instead.
+    } else if (!rest.empty() && (command == nullptr || rest.front().starts_with('-') ||
+                                 dynamic_cast<const CLI::ExtrasError*>(&fault) != nullptr)) {
         explanation = unexpected(line, command, rest.front());
     } else if (command == nullptr && dynamic_cast<const CLI::RequiredError*>(&fault) != nullptr) {
         explanation = "a command is required";
@@ -115,7 +121,7 @@ const DeclaredCommand* parse(CommandLine& line, const std::vector<std::string>& 
     } catch (const CLI::ParseError& fault) {
         // Who asks for help may leave out what is required.
         if (!line.help && !line.version) {
-            throw explained(line, chosen, parser, fault);
+            throw explained(line, chosen, parser, words, fault);
         }
         return chosen;
     }

@@ -10,7 +10,6 @@
 
 #include <algorithm>
 #include <csignal>
-#include <unistd.h>
 
 namespace {
 
@@ -49,6 +48,9 @@ ExitCode run(const std::vector<std::string>& words) {
     if (words == std::vector<std::string>{"manual"}) {
         return show(manualSections(line));
     }
+    if (words.empty()) {
+        return show(helpText(line, nullptr));
+    }
     const DeclaredCommand* command = nullptr;
     try {
         command = parse(line, words);
@@ -58,7 +60,7 @@ ExitCode run(const std::vector<std::string>& words) {
         return Tool(line.settings).fail(error);
     }
     if (line.help) {
-        return show(helpText(line, command, Terminal(STDOUT_FILENO, Terminal::Colours::NEVER).width()));
+        return show(helpText(line, command));
     }
     if (line.version) {
         return show("tarvik " TARVIK_VERSION "\n");

@@ -5,6 +5,7 @@
 #include "batch/InputLines.h"
 #include "batch/RequestReader.h"
 #include "query/Tool.h"
+#include "text/Suggest.h"
 
 #include <TarvikException.h>
 #include <tarvik/ConstraintsManager.h>
@@ -20,24 +21,28 @@ std::pair<const char*, Json> invoke(const PreparedCall& prepared, ConstraintsMan
     try {
         return {"result", prepared.call->invoke(manager, prepared.arguments)};
     } catch (const TarvikException& exception) {
-        return {"exception", {{"type", exception.what()}, {"line", exception.line()}}};
+        return {"exception", {{"type", exception.typeName()}, {"line", exception.line()}}};
     }
 }
 
 /// Answers requests from the one manager, which the first of them makes.
 class RequestHandler {
 public:
-    explicit RequestHandler(Messages& messages) : m_messages(messages) {}
+    RequestHandler(Messages& messages, const std::vector<batch::Handler>& handlers)
+        : m_messages(messages), m_handlers(handlers) {}
 
     [[nodiscard]] Json answer(const InputLines::Line& line) {
         if (line.tooLong) {
-            return error({}, fmt::format("a line longer than {} bytes", InputLines::LONGEST));
+            return error({}, fmt::format("a line longer than {} bytes", InputLines::MAX_LENGTH));
         }
         Request request = readRequest(line.text);
         if (!request.fault.empty()) {
             return error(std::move(request.id), request.fault);
         }
         const PreparedCall prepared = prepare(request);
+        if (prepared.isUnknown) {
+            return answerBesides(std::move(request));
+        }
         if (prepared.call == nullptr) {
             return error(std::move(request.id), prepared.fault);
         }
@@ -53,6 +58,46 @@ public:
     [[nodiscard]] bool ended() const noexcept { return m_ended; }
 
 private:
+    /// Answers what is no method of the interface.
+    [[nodiscard]] Json answerBesides(Request request) {
+        std::vector<std::string> names = callNames();
+        names.emplace_back(HELP);
+        for (const batch::Handler& handler : m_handlers) {
+            names.push_back(handler.name);
+            if (handler.name == request.call) {
+                return answerBy(handler, std::move(request));
+            }
+        }
+        if (request.call != HELP) {
+            return error(std::move(request.id), fmt::format("there is no call \"{}\"{}", request.call,
+                                                            didYouMean(request.call, names)));
+        }
+        if (!request.arguments.empty()) {
+            return error(std::move(request.id), "help takes ()");
+        }
+        return {{"id", std::move(request.id)}, {"result", help()}, {"messages", Json::array()}};
+    }
+
+    [[nodiscard]] Json answerBy(const batch::Handler& handler, Request request) {
+        try {
+            Json result = handler.invoke(request.arguments);
+            return {{"id", std::move(request.id)},
+                    {"result", std::move(result)},
+                    {"messages", asJson(m_messages.take())}};
+        } catch (const CommandError& fault) {
+            return error(std::move(request.id), fault.what());
+        }
+    }
+
+    [[nodiscard]] Json help() const {
+        Json calls = describeCalls();
+        for (const batch::Handler& handler : m_handlers) {
+            calls.push_back(handler.description);
+        }
+        calls.push_back({{"call", HELP}, {"args", Json::array()}, {"result", "array of calls"}});
+        return calls;
+    }
+
     static Json error(Json id, const std::string& fault) { return {{"id", std::move(id)}, {"error", fault}}; }
 
     static ConstraintsManager& manager() {
@@ -63,7 +108,10 @@ private:
         return *manager;
     }
 
+    static constexpr const char* HELP = "help";
+
     Messages& m_messages;
+    const std::vector<batch::Handler>& m_handlers;
     bool m_ended = false;
 };
 
@@ -71,11 +119,11 @@ private:
 
 namespace batch {
 
-ExitCode run(Tool& tool) {
+ExitCode run(Tool& tool, const std::vector<Handler>& handlers) {
     tool.openDatabase();
     Output& output = tool.output();
     InputLines lines(output);
-    RequestHandler handler(tool.messages());
+    RequestHandler handler(tool.messages(), handlers);
     while (!handler.ended() && !output.closed()) {
         const std::optional<InputLines::Line> line = lines.next();
         if (!line) {

@@ -12,10 +12,10 @@
 #include <type_traits>
 #include <utility>
 
-/// Binds a method to JSON: its types tell how arguments are read and how the result is written.
+/// Binds a method to JSON: its types decide how arguments are read and how the result is written.
 namespace binding {
 
-/// A recorder is asked for by its name, "recorder"; null asks for none.
+/// Whether a dump is written to a recorder: the argument is "recorder" or null.
 enum class Recorder : bool { NONE, GIVEN };
 
 enum class Kind { BOOLEAN, TEXT, BYTES, MODE, OUTPUT, OPERATION, OPTION, RECORDER };
@@ -37,10 +37,35 @@ inline constexpr Kind KIND<TARVIKNS::PROGRAM_OPTION> = Kind::OPTION;
 template <>
 inline constexpr Kind KIND<Recorder> = Kind::RECORDER;
 
-inline constexpr std::size_t MOST_PARAMETERS = 5;
+/// The JSON type of a result, as `help` names it.
+template <typename Type>
+constexpr std::string_view resultName() {
+    if constexpr (std::is_void_v<Type>) {
+        return "null";
+    } else if constexpr (std::is_same_v<Type, bool> ||
+                         std::is_convertible_v<Type, const ConstraintsManager*>) {
+        return "boolean";
+    } else if constexpr (std::is_same_v<Type, const char*>) {
+        return "text or null";
+    } else if constexpr (std::is_same_v<Type, Json>) {
+        return "text or null";
+    } else if constexpr (std::is_same_v<Type, StringBase>) {
+        return "text";
+    } else if constexpr (std::is_arithmetic_v<Type> || std::is_enum_v<Type>) {
+        return "integer";
+    } else if constexpr (std::is_same_v<Type, ConstraintsManager::Texts>) {
+        return "object of texts";
+    } else if constexpr (std::is_same_v<Type, ConstraintsManager::TextSet>) {
+        return "array of texts";
+    } else {
+        return "array of integers";
+    }
+}
 
-/// Arguments in the order of the parameters. They fit: numbers stand for enumerations.
-using Arguments = std::array<const Json*, MOST_PARAMETERS>;
+inline constexpr std::size_t MAX_PARAMETERS = 5;
+
+/// Arguments in the order of the parameters, of matching kinds; enumerations are numbers.
+using Arguments = std::array<const Json*, MAX_PARAMETERS>;
 
 struct Parameter {
     std::string_view name;
@@ -50,8 +75,9 @@ struct Parameter {
 /// One method of the exported interface, or one overload of it.
 struct Call {
     std::string_view name;
-    std::array<Parameter, MOST_PARAMETERS> parameters;
+    std::array<Parameter, MAX_PARAMETERS> parameters;
     std::size_t count;
+    std::string_view result; ///< the JSON type
     Json (*invoke)(ConstraintsManager& manager, const Arguments& arguments);
 };
 
@@ -79,7 +105,7 @@ inline Json toJson(bool value) { return value; }
 inline Json toJson(int value) { return value; }
 inline Json toJson(long value) { return value; }
 inline Json toJson(const char* text) { return text == nullptr ? Json() : Json(text); }
-inline Json toJson(const StringBase& text) { return plain(text); }
+inline Json toJson(const StringBase& text) { return toStdString(text); }
 inline Json toJson(const ConstraintsManager* manager) { return manager != nullptr; }
 
 template <typename Type>
@@ -103,15 +129,15 @@ inline Json toJson(const ConstraintsManager::TextSet& texts) {
 }
 
 inline Json toJson(const ConstraintsManager::Texts& texts) {
-    // The names of a map differ already: appended as they are, since setting each searches all before it.
+    // The names of a map are unique: appended without the search that setting each would do.
     Json::object_t object;
     for (const auto& [name, text] : texts) {
-        object.emplace_back(plain(name), toJson(text));
+        object.emplace_back(toStdString(name), toJson(text));
     }
     return object;
 }
 
-/// What a method takes besides the manager, and gives: methods, static ones, and functions on the manager.
+/// The parameters besides the manager and the result of a method, static method or function on the manager.
 template <typename Result, typename... Types>
 struct Signature {};
 
@@ -148,6 +174,7 @@ constexpr Call call(std::string_view name, Signature<Result, Types...>, Names...
     return {name,
             {Parameter{names, KIND<Types>}...},
             sizeof...(Names),
+            resultName<std::remove_cv_t<std::remove_reference_t<Result>>>(),
             [](ConstraintsManager& manager, const Arguments& arguments) {
                 return invoke<Method>(manager, arguments, Signature<Result, Types...>(),
                                       std::index_sequence_for<Types...>());

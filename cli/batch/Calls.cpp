@@ -38,7 +38,7 @@ Json dump(Manager& manager, Recorder wanted) {
     }
     TarvikSmokeMgr recorder;
     (manager.*Method)(&recorder);
-    return plain(recorder.text());
+    return toStdString(recorder.text());
 }
 
 template <void (Manager::*Method)(TarvikSmokeMgr*)>
@@ -53,7 +53,7 @@ constexpr auto check(bool (Manager::*method)(Types...)) {
 
 constexpr std::string_view REMOVE = "RemoveConstraintsManager";
 
-/// Overloads stand together.
+/// Overloads are neighbours.
 constexpr Call CALLS[] = {
     call<&Manager::getConstraintsManager>("getConstraintsManager"),
     call<&Manager::RemoveConstraintsManager>(REMOVE),
@@ -143,8 +143,8 @@ bool matchesKind(Kind kind, const Json& argument, bool named) {
     return kind == Kind::BOOLEAN ? argument.is_boolean() : argument.is_string() || argument.is_null();
 }
 
-/// Arranges the arguments in the order of the parameters. @return false when count, names or kinds differ
-bool bindArguments(const Call& call, Json& arguments, std::array<Json*, binding::MOST_PARAMETERS>& bound) {
+/// Binds the arguments to the parameters. @return false if count, names or kinds differ
+bool bindArguments(const Call& call, Json& arguments, std::array<Json*, binding::MAX_PARAMETERS>& bound) {
     const bool named = arguments.is_object();
     if (arguments.size() != call.count) {
         return false;
@@ -167,16 +167,16 @@ bool bindArguments(const Call& call, Json& arguments, std::array<Json*, binding:
     return true;
 }
 
-const std::vector<std::string>& keys(Kind kind) {
+vocabulary::Kind vocabularyOf(Kind kind) {
     switch (kind) {
     case Kind::MODE:
-        return vocabulary::modes();
+        return vocabulary::Kind::MODE;
     case Kind::OUTPUT:
-        return vocabulary::outputs();
+        return vocabulary::Kind::OUTPUT;
     case Kind::OPERATION:
-        return vocabulary::operations();
+        return vocabulary::Kind::OPERATION;
     default:
-        return vocabulary::options();
+        return vocabulary::Kind::OPTION;
     }
 }
 
@@ -189,31 +189,52 @@ bool fitsInt(const Json& number) {
     return value >= Limits::min() && value <= Limits::max();
 }
 
-/// Turns a key name into its number. @return what is wrong with the argument; empty when nothing is
+/// Turns a word into its number. @return what is wrong with the argument; empty if nothing is
 std::string normaliseArgument(const Parameter& parameter, Json& argument) {
     if (isEnumeration(parameter.kind)) {
         if (!argument.is_string()) {
             return fitsInt(argument) ? "" : fmt::format("\"{}\" is out of range", parameter.name);
         }
-        const std::vector<std::string>& known = keys(parameter.kind);
-        const auto& key = argument.get_ref<const std::string&>();
-        const auto found = std::find(known.begin(), known.end(), key);
-        if (found == known.end()) {
-            return fmt::format("\"{}\" has no key name \"{}\"{}", parameter.name, key,
-                               didYouMean(key, known));
+        const vocabulary::Kind kind = vocabularyOf(parameter.kind);
+        const auto& text = argument.get_ref<const std::string&>();
+        const std::optional<int> value = vocabulary::find(kind, text);
+        if (!value) {
+            return vocabulary::unknownWord(kind, text);
         }
-        argument = static_cast<int>(found - known.begin());
+        argument = *value;
     } else if (argument.is_string()) {
         const auto& text = argument.get_ref<const std::string&>();
         if (parameter.kind == Kind::RECORDER && text != "recorder") {
             return "the only recorder is \"recorder\"";
         }
-        // The method would see the text up to the NUL, and answer for another name than the one given.
+        // The method would read the text up to the NUL, and answer for another name than the given one.
         if (parameter.kind == Kind::TEXT && text.find('\0') != std::string::npos) {
             return fmt::format("\"{}\" holds a NUL", parameter.name);
         }
     }
     return {};
+}
+
+/// The type of an argument, as `help` names it.
+std::string_view typeName(Kind kind) {
+    switch (kind) {
+    case Kind::BOOLEAN:
+        return "boolean";
+    case Kind::TEXT:
+    case Kind::BYTES:
+        return "text or null";
+    case Kind::MODE:
+        return "mode";
+    case Kind::OUTPUT:
+        return "output";
+    case Kind::OPERATION:
+        return "operation";
+    case Kind::OPTION:
+        return "option";
+    case Kind::RECORDER:
+        break;
+    }
+    return "\"recorder\" or null";
 }
 
 std::string_view described(Kind kind) {
@@ -243,24 +264,16 @@ std::string described(Overloads overloads) {
     return fmt::format("{} takes {}", overloads.front().name, fmt::join(signatures, " or "));
 }
 
-std::string unknownCall(const std::string& name) {
-    std::vector<std::string> names;
-    for (const Call& call : CALLS) {
-        names.emplace_back(call.name);
-    }
-    return fmt::format("there is no call \"{}\"{}", name, didYouMean(name, names));
-}
-
 } // namespace
 
 PreparedCall prepare(Request& request) {
     PreparedCall prepared;
     const auto found = callsByName().find(request.call);
     if (found == callsByName().end()) {
-        prepared.fault = unknownCall(request.call);
+        prepared.isUnknown = true;
         return prepared;
     }
-    std::array<Json*, binding::MOST_PARAMETERS> bound{};
+    std::array<Json*, binding::MAX_PARAMETERS> bound{};
     const auto overload =
         std::find_if(found->second.begin(), found->second.end(), [&](const Call& candidate) {
             return bindArguments(candidate, request.arguments, bound);
@@ -278,3 +291,25 @@ PreparedCall prepare(Request& request) {
 }
 
 bool isShutdown(const Call& call) { return call.name == REMOVE; }
+
+std::vector<std::string> callNames() {
+    std::vector<std::string> names;
+    for (const auto& [name, overloads] : callsByName()) {
+        names.emplace_back(name);
+    }
+    std::sort(names.begin(), names.end());
+    return names;
+}
+
+Json describeCalls() {
+    Json calls = Json::array();
+    for (const Call& call : CALLS) {
+        Json arguments = Json::array();
+        for (std::size_t i = 0; i < call.count; ++i) {
+            arguments.push_back(
+                {{"name", call.parameters[i].name}, {"type", typeName(call.parameters[i].kind)}});
+        }
+        calls.push_back({{"call", call.name}, {"args", arguments}, {"result", call.result}});
+    }
+    return calls;
+}

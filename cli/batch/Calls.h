@@ -5,17 +5,25 @@
 #include "text/Json.h"
 
 #include <string>
+#include <vector>
 
 /// A call that is ready to be made.
 struct PreparedCall {
-    const binding::Call* call = nullptr; ///< null when the request fits no method
+    const binding::Call* call = nullptr; ///< null if the request fits no method
     binding::Arguments arguments{};
-    std::string fault; ///< why there is no call
+    bool isUnknown = false; ///< no method has this name
+    std::string fault;      ///< what is wrong with the arguments
 };
 
-/// Finds the method, and of overloads the one, that takes the arguments of a request. Key names among the
-/// arguments turn into the numbers that they stand for. The request must outlive the call.
+/// Finds the method, and of overloads the one, that takes the arguments of a request. Words among the arguments are
+/// replaced by the numbers that they stand for. The request must outlive the call.
 [[nodiscard]] PreparedCall prepare(Request& request);
 
-/// Does this call remove the manager, so that nothing may follow it?
+/// Whether this call removes the manager, so that no other may follow.
 [[nodiscard]] bool isShutdown(const binding::Call& call);
+
+/// The names of all methods, sorted.
+[[nodiscard]] std::vector<std::string> callNames();
+
+/// All methods with the names and types of their arguments and the type of their result.
+[[nodiscard]] Json describeCalls();

@@ -1,4 +1,4 @@
-// Buffered reading by hand: iostreams can't tell whether a read would wait, and answers must not wait then.
+// Buffered reading by hand: streams cannot report whether a read would wait, and then answers must be flushed.
 #include "batch/InputLines.h"
 
 #include "term/ExitCode.h"
@@ -31,12 +31,12 @@ std::optional<InputLines::Line> InputLines::next() {
         const std::size_t end = m_buffer.find('\n', m_scanned);
         if (end != std::string::npos) {
             const std::string_view text = std::string_view(m_buffer).substr(m_start, end - m_start);
-            tooLong = tooLong || text.size() > LONGEST;
+            tooLong = tooLong || text.size() > MAX_LENGTH;
             m_start = m_scanned = end + 1;
             return Line{tooLong ? std::string_view() : text, tooLong};
         }
         m_scanned = m_buffer.size();
-        if (m_scanned - m_start > LONGEST) {
+        if (m_scanned - m_start > MAX_LENGTH) {
             tooLong = true;
             m_start = m_scanned;
         }
@@ -74,7 +74,7 @@ bool InputLines::fill() {
     m_buffer.resize(kept + static_cast<std::size_t>(count < 0 ? 0 : count));
     if (count < 0) {
         throw CommandError(ExitCode::FAULT,
-                           std::string("can't read standard input: ") + std::strerror(errno));
+                           std::string("cannot read standard input: ") + std::strerror(errno));
     }
     m_ended = count == 0;
     return !m_ended;

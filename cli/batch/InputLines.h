@@ -6,11 +6,11 @@
 
 class Output;
 
-/// Reads standard input line by line, and flushes the output whenever it has to wait.
+/// The lines of standard input. The output is flushed whenever they have to be waited for.
 class InputLines {
 public:
-    /// What is longer than this is not kept.
-    static constexpr std::size_t LONGEST = std::size_t{16} * 1024 * 1024;
+    /// Longer lines are dropped.
+    static constexpr std::size_t MAX_LENGTH = std::size_t{16} * 1024 * 1024;
 
     struct Line {
         std::string_view text; ///< without its end; valid until the next line is read
@@ -19,13 +19,13 @@ public:
 
     explicit InputLines(Output& output) : m_output(output) {}
 
-    /// The next line; nothing at the end of the input, or when it would have to wait and nobody reads the
-    /// output any more. What stands behind the last line end counts as a line.
-    /// @throw CommandError (FAULT) when the input can't be read
+    /// The next line; nothing at the end of the input, or if it would have to wait after the output was closed. Text
+    /// after the last line end is a line.
+    /// @throw CommandError (FAULT) if the input cannot be read
     [[nodiscard]] std::optional<Line> next();
 
 private:
-    /// Appends what there is to read, waiting for it. @return false where there is nothing more to wait for
+    /// Appends what there is to read, waiting for it. @return false if nothing can follow
     bool fill();
 
     Output& m_output;

@@ -1,4 +1,4 @@
-// Reads requests strictly: a name given twice or not known is a fault of the caller that must not go unseen.
+// Reads requests strictly: a name that is unknown or given twice is an error of the caller, which must be reported.
 #include "batch/RequestReader.h"
 
 #include <fmt/format.h>
@@ -7,17 +7,17 @@
 
 namespace {
 
-/// Far more than any request needs; what is deeper would exhaust the stack where it is written again.
-constexpr std::size_t DEEPEST = 32;
-constexpr std::size_t MOST_NAMES = 64;
+/// Far more than any request needs. Deeper values would exhaust the stack when they are written.
+constexpr std::size_t MAX_DEPTH = 32;
+constexpr std::size_t MAX_NAMES = 64;
 
-/// Builds a value of what the parser reads, and stops at the first fault.
+/// Builds a value from what the parser reads, and stops at the first fault.
 class StrictReader : public nlohmann::json_sax<Json> {
 public:
     [[nodiscard]] Json& value() noexcept { return m_root; }
     [[nodiscard]] const std::string& fault() const noexcept { return m_fault; }
 
-    /// Behind a fault: the request's id, if it was read to its end.
+    /// After a fault: the request's id, if it was read to its end.
     [[nodiscard]] Json takeId() {
         const bool has = m_root.is_object() && m_root.contains("id");
         const bool inside = has && m_open.size() > 1 && m_open[1] == &m_root["id"];
@@ -42,7 +42,7 @@ public:
         if (object.contains(name)) {
             return refuse(fmt::format("the name \"{}\" is given twice", name));
         }
-        if (object.size() == MOST_NAMES) {
+        if (object.size() == MAX_NAMES) {
             return refuse("too many names");
         }
         m_name = std::move(name);
@@ -77,7 +77,7 @@ private:
     }
 
     bool open(Json value) {
-        if (m_open.size() == DEEPEST) {
+        if (m_open.size() == MAX_DEPTH) {
             return refuse("nested too deep");
         }
         m_open.push_back(&place(std::move(value)));
@@ -126,7 +126,7 @@ std::string takeMembers(Json& object, Request& request) {
 
 Request readRequest(std::string_view line) {
     Request request;
-    // To the parser a NUL is the end of the text; what stands behind it would go unseen.
+    // The parser ends at a NUL and would ignore what follows.
     if (line.find('\0') != std::string_view::npos) {
         request.fault = "a NUL byte";
         return request;

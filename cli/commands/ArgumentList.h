@@ -9,6 +9,7 @@
 enum class ValueKind {
     TEXT,
     PATH, ///< a file or a directory: the shell completes it
+    COMMAND,
     DEVICE,
     FLASH,
     FAMILY,

@@ -21,6 +21,7 @@ namespace {
 struct Arguments {
     std::string family;
     std::string glob;
+    bool namesOnly = false;
 };
 
 struct Device {
@@ -29,11 +30,21 @@ struct Device {
     std::optional<IdcodeFinder::Idcode> idcode;
 };
 
-using Devices = std::vector<Device>;
+struct Devices {
+    std::vector<Device> all;
+    bool namesOnly; ///< in text
+};
 
 std::string asText(const Devices& devices, const Terminal& terminal) {
+    if (devices.namesOnly) {
+        std::string names;
+        for (const Device& device : devices.all) {
+            names += terminal.sanitised(device.name) + '\n';
+        }
+        return names;
+    }
     Table table({"DEVICE", "FAMILY", "IDCODE"});
-    for (const Device& device : devices) {
+    for (const Device& device : devices.all) {
         table.add({device.name, device.family, device.idcode ? device.idcode->value : "-"});
     }
     return table.text(terminal);
@@ -41,7 +52,7 @@ std::string asText(const Devices& devices, const Terminal& terminal) {
 
 Json asJson(const Devices& devices) {
     Json list = Json::array();
-    for (const Device& device : devices) {
+    for (const Device& device : devices.all) {
         list.push_back({{"name", device.name},
                         {"family", device.family},
                         {"idcode", device.idcode ? Json(device.idcode->value) : Json()}});
@@ -79,13 +90,14 @@ std::vector<std::string> deviceNames(const std::string& wantedFamily) {
 ExitCode run(Tool& tool, const Arguments& arguments) {
     ConstraintsManager& manager = tool.manager();
     const IdcodeFinder idcodes(manager);
-    Devices devices;
+    Devices devices{{}, arguments.namesOnly};
     for (const std::string& name : deviceNames(arguments.family)) {
         if (matches(arguments.glob, name)) {
-            devices.push_back({name, plain(manager.getPartFamily(name.c_str())), idcodes.find(name)});
+            devices.all.push_back(
+                {name, toStdString(manager.getPartFamily(name.c_str())), idcodes.find(name)});
         }
     }
-    if (devices.empty()) {
+    if (devices.all.empty()) {
         throw CommandError(ExitCode::NO, arguments.glob.empty()
                                              ? "there is no such device"
                                              : fmt::format("no device matches \"{}\"{}", arguments.glob,
@@ -102,6 +114,9 @@ Action declare(ArgumentList& list) {
          .description = "List only the devices of this family",
          .kind = ValueKind::FAMILY,
          .target = &arguments->family},
+        {.name = "--names",
+         .description = "Show only the names, one a line",
+         .target = &arguments->namesOnly},
         {.name = "GLOB",
          .description = "List only the devices whose name matches, in any case; *, ? and [...] are wildcards",
          .kind = ValueKind::DEVICE,

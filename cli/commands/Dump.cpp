@@ -67,7 +67,7 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     }
     TarvikSmokeMgr recorder;
     (manager.*RECORDED.at(arguments.table))(&recorder);
-    return tool.answer(Dump{arguments.table, plain(recorder.text())});
+    return tool.answer(Dump{arguments.table, toStdString(recorder.text())});
 }
 
 Action declare(ArgumentList& list) {

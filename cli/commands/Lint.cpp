@@ -1,4 +1,4 @@
-// `lint`: what is wrong with a database, by file, line and column.
+// `lint`: reports what is wrong with a database, by file, line and column.
 #include "commands/Commands.h"
 
 #include "lint/Report.h"
@@ -12,7 +12,16 @@
 #include <fmt/ranges.h>
 
 #include <algorithm>
+#include <charconv>
+#include <cstddef>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
 #include <memory>
+#include <optional>
+#include <set>
+#include <system_error>
+#include <utility>
 
 namespace {
 
@@ -22,26 +31,26 @@ struct Arguments {
     std::vector<std::string> ignored;
     std::vector<std::string> explained;
     std::string format = "text";
+    std::string baseline;
+    std::optional<std::string> most;
     bool strict = false;
 };
 
-bool beginsWithAny(std::string_view code, const std::vector<std::string>& prefixes) {
-    return std::any_of(prefixes.begin(), prefixes.end(),
-                       [code](const std::string& prefix) { return code.starts_with(prefix); });
-}
+using Rules = std::set<const lint::Rule*>;
 
-/// A prefix that fits no code would silently select, or ignore, nothing.
-void requireCodes(const std::vector<std::string>& prefixes) {
-    for (const std::string& prefix : prefixes) {
-        const bool isKnown =
-            std::any_of(lint::rules().begin(), lint::rules().end(),
-                        [&](const lint::Rule* rule) { return rule->code.starts_with(prefix); });
-        if (prefix.empty() || !isKnown) {
+/// The rules of several codes. A code that matches no rule would silently select, or ignore, nothing.
+Rules rulesOf(const std::vector<std::string>& codes) {
+    Rules all;
+    for (const std::string& code : codes) {
+        const std::vector<const lint::Rule*> found = code == "all" ? lint::rules() : lint::rulesOf(code);
+        if (found.empty()) {
             throw CommandError(
                 ExitCode::FAULT,
-                fmt::format("no code begins with \"{}\"; see: tarvik lint --explain all", prefix));
+                fmt::format("no code begins with \"{}\"; see: tarvik lint --explain all", code));
         }
+        all.insert(found.begin(), found.end());
     }
+    return all;
 }
 
 struct Explanations {
@@ -60,9 +69,10 @@ std::string indented(std::string_view text) {
 std::string asText(const Explanations& explanations, const Terminal& terminal) {
     std::string text;
     for (const lint::Rule* rule : explanations.rules) {
-        const std::string title = fmt::format("{} ({}): {}", rule->code, nameOf(rule->level), rule->title);
+        const std::string title =
+            fmt::format("{} ({}), {}: {}", rule->slug, rule->code, nameOf(rule->severity), rule->title);
         const std::vector<std::string> explanation =
-            lines(wordsOf(std::string(rule->explanation)), terminal.width(), "");
+            lines(wordsOf(rule->explanation()), terminal.width(), "");
         text += fmt::format("{}{}\n\n{}\n", text.empty() ? "" : "\n", terminal.heading(title),
                             fmt::join(explanation, "\n"));
         if (!rule->example.empty()) {
@@ -76,89 +86,166 @@ Json asJson(const Explanations& explanations) {
     Json list = Json::array();
     for (const lint::Rule* rule : explanations.rules) {
         list.push_back({{"code", rule->code},
-                        {"level", nameOf(rule->level)},
+                        {"name", rule->slug},
+                        {"subject", subjectOf(*rule)},
+                        {"level", nameOf(rule->severity)},
                         {"title", rule->title},
-                        {"explanation", rule->explanation},
+                        {"explanation", rule->explanation()},
                         {"example", rule->example}});
     }
     return {{"rules", list}};
 }
 
 ExitCode explain(Tool& tool, const Arguments& arguments) {
-    const bool all =
-        std::find(arguments.explained.begin(), arguments.explained.end(), "all") != arguments.explained.end();
-    if (!all) {
-        requireCodes(arguments.explained);
-    }
+    const Rules wanted = rulesOf(arguments.explained);
     Explanations explanations;
-    for (const lint::Rule* rule : lint::rules()) {
-        if (all || beginsWithAny(rule->code, arguments.explained)) {
-            explanations.rules.push_back(rule);
-        }
-    }
+    std::copy_if(lint::rules().begin(), lint::rules().end(), std::back_inserter(explanations.rules),
+                 [&](const lint::Rule* rule) { return wanted.contains(rule); });
     return tool.answer(explanations);
 }
 
-bool isWanted(std::string_view code, const Arguments& arguments) {
-    return (arguments.selected.empty() || beginsWithAny(code, arguments.selected)) &&
-           !beginsWithAny(code, arguments.ignored);
-}
-
-lint::Report examine(const lint::Model& model, const Arguments& arguments) {
+lint::Report examine(const lint::Model& model, const Rules& selected, const Rules& ignored) {
     lint::Findings findings;
     Progress progress("looking for findings");
     std::size_t done = 0;
-    for (const lint::Group& group : lint::groups()) {
-        if (group.check != nullptr) {
-            group.check(model, findings);
+    for (const lint::RuleSet& set : lint::ruleSets()) {
+        if (set.check != nullptr) {
+            set.check(model, findings);
         }
-        progress.reach(++done, lint::groups().size());
+        progress.reach(++done, lint::ruleSets().size());
     }
-    // Comments first: one that ignores a finding is used, whether or not that finding is wanted.
-    std::vector<lint::Finding> all = lint::withoutIgnored(model, findings);
-    std::erase_if(all,
-                  [&](const lint::Finding& finding) { return !isWanted(finding.rule->code, arguments); });
+    // Comments first: one that suppresses a finding is used, even if that finding is not selected.
+    std::vector<lint::Finding> all = lint::withoutSuppressed(model, findings);
+    std::erase_if(all, [&](const lint::Finding& finding) {
+        return (!selected.empty() && !selected.contains(finding.rule)) || ignored.contains(finding.rule);
+    });
     return {lint::sorted(std::move(all), model)};
+}
+
+/// The fingerprints of a former report.
+std::set<std::string> readBaseline(const std::string& path) {
+    std::ifstream file(path, std::ios::binary);
+    const Json report = file ? Json::parse(file, nullptr, false) : Json();
+    if (!report.is_object() || !report.contains("findings") || !report["findings"].is_array()) {
+        throw CommandError(ExitCode::FAULT,
+                           fmt::format("{} is not a report of: tarvik lint --format json", printable(path)));
+    }
+    std::set<std::string> fingerprints;
+    for (const Json& finding : report["findings"]) {
+        if (finding.is_object() && finding.contains("fingerprint") && finding["fingerprint"].is_string()) {
+            fingerprints.insert(finding["fingerprint"].get<std::string>());
+        }
+    }
+    return fingerprints;
+}
+
+void dropKnown(lint::Report& report, const std::string& baseline) {
+    const std::set<std::string> known = readBaseline(baseline);
+    const std::vector<std::string> names = fingerprints(report.findings);
+    std::vector<lint::Finding> kept;
+    for (std::size_t i = 0; i < names.size(); ++i) {
+        if (!known.contains(names[i])) {
+            kept.push_back(std::move(report.findings[i]));
+        }
+    }
+    report.findings = std::move(kept);
+}
+
+std::size_t readCount(const std::string& text) {
+    std::size_t count = 0;
+    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), count);
+    if (error != std::errc() || end != text.data() + text.size()) {
+        throw CommandError(ExitCode::FAULT, fmt::format("--max needs a number, not \"{}\"", printable(text)));
+    }
+    return count;
+}
+
+/// Shows at most that many findings, and how many there are of each rule.
+ExitCode showSome(Tool& tool, lint::Report report, std::size_t most, ExitCode status) {
+    if (!report.findings.empty()) {
+        tool.note(fmt::format("{}; {} shown\n{}", summary(report), std::min(most, report.findings.size()),
+                              countsByCode(report)));
+    }
+    report.findings.erase(report.findings.begin() +
+                              static_cast<std::ptrdiff_t>(std::min(most, report.findings.size())),
+                          report.findings.end());
+    return tool.answer(report, status);
 }
 
 ExitCode show(Tool& tool, const lint::Report& report, const Arguments& arguments) {
     const bool isRefused =
-        report.count(lint::Level::ERROR) != 0 || (arguments.strict && !report.findings.empty());
+        report.count(lint::Severity::ERROR) != 0 || (arguments.strict && !report.findings.empty());
     const ExitCode status = isRefused ? ExitCode::NO : ExitCode::YES;
     if (arguments.format == "text") {
+        if (arguments.most) {
+            return showSome(tool, report, readCount(*arguments.most), status);
+        }
         if (!report.findings.empty()) {
             tool.note(summary(report));
         }
         return tool.answer(report, status);
     }
-    Json document;
-    if (arguments.format == "sarif") {
-        document = asSarif(report);
+    std::string text;
+    if (arguments.format == "github") {
+        text = asGithub(report);
+    } else if (arguments.format == "sarif") {
+        text = oneLine(asSarif(report)) + '\n';
     } else {
-        document = {{"version", 1}};
+        Json document{{"version", 1}};
         document.update(asJson(report));
         document["messages"] = Json::array();
+        text = oneLine(document) + '\n';
     }
-    tool.output().write(oneLine(document) + '\n');
+    tool.output().write(text);
     tool.output().flush();
     return status;
 }
 
-ExitCode run(Tool& tool, const Arguments& arguments) {
-    requireCodes(arguments.selected);
-    requireCodes(arguments.ignored);
+/// Replaces files by their directories.
+/// @return the files; empty when only directories are given
+std::set<std::string> takeFiles(std::vector<std::string>& paths) {
+    std::set<std::string> files;
+    std::vector<std::string> directories;
+    for (const std::string& path : paths) {
+        std::error_code ignored;
+        const bool isFile = std::filesystem::is_regular_file(path, ignored);
+        const std::string parent = std::filesystem::path(path).parent_path().string();
+        const std::string directory = !isFile ? path : parent.empty() ? "." : parent;
+        if (isFile) {
+            files.insert(
+                (std::filesystem::path(directory) / std::filesystem::path(path).filename()).string());
+        }
+        if (std::find(directories.begin(), directories.end(), directory) == directories.end()) {
+            directories.push_back(directory);
+        }
+    }
+    paths = std::move(directories);
+    return files;
+}
+
+ExitCode run(Tool& tool, Arguments arguments) {
+    const Rules selected = rulesOf(arguments.selected);
+    const Rules ignored = rulesOf(arguments.ignored);
     if (!arguments.explained.empty()) {
         return explain(tool, arguments);
     }
+    const std::set<std::string> files = takeFiles(arguments.directories);
     if (arguments.directories.empty()) {
         tool.openDatabase();
     } else {
         ::openDatabase(arguments.directories);
     }
     const lint::Model model(AcdLines::ofDatabase());
-    // What the readers said of the lines is found again, with a code.
+    // The rules report the readers' faults, too, with a code.
     static_cast<void>(tool.messages().take());
-    return show(tool, examine(model, arguments), arguments);
+    lint::Report report = examine(model, selected, ignored);
+    std::erase_if(report.findings, [&files](const lint::Finding& finding) {
+        return !files.empty() && !files.contains(std::string(finding.location.file->path()));
+    });
+    if (!arguments.baseline.empty()) {
+        dropKnown(report, arguments.baseline);
+    }
+    return show(tool, report, arguments);
 }
 
 Action declare(ArgumentList& list) {
@@ -166,8 +253,8 @@ Action declare(ArgumentList& list) {
     list = {
         {.name = "DIR",
          .description =
-             "The directories of the database, the uppermost layer first; without them, the database "
-             "that the other commands use",
+             "The directories of the database, the uppermost layer first, or one of its files; without them, "
+             "the database that the other commands use",
          .kind = ValueKind::PATH,
          .target = &arguments->directories},
         {.name = "--select",
@@ -193,8 +280,17 @@ Action declare(ArgumentList& list) {
          .value = "FORMAT",
          .description = "The form of the result",
          .kind = ValueKind::CHOICE,
-         .choices = {"text", "json", "sarif"},
+         .choices = {"text", "json", "sarif", "github"},
          .target = &arguments->format},
+        {.name = "--baseline",
+         .value = "FILE",
+         .description = "Do not report the findings of this former report, written by --format json",
+         .kind = ValueKind::PATH,
+         .target = &arguments->baseline},
+        {.name = "--max",
+         .value = "N",
+         .description = "Print at most N findings, and how many there are of each rule",
+         .target = &arguments->most},
         {.name = "--strict",
          .description = "Exit with status 1 for warnings, too",
          .target = &arguments->strict},

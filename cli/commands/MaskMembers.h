@@ -42,17 +42,27 @@ struct MaskMembers {
     MaskMembers members{std::move(device), std::move(asked), "operations", mask, {}, {}};
     for (const TARVIKNS::OP_TYPE operation : questions::operations(manager, mask)) {
         members.keys.push_back(vocabulary::key(operation));
-        members.names.push_back(vocabulary::operationNames().at(static_cast<std::size_t>(operation)));
+        members.names.push_back(vocabulary::displayName(operation));
     }
     return members;
 }
 
-/// Shows the members. An empty answer is explained, so that it is not taken for a failure.
+/// " in mode SS through SVF"
+[[nodiscard]] inline std::string circumstances(const Json& asked) {
+    std::string text;
+    if (asked.contains("mode")) {
+        text += " in mode " + asked["mode"].get<std::string>();
+    }
+    return text + " through " + asked["output"].get<std::string>();
+}
+
+/// Shows the members. An empty answer is a no, with a note so that it is not taken for a failure.
 [[nodiscard]] inline ExitCode showMembers(Tool& tool, const MaskMembers& members) {
     questions::requireKnown(tool.manager(), members.device);
-    const ExitCode status = tool.answer(members);
+    const ExitCode status = tool.answer(members, members.keys.empty() ? ExitCode::NO : ExitCode::YES);
     if (members.keys.empty()) {
-        tool.note(fmt::format("\"{}\" offers no {} there", members.device, members.kind));
+        tool.note(
+            fmt::format("{} allows no {}{}", members.device, members.kind, circumstances(members.asked)));
     }
     return status;
 }

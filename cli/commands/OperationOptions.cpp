@@ -1,4 +1,4 @@
-// `operation-options`: the options that an operation of a device carries in a mode.
+// `operation-options`: the options that an operation of a device has in a mode.
 #include "commands/Commands.h"
 
 #include "commands/CommonArguments.h"
@@ -30,7 +30,7 @@ struct OperationOptions {
 std::string asText(const OperationOptions& answer, const Terminal& terminal) {
     std::string text;
     for (const std::string& option : answer.options) {
-        text += terminal.shown(option) + '\n';
+        text += terminal.sanitised(option) + '\n';
     }
     return text;
 }
@@ -50,13 +50,13 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     OperationOptions answer{arguments.device, operation, vocabulary::key(mode), {}};
     for (const StringBase& option :
          manager.getDeviceOperationOptions(arguments.device.c_str(), operation.c_str(), mode)) {
-        answer.options.push_back(plain(option));
+        answer.options.push_back(toStdString(option));
     }
     questions::requireKnown(manager, arguments.device);
-    const ExitCode status = tool.answer(answer);
+    const ExitCode status = tool.answer(answer, answer.options.empty() ? ExitCode::NO : ExitCode::YES);
     if (answer.options.empty()) {
-        tool.note(fmt::format("{} of \"{}\" carries no options in mode {}", operation, arguments.device,
-                              answer.mode));
+        tool.note(
+            fmt::format("{} of {} has no options in mode {}", operation, arguments.device, answer.mode));
     }
     return status;
 }

@@ -29,7 +29,7 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
                {"package", arguments.package ? Json(*arguments.package) : Json()}};
     MaskMembers members{arguments.device, std::move(asked), "options", mask, {}, {}};
     for (const TARVIKNS::PROGRAM_OPTION option : questions::options(manager, mask)) {
-        members.keys.push_back(vocabulary::options().at(static_cast<std::size_t>(option)));
+        members.keys.push_back(vocabulary::key(option));
     }
     return showMembers(tool, members);
 }

@@ -28,7 +28,7 @@ std::vector<std::string> values(ConstraintsManager& manager, const char* device,
     std::vector<std::string> all;
     if (!flash) {
         for (const StringBase& one : manager.getDeviceStringProperties(device, key)) {
-            all.push_back(plain(one));
+            all.push_back(toStdString(one));
         }
     }
     return all.empty() ? std::vector<std::string>{value} : all;

@@ -12,30 +12,19 @@
 
 namespace {
 
-struct Mode {
-    std::string key;
-    std::vector<std::string> others;
-};
+using vocabulary::Kind;
+using vocabulary::Word;
 
-/// An output or an option: a database can name some of them only.
-struct Named {
-    std::string key;
-    bool inDatabases;
-};
+struct Words {};
 
-struct Operation {
-    std::string key;
-    std::string name;
-};
-
-struct Words {
-    std::vector<Mode> modes;
-    std::vector<Named> outputs;
-    std::vector<Operation> operations;
-    std::vector<Named> options;
-};
-
-bool readsOption(const std::string& key) {
+/// Does a database name the value by its key? Some outputs and options are written only.
+bool isReadFromDatabases(Kind kind, int value) {
+    const std::string& key = vocabulary::keys(kind).at(static_cast<std::size_t>(value));
+    if (kind == Kind::OUTPUT) {
+        const auto output = static_cast<TARVIKNS::OUTPUT_TYPE>(value);
+        return output != TARVIKNS::OUTPUT_TYPE::NONE &&
+               ConstraintsManager::cableString2Type(key.c_str()) == output;
+    }
     try {
         static_cast<void>(ConstraintsManager::optionString2Type(key.c_str()));
         return true;
@@ -44,75 +33,60 @@ bool readsOption(const std::string& key) {
     }
 }
 
-Words words() {
-    Words words;
-    for (const std::string& key : vocabulary::modes()) {
-        words.modes.push_back(
-            {key, vocabulary::otherModeTexts(static_cast<TARVIKNS::MODE_TYPE>(words.modes.size()))});
-    }
-    for (const std::string& key : vocabulary::outputs()) {
-        const auto output = static_cast<TARVIKNS::OUTPUT_TYPE>(words.outputs.size());
-        const bool read = output != TARVIKNS::OUTPUT_TYPE::NONE &&
-                          ConstraintsManager::cableString2Type(key.c_str()) == output;
-        words.outputs.push_back({key, read});
-    }
-    for (const std::string& key : vocabulary::operations()) {
-        words.operations.push_back({key, vocabulary::operationNames().at(words.operations.size())});
-    }
-    for (const std::string& key : vocabulary::options()) {
-        words.options.push_back({key, readsOption(key)});
-    }
-    return words;
-}
-
-std::string asText(const std::vector<Named>& all, const char* heading, const Terminal& terminal) {
-    Table table({"", heading, "IN DATABASES"});
-    for (std::size_t value = 0; value < all.size(); ++value) {
-        table.add({std::to_string(value), all[value].key, all[value].inDatabases ? "yes" : "no"});
+std::string tableOf(Kind kind, Table::Row headings, const Terminal& terminal) {
+    Table table(std::move(headings));
+    int value = 0;
+    for (const Word& word : vocabulary::words(kind)) {
+        Table::Row row{std::to_string(value), word.key};
+        if (kind == Kind::OUTPUT || kind == Kind::OPTION) {
+            row.emplace_back(isReadFromDatabases(kind, value) ? "yes" : "no");
+        }
+        if (kind == Kind::MODE) {
+            row.push_back(fmt::format("{}", fmt::join(word.others, " ")));
+        }
+        if (kind != Kind::OPTION) {
+            row.push_back(word.name);
+        }
+        table.add(std::move(row));
+        ++value;
     }
     return table.text(terminal);
 }
 
-std::string asText(const Words& words, const Terminal& terminal) {
-    Table modes({"", "MODE", "ALSO"});
-    for (std::size_t value = 0; value < words.modes.size(); ++value) {
-        const Mode& mode = words.modes[value];
-        modes.add({std::to_string(value), mode.key, fmt::format("{}", fmt::join(mode.others, " "))});
-    }
-    Table operations({"", "OPERATION", "DISPLAY NAME"});
-    for (std::size_t value = 0; value < words.operations.size(); ++value) {
-        const Operation& operation = words.operations[value];
-        operations.add({std::to_string(value), operation.key, operation.name});
-    }
-    return modes.text(terminal) + '\n' + asText(words.outputs, "OUTPUT", terminal) + '\n' +
-           operations.text(terminal) + '\n' + asText(words.options, "OPTION", terminal);
+std::string asText(const Words& /*all*/, const Terminal& terminal) {
+    return tableOf(Kind::MODE, {"", "MODE", "ALSO", "DISPLAY NAME"}, terminal) + '\n' +
+           tableOf(Kind::OUTPUT, {"", "OUTPUT", "IN DATABASES", "DISPLAY NAME"}, terminal) + '\n' +
+           tableOf(Kind::OPERATION, {"", "OPERATION", "DISPLAY NAME"}, terminal) + '\n' +
+           tableOf(Kind::OPTION, {"", "OPTION", "IN DATABASES"}, terminal);
 }
 
-Json asJson(const std::vector<Named>& all) {
+Json listOf(Kind kind) {
     Json list = Json::array();
-    for (const Named& one : all) {
-        list.push_back({{"value", list.size()}, {"key", one.key}, {"inDatabases", one.inDatabases}});
+    for (const Word& word : vocabulary::words(kind)) {
+        const int value = static_cast<int>(list.size());
+        Json object{{"value", value}, {"key", word.key}};
+        if (kind == Kind::MODE) {
+            object["also"] = word.others;
+        }
+        if (kind == Kind::OUTPUT || kind == Kind::OPTION) {
+            object["inDatabases"] = isReadFromDatabases(kind, value);
+        }
+        if (kind != Kind::OPTION) {
+            object["name"] = word.name;
+        }
+        list.push_back(std::move(object));
     }
     return list;
 }
 
-Json asJson(const Words& words) {
-    Json modes = Json::array();
-    for (const Mode& mode : words.modes) {
-        modes.push_back({{"value", modes.size()}, {"key", mode.key}, {"also", mode.others}});
-    }
-    Json operations = Json::array();
-    for (const Operation& operation : words.operations) {
-        operations.push_back(
-            {{"value", operations.size()}, {"key", operation.key}, {"name", operation.name}});
-    }
-    return {{"modes", modes},
-            {"outputs", asJson(words.outputs)},
-            {"operations", operations},
-            {"options", asJson(words.options)}};
+Json asJson(const Words& /*all*/) {
+    return {{"modes", listOf(Kind::MODE)},
+            {"outputs", listOf(Kind::OUTPUT)},
+            {"operations", listOf(Kind::OPERATION)},
+            {"options", listOf(Kind::OPTION)}};
 }
 
-ExitCode run(Tool& tool) { return tool.answer(words()); }
+ExitCode run(Tool& tool) { return tool.answer(Words{}); }
 
 } // namespace
 

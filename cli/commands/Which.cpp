@@ -114,7 +114,7 @@ Verdict askForProperty(Tool& tool, ConstraintsManager& manager, const Question& 
     }
     const std::size_t issued = tool.messages().count();
     const Verdict verdict = why::ask(manager, question);
-    tool.messages().forgetBehind(issued);
+    tool.messages().truncate(issued);
     return verdict;
 }
 

@@ -3,15 +3,12 @@
 
 #include "commands/CommonArguments.h"
 #include "explain/Explanation.h"
+#include "explain/Inquiry.h"
 #include "model/Catalogue.h"
 #include "model/Vocabulary.h"
 #include "query/Tool.h"
-#include "term/Table.h"
-#include "text/Suggest.h"
 
 #include <tarvik/ConstraintsManager.h>
-
-#include <fmt/format.h>
 
 #include <algorithm>
 #include <memory>
@@ -96,17 +93,6 @@ Question::Kind kindOf(const Arguments& arguments) {
     throw CommandError(ExitCode::FAULT, usage);
 }
 
-TARVIKNS::PROGRAM_OPTION readOption(const std::string& text) {
-    const std::vector<std::string>& keys = vocabulary::options();
-    const auto found = std::find(keys.begin(), keys.end(), text);
-    if (found == keys.end()) {
-        throw CommandError(ExitCode::FAULT,
-                           fmt::format("unknown option \"{}\"{}\noptions, in upper case:\n{}", text,
-                                       didYouMean(text, keys), wrapped(keys, 2)));
-    }
-    return static_cast<TARVIKNS::PROGRAM_OPTION>(found - keys.begin());
-}
-
 Question read(const Arguments& arguments) {
     Question question;
     question.kind = kindOf(arguments);
@@ -125,7 +111,7 @@ Question read(const Arguments& arguments) {
             vocabulary::readOperation(arguments.operation ? *arguments.operation : *arguments.bsdl);
     }
     if (arguments.option) {
-        question.option = readOption(*arguments.option);
+        question.option = vocabulary::readOption(*arguments.option);
     }
     return question;
 }
@@ -144,19 +130,21 @@ ExitCode status(Verdict verdict) {
 
 ExitCode run(Tool& tool, const Arguments& arguments) {
     const Question question = read(arguments);
-    ConstraintsManager& manager = tool.manager();
-    const Verdict verdict = why::ask(manager, question);
-    const bool known = !arguments.device || manager.isKorvelDevice(question.device.c_str());
+    tool.openDatabase();
+    const why::Inquiry asked(question);
+    const bool isKnown = !arguments.device || asked.manager->isKorvelDevice(question.device.c_str());
 
-    const why::StartUp facts = why::readStartUp();
-    why::Answer answer{question, verdict, why::explain(facts, question)};
-    if (verdict == Verdict::NO) {
-        for (why::Step& step : why::alternatives(facts, question)) {
+    // Further questions serve the explanation: what the manager reports about them is not about the user's question.
+    const std::size_t issued = tool.messages().count();
+    why::Answer answer{question, asked.verdict, why::explain(question)};
+    if (asked.verdict == Verdict::NO) {
+        for (why::Step& step : why::alternatives(question)) {
             answer.explanation.steps.push_back(std::move(step));
         }
     }
-    const ExitCode result = tool.answer(answer, status(verdict));
-    if (!known) {
+    tool.messages().forgetBehind(issued);
+    const ExitCode result = tool.answer(answer, status(asked.verdict));
+    if (!isKnown) {
         tool.note(catalogue::unknownDevice(question.device).what());
     }
     if (!answer.agrees()) {

@@ -42,7 +42,7 @@ std::string work(const std::vector<std::string>& layers, const Interview::Reache
     } catch (const CommandError& failure) {
         return said + failure.what() + FAULT;
     } catch (const TarvikException& fault) {
-        return said + "the database can't be read: " + fault.what() + FAULT;
+        return said + "the database can't be read: " + fault.typeName() + FAULT;
     }
 }
 

@@ -147,7 +147,7 @@ Answers Interview::answersApart(const Asking& ask) {
         try {
             return packed(ask());
         } catch (const TarvikException& fault) {
-            return packed(Answers{{{"faults"}, {fault.what()}}});
+            return packed(Answers{{{"faults"}, {fault.typeName()}}});
         }
     }));
 }

@@ -1,9 +1,9 @@
 // The questions that a manager is asked: whole topics at a time.
 #include "diff/SnapshotCollector.h"
 
-#include "lint/Keys.h"
 #include "model/Catalogue.h"
 #include "model/Multiboot.h"
+#include "model/Schema.h"
 #include "model/Vocabulary.h"
 #include "query/Properties.h"
 #include "text/Suggest.h"
@@ -75,7 +75,7 @@ Answers Interview::general() {
     for (const std::string& family : catalogue::list("spi.acd", "DEVICE_FAMILY")) {
         flashFamilies.insert(family);
         // The properties of classes are answers of their flashes; those of others speak for the name alone.
-        if (!lint::isClass(family)) {
+        if (!schema::isFlashClass(family)) {
             addFlashProperties(answers, family, "flash family " + family + ": property ");
         }
     }

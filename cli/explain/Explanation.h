@@ -1,7 +1,7 @@
 #pragma once
 
 #include "explain/Question.h"
-#include "explain/StartUp.h"
+#include "model/Records.h"
 #include "term/Terminal.h"
 
 #include <optional>
@@ -10,28 +10,31 @@
 
 namespace why {
 
+using catalogue::SourceText;
+
 /// One link of the chain that leads to an answer.
 struct Step {
     /// "name", "family", "table", "rule", "record" (which decides), "absent" (what decides is missing), "note" (an
-    /// oddity on the way), "fault", or behind a no "instead" and "differs".
+    /// oddity on the way), "fault", or after a no "instead" and "differs".
     std::string topic;
     std::string text;
-    std::optional<Piece> place; ///< where it stands, with the words that stand there
+    std::optional<SourceText> place{}; ///< the text of the database, and where it is written
+    catalogue::Shadows shadows{};      ///< what lower layers have in its place
 };
 
 struct Explanation {
     Verdict verdict = Verdict::NO; ///< that the steps come to
     std::vector<Step> steps;
 
-    /// The last record that had a say; null when there was none.
-    [[nodiscard]] const Piece* decidingRecord() const;
+    /// The last record that decides something; null when there is none.
+    [[nodiscard]] const SourceText* decidingRecord() const;
 };
 
-/// Follows the records to an answer, apart from the manager.
-[[nodiscard]] Explanation explain(const StartUp& facts, const Question& question);
+/// Asks a fresh manager, and finds what decides among the records that it read.
+[[nodiscard]] Explanation explain(const Question& question);
 
 /// What comes nearest to a question that was answered by no.
-[[nodiscard]] std::vector<Step> alternatives(const StartUp& facts, const Question& question);
+[[nodiscard]] std::vector<Step> alternatives(const Question& question);
 
 /// What is shown: the manager's verdict, and how the records lead there.
 struct Answer {

@@ -38,7 +38,7 @@ std::string clipped(const std::string& text, std::size_t room) {
 }
 
 /// "file:line:column: fragment" behind a lead, the fragment on a line of its own where the path leaves no room.
-std::string placeText(const char* lead, const Piece& place, const Terminal& terminal) {
+std::string placeText(const char* lead, const SourceText& place, const Terminal& terminal) {
     const std::size_t room = std::max(terminal.width(), LEAST_WIDTH) - INDENT;
     const std::string indent(INDENT, ' ');
     const std::string origin = lead + catalogue::asText(place.origin) + ':';
@@ -69,7 +69,7 @@ std::string asText(const Answer& answer, const Terminal& terminal) {
         text += stepText(step, terminal);
         if (step.place) {
             text += placeText("", *step.place, terminal);
-            for (const catalogue::Shadow& shadow : step.place->shadows) {
+            for (const catalogue::Shadow& shadow : step.shadows) {
                 text += placeText("shadows ", {shadow.text, shadow.origin}, terminal);
             }
         }
@@ -84,8 +84,8 @@ Json asJson(const Answer& answer) {
         if (step.place) {
             object.update(catalogue::asJson(step.place->origin));
             object["fragment"] = step.place->text;
-            if (!step.place->shadows.empty()) {
-                object["shadows"] = catalogue::asJson(step.place->shadows);
+            if (!step.shadows.empty()) {
+                object["shadows"] = catalogue::asJson(step.shadows);
             }
         }
         steps.push_back(std::move(object));

@@ -14,26 +14,17 @@ using Kind = Question::Kind;
 
 bool isInMask(int mask, int value) { return (static_cast<unsigned>(mask) >> value & 1U) != 0; }
 
-/// The one value that the manager gives is asked for first: only that question finds a flash's property, or that
-/// of a family's own family.
+/// A property's values are those that the manager gives as a set. It is asked for the single value first: for a flash
+/// only that question finds a property, and for others it reports that there is none.
 bool hasProperty(ConstraintsManager& manager, const Question& question) {
     const char* const device = question.device.c_str();
     const char* const key = question.property.c_str();
     const char* const value = manager.getDeviceStringProperty(device, key);
-    const bool flash = manager.isSpiDevice(device);
-    if (value == nullptr || (flash && *value == '\0')) {
-        return false;
+    if (manager.isSpiDevice(device)) {
+        return *value != '\0' && (!question.value || *question.value == value);
     }
-    if (!question.value) {
-        return true;
-    }
-    if (!flash) {
-        const ConstraintsManager::TextSet& values = manager.getDeviceStringProperties(device, key);
-        if (!values.empty()) {
-            return values.count(*question.value) != 0;
-        }
-    }
-    return *question.value == value;
+    const ConstraintsManager::TextSet& values = manager.getDeviceStringProperties(device, key);
+    return question.value ? values.count(*question.value) != 0 : !values.empty();
 }
 
 bool answer(ConstraintsManager& manager, const Question& question) {

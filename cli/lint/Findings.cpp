@@ -1,13 +1,13 @@
-// Gathers findings, puts them in order, and names them in a way that outlives edits elsewhere in the file.
+// Collects findings, sorts them, and identifies them independently of edits elsewhere in the file.
 #include "lint/Findings.h"
 
 #include "text/Suggest.h"
 
-#include <fmt/format.h>
-
 #include <algorithm>
 #include <cstdint>
+#include <iterator>
 #include <map>
+#include <set>
 #include <tuple>
 #include <utility>
 
@@ -26,15 +26,15 @@ std::string_view withoutBlanks(std::string_view text) {
     return text.substr(first, text.find_last_not_of(" \t\r") + 1 - first);
 }
 
-/// What a finding's fingerprint is made from, its ordinal aside: of a long line what is around the finding.
+/// The source of a finding's fingerprint, without its ordinal: of a long line the part around the finding.
 std::string subject(const Finding& finding) {
-    constexpr std::size_t LONGEST = 400;
+    constexpr std::size_t MAX_LENGTH = 400;
     std::string text(finding.rule->code);
-    text.append("\n").append(fileName(finding.place.file->path())).append("\n");
-    std::string_view source = finding.place.file->source(finding.place.line);
-    if (source.size() > LONGEST) {
-        const std::size_t at = std::min<std::size_t>(finding.place.column - 1, source.size());
-        source = source.substr(at - std::min(at, LONGEST / 2), LONGEST);
+    text.append("\n").append(fileName(finding.location.file->path())).append("\n");
+    std::string_view source = finding.location.file->source(finding.location.line);
+    if (source.size() > MAX_LENGTH) {
+        const std::size_t at = std::min<std::size_t>(finding.location.column - 1, source.size());
+        source = source.substr(at - std::min(at, MAX_LENGTH / 2), MAX_LENGTH);
     }
     return text.append(withoutBlanks(source));
 }
@@ -50,19 +50,29 @@ std::uint64_t hash(std::string_view text) {
 
 } // namespace
 
-void Findings::add(const Rule& rule, const Token& token, std::string text) {
-    // What goes on in the next line is marked up to the end of its first.
-    const std::size_t lineLength = token.place.file->source(token.place.line).size();
-    const std::size_t behind = lineLength - std::min<std::size_t>(lineLength, token.place.column - 1);
-    m_findings.push_back({&rule, token.place, std::min(token.text.size(), behind), std::move(text)});
+void Findings::addText(const Rule& rule, const Token& token, std::string text) {
+    // A text that continues in the next line is marked up to the end of its first line.
+    const SourceLocation& location = token.location;
+    const std::size_t lineLength = location.file->source(location.line).size();
+    const std::size_t rest = lineLength - std::min<std::size_t>(lineLength, location.column - 1);
+    m_findings.push_back({&rule, location, std::min(token.text.size(), rest), std::move(text)});
 }
 
-std::string Findings::didYouMean(std::string_view text, const std::vector<std::string>& candidates) {
-    if (candidates.size() > m_comparisons) {
+std::string Findings::didYouMean(std::string_view text, const std::vector<std::string>& candidates,
+                                 const std::vector<Token>& used) {
+    const std::size_t cost = candidates.size() + used.size();
+    if (cost > m_comparisonsLeft) {
         return {};
     }
-    m_comparisons -= candidates.size();
-    return ::didYouMean(text, candidates);
+    m_comparisonsLeft -= cost;
+    std::set<std::string_view> names;
+    for (const Token& token : used) {
+        names.insert(token.text);
+    }
+    std::vector<std::string> unused;
+    std::copy_if(candidates.begin(), candidates.end(), std::back_inserter(unused),
+                 [&names](const std::string& candidate) { return !names.contains(candidate); });
+    return ::didYouMean(text, unused);
 }
 
 std::vector<Finding> sorted(std::vector<Finding> findings, const Model& model) {
@@ -70,20 +80,20 @@ std::vector<Finding> sorted(std::vector<Finding> findings, const Model& model) {
     for (const AcdLines& file : model.files()) {
         order.emplace(&file, order.size());
     }
-    const auto place = [&order](const Finding& finding) {
-        return std::tuple(order.at(finding.place.file), finding.place.line, finding.place.column,
+    const auto location = [&order](const Finding& finding) {
+        return std::tuple(order.at(finding.location.file), finding.location.line, finding.location.column,
                           finding.rule->code);
     };
-    std::stable_sort(findings.begin(), findings.end(), [&place](const Finding& left, const Finding& right) {
-        return place(left) < place(right);
-    });
+    std::stable_sort(
+        findings.begin(), findings.end(),
+        [&location](const Finding& left, const Finding& right) { return location(left) < location(right); });
     return findings;
 }
 
 std::string quoted(std::string_view text) {
-    constexpr std::size_t LONGEST = 60;
-    return text.size() <= LONGEST ? fmt::format("\"{}\"", text)
-                                  : fmt::format("\"{}...\"", text.substr(0, LONGEST));
+    constexpr std::size_t MAX_LENGTH = 60;
+    return text.size() <= MAX_LENGTH ? fmt::format("\"{}\"", text)
+                                     : fmt::format("\"{}...\"", text.substr(0, MAX_LENGTH));
 }
 
 std::vector<std::string> fingerprints(const std::vector<Finding>& findings) {

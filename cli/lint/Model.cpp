@@ -1,7 +1,7 @@
-// Makes the model that all rules look at: files merged as the readers merge them, every piece with its place.
+// Builds the model that all rules check: files merged as the readers merge them, each text with its location.
 #include "lint/Model.h"
 
-#include "lint/Keys.h"
+#include "model/RecordSplitter.h"
 #include "text/Suggest.h"
 
 #include <algorithm>
@@ -13,107 +13,188 @@ namespace lint {
 
 namespace {
 
-void addList(std::set<std::string_view>& names, const Entry* entry) {
-    if (entry != nullptr) {
-        for (const Token& item : entry->list()) {
-            names.insert(item.text);
-        }
+std::set<std::string_view> texts(const std::vector<Token>& list) {
+    std::set<std::string_view> names;
+    for (const Token& item : list) {
+        names.insert(item.text);
     }
+    return names;
 }
 
 /// The values of property PACKAGES among the keys of a section.
 std::optional<std::vector<Token>> packagesOf(const Section& section) {
-    for (const auto& [key, firstValue] : {std::pair("PROPERTIES", 2), std::pair("PROPERTY", 1)}) {
-        const Entry* const entry = section.find(key);
-        if (entry == nullptr) {
-            continue;
-        }
-        for (auto record = entry->records.rbegin(); record != entry->records.rend(); ++record) {
-            if (record->fields.front().text == "PACKAGES") {
-                const auto first = std::min<std::ptrdiff_t>(firstValue, std::ssize(record->fields));
-                return std::vector<Token>(record->fields.begin() + first, record->fields.end());
+    // PROPERTIES is read last, so it counts.
+    for (const schema::PropertyKey key : {schema::PROPERTY_KEYS[1], schema::PROPERTY_KEYS[0]}) {
+        const std::vector<Item>& items = section.items(key.key);
+        for (auto item = items.rbegin(); item != items.rend(); ++item) {
+            if (item->fields.front().text == schema::PACKAGES) {
+                const auto first = static_cast<std::ptrdiff_t>(std::min(key.firstValue, item->fields.size()));
+                return std::vector<Token>(item->fields.begin() + first, item->fields.end());
             }
         }
     }
     return std::nullopt;
 }
 
+constexpr std::string_view SEPARATORS = ",:";
+
+std::string_view itemAt(std::string_view text, std::size_t offset, char separator) {
+    return text.substr(offset, text.find(separator, offset) - offset);
+}
+
 } // namespace
 
-const std::vector<Token>& Entry::list() const {
+const std::vector<Token>& Value::list() const {
     static const std::vector<Token> none;
-    return records.empty() ? none : records.front().fields;
+    return items.empty() ? none : items.front().fields;
 }
 
-void Entry::assign(const AcdLines& file, const AcdLines::Line& line) {
+void Value::assign(const AcdLines& file, const AcdLines::Line& line, char separator) {
+    const AcdLines::SourceSpan& first = line.spans.front();
+    const Token value{line.value, {&file, first.line, first.column}};
     if (line.kind == AcdLines::Kind::ASSIGNMENT) {
-        m_text.clear();
-        m_fragments.clear();
-        tooLong.clear();
-    }
-    if (line.value.size() > LONGEST - m_text.size()) {
-        const AcdLines::SourceSpan& first = line.spans.front();
-        tooLong.push_back({line.value, {&file, first.line, first.column}});
-        return;
-    }
-    key = {line.name, {&file, line.line, line.column}};
-    for (const AcdLines::SourceSpan& fragment : line.spans) {
-        m_fragments.push_back({m_text.size() + fragment.offset, {&file, fragment.line, fragment.column}});
-    }
-    m_text += line.value;
-}
-
-void Entry::split(Shape wanted) {
-    shape = wanted;
-    if (m_text.empty() || shape == Shape::NONE) {
-        return;
-    }
-    if (shape == Shape::LIST) {
-        records.push_back({token(0, m_text.size()), pieces(0, m_text.size(), ',')});
-        return;
-    }
-    const std::vector<Token> items = pieces(0, m_text.size(), ':');
-    records.reserve(items.size());
-    for (const Token& item : items) {
-        const auto begin = static_cast<std::size_t>(item.text.data() - m_text.data());
-        records.push_back({item, pieces(begin, begin + item.text.size(), ',')});
-    }
-}
-
-Token Entry::token(std::size_t offset, std::size_t length) const {
-    const auto behind = std::upper_bound(
-        m_fragments.begin(), m_fragments.end(), offset,
-        [](std::size_t wanted, const Fragment& fragment) { return wanted < fragment.offset; });
-    const Fragment& fragment = *std::prev(behind);
-    Place place = fragment.place;
-    place.column += static_cast<unsigned>(offset - fragment.offset);
-    return {std::string_view(m_text).substr(offset, length), place};
-}
-
-std::vector<Token> Entry::pieces(std::size_t begin, std::size_t end, char separator) {
-    const std::string_view text = std::string_view(m_text).substr(begin, end - begin);
-    std::vector<Token> all;
-    // Databases are mostly pieces: growing step by step would take twice the memory.
-    all.reserve(
-        std::min(MOST, static_cast<std::size_t>(std::count(text.begin(), text.end(), separator)) + 1));
-    for (std::size_t start = begin; start <= end;) {
-        const std::size_t next = std::min(m_text.find(separator, start), end);
-        if (all.size() == MOST) {
-            unseen.push_back(token(start, next - start));
-            break;
+        if (!m_source.text.empty() && m_source.key.location.file != &file) {
+            m_replaced.push_back(std::move(m_source));
+            isReplaced = true;
         }
-        all.push_back(token(start, next - start));
-        start = next + 1;
+        m_source = {};
+        isAssigned = true;
+        oversizedAppends.clear();
+        joinedAppends.clear();
     }
-    return all;
+    if (line.value.size() > MAX_LENGTH - m_source.text.size()) {
+        oversizedAppends.push_back(value);
+        return;
+    }
+    key = m_source.key = {line.name, {&file, line.line, line.column}};
+    if (!m_source.text.empty() && !line.value.empty() &&
+        SEPARATORS.find(m_source.text.back()) == SEPARATORS.npos &&
+        SEPARATORS.find(line.value.front()) == SEPARATORS.npos) {
+        joinedAppends.push_back(value);
+        m_source.text += separator;
+    }
+    for (const AcdLines::SourceSpan& span : line.spans) {
+        m_source.spans.push_back({m_source.text.size() + span.offset, {&file, span.line, span.column}});
+    }
+    m_source.text += line.value;
 }
 
-const Entry* Section::find(std::string_view key) const {
-    const auto found = entries.find(key);
-    return found == entries.end() ? nullptr : &found->second;
+void Value::split(schema::File file, std::string_view name, schema::Shape wanted) {
+    shape = wanted;
+    if (shape == schema::Shape::NONE) {
+        return;
+    }
+    items = itemsOf(m_source, truncatedItems);
+    if (!items.empty()) {
+        restoreHidden(file, name);
+    }
 }
 
-Token Family::place() const { return startOf(*files.front()); }
+std::vector<Item> Value::itemsOf(const SourceText& source, std::vector<Token>& truncated) const {
+    std::vector<Item> found;
+    const std::string_view text = source.text;
+    const auto addItem = [&](std::string_view item, std::size_t offset) {
+        std::vector<Token> fields;
+        // Databases are mostly fields: growing step by step would take twice the memory.
+        fields.reserve(
+            std::min(AcdText::MAX_PARTS,
+                     static_cast<std::size_t>(std::count(item.begin(), item.end(), splitter::FIELDS)) + 1));
+        const std::size_t end =
+            splitter::forEachField(item, splitter::FIELDS, [&](std::string_view field, std::size_t at) {
+                fields.push_back(source.token(field, offset + at));
+            });
+        if (end != text.npos) {
+            truncated.push_back(source.token(itemAt(item, end, splitter::FIELDS), offset + end));
+        }
+        found.push_back({source.token(item, offset), std::move(fields)});
+    };
+    if (shape == schema::Shape::LIST) {
+        if (!text.empty()) {
+            addItem(text, 0);
+        }
+        return found;
+    }
+    const std::size_t end = splitter::forEachItem(text, splitter::RECORDS, addItem);
+    if (end != text.npos) {
+        truncated.push_back(source.token(itemAt(text, end, splitter::RECORDS), end));
+    }
+    return found;
+}
+
+void Value::restoreHidden(schema::File file, std::string_view name) {
+    const bool isNamed = schema::hasNamedRecords(file, name);
+    const std::size_t first = schema::firstListed(file, name);
+    if (m_replaced.empty() || (!isNamed && first > 1)) {
+        return; // tables may be replaced as a whole
+    }
+    std::vector<Token> ignored;
+    for (auto source = m_replaced.rbegin(); source != m_replaced.rend(); ++source) {
+        std::set<std::string_view> known;
+        const auto addKnown = [&known](const Token& token) { known.insert(token.text); };
+        for (const Item& item : items) {
+            std::for_each(item.fields.begin(), isNamed ? item.fields.begin() + 1 : item.fields.end(),
+                          addKnown);
+        }
+        std::vector<Item> below = itemsOf(*source, ignored);
+        Hiding hiding{key, source->key, {}};
+        std::size_t kept = 0;
+        for (std::size_t i = 0; i < below.size(); ++i) {
+            const std::vector<Token>& fields = below[i].fields;
+            for (std::size_t j = isNamed ? 0 : first; j < (isNamed ? 1 : fields.size()); ++j) {
+                if (known.contains(fields[j].text)) {
+                    ++kept;
+                } else {
+                    hiding.names.push_back(fields[j]);
+                }
+            }
+        }
+        // Whoever writes a list again and keeps most of it removes names on purpose. Properties are never removed.
+        const bool isProperty = isNamed && name != schema::IDCODE;
+        if (hiding.names.empty() || (!isProperty && hiding.names.size() <= kept)) {
+            continue;
+        }
+        for (std::size_t i = 0; i < below.size(); ++i) {
+            if (isNamed && !known.contains(below[i].fields.front().text)) {
+                items.push_back(std::move(below[i]));
+            } else if (!isNamed && i < items.size()) {
+                std::copy_if(below[i].fields.begin() + static_cast<std::ptrdiff_t>(first),
+                             below[i].fields.end(), std::back_inserter(items[i].fields),
+                             [&known](const Token& token) { return !known.contains(token.text); });
+            }
+        }
+        hidings.push_back(std::move(hiding));
+    }
+}
+
+Token Value::SourceText::token(std::string_view part, std::size_t offset) const {
+    const auto next =
+        std::upper_bound(spans.begin(), spans.end(), offset,
+                         [](std::size_t wanted, const Span& span) { return wanted < span.offset; });
+    // An inserted separator belongs to the end of the span before it.
+    const Span& span = *std::prev(next);
+    SourceLocation location = span.location;
+    location.column += static_cast<unsigned>(offset - span.offset);
+    return {part, location};
+}
+
+const Value* Section::find(std::string_view key) const {
+    const auto found = values.find(key);
+    return found == values.end() ? nullptr : &found->second;
+}
+
+const std::vector<Item>& Section::items(std::string_view key) const {
+    static const std::vector<Item> none;
+    const Value* const value = find(key);
+    return value == nullptr ? none : value->items;
+}
+
+const std::vector<Token>& Section::list(std::string_view key) const {
+    static const std::vector<Token> none;
+    const Value* const value = find(key);
+    return value == nullptr ? none : value->list();
+}
+
+Token FamilyData::start() const { return startOf(*files.front()); }
 
 Token startOf(const AcdLines& file) {
     if (file.lines().empty()) {
@@ -127,29 +208,32 @@ Model::Model(std::vector<AcdLines> files) : m_files(std::move(files)) {
     for (const AcdLines& file : m_files) {
         addFile(file);
     }
-    for (const Family& family : m_families) {
-        m_base = family.kind == Family::Kind::BASE ? &family : m_base;
-        m_spi = family.kind == Family::Kind::SPI ? &family : m_spi;
+    for (const FamilyData& family : m_families) {
+        m_base = family.kind == schema::File::BASE ? &family : m_base;
+        m_spi = family.kind == schema::File::SPI ? &family : m_spi;
         m_familyNames.push_back(family.name);
         m_lowerFamilies.insert(lowerCase(family.name));
     }
-    splitEntries();
-    addList(m_supported, baseEntry("DEVICE_SUPPORTED"));
-    addList(m_optionPackages, baseEntry("PROGRAM_OPTION_PACKAGE"));
+    // spi is a family even without a file.
+    if (m_spi == nullptr) {
+        m_familyNames.emplace_back("spi");
+        m_lowerFamilies.insert("spi");
+    }
+    splitValues();
+    m_supported = texts(baseKeys().list(schema::DEVICE_SUPPORTED));
+    m_optionPackages = texts(baseKeys().list(schema::PROGRAM_OPTION_PACKAGE));
     findDevices();
     findFlashes();
 }
 
 void Model::addFile(const AcdLines& file) {
-    // The files of a family come one behind the other.
+    // The files of a family follow each other.
     if (m_families.empty() || m_families.back().name != file.family()) {
-        Family& added = m_families.emplace_back();
+        FamilyData& added = m_families.emplace_back();
         added.name = file.family();
-        added.kind = sameWithoutCase(added.name, "base")  ? Family::Kind::BASE
-                     : sameWithoutCase(added.name, "spi") ? Family::Kind::SPI
-                                                          : Family::Kind::PARTS;
+        added.kind = schema::fileOf(added.name);
     }
-    Family& family = m_families.back();
+    FamilyData& family = m_families.back();
     family.files.push_back(&file);
 
     std::map<std::string, Section*> sections;
@@ -168,27 +252,28 @@ void Model::addFile(const AcdLines& file) {
             }
             open = section;
         } else if (open != nullptr) {
-            open->entries[line.name].assign(file, line);
+            const bool isList = schema::firstListed(family.kind, line.name) <= 1;
+            open->values[line.name].assign(file, line, isList ? splitter::FIELDS : splitter::RECORDS);
         }
     }
 }
 
-void Model::splitEntries() {
-    for (Family& family : m_families) {
-        for (auto& [key, entry] : family.own.entries) {
-            entry.split(shapeOf(family.kind, key));
+void Model::splitValues() {
+    for (FamilyData& family : m_families) {
+        for (auto& [key, value] : family.own.values) {
+            value.split(family.kind, key, schema::shapeOf(family.kind, key));
         }
         for (Section& device : family.devices) {
-            for (auto& [key, entry] : device.entries) {
-                entry.split(shapeInSection(key));
+            for (auto& [key, value] : device.values) {
+                value.split(schema::File::FAMILY, key, schema::shapeInSection(key));
             }
         }
     }
 }
 
 void Model::findDevices() {
-    for (const Family& family : m_families) {
-        if (family.kind != Family::Kind::PARTS) {
+    for (const FamilyData& family : m_families) {
+        if (family.kind != schema::File::FAMILY) {
             continue;
         }
         for (const Section& section : family.devices) {
@@ -204,16 +289,11 @@ void Model::findDevices() {
 }
 
 void Model::findFlashes() {
-    const Entry* const families = spiEntry("DEVICE_FAMILY");
-    if (families == nullptr) {
-        return;
-    }
-    for (const Token& family : families->list()) {
-        const Entry* const devices = spiEntry(std::string(family.text) + "_DEVICES");
-        m_flashFamilies.push_back({family, devices == nullptr ? nullptr : &devices->list()});
+    for (const Token& family : spiKeys().list(schema::DEVICE_FAMILY)) {
+        m_flashFamilies.push_back({family, spiKeys().list(schema::devicesKey(family.text))});
         m_flashNames.emplace_back(family.text);
-        for (std::size_t i = 0; devices != nullptr && i < devices->list().size(); ++i) {
-            m_flashNames.emplace_back(devices->list()[i].text);
+        for (const Token& flash : m_flashFamilies.back().devices) {
+            m_flashNames.emplace_back(flash.text);
         }
     }
     for (const std::string& name : m_flashNames) {
@@ -221,12 +301,14 @@ void Model::findFlashes() {
     }
 }
 
-const Entry* Model::baseEntry(std::string_view key) const {
-    return m_base == nullptr ? nullptr : m_base->own.find(key);
+const Section& Model::baseKeys() const {
+    static const Section none{};
+    return m_base == nullptr ? none : m_base->own;
 }
 
-const Entry* Model::spiEntry(std::string_view key) const {
-    return m_spi == nullptr ? nullptr : m_spi->own.find(key);
+const Section& Model::spiKeys() const {
+    static const Section none{};
+    return m_spi == nullptr ? none : m_spi->own;
 }
 
 const Device* Model::device(std::string_view name) const {

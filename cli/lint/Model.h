@@ -1,5 +1,7 @@
 #pragma once
 
+#include "model/Schema.h"
+
 #include <AcdLines.h>
 
 #include <deque>
@@ -11,104 +13,133 @@
 
 namespace lint {
 
-/// A place in a file of the database, counted from 1, the column in bytes.
-struct Place {
+/// A location in a file of the database; line and column are counted from 1, the column in bytes.
+struct SourceLocation {
     const AcdLines* file = nullptr;
     unsigned line = 1;
     unsigned column = 1;
 };
 
-/// A piece of the database's text that knows where it stands.
+/// A text of the database and its location.
 struct Token {
     std::string_view text;
-    Place place;
+    SourceLocation location;
 };
 
-/// One item of a value between ":", with its fields between ",". A flat list is one record.
-struct Record {
+/// One item of a value between ":", with its fields between ",". A flat list is one item.
+struct Item {
     Token whole;
-    std::vector<Token> fields;
+    std::vector<Token> fields; ///< never empty
 };
 
-/// What kind of value a key has.
-enum class Shape {
-    NONE,    ///< nobody reads it
-    LIST,    ///< item,item,...
-    RECORDS, ///< field,...:field,...
-};
-
-/// What one key of a section says, all layers merged as the readers merge them.
-class Entry {
+/// The value of one key of a section, all layers merged as the readers merge them.
+///
+/// Two mistakes are reported once, at the line that makes them, and otherwise read as they were meant: an appended
+/// text that lacks its separator, and a layer that hides the names below by "=" in place of "+=".
+class Value {
 public:
-    /// How many items, or fields of an item, are ever read.
-    static constexpr std::size_t MOST = 32768;
-
     /// How long a value may grow by appending.
-    static constexpr std::size_t LONGEST = std::size_t{1} << 30;
+    static constexpr std::size_t MAX_LENGTH = std::size_t{1} << 30;
+
+    /// Names of lower layers that "=" on top hides.
+    struct Hiding {
+        Token key;                ///< where the layer on top sets the key
+        Token below;              ///< where the hidden value was set
+        std::vector<Token> names; ///< that are hidden
+    };
 
     Token key; ///< where it was set last
-    Shape shape = Shape::NONE;
-    std::vector<Record> records;
-    std::vector<Token> tooLong; ///< what was appended in vain, since the value would grow too long
-    std::vector<Token> unseen;  ///< the first item, or field, of each list that is too long
+    schema::Shape shape = schema::Shape::NONE;
+    std::vector<Item> items;
+    std::vector<Token> oversizedAppends; ///< dropped, since the value would have grown too long
+    std::vector<Token>
+        truncatedItems; ///< of each list that is too long the first item, or field, that is not read
+    std::vector<Token> joinedAppends; ///< without a separator before them
+    std::vector<Hiding> hidings;
+    bool isAssigned = false; ///< false: there are only appended texts
+    bool isReplaced = false; ///< a layer on top has set it again
 
     /// The items of a flat list.
     [[nodiscard]] const std::vector<Token>& list() const;
 
-    void assign(const AcdLines& file, const AcdLines::Line& line);
-    void split(Shape wanted);
+    /// @param separator between what the value has and what is appended
+    void assign(const AcdLines& file, const AcdLines::Line& line, char separator);
+    void split(schema::File file, std::string_view name, schema::Shape wanted);
 
 private:
-    struct Fragment {
-        std::size_t offset;
-        Place place;
+    /// A text with the origin of each byte.
+    struct SourceText {
+        struct Span {
+            std::size_t offset;
+            SourceLocation location;
+        };
+
+        Token key;
+        std::string text;
+        std::vector<Span> spans;
+
+        [[nodiscard]] Token token(std::string_view part, std::size_t offset) const;
     };
 
-    [[nodiscard]] Token token(std::size_t offset, std::size_t length) const;
-    [[nodiscard]] std::vector<Token> pieces(std::size_t begin, std::size_t end, char separator);
+    [[nodiscard]] std::vector<Item> itemsOf(const SourceText& source, std::vector<Token>& truncated) const;
+    void restoreHidden(schema::File file, std::string_view name);
 
-    std::string m_text;
-    std::vector<Fragment> m_fragments;
+    SourceText m_source;
+    std::vector<SourceText> m_replaced; ///< by layers on top
 };
 
 /// The keys of one device, or those of the family itself.
 struct Section {
     Token name; ///< where it opens first
-    std::map<std::string_view, Entry> entries;
+    std::map<std::string_view, Value> values;
 
-    /// What a key says; null when it is not there.
-    [[nodiscard]] const Entry* find(std::string_view key) const;
+    /// The value of a key; null when the section does not set it.
+    [[nodiscard]] const Value* find(std::string_view key) const;
+
+    /// The items of a key; none when the section does not set it.
+    [[nodiscard]] const std::vector<Item>& items(std::string_view key) const;
+
+    /// The items of a key that is a flat list, likewise.
+    [[nodiscard]] const std::vector<Token>& list(std::string_view key) const;
 };
 
-struct Family {
-    enum class Kind { BASE, SPI, PARTS };
-
+/// The files of one family, merged.
+struct FamilyData {
     std::string name;
-    Kind kind = Kind::PARTS;
+    schema::File kind = schema::File::FAMILY;
     std::vector<const AcdLines*> files; ///< the bottom layer first
     Section own;
     std::deque<Section> devices; ///< in the order in which they open first
 
-    /// Where something is told that the family's files lack.
-    [[nodiscard]] Token place() const;
+    /// Where to report something that the family's files lack.
+    [[nodiscard]] Token start() const;
+
+    /// Calls `use(section)` for the family's own keys and for each device.
+    template <typename Use>
+    void forEachSection(Use use) const {
+        use(own);
+        for (const Section& device : devices) {
+            use(device);
+        }
+    }
 };
 
-/// Where something is told that no line of a file says.
+/// Where to report something that no line of a file says.
 [[nodiscard]] Token startOf(const AcdLines& file);
 
 /// A device of a part family.
 struct Device {
-    const Family* family;
+    const FamilyData* family;
     const Section* section;
 };
 
 /// The flashes of one SPI family or class.
 struct FlashList {
     Token family;
-    const std::vector<Token>* devices; ///< null when there is no list
+    std::vector<Token> devices; ///< none when there is no list
 };
 
-/// A database as the rules see it. Made once, and never changed.
+/// A database as the rules see it. Immutable.
 class Model {
 public:
     explicit Model(std::vector<AcdLines> files);
@@ -116,17 +147,17 @@ public:
     Model& operator=(const Model&) = delete;
 
     [[nodiscard]] const std::vector<AcdLines>& files() const noexcept { return m_files; }
-    [[nodiscard]] const std::deque<Family>& families() const noexcept { return m_families; }
+    [[nodiscard]] const std::deque<FamilyData>& families() const noexcept { return m_families; }
 
     /// Null when the family has no file.
-    [[nodiscard]] const Family* base() const noexcept { return m_base; }
-    [[nodiscard]] const Family* spi() const noexcept { return m_spi; }
+    [[nodiscard]] const FamilyData* base() const noexcept { return m_base; }
+    [[nodiscard]] const FamilyData* spi() const noexcept { return m_spi; }
 
-    /// What a key of the base, or the SPI, database says; null when it is not there.
-    [[nodiscard]] const Entry* baseEntry(std::string_view key) const;
-    [[nodiscard]] const Entry* spiEntry(std::string_view key) const;
+    /// The keys of base.acd and of spi.acd; an empty section when there is no such file.
+    [[nodiscard]] const Section& baseKeys() const;
+    [[nodiscard]] const Section& spiKeys() const;
 
-    /// The devices of the part families by name; of several of one name the one that is found.
+    /// The devices of the part families by name; of several with one name the one that is found.
     [[nodiscard]] const std::map<std::string_view, Device>& devices() const noexcept { return m_devices; }
     [[nodiscard]] const Device* device(std::string_view name) const;
     [[nodiscard]] bool isFamily(std::string_view name) const;
@@ -155,14 +186,14 @@ public:
 
 private:
     void addFile(const AcdLines& file);
-    void splitEntries();
+    void splitValues();
     void findDevices();
     void findFlashes();
 
     std::vector<AcdLines> m_files;
-    std::deque<Family> m_families;
-    const Family* m_base = nullptr;
-    const Family* m_spi = nullptr;
+    std::deque<FamilyData> m_families;
+    const FamilyData* m_base = nullptr;
+    const FamilyData* m_spi = nullptr;
     std::map<std::string_view, Device> m_devices;
     std::set<std::string_view> m_supported;
     std::set<std::string_view> m_optionPackages;

@@ -1,34 +1,36 @@
 // Shows findings to people, and to programs in the tool's own JSON.
 #include "lint/Report.h"
 
+#include <AcdText.h>
+
 #include <fmt/format.h>
 
 #include <algorithm>
+#include <map>
+#include <utility>
 
 namespace lint {
 
 namespace {
 
-/// What stands beside the line of the file: the indentation, and what tells that the line goes on.
-constexpr std::size_t BESIDE_EXCERPT = 10;
-constexpr std::size_t LEAST_EXCERPT = 20;
+/// The columns beside the line of the file: the indentation, and "..." at both ends.
+constexpr std::size_t EXCERPT_MARGIN = 10;
+constexpr std::size_t MIN_EXCERPT = 20;
 
-bool continuesCharacter(char byte) { return (static_cast<unsigned char>(byte) & 0xC0U) == 0x80U; }
-
-/// The number of columns, taking the text as UTF-8.
+/// The number of columns, reading the text as UTF-8.
 std::size_t width(std::string_view text) {
     const std::string shown = printable(text);
-    return static_cast<std::size_t>(
-        std::count_if(shown.begin(), shown.end(), [](char byte) { return !continuesCharacter(byte); }));
+    return static_cast<std::size_t>(std::count_if(
+        shown.begin(), shown.end(), [](char byte) { return !AcdText::continuesCharacter(byte); }));
 }
 
-/// The line of the file, of a long one what is around the finding, and a caret below.
+/// The line of the file, or of a long line the part around the finding, and a caret below it.
 std::string excerpt(const Finding& finding, const Terminal& terminal) {
-    const std::size_t room = std::max(terminal.width(), BESIDE_EXCERPT + LEAST_EXCERPT) - BESIDE_EXCERPT;
-    const std::string_view line = finding.place.file->source(finding.place.line);
-    const std::size_t at = std::min<std::size_t>(finding.place.column - 1, line.size());
+    const std::size_t room = std::max(terminal.width(), EXCERPT_MARGIN + MIN_EXCERPT) - EXCERPT_MARGIN;
+    const std::string_view line = finding.location.file->source(finding.location.line);
+    const std::size_t at = std::min<std::size_t>(finding.location.column - 1, line.size());
     std::size_t begin = line.size() <= room ? 0 : at - std::min(at, room / 2);
-    while (begin > 0 && continuesCharacter(line[begin])) {
+    while (begin > 0 && AcdText::continuesCharacter(line[begin])) {
         --begin;
     }
     const std::string_view shown = line.substr(begin, room);
@@ -47,26 +49,61 @@ std::string counted(std::size_t count, const char* noun) {
 
 } // namespace
 
-std::size_t Report::count(Level level) const {
+std::size_t Report::count(Severity severity) const {
     return static_cast<std::size_t>(
         std::count_if(findings.begin(), findings.end(),
-                      [level](const Finding& finding) { return finding.rule->level == level; }));
+                      [severity](const Finding& finding) { return finding.rule->severity == severity; }));
 }
 
 std::string summary(const Report& report) {
-    return counted(report.count(Level::ERROR), "error") + ", " +
-           counted(report.count(Level::WARNING), "warning");
+    return counted(report.count(Severity::ERROR), "error") + ", " +
+           counted(report.count(Severity::WARNING), "warning");
+}
+
+std::string countsByCode(const Report& report) {
+    std::map<std::string_view, std::size_t> counts;
+    for (const Finding& finding : report.findings) {
+        ++counts[finding.rule->code];
+    }
+    std::vector<std::pair<std::string_view, std::size_t>> sorted(counts.begin(), counts.end());
+    std::stable_sort(sorted.begin(), sorted.end(),
+                     [](const auto& left, const auto& right) { return left.second > right.second; });
+    std::string text;
+    for (const auto& [code, count] : sorted) {
+        text += fmt::format("{}{}: {}", text.empty() ? "" : ", ", code, count);
+    }
+    return text;
+}
+
+std::string asGithub(const Report& report) {
+    // The runner unescapes all texts, and ends a property at ":" or ",".
+    const auto escaped = [](std::string_view text, bool isProperty) {
+        std::string result;
+        for (const char byte : printable(text)) {
+            const bool isSpecial = byte == '%' || (isProperty && (byte == ':' || byte == ','));
+            result += isSpecial ? fmt::format("%{:02X}", static_cast<unsigned>(byte)) : std::string(1, byte);
+        }
+        return result;
+    };
+    std::string text;
+    for (const Finding& finding : report.findings) {
+        text += fmt::format("::{} file={},line={},col={},title={}::{}\n", nameOf(finding.rule->severity),
+                            escaped(finding.location.file->path(), true), finding.location.line,
+                            finding.location.column, finding.rule->code, escaped(finding.text, false));
+    }
+    return text;
 }
 
 std::string asText(const Report& report, const Terminal& terminal) {
     std::string text;
     for (const Finding& finding : report.findings) {
-        const std::string place = fmt::format("{}:{}:{}:", printable(finding.place.file->path()),
-                                              finding.place.line, finding.place.column);
-        const Level level = finding.rule->level;
-        const std::string levelText = fmt::format("{}:", nameOf(level));
+        const std::string place = fmt::format("{}:{}:{}:", printable(finding.location.file->path()),
+                                              finding.location.line, finding.location.column);
+        const Severity severity = finding.rule->severity;
+        const std::string severityText = fmt::format("{}:", nameOf(severity));
         text += fmt::format("{} {} {} [{}]\n", terminal.heading(place),
-                            level == Level::ERROR ? terminal.bad(levelText) : terminal.doubtful(levelText),
+                            severity == Severity::ERROR ? terminal.bad(severityText)
+                                                        : terminal.doubtful(severityText),
                             printable(finding.text), finding.rule->code);
         text += excerpt(finding, terminal);
     }
@@ -78,17 +115,18 @@ Json asJson(const Report& report) {
     Json list = Json::array();
     for (std::size_t i = 0; i < report.findings.size(); ++i) {
         const Finding& finding = report.findings[i];
-        list.push_back({{"file", finding.place.file->path()},
-                        {"line", finding.place.line},
-                        {"column", finding.place.column},
+        list.push_back({{"file", finding.location.file->path()},
+                        {"line", finding.location.line},
+                        {"column", finding.location.column},
                         {"length", finding.length},
-                        {"level", nameOf(finding.rule->level)},
+                        {"level", nameOf(finding.rule->severity)},
                         {"code", finding.rule->code},
+                        {"name", finding.rule->slug},
                         {"text", finding.text},
                         {"fingerprint", names[i]}});
     }
-    return {{"errors", report.count(Level::ERROR)},
-            {"warnings", report.count(Level::WARNING)},
+    return {{"errors", report.count(Severity::ERROR)},
+            {"warnings", report.count(Severity::WARNING)},
             {"findings", list}};
 }
 

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <string>
 #include <string_view>
 #include <vector>
 
@@ -8,37 +9,46 @@ namespace lint {
 class Findings;
 class Model;
 
-enum class Level {
-    WARNING, ///< without effect, or not for long right
-    ERROR,   ///< the database does not say what it seems to say
+enum class Severity {
+    WARNING, ///< without effect, or right only by accident
+    ERROR,   ///< the database does not mean what it seems to mean
 };
 
 /// What can be found.
 struct Rule {
     std::string_view code; ///< a letter and three digits; never given to another rule
-    Level level;
-    std::string_view title;       ///< in one line
-    std::string_view explanation; ///< why it matters, and what to write in its place
-    std::string_view example;     ///< lines that are found
+    std::string_view slug; ///< its name in words: "unknown-operation"
+    Severity severity;
+    std::string_view title;   ///< in one line
+    std::string_view detail;  ///< why it matters, and what to write instead; a line break is a blank
+    std::string_view example; ///< lines that are found
+
+    /// The detail on one line.
+    [[nodiscard]] std::string explanation() const;
 };
 
-/// Rules about one thing, and the function that looks for them.
-struct Group {
+/// Rules about one subject, and the function that checks them.
+struct RuleSet {
+    std::string_view
+        subject; ///< what the rules of its letter are about; empty if the set has rules of several letters
     std::vector<const Rule*> rules;
     void (*check)(const Model& model, Findings& findings);
 };
 
-/// All groups, in the order of the codes' letters.
-[[nodiscard]] const std::vector<Group>& groups();
+/// All rule sets, in the order of the codes' letters.
+[[nodiscard]] const std::vector<RuleSet>& ruleSets();
 
 /// All rules, in the order of their codes.
 [[nodiscard]] const std::vector<const Rule*>& rules();
 
-/// The rule of that code; null when there is none.
-[[nodiscard]] const Rule* ruleOf(std::string_view code);
+/// What the rules with the same letter are about.
+[[nodiscard]] std::string_view subjectOf(const Rule& rule);
 
-[[nodiscard]] constexpr std::string_view nameOf(Level level) {
-    return level == Level::ERROR ? "error" : "warning";
+/// The rules whose code begins with a text, in any case, or whose slug it is.
+[[nodiscard]] std::vector<const Rule*> rulesOf(std::string_view codeOrSlug);
+
+[[nodiscard]] constexpr std::string_view nameOf(Severity severity) {
+    return severity == Severity::ERROR ? "error" : "warning";
 }
 
 } // namespace lint

@@ -1,4 +1,4 @@
-// Shows findings in SARIF 2.1.0, the form that code review tools read.
+// Prints findings in SARIF 2.1.0, the format that code review tools read.
 #include "lint/Report.h"
 
 #include <fmt/format.h>
@@ -25,7 +25,7 @@ std::string asUri(std::string_view path) {
     return uri;
 }
 
-/// The number of characters in the text, as the reports show it: each byte that is no UTF-8 is one.
+/// The number of characters in the text, as the reports show it: each byte that is not UTF-8 is one.
 std::size_t characters(std::string_view text) {
     const std::string shown = Json::parse(oneLine(Json(text))).get<std::string>();
     return static_cast<std::size_t>(std::count_if(shown.begin(), shown.end(), [](char byte) {
@@ -33,15 +33,15 @@ std::size_t characters(std::string_view text) {
     }));
 }
 
-/// Turns columns in bytes into columns in characters. Findings come in order, so each line is walked over once.
+/// Turns columns in bytes into columns in characters. Findings are sorted, so each line is walked over once.
 class Columns {
 public:
     /// The column of a byte of the finding's line.
-    std::size_t at(const Place& place, std::size_t byte) {
-        const std::string_view line = place.file->source(place.line);
-        if (place.file != m_file || place.line != m_line || byte < m_byte) {
-            m_file = place.file;
-            m_line = place.line;
+    std::size_t at(const SourceLocation& location, std::size_t byte) {
+        const std::string_view line = location.file->source(location.line);
+        if (location.file != m_file || location.line != m_line || byte < m_byte) {
+            m_file = location.file;
+            m_line = location.line;
             m_byte = m_characters = 0;
         }
         m_characters += characters(line.substr(m_byte, byte - m_byte));
@@ -57,24 +57,25 @@ private:
 };
 
 Json region(const Finding& finding, Columns& columns) {
-    const std::size_t length = finding.place.file->source(finding.place.line).size();
-    const std::size_t begin = std::min<std::size_t>(finding.place.column - 1, length);
-    const std::size_t startColumn = columns.at(finding.place, begin);
-    // The end is counted apart: the next finding may begin within this one.
+    const std::size_t length = finding.location.file->source(finding.location.line).size();
+    const std::size_t begin = std::min<std::size_t>(finding.location.column - 1, length);
+    const std::size_t startColumn = columns.at(finding.location, begin);
+    // The end is counted separately: the next finding may begin within this one.
     const std::size_t endColumn =
         startColumn +
-        characters(finding.place.file->source(finding.place.line).substr(begin, finding.length));
-    return {{"startLine", finding.place.line},
+        characters(finding.location.file->source(finding.location.line).substr(begin, finding.length));
+    return {{"startLine", finding.location.line},
             {"startColumn", startColumn},
-            {"endLine", finding.place.line},
+            {"endLine", finding.location.line},
             {"endColumn", endColumn}};
 }
 
 Json descriptor(const Rule& rule) {
     Json object{{"id", rule.code},
+                {"name", rule.slug},
                 {"shortDescription", {{"text", rule.title}}},
-                {"fullDescription", {{"text", rule.explanation}}},
-                {"defaultConfiguration", {{"level", nameOf(rule.level)}}}};
+                {"fullDescription", {{"text", rule.explanation()}}},
+                {"defaultConfiguration", {{"level", nameOf(rule.severity)}}}};
     if (!rule.example.empty()) {
         object["help"] = {{"text", fmt::format("Found in:\n{}", rule.example)}};
     }
@@ -97,11 +98,12 @@ Json asSarif(const Report& report) {
         results.push_back(
             {{"ruleId", finding.rule->code},
              {"ruleIndex", index},
-             {"level", nameOf(finding.rule->level)},
+             {"level", nameOf(finding.rule->severity)},
              {"message", {{"text", finding.text}}},
-             {"locations", Json::array({{{"physicalLocation",
-                                          {{"artifactLocation", {{"uri", asUri(finding.place.file->path())}}},
-                                           {"region", region(finding, columns)}}}}})},
+             {"locations",
+              Json::array({{{"physicalLocation",
+                             {{"artifactLocation", {{"uri", asUri(finding.location.file->path())}}},
+                              {"region", region(finding, columns)}}}}})},
              {"partialFingerprints", {{"tarvikLint/v1", names[i]}}}});
     }
     return {

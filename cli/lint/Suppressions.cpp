@@ -1,9 +1,7 @@
-// Comments to the linter: they stand above a line, and speak for all that the line goes on with.
+// Comments to the linter: each is above a line, and applies to that line with its continuation lines.
 #include "lint/Suppressions.h"
 
 #include "lint/rules/RuleSets.h"
-
-#include <fmt/format.h>
 
 #include <algorithm>
 #include <iterator>
@@ -12,27 +10,37 @@
 
 namespace lint {
 
-constexpr Rule UNREADABLE_COMMENT{
-    "X101", Level::WARNING, "comment to the linter that can't be read",
-    "A comment to the linter has the form \"# lint: ignore CODE\", with several codes between "
-    "blanks or commas. Anything else, a code that there is not included, is without "
-    "effect.",
-    "# lint: ignore T999"};
-constexpr Rule UNUSED_IGNORE{
-    "X102", Level::WARNING, "comment that ignores nothing",
-    "Nothing of that code was found in the line below, with all that it goes on with: the line "
-    "was mended, or the comment has lost it. Drop the comment before it hides something new.",
-    "# lint: ignore T105\nOPERATION = PROGRAM,Bscan,USB2"};
-
 namespace {
+
+constexpr Rule UNREADABLE_COMMENT{
+    "X101",
+    "unreadable-comment",
+    Severity::WARNING,
+    "comment to the linter that cannot be read",
+    R"(A comment to the linter has the form "# lint: ignore CODE", with blanks or commas between several codes. Any
+other form, or an unknown code, has no effect.)",
+    "# lint: ignore T999"};
+constexpr Rule UNUSED_SUPPRESSION{
+    "X102",
+    "unused-suppression",
+    Severity::WARNING,
+    "comment that ignores nothing",
+    R"(The line below, its continuation lines included, has no finding of that code: the line was corrected, or the
+comment was separated from it. Remove the comment before it hides a new finding.)",
+    "# lint: ignore T105\nOPERATION = PROGRAM,Bscan,USB2"};
 
 constexpr std::string_view BLANKS = " \t,";
 
 /// One code of a comment.
-struct Ignore {
+struct Suppression {
     Token code;
     bool isUsed = false;
 };
+
+bool isCode(std::string_view text) {
+    return std::any_of(rules().begin(), rules().end(),
+                       [text](const Rule* rule) { return rule->code == text; });
+}
 
 /// Reads the comments of one file.
 class Comments {
@@ -47,9 +55,9 @@ public:
     bool ignores(std::string_view code, unsigned line) {
         bool isIgnored = false;
         for (unsigned above = firstLineOf(line); above > 1 && m_isComment.contains(--above);) {
-            for (Ignore& ignore : m_ignores[above]) {
-                if (ignore.code.text == code) {
-                    ignore.isUsed = isIgnored = true;
+            for (Suppression& suppression : m_suppressions[above]) {
+                if (suppression.code.text == code) {
+                    suppression.isUsed = isIgnored = true;
                 }
             }
         }
@@ -57,11 +65,11 @@ public:
     }
 
     void addUnused(Findings& findings) const {
-        for (const auto& [line, ignores] : m_ignores) {
-            for (const Ignore& ignore : ignores) {
-                if (!ignore.isUsed) {
-                    findings.add(UNUSED_IGNORE, ignore.code,
-                                 fmt::format("nothing to ignore: no {} in the line below", ignore.code.text));
+        for (const auto& [line, suppressions] : m_suppressions) {
+            for (const Suppression& suppression : suppressions) {
+                if (!suppression.isUsed) {
+                    findings.add(UNUSED_SUPPRESSION, suppression.code,
+                                 "nothing to ignore: no {} in the line below", suppression.code.text);
                 }
             }
         }
@@ -91,37 +99,41 @@ private:
         dropBlanks();
         const Token what = token(rest.size());
         if (!drop("ignore") || rest.find_first_of(BLANKS) != 0) {
-            findings.add(UNREADABLE_COMMENT, what, "the form is \"# lint: ignore CODE\"");
+            findings.addText(UNREADABLE_COMMENT, what, "the form is \"# lint: ignore CODE\"");
             return;
         }
         for (dropBlanks(); !rest.empty(); dropBlanks()) {
             const Token code = token(std::min(rest.find_first_of(BLANKS), rest.size()));
             rest.remove_prefix(code.text.size());
-            if (ruleOf(code.text) == nullptr) {
-                findings.add(UNREADABLE_COMMENT, code, fmt::format("there is no code {}", quoted(code.text)));
+            if (!isCode(code.text)) {
+                findings.add(UNREADABLE_COMMENT, code, "there is no code {}", quoted(code.text));
             } else {
-                m_ignores[comment.line].push_back({code});
+                m_suppressions[comment.line].push_back({code});
             }
         }
     }
 
-    /// The first line of what goes on in this one.
+    /// The first line of those that this one continues.
     [[nodiscard]] unsigned firstLineOf(unsigned line) const {
         const std::vector<AcdLines::Line>& lines = m_file.lines();
-        const auto behind = std::upper_bound(
+        const auto next = std::upper_bound(
             lines.begin(), lines.end(), line,
             [](unsigned wanted, const AcdLines::Line& candidate) { return wanted < candidate.firstLine; });
-        return behind == lines.begin() ? line : std::prev(behind)->firstLine;
+        return next == lines.begin() ? line : std::prev(next)->firstLine;
     }
 
     const AcdLines& m_file;
     std::set<unsigned> m_isComment;
-    std::map<unsigned, std::vector<Ignore>> m_ignores; ///< by line
+    std::map<unsigned, std::vector<Suppression>> m_suppressions; ///< by line
 };
 
 } // namespace
 
-std::vector<Finding> withoutIgnored(const Model& model, const Findings& findings) {
+RuleSet commentRules() {
+    return {"comments to the linter", {&UNREADABLE_COMMENT, &UNUSED_SUPPRESSION}, nullptr};
+}
+
+std::vector<Finding> withoutSuppressed(const Model& model, const Findings& findings) {
     Findings ofComments;
     std::map<const AcdLines*, Comments> comments;
     for (const AcdLines& file : model.files()) {
@@ -129,7 +141,7 @@ std::vector<Finding> withoutIgnored(const Model& model, const Findings& findings
     }
     std::vector<Finding> kept;
     for (const Finding& finding : findings.all()) {
-        if (!comments.at(finding.place.file).ignores(finding.rule->code, finding.place.line)) {
+        if (!comments.at(finding.location.file).ignores(finding.rule->code, finding.location.line)) {
             kept.push_back(finding);
         }
     }

@@ -6,8 +6,8 @@
 
 namespace lint {
 
-/// Drops what a comment `# lint: ignore CODE...` right above the line tells to ignore. Adds the comments that
-/// ignore nothing, and those that can't be read.
-[[nodiscard]] std::vector<Finding> withoutIgnored(const Model& model, const Findings& findings);
+/// Drops the findings that a comment `# lint: ignore CODE...` directly above the line suppresses. Adds findings
+/// for the comments that suppress nothing, and for those that cannot be read.
+[[nodiscard]] std::vector<Finding> withoutSuppressed(const Model& model, const Findings& findings);
 
 } // namespace lint

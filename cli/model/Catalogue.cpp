@@ -1,6 +1,8 @@
 // Names and origins from the host layer's database, for lists, suggestions, and to say where a value stands.
 #include "model/Catalogue.h"
 
+#include "model/RecordSplitter.h"
+#include "model/Schema.h"
 #include "text/Suggest.h"
 
 #include <TarvikException.h>
@@ -14,27 +16,10 @@ namespace catalogue {
 
 namespace {
 
-/// The manager's SPI catalogue is this file, whatever else may be called "spi".
-constexpr const char* SPI_DATABASE = "spi.acd";
-
-bool isOwnFamily(const std::string& family) {
-    return !sameWithoutCase(family, "base") && !sameWithoutCase(family, "spi");
-}
-
-/// Calls `use(piece, offset)` for each piece. An empty text has none.
-template <typename Use>
-void forEachPiece(std::string_view text, char separator, Use use) {
-    for (std::size_t start = 0; !text.empty() && start <= text.size();) {
-        const std::size_t end = std::min(text.find(separator, start), text.size());
-        use(text.substr(start, end - start), start);
-        start = end + 1;
-    }
-}
-
 /// The last entry of each name.
 std::map<std::string, Entry> lastEntries(const AcdStore::Value& value) {
     std::map<std::string, Entry> found;
-    forEachPiece(value.text, ':', [&](std::string_view text, std::size_t offset) {
+    splitter::forEachItem(value.text, splitter::RECORDS, [&](std::string_view text, std::size_t offset) {
         Entry entry{originOf(value.at(offset)), value.fromSection, std::string(text), {}};
         const auto [known, isNew] = found.try_emplace(std::string(text.substr(0, text.find(','))));
         if (!isNew) {
@@ -107,7 +92,8 @@ std::map<std::string, Entry> entries(const std::string& database, const std::str
 std::vector<std::string> list(const std::string& database, const std::string& key) {
     std::vector<std::string> texts;
     if (const std::optional<AcdStore::Value> value = AcdStore::value(database.c_str(), key.c_str())) {
-        forEachPiece(value->text, ',', [&](std::string_view text, std::size_t) { texts.emplace_back(text); });
+        splitter::forEachItem(value->text, splitter::FIELDS,
+                              [&](std::string_view text, std::size_t) { texts.emplace_back(text); });
     }
     return texts;
 }
@@ -115,7 +101,7 @@ std::vector<std::string> list(const std::string& database, const std::string& ke
 std::vector<std::string> families() {
     std::vector<std::string> own;
     for (std::string& family : AcdStore::families()) {
-        if (isOwnFamily(family)) {
+        if (schema::fileOf(family) == schema::File::FAMILY) {
             own.push_back(std::move(family));
         }
     }
@@ -124,8 +110,8 @@ std::vector<std::string> families() {
 
 std::vector<Flash> flashes() {
     std::vector<Flash> all;
-    for (const std::string& family : list(SPI_DATABASE, "DEVICE_FAMILY")) {
-        for (std::string& name : list(SPI_DATABASE, family + "_DEVICES")) {
+    for (const std::string& family : list(schema::SPI, schema::DEVICE_FAMILY)) {
+        for (std::string& name : list(schema::SPI, schema::devicesKey(family))) {
             all.push_back({std::move(name), family});
         }
     }

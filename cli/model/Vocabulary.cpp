@@ -3,14 +3,15 @@
 
 #include "term/ExitCode.h"
 #include "term/Table.h"
-#include "text/Json.h"
 #include "text/Suggest.h"
 
-#include <tarvik/ConstraintsManager.h>
+// The manager's own table: the class itself does not give the display names of modes and outputs.
+#include <Vocabulary.h>
 
 #include <fmt/format.h>
 
 #include <algorithm>
+#include <array>
 
 using TARVIKNS::MODE_TYPE;
 using TARVIKNS::OP_TYPE;
@@ -21,115 +22,132 @@ namespace vocabulary {
 
 namespace {
 
-/// What the manager's mode converter knows besides the key names.
-const std::vector<std::string> OTHER_MODE_TEXTS{"Bscan", "SSerial",      "Smap", "DTCONFIG",
-                                                "CF",    "CompactFlash", "MPM",  "PromFile"};
+constexpr std::array<const char*, 4> KIND_NAMES{"mode", "output", "operation", "option"};
 
-/// The texts of all values from 0 to `last`.
-template <typename Type>
-std::vector<std::string> texts(Type last, StringBase (*convert)(Type)) {
-    std::vector<std::string> all;
-    for (int value = 0; value <= static_cast<int>(last); ++value) {
-        all.push_back(plain(convert(static_cast<Type>(value))));
+const char* nameOf(Kind kind) { return KIND_NAMES.at(static_cast<std::size_t>(kind)); }
+
+std::vector<Word> modeWords() {
+    std::vector<Word> words;
+    for (const Mode& mode : MODES) {
+        words.push_back({mode.key, {}, mode.display});
+        for (const char* const name : mode.names) {
+            if (name != nullptr && words.back().key != name) {
+                words.back().others.emplace_back(name);
+            }
+        }
     }
-    return all;
+    return words;
 }
 
-/// The position of a text among others; nothing when it is not there.
-template <typename Equal>
-std::optional<int> position(const std::vector<std::string>& all, const std::string& text, Equal equal) {
-    const auto found = std::find_if(all.begin(), all.end(),
-                                    [&](const std::string& candidate) { return equal(candidate, text); });
-    return found == all.end() ? std::nullopt : std::optional(static_cast<int>(found - all.begin()));
+template <typename Rows>
+std::vector<Word> wordsOf(const Rows& rows) {
+    std::vector<Word> words;
+    for (const auto& row : rows) {
+        words.push_back({row.key, {}, row.display});
+    }
+    return words;
 }
 
-std::vector<std::string> joined(std::vector<std::string> left, const std::vector<std::string>& right) {
-    left.insert(left.end(), right.begin(), right.end());
-    return left;
+std::vector<Word> optionWords() {
+    std::vector<Word> words;
+    for (const Option& option : OPTIONS) {
+        words.push_back({option.key, {}, ""});
+    }
+    return words;
 }
 
-/// @param kind "mode", "output", "operation"
-/// @param accepted what to list
-/// @param known what to suggest from
-CommandError unknown(const char* kind, const std::string& text, const char* rule,
-                     const std::vector<std::string>& accepted, const std::vector<std::string>& known) {
-    return {ExitCode::FAULT, fmt::format("unknown {} \"{}\"{}\n{}:\n{}", kind, text, didYouMean(text, known),
-                                         rule, wrapped(accepted, 2))};
+/// A display name with single blanks, and without what all names of its kind end in.
+std::string shortName(Kind kind, std::string_view name) {
+    std::vector<std::string> words = ::wordsOf(std::string(name));
+    const char* const ending = kind == Kind::MODE ? "mode" : "cable";
+    if (words.size() > 1 && kind <= Kind::OUTPUT && sameWithoutCase(words.back(), ending)) {
+        words.pop_back();
+    }
+    std::string text;
+    for (const std::string& word : words) {
+        text += (text.empty() ? "" : " ") + word;
+    }
+    return text;
+}
+
+/// All texts that suggestions come from.
+std::vector<std::string> acceptedTexts(Kind kind) {
+    std::vector<std::string> texts = keys(kind);
+    for (const Word& word : words(kind)) {
+        texts.insert(texts.end(), word.others.begin(), word.others.end());
+        if (!word.name.empty()) {
+            texts.push_back(shortName(kind, word.name));
+        }
+    }
+    return texts;
+}
+
+template <typename Type>
+Type read(Kind kind, const std::string& text) {
+    if (const std::optional<int> value = find(kind, text)) {
+        return static_cast<Type>(*value);
+    }
+    // The long lists would hide the suggestion.
+    const std::string list = kind == Kind::MODE || kind == Kind::OUTPUT
+                                 ? fmt::format("{}s, in any case:\n{}", nameOf(kind), wrapped(keys(kind), 2))
+                                 : std::string();
+    throw CommandError(ExitCode::FAULT,
+                       fmt::format("{}\n{}see: tarvik vocabulary", unknownWord(kind, text), list));
 }
 
 } // namespace
 
-const std::vector<std::string>& modes() {
-    static const std::vector<std::string> all = texts(MODE_TYPE::PFF, ConstraintsManager::modeType2String);
-    return all;
+const std::vector<Word>& words(Kind kind) {
+    static const std::array<std::vector<Word>, 4> all{modeWords(), wordsOf(OUTPUTS), wordsOf(OPERATIONS),
+                                                      optionWords()};
+    return all.at(static_cast<std::size_t>(kind));
 }
 
-const std::vector<std::string>& outputs() {
-    static const std::vector<std::string> all =
-        texts(OUTPUT_TYPE::NONE, ConstraintsManager::cableType2String);
-    return all;
-}
-
-const std::vector<std::string>& operations() {
-    static const std::vector<std::string> all =
-        texts(OP_TYPE::EXPRESSQSVF, ConstraintsManager::operationType2String);
-    return all;
-}
-
-const std::vector<std::string>& options() {
-    static const std::vector<std::string> all =
-        texts(PROGRAM_OPTION::RS_PIN0, ConstraintsManager::optionType2String);
-    return all;
-}
-
-const std::vector<std::string>& operationNames() {
-    static const std::vector<std::string> all =
-        texts(OP_TYPE::EXPRESSQSVF, ConstraintsManager::operationType2DisplayString);
-    return all;
-}
-
-std::vector<std::string> otherModeTexts(MODE_TYPE mode) {
-    std::vector<std::string> others;
-    for (const std::string& text : OTHER_MODE_TEXTS) {
-        if (ConstraintsManager::modeString2Type(text.c_str()) == mode) {
-            others.push_back(text);
+const std::vector<std::string>& keys(Kind kind) {
+    static const std::array<std::vector<std::string>, 4> all = [] {
+        std::array<std::vector<std::string>, 4> keys;
+        for (std::size_t one = 0; one < keys.size(); ++one) {
+            for (const Word& word : words(static_cast<Kind>(one))) {
+                keys.at(one).push_back(word.key);
+            }
         }
-    }
-    return others;
+        return keys;
+    }();
+    return all.at(static_cast<std::size_t>(kind));
 }
 
-MODE_TYPE readMode(const std::string& text) {
-    if (const std::optional<int> value = position(modes(), text, sameWithoutCase)) {
-        return static_cast<MODE_TYPE>(*value);
-    }
-    if (position(OTHER_MODE_TEXTS, text, sameWithoutCase)) {
-        return ConstraintsManager::modeString2Type(text.c_str());
-    }
-    const std::vector<std::string> all = joined(modes(), OTHER_MODE_TEXTS);
-    throw unknown("mode", text, "modes, in any case", all, all);
+std::optional<int> find(Kind kind, std::string_view text) {
+    const std::vector<Word>& all = words(kind);
+    const std::string name = shortName(kind, text);
+    const auto hasKey = [&](const Word& word) {
+        return sameWithoutCase(word.key, text) ||
+               std::any_of(word.others.begin(), word.others.end(),
+                           [&](const std::string& other) { return sameWithoutCase(other, text); });
+    };
+    const auto hasName = [&](const Word& word) {
+        return !word.name.empty() && sameWithoutCase(shortName(kind, word.name), name);
+    };
+    auto found = std::find_if(all.begin(), all.end(), hasKey);
+    found = found == all.end() ? std::find_if(all.begin(), all.end(), hasName) : found;
+    return found == all.end() ? std::nullopt : std::optional(static_cast<int>(found - all.begin()));
 }
 
-OUTPUT_TYPE readOutput(const std::string& text) {
-    if (const std::optional<int> value = position(outputs(), text, std::equal_to<>())) {
-        return static_cast<OUTPUT_TYPE>(*value);
-    }
-    throw unknown("output", text, "outputs, in upper case", outputs(), outputs());
+std::string unknownWord(Kind kind, std::string_view text) {
+    return fmt::format("unknown {} \"{}\"{}", nameOf(kind), text, didYouMean(text, acceptedTexts(kind)));
 }
 
-OP_TYPE readOperation(const std::string& text) {
-    std::optional<int> value = position(operations(), text, sameWithoutCase);
-    if (!value) {
-        value = position(operationNames(), text, sameWithoutCase);
-    }
-    if (value) {
-        return static_cast<OP_TYPE>(*value);
-    }
-    throw unknown("operation", text, "operations, in any case (or by display name, see: tarvik vocabulary)",
-                  operations(), joined(operations(), operationNames()));
-}
+MODE_TYPE readMode(const std::string& text) { return read<MODE_TYPE>(Kind::MODE, text); }
+OUTPUT_TYPE readOutput(const std::string& text) { return read<OUTPUT_TYPE>(Kind::OUTPUT, text); }
+OP_TYPE readOperation(const std::string& text) { return read<OP_TYPE>(Kind::OPERATION, text); }
+PROGRAM_OPTION readOption(const std::string& text) { return read<PROGRAM_OPTION>(Kind::OPTION, text); }
 
 const std::string& key(MODE_TYPE mode) { return modes().at(static_cast<std::size_t>(mode)); }
 const std::string& key(OUTPUT_TYPE output) { return outputs().at(static_cast<std::size_t>(output)); }
 const std::string& key(OP_TYPE operation) { return operations().at(static_cast<std::size_t>(operation)); }
+const std::string& key(PROGRAM_OPTION option) { return options().at(static_cast<std::size_t>(option)); }
+
+const std::string& displayName(OP_TYPE operation) {
+    return words(Kind::OPERATION).at(static_cast<std::size_t>(operation)).name;
+}
 
 } // namespace vocabulary

@@ -1,12 +1,12 @@
 // Which devices there are, and which of them can't be asked for one after the other.
 #include "query/DeviceList.h"
 
-#include "explain/StartUp.h"
 #include "model/Catalogue.h"
 #include "query/OrderDependentNames.h"
 #include "text/Suggest.h"
 
 #include <AcdStore.h>
+#include <UT_STR.h>
 
 #include <unordered_set>
 
@@ -55,7 +55,7 @@ private:
     }
 
     [[nodiscard]] bool isFlash(const std::string& name) const {
-        return m_flashes.count(upperCase(name)) != 0;
+        return m_flashes.count(plain(UT_STR::Upper(name.c_str()))) != 0;
     }
 
     Set m_flashes; ///< as listed, families of flashes too

@@ -1,7 +1,7 @@
 // Tells which names have to be asked about apart from all others.
 #include "query/OrderDependentNames.h"
 
-#include "explain/Records.h"
+#include "model/Records.h"
 #include "text/Suggest.h"
 
 #include <AcdStore.h>
@@ -31,7 +31,7 @@ bool hasUnknownOption(const std::string& name, bool sectionOnly) {
     if (!value || (sectionOnly && !value->fromSection)) {
         return false;
     }
-    for (const Record& record : readRecords(name, "PROGRAM_OPTION").all) {
+    for (const catalogue::Record& record : catalogue::readRecords(name, "PROGRAM_OPTION").all) {
         try {
             static_cast<void>(ConstraintsManager::optionString2Type(record.fields.front().text.c_str()));
         } catch (const DataMismatchException&) {

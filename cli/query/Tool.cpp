@@ -1,4 +1,4 @@
-// Shows answers, messages and faults the one way, in text or in JSON.
+// Shows the answers, messages and errors of all commands alike, as text or as JSON.
 #include "query/Tool.h"
 
 #include "query/Database.h"
@@ -41,7 +41,7 @@ ExitCode Tool::fail(const CommandError& failure) {
         }
         m_output.flush();
     } catch (const CommandError&) {
-        // The output is what failed, and that is told already.
+        // The output itself failed, which is reported already.
         return ExitCode::FAULT;
     }
     return failure.status();
@@ -74,7 +74,7 @@ std::vector<Messages::Message> Tool::showMessages() {
         if (message.channel != Channel::STATUS) {
             writeError(message.text);
         } else if (!m_settings.json) {
-            m_output.write(message.text);
+            m_output.write(m_terminal.isTerminal() ? printableLines(message.text) : message.text);
         }
         shown.push_back(std::move(message));
     }

@@ -11,7 +11,7 @@
 
 class ConstraintsManager;
 
-/// What every command works with: the database, the manager, and the one place where answers are shown.
+/// The session of a command: the database, the manager, and the one place where answers are shown.
 class Tool {
 public:
     struct Settings {
@@ -23,8 +23,8 @@ public:
 
     explicit Tool(Settings settings);
 
-    /// Opens the database; a second call does nothing.
-    /// @throw CommandError (FAULT) when it is missing or can't be read
+    /// Opens the database; a second call has no effect.
+    /// @throw CommandError (FAULT) if it is missing or cannot be read
     void openDatabase();
 
     /// The manager, with exceptions off, on the database.
@@ -34,7 +34,7 @@ public:
     [[nodiscard]] Messages& messages() noexcept { return m_messages; }
     [[nodiscard]] Output& output() noexcept { return m_output; }
 
-    /// Shows what a command found, as text or as a JSON object, behind the messages that came with it.
+    /// Shows what a command found, as text or as a JSON object, after the messages that came with it.
     /// @param facts anything with `std::string asText(facts, const Terminal&)` and `Json asJson(facts)`
     /// @return the status
     template <typename Facts>
@@ -47,7 +47,7 @@ public:
         return status;
     }
 
-    /// Tells the user something beside the answer.
+    /// Shows the user something besides the answer, on standard error.
     void note(const std::string& text) const;
 
     /// Shows why there is no answer.
@@ -60,7 +60,7 @@ private:
     void writeJson(const Json& facts, const std::vector<Messages::Message>& messages);
 
     /// Info and debug messages go to standard error; status messages go where text answers go, while in JSON
-    /// they stand in the object alone. Debug messages count only when they were asked for.
+    /// they are in the object only. Debug messages are shown only with `--verbose`.
     std::vector<Messages::Message> showMessages();
 
     Settings m_settings;

@@ -107,7 +107,7 @@ Subject askApart(Tool& tool, const why::Member& member) {
         } catch (const CommandError& failure) {
             object["fault"] = failure.what();
         } catch (const TarvikException& fault) {
-            object["fault"] = fmt::format("the database can't be read: {}", fault.what());
+            object["fault"] = fmt::format("the database can't be read: {}", fault.typeName());
         }
         std::string text;
         Packed::to_msgpack(object, text);

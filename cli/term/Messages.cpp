@@ -1,4 +1,4 @@
-// What the manager says while it is asked: gathered, so that each way to show an answer can place it.
+// Gathers the messages of the manager, so that each kind of output can place them.
 #include "term/Messages.h"
 
 #include <utility>
@@ -22,11 +22,11 @@ const char* channelName(Channel channel) {
 } // namespace
 
 Messages::Messages()
-    : m_former(Port_MsgManData::setSink([this](const Port_MsgManData::Message& message) {
+    : m_previous(Port_MsgManData::setSink([this](const Port_MsgManData::Message& message) {
           m_messages.push_back({message.channel, message.line, std::string(message.text)});
       })) {}
 
-Messages::~Messages() { Port_MsgManData::setSink(std::move(m_former)); }
+Messages::~Messages() { Port_MsgManData::setSink(std::move(m_previous)); }
 
 std::vector<Messages::Message> Messages::take() { return std::exchange(m_messages, {}); }
 

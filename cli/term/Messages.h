@@ -7,7 +7,7 @@
 #include <string>
 #include <vector>
 
-/// Takes all messages of the manager and the host layer, from its construction to its end.
+/// Receives all messages of the manager and the host layer while it lives.
 class Messages {
 public:
     struct Message {
@@ -21,22 +21,23 @@ public:
     Messages(const Messages&) = delete;
     Messages& operator=(const Messages&) = delete;
 
-    /// What was issued since the last call, in order.
+    /// Returns and removes the messages, in order.
     [[nodiscard]] std::vector<Message> take();
 
-    /// What was issued on the status channel since the last call, joined. Other messages stay.
+    /// Returns and removes the texts of the status channel, joined. Other messages stay.
     [[nodiscard]] std::string takeStatus();
 
-    /// How many were issued since the last `take`.
+    /// The number of messages since the last `take`.
     [[nodiscard]] std::size_t count() const noexcept { return m_messages.size(); }
 
-    /// Forgets all but the first `count`.
-    void forgetBehind(std::size_t count) { m_messages.resize(count); }
+    /// Drops all but the first `count`.
+    void truncate(std::size_t count) { m_messages.resize(count); }
+    void forgetBehind(std::size_t count) { truncate(count); }
 
 private:
-    Port_MsgManData::Sink m_former;
+    Port_MsgManData::Sink m_previous;
     std::vector<Message> m_messages;
 };
 
-/// An array of objects that name channel, line and text.
+/// An array of objects with channel, line and text.
 [[nodiscard]] Json asJson(const std::vector<Messages::Message>& messages);

@@ -1,7 +1,8 @@
-// Standard output and standard error: nothing is lost silently, and a reader that leaves early is no fault.
+// Standard output and standard error: a failing write is reported, except that a reader may leave early.
 #include "term/Output.h"
 
 #include "term/ExitCode.h"
+#include "term/Terminal.h"
 
 #include <cerrno>
 #include <cstring>
@@ -11,10 +12,10 @@
 
 namespace {
 
-constexpr std::size_t MUCH = std::size_t{64} * 1024;
+constexpr std::size_t FULL = std::size_t{64} * 1024;
 
-/// Writes some of the text, waiting where the descriptor can't take any now.
-/// @return the number of bytes written; negative for a fault, which `errno` tells
+/// Writes some of the text, waiting while the descriptor accepts none.
+/// @return the number of bytes written; negative for an error, which is in `errno`
 ssize_t writeSome(int descriptor, std::string_view text) {
     for (;;) {
         const ssize_t written = ::write(descriptor, text.data(), text.size());
@@ -30,7 +31,7 @@ ssize_t writeSome(int descriptor, std::string_view text) {
     }
 }
 
-/// @return false for a fault, which `errno` tells
+/// @return false for an error, which is in `errno`
 bool writeAll(int descriptor, std::string_view text) {
     while (!text.empty()) {
         const ssize_t written = writeSome(descriptor, text);
@@ -45,33 +46,33 @@ bool writeAll(int descriptor, std::string_view text) {
 } // namespace
 
 void Output::write(std::string_view text) {
-    m_kept += text;
-    if (m_kept.size() >= MUCH) {
+    m_buffer += text;
+    if (m_buffer.size() >= FULL) {
         flush();
     }
 }
 
 void Output::flush() {
-    const std::string text = std::exchange(m_kept, {});
+    const std::string text = std::exchange(m_buffer, {});
     if (m_closed || writeAll(STDOUT_FILENO, text)) {
         return;
     }
     if (errno != EPIPE) {
         throw CommandError(ExitCode::FAULT,
-                           std::string("can't write to standard output: ") + std::strerror(errno));
+                           std::string("cannot write to standard output: ") + std::strerror(errno));
     }
     m_closed = true;
 }
 
 void writeError(std::string_view line) {
-    std::string text(line);
+    std::string text = ::isatty(STDERR_FILENO) == 1 ? printableLines(line) : std::string(line);
     if (!text.ends_with('\n')) {
         text += '\n';
     }
-    writePiece(text);
+    writeErrorRaw(text);
 }
 
-void writePiece(std::string_view text) {
-    // There is nowhere left to report a fault of standard error.
+void writeErrorRaw(std::string_view text) {
+    // There is nowhere to report a failure of standard error.
     static_cast<void>(writeAll(STDERR_FILENO, text));
 }

@@ -5,27 +5,27 @@
 
 /// Standard output, written in large pieces.
 ///
-/// A reader that has closed its end wanted no more: what is written then is dropped.
+/// If the reader has closed its end, the rest is dropped.
 class Output {
 public:
-    /// Keeps a text for the next flush, which is now when much has gathered.
-    /// @throw CommandError (FAULT) when the output can't be written
+    /// Buffers a text; a full buffer is flushed.
+    /// @throw CommandError (FAULT) if the output cannot be written
     void write(std::string_view text);
 
-    /// Writes what was kept.
-    /// @throw CommandError (FAULT) when the output can't be written
+    /// Writes the buffer.
+    /// @throw CommandError (FAULT) if the output cannot be written
     void flush();
 
-    /// Has the reader closed its end?
+    /// Whether the reader has closed its end.
     [[nodiscard]] bool closed() const noexcept { return m_closed; }
 
 private:
-    std::string m_kept;
+    std::string m_buffer;
     bool m_closed = false;
 };
 
-/// Writes a text to standard error, and a line end where the text has none.
+/// Writes a text to standard error, with a line end if it has none. On a terminal control characters become `?`.
 void writeError(std::string_view line);
 
-/// Writes a text to standard error as it is.
-void writePiece(std::string_view text);
+/// Writes a text to standard error unchanged.
+void writeErrorRaw(std::string_view text);

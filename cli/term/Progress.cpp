@@ -24,7 +24,7 @@ std::size_t widthOfStandardError() {
 } // namespace
 
 Progress::Progress(std::string task)
-    : Progress(std::move(task), widthOfStandardError(), std::chrono::steady_clock::now, writePiece) {}
+    : Progress(std::move(task), widthOfStandardError(), std::chrono::steady_clock::now, writeErrorRaw) {}
 
 Progress::Progress(std::string task, std::size_t width, Clock clock, Write write)
     : m_task(std::move(task)), m_width(width), m_clock(std::move(clock)), m_write(std::move(write)),

@@ -57,7 +57,7 @@ std::string Table::text(const Terminal& terminal, std::size_t indent) const {
     std::vector<Row> rows = m_rows;
     for (Row& row : rows) {
         for (std::string& cell : row) {
-            cell = terminal.shown(cell);
+            cell = terminal.sanitised(cell);
         }
     }
     const std::vector<std::size_t> widths = widthsOf(rows);

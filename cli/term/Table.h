@@ -19,8 +19,8 @@ public:
 
     void add(Row row) { m_rows.push_back(std::move(row)); }
 
-    /// All rows, each behind `indent` blanks. On a terminal the words of the last column go on in further lines
-    /// where they don't fit; elsewhere a row is a line, for whatever reads lines.
+    /// All rows, indented. On a terminal the words of the last column continue in further lines if they don't fit;
+    /// otherwise a row is a line, for programs that read lines.
     [[nodiscard]] std::string text(const Terminal& terminal, std::size_t indent = 0) const;
 
 private:
@@ -28,12 +28,11 @@ private:
     bool m_hasHeadings = false;
 };
 
-/// The words, with `separator` and a blank between, broken into lines of at most `width` columns where the words
-/// allow it.
+/// The words, joined by `separator` and a blank, in lines of at most `width` columns. A longer word has its own line.
 [[nodiscard]] std::vector<std::string> lines(const std::vector<std::string>& words, std::size_t width,
                                              std::string_view separator = ",");
 
-/// The same, with commas, as a text of that width, each line behind `indent` blanks.
+/// The same with commas, as a text of that width with indented lines.
 [[nodiscard]] std::string wrapped(const std::vector<std::string>& words, std::size_t indent,
                                   std::size_t width = LINE_WIDTH);
 

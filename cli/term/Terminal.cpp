@@ -1,6 +1,7 @@
-// The one place that knows terminals: whether there is one, how wide it is, and how it is told to colour a text.
+// The one place that knows terminals: whether there is one, how wide it is, and how to colour a text.
 #include "term/Terminal.h"
 
+#include <algorithm>
 #include <charconv>
 #include <cstdlib>
 #include <optional>
@@ -9,7 +10,7 @@
 
 namespace {
 
-/// A variable of the environment; one without a text counts as absent.
+/// A variable of the environment; nothing if it is empty.
 std::optional<std::string_view> variable(const char* name) {
     const char* const text = std::getenv(name);
     return text == nullptr || *text == '\0' ? std::nullopt : std::optional<std::string_view>(text);
@@ -21,7 +22,10 @@ bool isControl(std::string_view text, std::size_t index) {
     return byte < 0x20 || byte == 0x7F || (byte == 0xC2 && next >= 0x80 && next <= 0x9F);
 }
 
-std::size_t columnsOf(int descriptor) {
+/// The width of what has no width: far more than any line needs, and safe to calculate with.
+constexpr std::size_t UNLIMITED = std::size_t{1} << 40U;
+
+std::size_t columnsOf(int descriptor, bool isTerminal) {
     if (const std::optional<std::string_view> columns = variable("COLUMNS")) {
         std::size_t number = 0;
         const char* const end = columns->data() + columns->size();
@@ -29,6 +33,9 @@ std::size_t columnsOf(int descriptor) {
         if (read.ec == std::errc() && read.ptr == end && number != 0) {
             return number;
         }
+    }
+    if (!isTerminal) {
+        return UNLIMITED;
     }
     winsize size{};
     return ::ioctl(descriptor, TIOCGWINSZ, &size) == 0 && size.ws_col != 0 ? size.ws_col : LINE_WIDTH;
@@ -44,25 +51,38 @@ bool showsColours(bool isTerminal, Terminal::Colours colours) {
 } // namespace
 
 std::string printable(std::string_view text) {
-    std::string shown;
+    std::string result;
     for (std::size_t i = 0; i < text.size(); ++i) {
         if (text[i] == '\t') {
-            shown += ' ';
+            result += ' ';
         } else if (isControl(text, i)) {
-            shown += '?';
+            result += '?';
             i += text[i] == '\xC2' ? 1U : 0U;
         } else {
-            shown += text[i];
+            result += text[i];
         }
     }
-    return shown;
+    return result;
+}
+
+std::string printableLines(std::string_view text) {
+    std::string result;
+    for (std::size_t start = 0; start < text.size();) {
+        const std::size_t end = std::min(text.find('\n', start), text.size());
+        result += printable(text.substr(start, end - start));
+        if (end < text.size()) {
+            result += '\n';
+        }
+        start = end + 1;
+    }
+    return result;
 }
 
 Terminal::Terminal(int descriptor, Colours colours)
     : m_isTerminal(::isatty(descriptor) == 1), m_hasColours(showsColours(m_isTerminal, colours)),
-      m_width(columnsOf(descriptor)) {}
+      m_width(columnsOf(descriptor, m_isTerminal)) {}
 
-std::string Terminal::shown(std::string_view text) const {
+std::string Terminal::sanitised(std::string_view text) const {
     return m_isTerminal ? printable(text) : std::string(text);
 }
 

@@ -13,7 +13,8 @@ struct Verdict {
 };
 
 [[nodiscard]] inline std::string asText(const Verdict& verdict, const Terminal& terminal) {
-    return (verdict.allowed ? terminal.good("yes:") : terminal.bad("no:")) + ' ' + verdict.question + '\n';
+    return (verdict.allowed ? terminal.good("yes:") : terminal.bad("no:")) + ' ' +
+           terminal.sanitised(verdict.question) + '\n';
 }
 
 [[nodiscard]] inline Json asJson(const Verdict& verdict) {

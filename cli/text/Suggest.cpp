@@ -1,26 +1,30 @@
 // Suggestions for mistyped names: the edit distance, cut off where a suggestion would be a guess.
 #include "text/Suggest.h"
 
+#include <AcdText.h>
+
 #include <algorithm>
 #include <numeric>
+#include <utility>
 
 namespace {
 
-char lowerCase(char letter) {
-    return letter >= 'A' && letter <= 'Z' ? static_cast<char>(letter - 'A' + 'a') : letter;
-}
-
-/// The least number of insertions, deletions and replacements that turn one text into the other.
+/// The least number of insertions, deletions, replacements and exchanges of neighbours that turn one text into the
+/// other.
 std::size_t distance(std::string_view left, std::string_view right) {
+    std::vector<std::size_t> beforeLast;
+    std::vector<std::size_t> last(right.size() + 1);
     std::vector<std::size_t> row(right.size() + 1);
     std::iota(row.begin(), row.end(), std::size_t{0});
     for (std::size_t i = 0; i < left.size(); ++i) {
-        std::size_t diagonal = row[0];
+        beforeLast = std::exchange(last, row);
         row[0] = i + 1;
         for (std::size_t j = 0; j < right.size(); ++j) {
-            const std::size_t replaced = diagonal + (left[i] == right[j] ? 0 : 1);
-            diagonal = row[j + 1];
-            row[j + 1] = std::min({replaced, diagonal + 1, row[j] + 1});
+            const std::size_t replaced = last[j] + (left[i] == right[j] ? 0 : 1);
+            row[j + 1] = std::min({replaced, last[j + 1] + 1, row[j] + 1});
+            if (i > 0 && j > 0 && left[i] == right[j - 1] && left[i - 1] == right[j]) {
+                row[j + 1] = std::min(row[j + 1], beforeLast[j - 1] + 1);
+            }
         }
     }
     return row.back();
@@ -33,18 +37,13 @@ std::size_t difference(std::size_t left, std::size_t right) {
 } // namespace
 
 bool sameWithoutCase(std::string_view left, std::string_view right) {
-    return std::equal(left.begin(), left.end(), right.begin(), right.end(),
-                      [](char one, char other) { return lowerCase(one) == lowerCase(other); });
+    return AcdText::equalsIgnoreCase(left, right);
 }
 
-std::string lowerCase(std::string_view text) {
-    std::string lower(text);
-    std::transform(lower.begin(), lower.end(), lower.begin(), [](char letter) { return lowerCase(letter); });
-    return lower;
-}
+std::string lowerCase(std::string_view text) { return AcdText::lowerCase(text); }
 
-std::optional<std::string> nearest(std::string_view text, const std::vector<std::string>& candidates) {
-    // Nobody mistypes a name of this length; and the distance costs the product of both lengths.
+std::optional<std::string> suggest(std::string_view text, const std::vector<std::string>& candidates) {
+    // A name of this length is not mistyped, and the distance costs the product of both lengths.
     constexpr std::size_t LONGEST = 100;
     if (text.empty() || text.size() > LONGEST) {
         return std::nullopt;
@@ -72,6 +71,6 @@ std::optional<std::string> nearest(std::string_view text, const std::vector<std:
 }
 
 std::string didYouMean(std::string_view text, const std::vector<std::string>& candidates) {
-    const std::optional<std::string> candidate = nearest(text, candidates);
+    const std::optional<std::string> candidate = suggest(text, candidates);
     return candidate ? "; did you mean \"" + *candidate + "\"?" : std::string();
 }

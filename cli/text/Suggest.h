@@ -5,14 +5,19 @@
 #include <string_view>
 #include <vector>
 
-/// The candidate that a mistyped text most likely meant, without regard to case; nothing when none is near.
-[[nodiscard]] std::optional<std::string> nearest(std::string_view text,
+/// The candidate that a mistyped text most likely means, in any case; nothing if none is near.
+[[nodiscard]] std::optional<std::string> suggest(std::string_view text,
                                                  const std::vector<std::string>& candidates);
 
-/// `; did you mean "KS50"?`, or nothing.
+[[nodiscard]] inline std::optional<std::string> nearest(std::string_view text,
+                                                        const std::vector<std::string>& candidates) {
+    return suggest(text, candidates);
+}
+
+/// `; did you mean "KS50"?`, or an empty text.
 [[nodiscard]] std::string didYouMean(std::string_view text, const std::vector<std::string>& candidates);
 
-/// The same text but for ASCII case?
+/// Whether the texts are the same but for ASCII case.
 [[nodiscard]] bool sameWithoutCase(std::string_view left, std::string_view right);
 
 /// The text in ASCII lower case.

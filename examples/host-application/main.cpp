@@ -103,10 +103,18 @@ int main(int argc, char** argv) try {
         const bool offered = manager->checkConstraints(MODE_TYPE::DP770, CABLE, device, nullptr);
         std::cout << "In the desktop programmer: " << (offered ? "yes" : "no") << '\n';
     } catch (const DataMismatchException& fault) {
-        std::cerr << "the database has a malformed record (" << fault.line() << ")\n";
+        std::cerr << "the database has a malformed record: " << fault.what() << '\n';
         status = 2;
     } catch (const OutOfRangeException& fault) {
-        std::cerr << device << " belongs to a family that is not supported (" << fault.line() << ")\n";
+        // Raised for a family that the base database does not list; other locations are those of words in records.
+        constexpr int FAMILY_NOT_SUPPORTED = 1999;
+        if (fault.line() != FAMILY_NOT_SUPPORTED) {
+            std::cerr << "the database has an unknown word: " << fault.what() << '\n';
+        } else if (manager->getAllDeviceIdcodes().empty()) {
+            std::cerr << "there is no device database in " << argv[1] << '\n';
+        } else {
+            std::cerr << device << " belongs to no family that is supported: " << fault.what() << '\n';
+        }
         status = 2;
     }
     log.print();

@@ -170,7 +170,7 @@ Value DatabaseBuilder::join(Assignments::iterator first, Assignments::iterator l
     for (auto part = first; part != last; ++part) {
         length += part->value.m_textLength;
     }
-    auto& text = m_database.m_joinedTexts.emplace_back(std::make_unique_for_overwrite<char[]>(length));
+    auto& text = m_database.m_joinedTexts.emplace_back(makeBuffer(length));
     auto& spans = m_database.m_spans;
 
     Value joined = first->value;

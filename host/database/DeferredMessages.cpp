@@ -22,6 +22,11 @@ void DeferredMessages::addMissingBase(const std::string& where) {
     m_messages.push_back({location::BASE_MISSING, "no base.acd " + printable(where)});
 }
 
+void DeferredMessages::addTooLate(const char* what) {
+    m_messages.push_back({location::SET_TOO_LATE,
+                          std::string(what) + " can't be set after databases were looked for: ignored"});
+}
+
 void DeferredMessages::issue() {
     while (!m_messages.empty()) {
         const Report report = std::move(m_messages.front());

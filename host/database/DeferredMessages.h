@@ -19,6 +19,7 @@ namespace location {
 inline constexpr int BASE_MISSING = 101;
 inline constexpr int FILE_UNREADABLE = 102;
 inline constexpr int DIRECTORY_UNREADABLE = 103;
+inline constexpr int SET_TOO_LATE = 104;
 
 } // namespace location
 
@@ -34,6 +35,10 @@ public:
 
     /// There is no base database.
     void addMissingBase(const std::string& where);
+
+    /// Databases can no longer come from somewhere else.
+    /// @param what was set in vain
+    void addTooLate(const char* what);
 
     /// Adds what the other has, which then has none.
     void add(DeferredMessages&& other) noexcept { m_messages.splice(m_messages.end(), other.m_messages); }

@@ -19,6 +19,9 @@ std::string_view fileNameOf(std::string_view path) noexcept { return path.substr
 
 std::string_view familyName(std::string_view fileName) noexcept {
     constexpr std::string_view EXTENSION = ".acd";
+    if (fileName.starts_with('.')) {
+        return {}; // a lock or a backup of an editor
+    }
     const std::size_t length = fileName.size() - std::min(fileName.size(), EXTENSION.size());
     return AcdText::equalsIgnoreCase(fileName.substr(length), EXTENSION) ? fileName.substr(0, length)
                                                                          : std::string_view();

@@ -110,12 +110,12 @@ std::vector<std::string> listDirectory(const std::string& path) {
 Text readAll(ByteSource& source) {
     // One byte more than expected, so that the end is met without asking for more memory.
     std::size_t capacity = source.expectedSize() + 1;
-    Text text{std::make_unique_for_overwrite<char[]>(capacity), 0};
+    Text text{makeBuffer(capacity), 0};
     while (const std::size_t count = source.read(text.bytes.get() + text.size, capacity - text.size)) {
         text.size += count;
         if (text.size == capacity) {
             capacity *= 2;
-            auto larger = std::make_unique_for_overwrite<char[]>(capacity);
+            auto larger = makeBuffer(capacity);
             std::memcpy(larger.get(), text.bytes.get(), text.size);
             text.bytes = std::move(larger);
         }

@@ -77,6 +77,11 @@ private:
     std::string_view m_rest;
 };
 
+/// Memory for so many bytes, which have no values yet: clearing what is read into next would take time.
+[[nodiscard]] inline std::unique_ptr<char[]> makeBuffer(std::size_t size) {
+    return std::unique_ptr<char[]>(new char[size]);
+}
+
 /// A text in memory of its own.
 struct Text {
     std::unique_ptr<char[]> bytes;

@@ -2,6 +2,7 @@
 
 #include "database/Database.h"
 #include "database/FileNames.h"
+#include "database/ParseError.h"
 
 #include <PM_DEVKEY.h>
 
@@ -76,6 +77,29 @@ AcdStore::Read ReadLog::describe(const PM_DEVKEY& accessor) {
         read.location = locationIn(database, *value, item.offset() + offset);
     }
     return read;
+}
+
+std::string ReadLog::describeLatest() {
+    if (s_latest == nullptr) {
+        return {};
+    }
+    const AcdStore::Read read = describe(*s_latest);
+    std::string text;
+    if (read.itemLocation.file.empty()) {
+        text = printable(read.family);
+    } else {
+        const AcdStore::SourceLocation& location = read.text == nullptr ? read.itemLocation : read.location;
+        text = printable(location.file) + ':' + std::to_string(location.line) + ':' +
+               std::to_string(location.column);
+    }
+    if (!read.device.empty()) {
+        text += ": [" + printable(read.device) + ']';
+    }
+    text += ": " + excerpt(read.key) + ", item " + std::to_string(read.item);
+    if (read.subSeparator != nullptr) {
+        text += ", field " + std::to_string(read.field);
+    }
+    return text + ": " + (read.text == nullptr ? "missing" : '\'' + excerpt(read.text) + '\'');
 }
 
 void ReadLog::notify(const PM_DEVKEY& accessor) {

@@ -2,6 +2,8 @@
 
 #include <AcdStore.h>
 
+#include <string>
+
 class PM_DEVKEY;
 
 namespace acd {
@@ -20,6 +22,12 @@ public:
             notify(accessor);
         }
     }
+
+    /// Forgets the latest read.
+    static void clear() noexcept { s_latest = nullptr; }
+
+    /// The latest read in one line without a line end: where, what, and the text. Empty if there is none.
+    [[nodiscard]] static std::string describeLatest();
 
     /// Forgets the latest read if it is this accessor's.
     static void forget(const PM_DEVKEY& accessor) noexcept {

@@ -1,28 +1,51 @@
 #include "database/SearchPath.h"
 
 #include <cstdlib>
+#include <exception>
 #include <filesystem>
 #include <system_error>
 #include <utility>
 
 #include <dlfcn.h>
 
-// Where databases are looked for when nobody says so: what the environment and the place of the installed
-// library have to say about it.
+// Where databases are looked for by default: in the directories of the environment, else beside the installed
+// library.
 
 namespace acd {
 
 namespace {
 
-/// The file that this code was loaded from, as the loader names it.
-[[nodiscard]] std::string ownLibrary() {
-    static const char anchor = 0;
-    Dl_info information{};
-    return dladdr(&anchor, &information) != 0 && information.dli_fname != nullptr ? information.dli_fname
-                                                                                  : "";
+/// The file of this code. Never destroyed, since databases may be looked for at exit.
+[[nodiscard]] const std::string& ownFile() {
+    static const auto& file = *new std::string(findOwnFile());
+    return file;
+}
+
+/// Looks for it when the library is loaded: a relative name loses its meaning when the program changes its
+/// directory.
+[[gnu::constructor]] void rememberOwnFile() {
+    try {
+        static_cast<void>(ownFile());
+    } catch (const std::exception&) {
+        // No memory: it is looked for again when it is needed.
+    }
 }
 
 } // namespace
+
+std::string findOwnFile() {
+    static const char anchor = 0;
+    Dl_info information{};
+    if (dladdr(&anchor, &information) == 0 || information.dli_fname == nullptr) {
+        return {};
+    }
+    const std::filesystem::path file = information.dli_fname;
+    std::error_code error;
+    // A bare name is the program's own, as it was typed: the loader names libraries by their paths.
+    return (file.has_parent_path() ? std::filesystem::absolute(file, error)
+                                   : std::filesystem::read_symlink("/proc/self/exe", error))
+        .string();
+}
 
 SearchPath defaultSearchPath() {
     // Not from the environment of a process that runs with more rights than its user has.
@@ -31,7 +54,7 @@ SearchPath defaultSearchPath() {
             return {std::move(directories), {}};
         }
     }
-    return installedSearchPath(ownLibrary());
+    return installedSearchPath(ownFile());
 }
 
 std::vector<std::string> splitDirectories(std::string_view list) {
@@ -51,7 +74,7 @@ SearchPath installedSearchPath(const std::string& library) {
     const std::filesystem::path directory = std::filesystem::path(library).parent_path();
     SearchPath searchPath;
     if (directory.empty()) {
-        return searchPath; // a bare name says nothing about its place
+        return searchPath; // the place is unknown
     }
     // lib, or lib/<architecture>
     for (const char* const prefix : {"..", "../.."}) {

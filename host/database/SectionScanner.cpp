@@ -38,7 +38,7 @@ void PackedStrings::add(std::string_view name) {
 }
 
 SectionScanner::SectionScanner(std::size_t bufferSize)
-    : m_bufferSize(bufferSize), m_buffer(std::make_unique_for_overwrite<char[]>(bufferSize)) {}
+    : m_bufferSize(bufferSize), m_buffer(makeBuffer(bufferSize)) {}
 
 const PackedStrings& SectionScanner::names(const std::function<std::unique_ptr<ByteSource>()>& open) {
     m_names.clear();

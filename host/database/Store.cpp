@@ -1,5 +1,7 @@
 #include "database/Store.h"
 
+#include "database/ReadLog.h"
+
 #include <TarvikException.h>
 
 #include <utility>
@@ -8,6 +10,16 @@
 // raised when what is there can't be read.
 
 namespace acd {
+
+namespace {
+
+/// No value that was read is the cause.
+[[noreturn]] void raise(int location) {
+    ReadLog::clear();
+    throw DataNotFoundException(PRODUCT, SOURCE, REVISION, location);
+}
+
+} // namespace
 
 Store*& Store::current() {
     // Never destroyed: readers may be used until the very end of the process.
@@ -20,22 +32,29 @@ Store& Store::instance() { return *current(); }
 void Store::resetForTesting() { delete std::exchange(current(), new Store); }
 
 void Store::setSearchPath(std::vector<std::string> directories) {
-    retire();
+    if (isSettled("the search path")) {
+        return;
+    }
     m_memoryFiles.reset();
     m_searchPath = SearchPath{std::move(directories), {}};
 }
 
 void Store::setMemoryFiles(MemoryFiles files) {
-    auto shared = std::make_shared<const MemoryFiles>(std::move(files));
-    retire();
-    m_memoryFiles = std::move(shared);
+    if (isSettled("the files in memory")) {
+        return;
+    }
+    m_memoryFiles = std::make_shared<const MemoryFiles>(std::move(files));
     m_searchPath = SearchPath();
 }
 
-void Store::retire() {
-    if (m_catalogue != nullptr) {
-        m_retired.push_back(std::move(m_catalogue));
+/// Databases never change once they have been looked for: answers of two would be mixed. Reports an attempt.
+bool Store::isSettled(const char* what) {
+    if (m_catalogue == nullptr) {
+        return false;
     }
+    m_messages.addTooLate(what);
+    m_messages.issue();
+    return true;
 }
 
 const std::vector<std::string>& Store::directories() { return searchPath().directories; }
@@ -54,10 +73,8 @@ Catalogue& Store::catalogue() {
                                                : std::make_unique<Catalogue>(directories(), found);
         m_messages.add(std::move(found));
     }
-    // Who receives the reports may set another search path; this catalogue then lives on, retired.
-    Catalogue& catalogue = *m_catalogue;
     m_messages.issue();
-    return catalogue;
+    return *m_catalogue;
 }
 
 const std::vector<std::unique_ptr<Family>>& Store::families() { return catalogue().families(); }
@@ -65,6 +82,8 @@ const std::vector<std::unique_ptr<Family>>& Store::families() { return catalogue
 Family* Store::family(std::string_view name) { return catalogue().family(name); }
 
 Resolution Store::resolve(std::string_view name) {
+    // What was read before has nothing to do with what may be wrong with this name.
+    ReadLog::clear();
     Catalogue& catalogue = this->catalogue();
     const auto resolveWhole = [&](std::string_view whole) -> Resolution {
         if (Family* const family = catalogue.familyOfFile(whole)) {
@@ -98,7 +117,7 @@ DatabaseHandle Store::openBase() {
     }
     m_messages.addMissingBase(placesSearched());
     m_messages.issue();
-    throw DataNotFoundException(PRODUCT, SOURCE, REVISION, location::BASE_MISSING);
+    raise(location::BASE_MISSING);
 }
 
 /// Where the catalogue comes from, for the user to look there.
@@ -121,7 +140,7 @@ const Database& Store::database(Family& family) {
     const Database* const database = catalogue().database(family, m_messages);
     m_messages.issue();
     if (database == nullptr) {
-        throw DataNotFoundException(PRODUCT, SOURCE, REVISION, location::FILE_UNREADABLE);
+        raise(location::FILE_UNREADABLE);
     }
     return *database;
 }
@@ -138,7 +157,7 @@ Text Store::read(const SourceFile& file) {
         m_messages.add(file.path, location::FILE_UNREADABLE, unreadable.what());
     }
     m_messages.issue();
-    throw DataNotFoundException(PRODUCT, SOURCE, REVISION, location::FILE_UNREADABLE);
+    raise(location::FILE_UNREADABLE);
 }
 
 PM_DEVKEY& Store::accessor(const DatabaseHandle& opened) {

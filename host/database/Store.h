@@ -34,7 +34,7 @@ public:
     /// Makes the process forget all that was set and read.
     static void resetForTesting();
 
-    /// From now on databases come from there. Those already read stay as they are, for those who use them.
+    /// Sets where databases come from. Ignored, with a message, once they have been looked for.
     void setSearchPath(std::vector<std::string> directories);
     void setMemoryFiles(MemoryFiles files);
 
@@ -80,12 +80,11 @@ private:
     [[nodiscard]] const SearchPath& searchPath();
     [[nodiscard]] Catalogue& catalogue();
     [[nodiscard]] std::string placesSearched();
-    void retire();
+    [[nodiscard]] bool isSettled(const char* what);
 
     std::shared_ptr<const MemoryFiles> m_memoryFiles; ///< null while databases come from directories
     std::optional<SearchPath> m_searchPath;           ///< once it is settled
-    std::unique_ptr<Catalogue> m_catalogue;
-    std::vector<std::unique_ptr<Catalogue>> m_retired;
+    std::unique_ptr<Catalogue> m_catalogue;           ///< once databases have been looked for
     DeferredMessages m_messages;
 
     const Database m_nothing{};

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <TarvikAbi.h>
+
 #include <cstddef>
 #include <functional>
 #include <map>
@@ -16,12 +18,14 @@
 /// What has been read lives as long as the process.
 class __attribute__((visibility("default"))) AcdStore {
 public:
-    /// Looks in these directories. Call it before the first reader.
+    /// Looks in these directories. To be called before the first reader: once a reader, a configuration or a
+    /// method of this class but `searchPath()` has looked for a database, so once a manager exists, the call is
+    /// ignored and an info message says so.
     /// @param directories the first one on top: where several hold a file, its keys replace or, with `+=`,
     ///        extend those of the layers below
     static void setSearchPath(std::vector<std::string> directories);
 
-    /// Holds these files in place of any directory. Call it before the first reader.
+    /// Uses these files instead of any directory. To be called before the first reader, as `setSearchPath`.
     /// @param files name ("kestrel.acd") to text
     static void setMemoryFiles(std::map<std::string, std::string> files);
 

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <AcdText.h>
+#include <TarvikAbi.h>
 
 #include <cstddef>
 #include <string>

@@ -1,7 +1,19 @@
 #pragma once
 
+#include "TarvikAbi.h"
+
 #include <functional>
 #include <string_view>
+
+// Applications define macros of these names (-DDEBUG), which must not replace the enumerators.
+#pragma push_macro("INFO")
+#pragma push_macro("STATUS")
+#pragma push_macro("DEBUG")
+#pragma push_macro("TRACE")
+#undef INFO
+#undef STATUS
+#undef DEBUG
+#undef TRACE
 
 /// The message manager: everything that the libraries say goes through it, and out through one sink.
 ///
@@ -13,9 +25,10 @@ class __attribute__((visibility("default"))) Port_MsgManData {
 public:
     /// Whom a message is for.
     enum class Channel : int {
-        INFO,   ///< notices to the user
-        STATUS, ///< status and dump lines
-        DEBUG,  ///< trace output for developers
+        INFO,          ///< notices to the user
+        STATUS,        ///< status and dump lines
+        DEBUG,         ///< trace output for developers
+        TRACE = DEBUG, ///< the same, for applications that define a macro DEBUG
     };
 
     /// One message on its way to the sink. The texts are valid during the sink's call only.
@@ -31,8 +44,9 @@ public:
     /// What takes the messages.
     using Sink = std::function<void(const Message&)>;
 
-    /// Sends all messages to a sink from now on. What it throws passes through to the caller that issued the
-    /// message.
+    /// Sends all messages to a sink from now on. A sink must not throw: what it throws passes through the library
+    /// to whoever asked it, in the middle of its work. A sink of a plugin has to be removed before the plugin is
+    /// unloaded.
     /// @param sink an empty one restores the default: info to standard error, status to standard output, debug
     ///        dropped unless the environment variable TARVIK_DEBUG is set (then to standard error)
     /// @return the former sink; empty when that was the default
@@ -82,3 +96,8 @@ private:
     int m_line;
     const char* m_revision;
 };
+
+#pragma pop_macro("TRACE")
+#pragma pop_macro("DEBUG")
+#pragma pop_macro("STATUS")
+#pragma pop_macro("INFO")

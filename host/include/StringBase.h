@@ -1,9 +1,13 @@
 #pragma once
 
+#include "TarvikAbi.h"
+
 #include <cstddef>
 #include <cstdint>
+#include <iosfwd>
 #include <string>
 #include <string_view>
+#include <type_traits>
 
 /// A byte string with length: the text type of every interface and container of the system.
 ///
@@ -25,6 +29,10 @@ public:
     /// @param bytes may be null when `length` is 0
     /// @param length how many
     StringBase(const char* bytes, std::size_t length) : m_text(std::string_view(bytes, length)) {}
+
+    /// Copies a text of the standard library, NULs included.
+    /// @param text any text
+    explicit StringBase(std::string_view text) : m_text(text) {}
 
     /// Becomes a copy.
     /// @param text NUL-terminated; null is the empty text
@@ -53,6 +61,17 @@ public:
 
     /// @return the number of bytes, without the terminator
     [[nodiscard]] std::size_t GetLength() const noexcept { return m_text.size(); }
+
+    /// @return the bytes; valid until this object is changed or destroyed
+    [[nodiscard]] operator std::string_view() const noexcept { return m_text; }
+
+    /// @return whether there are no bytes
+    [[nodiscard]] bool empty() const noexcept { return m_text.empty(); }
+
+    /// @return the first byte; valid until this object is changed or destroyed
+    [[nodiscard]] const char* begin() const noexcept { return m_text.data(); }
+    /// @return the end of the bytes, likewise
+    [[nodiscard]] const char* end() const noexcept { return m_text.data() + m_text.size(); }
 
     /// Becomes a finished text.
     /// @param text `%%` in it gives `%`, any other `%` stands as it is
@@ -107,18 +126,74 @@ private:
     std::string m_text;
 };
 
-/// Are two texts the same?
-/// @param left any text
-/// @param right any text
-/// @return whether they have the same length and the same bytes
-[[nodiscard]] inline bool operator==(const StringBase& left, const StringBase& right) noexcept {
-    return left.GetLength() == right.GetLength() && left.Compare(right) == 0;
-}
+/// Comparisons of a text with any kind of text, in byte order as unsigned bytes, the shorter first on a tie. A
+/// null text is the empty text.
+namespace StringBaseComparison {
 
-/// Do two texts differ?
-/// @param left any text
-/// @param right any text
-/// @return whether they do
+[[nodiscard]] inline std::string_view view(const char* text) noexcept {
+    return text == nullptr ? std::string_view() : std::string_view(text);
+}
+[[nodiscard]] inline std::string_view view(std::string_view text) noexcept { return text; }
+
+/// Takes part if `Text` is a text, but not a `StringBase`.
+template <typename Text>
+using IfOther = std::enable_if_t<std::is_convertible_v<const Text&, std::string_view> &&
+                                 !std::is_base_of_v<StringBase, Text>>;
+
+} // namespace StringBaseComparison
+
+// clang-format off
+[[nodiscard]] inline bool operator==(const StringBase& left, const StringBase& right) noexcept {
+    return std::string_view(left) == std::string_view(right);
+}
 [[nodiscard]] inline bool operator!=(const StringBase& left, const StringBase& right) noexcept {
     return !(left == right);
 }
+[[nodiscard]] inline bool operator<(const StringBase& left, const StringBase& right) noexcept {
+    return std::string_view(left) < std::string_view(right);
+}
+template <typename Text, typename = StringBaseComparison::IfOther<Text>>
+[[nodiscard]] bool operator==(const StringBase& left, const Text& right) noexcept {
+    return std::string_view(left) == StringBaseComparison::view(right);
+}
+template <typename Text, typename = StringBaseComparison::IfOther<Text>>
+[[nodiscard]] bool operator==(const Text& left, const StringBase& right) noexcept {
+    return right == left;
+}
+template <typename Text, typename = StringBaseComparison::IfOther<Text>>
+[[nodiscard]] bool operator!=(const StringBase& left, const Text& right) noexcept {
+    return !(left == right);
+}
+template <typename Text, typename = StringBaseComparison::IfOther<Text>>
+[[nodiscard]] bool operator!=(const Text& left, const StringBase& right) noexcept {
+    return !(right == left);
+}
+template <typename Text, typename = StringBaseComparison::IfOther<Text>>
+[[nodiscard]] bool operator<(const StringBase& left, const Text& right) noexcept {
+    return std::string_view(left) < StringBaseComparison::view(right);
+}
+template <typename Text, typename = StringBaseComparison::IfOther<Text>>
+[[nodiscard]] bool operator<(const Text& left, const StringBase& right) noexcept {
+    return StringBaseComparison::view(left) < std::string_view(right);
+}
+// clang-format on
+
+/// Writes the bytes of a text. Include <ostream> to use it.
+/// @param stream of bytes
+/// @param text any text
+/// @return the stream
+template <typename Traits>
+std::basic_ostream<char, Traits>& operator<<(std::basic_ostream<char, Traits>& stream,
+                                             const StringBase& text) {
+    return stream << std::basic_string_view<char, Traits>(text.c_str(), text.GetLength());
+}
+
+/// Hashes the bytes of a text, as those of a `std::string_view`.
+template <>
+struct std::hash<StringBase> {
+    /// @param text any text
+    /// @return its hash
+    [[nodiscard]] std::size_t operator()(const StringBase& text) const noexcept {
+        return std::hash<std::string_view>()(text);
+    }
+};

@@ -1,6 +1,10 @@
 #pragma once
 
+#include "TarvikAbi.h"
+
 #include <exception>
+#include <memory>
+#include <string>
 
 namespace Port {
 
@@ -22,7 +26,8 @@ public:
     /// @param source of the place
     /// @param revision of the source
     /// @param line the location number of the place
-    TarvikException(const char* product, const char* source, const char* revision, int line) noexcept;
+    TarvikException(const char* product, const char* source, const char* revision, int line) noexcept
+        : TarvikException("TarvikException", product, source, revision, line) {}
     ~TarvikException() override;
 
     /// @return the product that failed
@@ -36,54 +41,72 @@ public:
     [[nodiscard]] int line() const noexcept { return m_line; }
 
     /// @return the name of the exception's type
+    [[nodiscard]] const char* typeName() const noexcept { return m_typeName; }
+
+    /// What happened, in one line: the type, the source and the location number, and the value that was read last
+    /// from a database, with its file, line and column ("OutOfRangeException at ../s/ConstraintsManager, line
+    /// 1631; last read: /db/kestrel.acd:12:5: OPERATION, item 3, field 0: 'PROGRM'"). Items and fields are
+    /// counted from 0. The last read is left out if nothing was read since a database was opened last.
+    /// @return the text, which lives as long as this exception and its copies; the type alone without memory
     [[nodiscard]] const char* what() const noexcept override;
 
     /// Issues one info message with the exception's type and its place of origin.
     virtual void report() const;
 
+protected:
+    /// A failure of a type that derives from this one.
+    /// @param typeName of that type
+    /// @param product that fails
+    /// @param source of the place
+    /// @param revision of the source
+    /// @param line the location number of the place
+    TarvikException(const char* typeName, const char* product, const char* source, const char* revision,
+                    int line) noexcept;
+
 private:
+    const char* m_typeName;
     const char* m_product;
     const char* m_source;
     const char* m_revision;
     int m_line;
+    std::shared_ptr<const std::string> m_text; ///< null if there was no memory for it
 };
 
 /// A failure of the data or of the call, rather than of the machine.
 class __attribute__((visibility("default"))) LogicException : public TarvikException {
 public:
     /// @copydoc TarvikException::TarvikException(const char*, const char*, const char*, int)
-    using TarvikException::TarvikException;
+    LogicException(const char* product, const char* source, const char* revision, int line) noexcept
+        : TarvikException("LogicException", product, source, revision, line) {}
     ~LogicException() override;
-    /// @return the name of the exception's type
-    [[nodiscard]] const char* what() const noexcept override;
+
+protected:
+    using TarvikException::TarvikException;
 };
 
 /// A record of the database does not have the form it must have.
 class __attribute__((visibility("default"))) DataMismatchException : public LogicException {
 public:
     /// @copydoc TarvikException::TarvikException(const char*, const char*, const char*, int)
-    using LogicException::LogicException;
+    DataMismatchException(const char* product, const char* source, const char* revision, int line) noexcept
+        : LogicException("DataMismatchException", product, source, revision, line) {}
     ~DataMismatchException() override;
-    /// @return the name of the exception's type
-    [[nodiscard]] const char* what() const noexcept override;
 };
 
 /// A value or a name lies outside what there is.
 class __attribute__((visibility("default"))) OutOfRangeException : public LogicException {
 public:
     /// @copydoc TarvikException::TarvikException(const char*, const char*, const char*, int)
-    using LogicException::LogicException;
+    OutOfRangeException(const char* product, const char* source, const char* revision, int line) noexcept
+        : LogicException("OutOfRangeException", product, source, revision, line) {}
     ~OutOfRangeException() override;
-    /// @return the name of the exception's type
-    [[nodiscard]] const char* what() const noexcept override;
 };
 
 /// Data that must be there is not there, or can't be read.
 class __attribute__((visibility("default"))) DataNotFoundException : public LogicException {
 public:
     /// @copydoc TarvikException::TarvikException(const char*, const char*, const char*, int)
-    using LogicException::LogicException;
+    DataNotFoundException(const char* product, const char* source, const char* revision, int line) noexcept
+        : LogicException("DataNotFoundException", product, source, revision, line) {}
     ~DataNotFoundException() override;
-    /// @return the name of the exception's type
-    [[nodiscard]] const char* what() const noexcept override;
 };

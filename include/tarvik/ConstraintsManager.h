@@ -1,58 +1,50 @@
 #pragma once
 
-#include <tarvik/NameSequence.h>
-#include <tarvik/NameSet.h>
 #include <tarvik/TARVIKNS.h>
-#include <tarvik/TextHash.h>
 #include <tarvik/ltptstr.h>
 
 #include <StringBase.h>
 
-#include <array>
-#include <cstddef>
 #include <map>
-#include <memory>
-#include <memory_resource>
 #include <set>
-#include <string_view>
-#include <unordered_map>
 #include <vector>
 
-class PermissionTable;
-class PM_DEVKEY;
-class PropertyTable;
-class PropertyValues;
 class TarvikSmokeMgr;
 
-/// Tells a device-programming application what it may offer its user for a device.
+/// Answers what a device-programming application may offer its user for a device.
 ///
-/// One manager exists per process. It answers from the device database, which it reads as it goes: its
-/// start-up reads the base database and the SPI flash database, the first question about a device loads that
-/// device's records and its family's. It takes no lock: call it from one thread.
+/// A process has one manager. Its start-up reads the base database and the SPI flash database; the first question about a
+/// device loads that device's records and those of its family. It takes no lock: call it from one thread.
 ///
-/// **Arguments.** A null text is the empty text, but a null package is no package. A device name may carry a
-/// package behind its first "_"; the name before it is what families are found by. An enumeration may hold
-/// any integer; each method says what one outside its list gives.
+/// **Arguments.** A null text is treated as the empty text, except that a null package means no package. A device name
+/// may be followed by "_" and a package; families are found by the name before the first "_". An enumeration may hold
+/// any integer; each method says what it does with a value that is not listed. A text that a method returned is a valid
+/// argument of every method.
 ///
-/// **Results.** Texts, sets and maps that are returned by pointer or reference belong to the manager and live
-/// until it is removed; all others are the caller's. Bit i of a mask stands for the enumeration's value i.
+/// **Results.** Texts, sets and maps that are returned by pointer or reference belong to the manager. They stay valid
+/// until it is removed; texts and sets of properties also stay unchanged. All other results belong to the caller. Bit i
+/// of a mask stands for the enumeration's value i.
 ///
-/// **Errors.** A refusal is the answer no and a message, never an exception. While exceptions are on, as they
-/// are after the start-up, faults of the database raise; while they are off the same faults give a neutral
-/// value: false, 0, null or the empty set. A method that *loads* a device raises, the first time, for
-/// - a malformed record, `DataMismatchException` with the location of the fault (1011 to 1760), after a debug
-///   message. Cells that were filled before it stay filled, and the load is not tried again;
-/// - an operation that nobody knows (1631, 1688), a family that is not supported (1999) or no option package
-///   (2024), `OutOfRangeException`.
+/// **Errors.** A refusal is the answer false and a message, never an exception. Exceptions are on after the start-up.
+/// While they are on, faults of the database raise; while they are off, the same faults give a neutral value: false, 0,
+/// null or the empty set. A method that *loads* a device raises, the first time,
+/// - `DataMismatchException` for a malformed record (locations 1011 to 1760). What was read before the fault stays, and
+///   the load is not repeated: the device then answers from what was read;
+/// - `OutOfRangeException` for a record of an unknown operation (1631, 1688), for a family that is not supported (1999),
+///   and for a family that is not an option package (2024).
 ///
-/// Two faults raise in either case: a record of an option that nobody knows, `DataMismatchException` (1500),
-/// and a database file that is there but can't be read, `DataNotFoundException`.
+/// Two faults raise even while exceptions are off: a record of an unknown option, `DataMismatchException` (1500), and a
+/// database file that cannot be read, which every method that needs the file passes on as the host layer raises it.
+/// `docs/embedding.md` lists all locations.
+///
+/// **Messages.** A message sink may call the manager. It must not throw: an exception from a sink ends the call as a
+/// fault of the database does, and what was being loaded stays incomplete.
 class __attribute__((visibility("default"))) ConstraintsManager {
 public:
     /// Texts by name, in byte order of the names.
     using Texts = std::map<StringBase, StringBase, ltptstr>;
 
-    /// Texts, each once, in byte order.
+    /// Texts without repetition, in byte order.
     using TextSet = std::set<StringBase, ltptstr>;
 
     ConstraintsManager(const ConstraintsManager&) = delete;
@@ -60,19 +52,21 @@ public:
 
     // ---- The manager itself -------------------------------------------------------------------------------
 
-    /// The one manager of the process, made by the first call.
+    /// Returns the manager of the process. The first call makes it.
     ///
-    /// A database fault ends the start-up early, reports itself by an info message and leaves a manager that
-    /// answers from what it has.
-    /// @return the manager; null when there is no memory for the object itself. What else may fail (memory
-    ///         for the data) passes out, and the next call tries again.
+    /// A database fault ends the start-up early, reports itself by an info message, and leaves a manager that
+    /// answers from what was read before.
+    /// @return the manager; null when there is no memory for the object itself, and for a message sink that asks
+    ///         while the start-up issues a message
+    /// @throw std::bad_alloc when there is no memory for the data; the next call tries again
     [[nodiscard]] static ConstraintsManager* getConstraintsManager();
 
-    /// Destroys the manager, if there is one. Call it once, at shutdown, and nothing behind it: a manager
-    /// can't be made twice in a process.
+    /// Destroys the manager, if there is one. Call it once, at shutdown, and nothing after it: a process cannot make
+    /// a second manager.
     static void RemoveConstraintsManager();
 
-    /// Turns exceptions on (as they are after the start-up) or off, from the next call on.
+    /// Turns exceptions on (as they are after the start-up) or off, at once: a message sink that calls this while a
+    /// device is loaded decides about the rest of that load.
     /// @param exceptions true: faults raise; false: they give a neutral value
     void setExceptions(bool exceptions) noexcept;
 
@@ -84,52 +78,52 @@ public:
     /// @return the values 0 to 23; empty when a fault ended the start-up before they were set
     [[nodiscard]] const std::vector<TARVIKNS::PROGRAM_OPTION>& getProgramOptionOrders() const noexcept;
 
-    // ---- The vocabulary: conversions that need no manager and raise whatever `setExceptions` says ---------
+    // ---- The vocabulary: conversions that need no manager and do not depend on `setExceptions` -------------
 
     /// The mode that a text names.
-    /// @param text a key name, or a name that databases write, in any case
-    /// @return the mode; `BS` for every text that names none
+    /// @param text a key name, or a name that databases use, in any case
+    /// @return the mode; `BS` for every other text
     [[nodiscard]] static TARVIKNS::MODE_TYPE modeString2Type(const char* text) noexcept;
 
     /// The key name of a mode.
     /// @param mode any value
-    /// @return the name; "BS" for every value that is none
+    /// @return the name; "BS" for a value that is not listed
     [[nodiscard]] static StringBase modeType2String(TARVIKNS::MODE_TYPE mode);
 
     /// The output that a text names.
-    /// @param text a key name, case included
-    /// @return the output; `NONE` for every other text, "QSVF" and "NULLCABLE" too
+    /// @param text a key name, in upper case as listed
+    /// @return the output; `NONE` for every other text, including "QSVF" and "NULLCABLE"
     [[nodiscard]] static TARVIKNS::OUTPUT_TYPE cableString2Type(const char* text) noexcept;
 
     /// The key name of an output.
     /// @param output any value
-    /// @return the name; empty for every value that is none
+    /// @return the name; empty for a value that is not listed
     [[nodiscard]] static StringBase cableType2String(TARVIKNS::OUTPUT_TYPE output);
 
-    /// The operation that a key name stands for.
+    /// The operation with a key name.
     /// @param text a key name in any case
     /// @return the operation; for every other text `NO_OPERATION`, after the info message
     ///         "Operation %s is not defined.\n"
     [[nodiscard]] static TARVIKNS::OP_TYPE operationString2Type(const char* text);
 
-    /// The operation that a display name stands for.
+    /// The operation with a display name.
     /// @param text a display name in any case
     /// @return as `operationString2Type`
     [[nodiscard]] static TARVIKNS::OP_TYPE operationDisplayString2Type(const char* text);
 
     /// The key name of an operation.
     /// @param operation any value
-    /// @return the name; empty for every value that is none, after the info message
+    /// @return the name; empty for a value that is not listed, after the info message
     ///         "Operation %d is not defined.\n"
     [[nodiscard]] static StringBase operationType2String(TARVIKNS::OP_TYPE operation);
 
-    /// The name by which an operation is shown to users.
+    /// The name of an operation for users.
     /// @param operation any value
     /// @return as `operationType2String`
     [[nodiscard]] static StringBase operationType2DisplayString(TARVIKNS::OP_TYPE operation);
 
     /// The option that a text names.
-    /// @param text a key name, case included, of an option up to `SECTOR_LOCKDOWN`
+    /// @param text the key name, in upper case as listed, of an option up to `SECTOR_LOCKDOWN`
     /// @return the option
     /// @throw DataMismatchException (1500) for every other text
     [[nodiscard]] static TARVIKNS::PROGRAM_OPTION optionString2Type(const char* text);
@@ -137,345 +131,228 @@ public:
     /// The key name of an option.
     /// @param option 0 to 23
     /// @return the name
-    /// @throw DataMismatchException (1413) for every value that is none
+    /// @throw DataMismatchException (1413) for a value that is not listed
     [[nodiscard]] static StringBase optionType2String(TARVIKNS::PROGRAM_OPTION option);
 
-    /// Cuts a device name before its first "_"; a name without one stays as it is.
+    /// Cuts a device name before its first "_". A name without one does not change.
     /// @param device the name, changed in place
     static void removePackageName(StringBase& device);
 
     // ---- Checks -------------------------------------------------------------------------------------------
 
     /// May the mode use the output? Loads nothing.
-    /// @param mode a value that is none may use nothing
-    /// @param output any value; `PFF` may use each
+    /// @param mode any value; one that is not listed may use nothing, `PFF` may use everything
+    /// @param output any value. `NONE` also stands for all outputs in the database that have no name
     /// @return whether it may; a refusal issues the info message "%s is not supported in %s\n"
     [[nodiscard]] bool checkConstraints(TARVIKNS::MODE_TYPE mode, TARVIKNS::OUTPUT_TYPE output);
 
     /// May the device be configured in the mode? Loads nothing.
     /// @param mode `SPI` and `PFF` accept every device
-    /// @param device the device, whose family the mode must list
-    /// @param package in which the mode must not exclude the device; null asks for no package
+    /// @param device the device; the mode must list its family
+    /// @param package a package in which the mode must not exclude the device; null for no package
     /// @return whether it may; a refusal issues the info message "%s is not supported in %s\n"
-    /// @throw OutOfRangeException (644) while exceptions are on, for a value that is no mode
+    /// @throw OutOfRangeException (644) while exceptions are on, for a mode that is not listed, unless `BS` excludes
+    ///        the device in the package
     [[nodiscard]] bool checkConstraints(TARVIKNS::MODE_TYPE mode, const char* device, const char* package);
 
-    /// May the mode use the output, and the device be configured in it? Loads nothing.
-    /// @param mode unlike above, `SPI` and `PFF` do check the device
+    /// May the mode use the output, and may the device be configured in it? Loads nothing.
+    /// @param mode as above, but `PFF` checks the family of the device, and `SPI` that of the name "spi"
     /// @param output as above
     /// @param device as above
     /// @param package as above
-    /// @return whether both may; a refusal issues the info message as above, which names the output when
-    ///         both are refused
-    /// @throw OutOfRangeException (644) while exceptions are on, for a value that is no mode
+    /// @return whether both are allowed; a refusal issues the info message "%s is not supported in %s\n", which names
+    ///         the output if both are refused
+    /// @throw OutOfRangeException (644) as above
     [[nodiscard]] bool checkConstraints(TARVIKNS::MODE_TYPE mode, TARVIKNS::OUTPUT_TYPE output,
                                         const char* device, const char* package);
 
-    /// May the operation run on the device, in the mode, through the output? Loads the device.
-    /// @param mode in `SPI` the answer is that of "spi", whatever the device; else 0 to 8
-    /// @param output 0 to 9
+    /// May the operation run on the device, in the mode, through the output? Loads the device, except in `SPI`.
+    /// @param mode `BS` to `SPI` (0 to 5); in `SPI` the answer is that of "spi" for every device
+    /// @param output `PARALLEL` to `STAPL` (0 to 4)
     /// @param device the device
     /// @param operation 0 to 31
-    /// @param family is not read: the device's own family counts
-    /// @return whether it may, without a message; for a value out of range false, after a debug message
-    /// @throw OutOfRangeException (1999) while exceptions are on, for a device whose family is not supported,
-    ///        and what loading raises
+    /// @param family not read: the device's own family is used
+    /// @return whether it may, without a message; for a value outside its range false, after a debug message
+    /// @throw OutOfRangeException (1999) while exceptions are on, for a device whose family is not supported, unless
+    ///        a value is outside its range; and what loading raises
     [[nodiscard]] bool checkConstraints(TARVIKNS::MODE_TYPE mode, TARVIKNS::OUTPUT_TYPE output,
                                         const char* device, TARVIKNS::OP_TYPE operation, const char* family);
 
-    /// Does the device's property that is named as the operation list the mode? Loads the device.
-    /// @param device the device
-    /// @param mode a value that is none counts as `BS`
-    /// @param operation a value that is none gives false, after the info message
-    ///        "Operation %d is not defined.\n"
-    /// @param family is not read
-    /// @return whether it does, without a message
-    /// @throw LogicException as loading raises it
+    /// Does the device's property with the operation's key name list the mode? Loads the device.
+    /// @param device the device; a package is cut off
+    /// @param mode a value that is not listed is treated as `BS`
+    /// @param operation a value that is not listed issues the info message "Operation %d is not defined.\n" and has the
+    ///        empty key name, which a database may give to a property, too
+    /// @param family not read
+    /// @return whether it does
+    /// @throw LogicException what loading raises
     [[nodiscard]] bool checkConstraints(const char* device, TARVIKNS::MODE_TYPE mode,
                                         TARVIKNS::OP_TYPE operation, const char* family);
 
     // ---- What a device offers -----------------------------------------------------------------------------
 
-    /// The operations that the device offers in the mode through the output. Loads the device.
+    /// The operations that the device offers in the mode through the output. Loads the device, except in `SPI`.
     /// @param device the device
-    /// @param mode in `SPI` the answer is that of "spi", whatever the device
-    /// @param output any value; it, or a mode, out of range gives 0 without a message
-    /// @return a mask of operations
-    /// @throw OutOfRangeException (1999) while exceptions are on, for a device whose family is not supported,
-    ///        and what loading raises
+    /// @param mode `BS` to `SPI` (0 to 5); in `SPI` the answer is that of "spi" for every device
+    /// @param output `PARALLEL` to `STAPL` (0 to 4)
+    /// @return a mask of operations; 0, without a message, for a value outside its range
+    /// @throw OutOfRangeException (1999) while exceptions are on, for a device whose family is not supported, and what
+    ///        loading raises
     [[nodiscard]] int getDeviceOperations(const char* device, TARVIKNS::MODE_TYPE mode,
                                           TARVIKNS::OUTPUT_TYPE output);
 
-    /// The programming options that the device has in the mode through the output. Loads the device.
-    /// @param device the device; it has options of its own when a list holds it, else those of its family
-    /// @param mode in `SPI` the answer is that of "spi", whatever the device; else 0 to 8
-    /// @param output 0 to 9; it, or a mode, out of range gives 0, after a debug message
-    /// @param package in which the device has options of its own when they are listed together; may be null
-    /// @return a mask of options
-    /// @throw OutOfRangeException (2024) while exceptions are on, for a name that is no option package, and
-    ///        what loading raises
+    /// The programming options that the device has in the mode through the output. Loads the device, except in `SPI`.
+    /// @param device the device; it has options of its own if it is listed as an option package, otherwise those of
+    ///        its family
+    /// @param mode `BS` to `SPI` (0 to 5); in `SPI` the answer is that of "spi" for every device
+    /// @param output `PARALLEL` to `STAPL` (0 to 4)
+    /// @param package if device and package, joined, are listed as an option package, they have options of their own;
+    ///        may be null
+    /// @return a mask of options; 0, after a debug message, for a value outside its range
+    /// @throw OutOfRangeException (2024) while exceptions are on, if neither the device nor its family is listed as an
+    ///        option package, unless a value is outside its range; and what loading raises
     [[nodiscard]] int getProgramOptions(const char* device, TARVIKNS::MODE_TYPE mode,
                                         TARVIKNS::OUTPUT_TYPE output, const char* package);
 
-    /// The operations that the device offers by boundary scan alone. Loads the device.
+    /// The boundary-scan operations that the device offers through the output. Loads the device.
     /// @param device the device
-    /// @param output 0 to 9; more gives 0, after a debug message, and less gives 0 without one
-    /// @return a mask of operations
-    /// @throw OutOfRangeException (1999) while exceptions are on, for a device whose family is not supported,
-    ///        and what loading raises
+    /// @param output `PARALLEL` to `STAPL` (0 to 4)
+    /// @return a mask of operations; 0 for an output outside its range, after a debug message if it is above
+    /// @throw OutOfRangeException (1999) while exceptions are on, for a device whose family is not supported, and what
+    ///        loading raises
     [[nodiscard]] int getBsdlOperations(const char* device, TARVIKNS::OUTPUT_TYPE output);
 
-    /// The options that an operation of the device carries in the mode. Loads the device.
+    /// The options of an operation of the device in the mode. Loads the device.
     /// @param device the device
-    /// @param operation the key name, as properties spell it
-    /// @param mode a value that is none counts as `BS`
-    /// @return their names; empty when the device's property named as the operation does not list the mode
-    /// @throw LogicException as loading raises it
+    /// @param operation the key name, spelt as the property that lists the operation's modes
+    /// @param mode a value that is not listed is treated as `BS`
+    /// @return their names: the values of the property "OP_" + `operation`, or if there are none, of that with "_" and
+    ///         the mode appended; empty if the property `operation` does not list the mode
+    /// @throw LogicException what loading raises
     [[nodiscard]] const TextSet& getDeviceOperationOptions(const char* device, const char* operation,
                                                            TARVIKNS::MODE_TYPE mode);
 
     // ---- Properties of devices ----------------------------------------------------------------------------
 
     /// The values of a property. Loads the device.
-    /// @param device the device, or else its family, has it
-    /// @param key its name, case included
-    /// @return the values; empty, without a message, when there is none
-    /// @throw LogicException as loading raises it
+    /// @param device the device; its family's property answers if it has none of its own
+    /// @param key the property's name; case matters
+    /// @return the values; empty, without a message, if there is no such property
+    /// @throw LogicException what loading raises
     [[nodiscard]] const TextSet& getDeviceStringProperties(const char* device, const char* key);
 
-    /// The value of a property, of several the smallest in byte order. Loads the device.
-    /// @param device as above; an SPI flash answers as `getSpiDeviceStringProperty`
-    /// @param key its name, case included
-    /// @return the value; null when there is none, after the info message
+    /// The value of a property; of several values, the first in byte order. Loads the device, except an SPI flash.
+    /// @param device as above; for an SPI flash the result is that of `getSpiDeviceStringProperty`
+    /// @param key the property's name; case matters
+    /// @return the value; null if there is no value, after the info message
     ///         "ACD entry  %s not found for device family %s.\n"
-    /// @throw DataNotFoundException (437) in place of null while exceptions are on, and what loading raises
+    /// @throw DataNotFoundException (437), after that message, in place of null while exceptions are on; and what
+    ///        loading raises
     [[nodiscard]] const char* getDeviceStringProperty(const char* device, const char* key);
 
     /// Is "TRUE" among the values of a property? Loads the device.
-    /// @param device as above, but SPI flashes have a getter of their own
-    /// @param key its name, case included
-    /// @return whether it is; false, without a message, when there is no such property
-    /// @throw LogicException as loading raises it
+    /// @param device as for `getDeviceStringProperties`; SPI flashes have a getter of their own
+    /// @param key the property's name; case matters
+    /// @return whether it is, in upper case; false, without a message, if there is no such property
+    /// @throw LogicException what loading raises
     [[nodiscard]] bool getDeviceBoolProperty(const char* device, const char* key);
 
     /// The value of `getDeviceStringProperty` as a decimal number.
     /// @param device as there
     /// @param key as there
-    /// @return -2147483648 to 2147483647, 0 for a text that is no number; -1 in place of null
-    /// @throw DataNotFoundException (437) as there
+    /// @return -2147483648 to 2147483647; 0 for a text that does not start with a number; -1 in place of null
+    /// @throw DataNotFoundException (437) as there, and what loading raises
     [[nodiscard]] long getDeviceLongProperty(const char* device, const char* key);
 
     // ---- Families -----------------------------------------------------------------------------------------
 
     /// The family of a device. Loads nothing.
-    /// @param device the device
-    /// @return its name; "spi" for an SPI flash, "base" for a device that nobody knows
+    /// @param device the device; a package is ignored unless an SPI flash is listed with it
+    /// @return the family's name; "spi" for an SPI flash, "base" for an unknown device
     [[nodiscard]] StringBase getPartFamily(const char* device);
 
-    /// Tells the manager a device's family, unless the latest family that it resolved is itself cached as a
-    /// device.
-    /// @param device its name, kept in the case given; names are looked up in lower case
+    /// Sets a device's family for all further questions, unless the family that the manager resolved last is itself
+    /// cached as a device.
+    /// @param device its name; a package is cut off. Only a name in lower case has an effect, as devices are looked up in
+    ///        lower case
     /// @param family the family's name
     void addCachedDeviceFamily(const char* device, const char* family);
 
-    /// Is the device known at all?
+    /// Is the device known?
     /// @param device the device
-    /// @return whether `getPartFamily` answers anything but "base"
+    /// @return whether `getPartFamily` returns anything but "base"
     [[nodiscard]] bool isKorvelDevice(const char* device);
 
     /// The IDCODE of each device.
-    /// @return IDCODEs by the names of the devices, both as the database writes them
+    /// @return IDCODEs by device name, both as the database spells them
     [[nodiscard]] const Texts& getAllDeviceIdcodes() const noexcept;
 
-    // ---- SPI flash: known from the start-up on, so that nothing is loaded and nothing raised ---------------
+    // ---- SPI flash: read by the start-up, so nothing is loaded and nothing raised --------------------------
 
     /// Is the name an SPI flash or an SPI flash family?
-    /// @param device the whole name, in any case
+    /// @param device the whole name, in any case; the database has to spell it in upper case
     /// @return whether it is
     [[nodiscard]] bool isSpiDevice(StringBase device) const;
 
-    /// A property of an SPI flash, or else of its class.
+    /// A property of an SPI flash, or if it has none, of its class.
     /// @param device its name, in any case
-    /// @param property the property's name, in any case
-    /// @return the value; empty when there is none, and never null
+    /// @param property the property's name, in any case. The database has to spell both in upper case
+    /// @return the value; empty if there is no such property, never null
     [[nodiscard]] const char* getSpiDeviceStringProperty(const char* device, const char* property) const;
 
     /// Is a property of an SPI flash "true"?
-    /// @param device its name, in any case
-    /// @param property the property's name, in any case
-    /// @return whether it is, in any case; false when there is none
+    /// @param device as above
+    /// @param property as above
+    /// @return whether it is, in any case; false if there is no such property
     [[nodiscard]] bool getSpiDeviceBoolProperty(const char* device, const char* property) const;
 
     /// A property of an SPI flash as a decimal number.
-    /// @param device its name, in any case
-    /// @param property the property's name, in any case
-    /// @return -2147483648 to 2147483647; 0 when there is none
+    /// @param device as above
+    /// @param property as above
+    /// @return -2147483648 to 2147483647; 0 if there is no such property
     [[nodiscard]] long getSpiDeviceLongProperty(const char* device, const char* property) const;
 
     // ---- Multiboot ----------------------------------------------------------------------------------------
 
-    /// Does the device support a multiboot arrangement? No argument's case matters.
+    /// Does the device support a multiboot arrangement? All texts may be in any case.
     /// @param device the device
     /// @param typePrefix "TYPE_BPI", "TYPE_MB_SPI", "TYPE_MB_BPI" or "TYPE_MB_QPRM"
-    /// @param width "SERIAL", "PARALLEL" or "NONE"
-    /// @param lead true for the lead device of the chain, false for a device further down
-    /// @return whether it does; false for texts that are none of these
+    /// @param width "SERIAL" or "PARALLEL" for BPI, "NONE" for the other two
+    /// @param lead true for the first device of the chain, false for any other
+    /// @return whether it does; false for other texts
     [[nodiscard]] bool isMbBpiSpiSupport(const char* device, const char* typePrefix, const char* width,
                                          bool lead) const;
 
-    // ---- Dumps for smoke tests: what the tables hold by now, in fixed columns. Nothing is loaded -----------
+    // ---- Dumps for smoke tests: the current contents of the tables. Nothing is loaded ----------------------
 
-    /// Writes the operations of all families.
-    /// @param recorder what takes the text; null: the status channel, piece by piece
+    /// Writes the operations of all supported families, in fixed columns.
+    /// @param recorder receives the text piece by piece; null for the status channel
     void dumpOperationsTable(TarvikSmokeMgr* recorder);
 
-    /// Writes the boundary-scan operations of all families.
+    /// Writes the boundary-scan operations of all supported families, in fixed columns.
     /// @param recorder as above
     void dumpBsdlOperationsTable(TarvikSmokeMgr* recorder);
 
-    /// Writes the programming options of all option packages.
+    /// Writes the programming options of all option packages, in fixed columns.
     /// @param recorder as above
     void dumpProgramOptionsTable(TarvikSmokeMgr* recorder);
 
-    /// Writes the family of each device that was resolved or seeded.
+    /// Writes the family of each device that was resolved or set, a line each.
     /// @param recorder as above
     void dumpCachedDeviceFamilies(TarvikSmokeMgr* recorder);
 
-    /// Writes the devices of each multiboot type to the status channel.
+    /// Writes the devices of each multiboot type to the status channel, a line each.
     void dumpMbBpiSpi() const;
 
 private:
     friend class ManagerFactory;
     friend class TarvikTestPeer;
+    class Implementation;
 
-    ConstraintsManager();
-    ~ConstraintsManager();
-    void initialise();
+    [[gnu::visibility("hidden")]] ConstraintsManager();
+    [[gnu::visibility("hidden")]] ~ConstraintsManager();
 
-    static ConstraintsManager* s_instance;
+    [[gnu::visibility("hidden")]] static ConstraintsManager* s_instance;
 
-    // Start-up from the base database.
-    struct ModeTable;
-    static const ModeTable* modeTable(TARVIKNS::MODE_TYPE mode);
-    void loadSupportedLists();
-    void loadModeOutputSets();
-    void loadModeDeviceSets();
-    void loadDeviceIdcodes();
-    void loadNotSupportedParts();
-    void allocateTables();
-
-    // The entries that fill the permission tables.
-    void parseOperationEntries(PM_DEVKEY* accessor, unsigned familyIndex, const char* family);
-    void parseBsdlOperationEntries(PM_DEVKEY* accessor, unsigned familyIndex, const char* family);
-    void parseProgramOptionEntries(PM_DEVKEY* accessor, const char* family);
-    int programOptionTableIndex(const char* name);
-
-    // The SPI flash database.
-    struct SpiClass;
-    static const std::array<SpiClass, 6>& spiClasses();
-    void loadSpiCatalogue();
-    void readSpiNames(PM_DEVKEY* accessor);
-    void readSpiProperties(PM_DEVKEY* accessor);
-    void readMultibootDeviceLists(PM_DEVKEY* accessor);
-    void readMultibootTypes(PM_DEVKEY* accessor);
-    StringBase spiDeviceClass(const char* device) const;
-
-    // Families, and loading on demand.
-    unsigned familyIndex(const char* name);
-    bool isFamilyName(const StringBase& name);
-    StringBase resolveFamily(const StringBase& device, const StringBase& base) const;
-    void loadDeviceData(const char* device, const char* package);
-    StringBase loadDevice(const StringBase& device, const char* package);
-    void loadFamily(const StringBase& family);
-    void loadFamilyTables(PM_DEVKEY* accessor, const char* family);
-    void loadProperties(PM_DEVKEY* accessor, const StringBase& owner);
-
-    // Checks.
-    const NameSet* modeDeviceSet(TARVIKNS::MODE_TYPE mode, int location) const;
-    bool modeAllowsOutput(TARVIKNS::MODE_TYPE mode, TARVIKNS::OUTPUT_TYPE output) const;
-    bool familySupportsMode(TARVIKNS::MODE_TYPE mode, const StringBase& device, const char* package);
-    bool deviceSupportsMode(TARVIKNS::MODE_TYPE mode, const StringBase& device, const char* package);
-    bool isPartAllowedInMode(TARVIKNS::MODE_TYPE mode, const StringBase& device, const char* package) const;
-    bool hasDevicePropertyValue(const char* device, const char* key, const char* value);
-
-    // Queries.
-    struct Shortcut {
-        const StringBase*
-            family; ///< what resolving leaves as the latest resolution; null when nothing is resolved
-        std::size_t block;
-    };
-    using Shortcuts = std::pmr::unordered_map<StringBase, Shortcut, TextHash, TextEqual>;
-    const Shortcut* recall(const Shortcuts& shortcuts, const char* device);
-    void keepOperationShortcut(const StringBase& device, const StringBase& owner, std::size_t block);
-    void keepOptionShortcut(const StringBase& device, std::size_t block);
-    StringBase operationOwner(const StringBase& device);
-    bool isProgramOptionTableLoaded(const char* name) const;
-    StringBase loadedOptionOwner(const StringBase& device, const char* package);
-    const PropertyValues* findLoaded(std::string_view owner, std::string_view property) const;
-    const PropertyValues* findProperty(const char* device, const char* key);
-
-    // Dumps.
-    StringBase supportedDeviceNameAt(int position) const;
-    StringBase programOptionPackageNameAt(int position) const;
-
-    bool m_exceptions = false;
-    PM_DEVKEY* m_devKey = nullptr; ///< of the base database; lives as long as the process
-
-    std::set<TARVIKNS::OUTPUT_TYPE> m_bsCables;
-    std::set<TARVIKNS::OUTPUT_TYPE> m_ssCables;
-    std::set<TARVIKNS::OUTPUT_TYPE> m_smCables;
-    std::set<TARVIKNS::OUTPUT_TYPE> m_bsFileCables;
-    std::set<TARVIKNS::OUTPUT_TYPE> m_dp770Cables;
-    std::set<TARVIKNS::OUTPUT_TYPE> m_spiCables;
-    std::set<TARVIKNS::OUTPUT_TYPE> m_kiteCfCables;
-    std::set<TARVIKNS::OUTPUT_TYPE> m_kiteMpmCables;
-    std::set<TARVIKNS::OUTPUT_TYPE> m_pffCables;
-
-    NameSet m_supportedDevices;
-
-    NameSet m_bsDevices;
-    NameSet m_ssDevices;
-    NameSet m_smDevices;
-    NameSet m_bsFileDevices;
-    NameSet m_dp770Devices;
-    NameSet m_spiDevices;
-    NameSet m_kiteCfDevices;
-    NameSet m_kiteMpmDevices;
-    NameSet m_pffDevices;
-
-    NameSet m_programOptionPackages;
-    NameSet m_notSupportedPartInMode;
-    Texts m_deviceIdcodes;
-
-    TextSet m_loadedFamilies;            ///< owners whose properties are loaded
-    NameSequence m_operationsLoaded;     ///< families whose operations are loaded
-    NameSequence m_programOptionsLoaded; ///< owners whose program options are loaded
-    std::unique_ptr<PropertyTable> m_deviceProperties;
-    Texts m_deviceFamilyCache; ///< lower-cased base name to family
-
-    /// Apart from all else, so that the shortcuts stand close together however much is loaded between them.
-    std::pmr::unsynchronized_pool_resource m_shortcutMemory;
-    Shortcuts m_operationShortcuts{&m_shortcutMemory}; ///< name as asked to its block of the operation tables
-    Shortcuts m_optionShortcuts{&m_shortcutMemory};    ///< name as asked to its block of the option table
-
-    std::map<StringBase, int, ltptstr> m_programOptionPackageIndex;
-    TextSet m_operationOptions; ///< stays empty: what a look-up returns that finds nothing
-    StringBase m_partFamily;    ///< the family resolved latest
-
-    std::unique_ptr<PermissionTable> m_operationTable;
-    std::unique_ptr<PermissionTable> m_programOptionTable;
-    std::unique_ptr<PermissionTable> m_bsdlOperationTable;
-    std::vector<TARVIKNS::OP_TYPE> m_operationOrders;
-    std::vector<TARVIKNS::PROGRAM_OPTION> m_programOptionOrders;
-
-    Texts m_spiProperties; ///< name and property written together, to value
-    NameSequence m_spiNames;
-    std::vector<StringBase> m_spiFamilies;
-    std::vector<StringBase> m_at1Devices;
-    std::vector<StringBase> m_st1Devices;
-    std::vector<StringBase> m_st2Devices;
-    std::vector<StringBase> m_bpi1Devices;
-    std::vector<StringBase> m_bpi2Devices;
-    std::vector<StringBase> m_bpi3Devices;
-    std::map<StringBase, std::vector<StringBase>, ltptstr> m_multibootTypes;
+    Implementation* const m_implementation;
 };

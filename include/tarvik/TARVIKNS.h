@@ -1,7 +1,45 @@
 #pragma once
 
-/// The vocabulary of the constraints manager. Every enumeration rests on `int`, so that any value a caller
-/// passes is well defined; what a value outside its list gives stands with each method.
+// Applications and their platforms define short names as macros; here they are enumerators.
+#pragma push_macro("BS")
+#pragma push_macro("SS")
+#pragma push_macro("SM")
+#pragma push_macro("SPI")
+#pragma push_macro("PFF")
+#pragma push_macro("SVF")
+#pragma push_macro("QSVF")
+#pragma push_macro("NONE")
+#pragma push_macro("PARALLEL")
+#pragma push_macro("PROGRAM")
+#pragma push_macro("VERIFY")
+#pragma push_macro("ERASE")
+#pragma push_macro("CHECKSUM")
+#pragma push_macro("BYPASS")
+#pragma push_macro("UES")
+#pragma push_macro("OTF")
+#pragma push_macro("OTP")
+#pragma push_macro("PROG")
+#undef BS
+#undef SS
+#undef SM
+#undef SPI
+#undef PFF
+#undef SVF
+#undef QSVF
+#undef NONE
+#undef PARALLEL
+#undef PROGRAM
+#undef VERIFY
+#undef ERASE
+#undef CHECKSUM
+#undef BYPASS
+#undef UES
+#undef OTF
+#undef OTP
+#undef PROG
+
+/// The vocabulary of the constraints manager. Every enumeration is based on `int`, so that every value a caller passes is
+/// well defined; each method says what it does with a value that is not listed.
 namespace TARVIKNS {
 
 /// Configuration modes.
@@ -57,7 +95,7 @@ enum class OP_TYPE : int {
     EXPRESSQSVF,
 };
 
-/// The value that an unknown operation name converts to.
+/// The value for unknown operation names.
 inline constexpr OP_TYPE NO_OPERATION{32};
 
 /// Programming options.
@@ -89,3 +127,22 @@ enum class PROGRAM_OPTION : int {
 };
 
 } // namespace TARVIKNS
+
+#pragma pop_macro("BS")
+#pragma pop_macro("SS")
+#pragma pop_macro("SM")
+#pragma pop_macro("SPI")
+#pragma pop_macro("PFF")
+#pragma pop_macro("SVF")
+#pragma pop_macro("QSVF")
+#pragma pop_macro("NONE")
+#pragma pop_macro("PARALLEL")
+#pragma pop_macro("PROGRAM")
+#pragma pop_macro("VERIFY")
+#pragma pop_macro("ERASE")
+#pragma pop_macro("CHECKSUM")
+#pragma pop_macro("BYPASS")
+#pragma pop_macro("UES")
+#pragma pop_macro("OTF")
+#pragma pop_macro("OTP")
+#pragma pop_macro("PROG")

@@ -1,6 +1,7 @@
-#include "CoreFixtures.h"
 #include "FailingAllocations.h"
+#include "ManagerFixture.h"
 
+#include <algorithm>
 #include <new>
 
 // A machine that runs out of memory while the manager is made.
@@ -30,15 +31,15 @@ TYPE_BPI_SERIAL_LEAD = KS50
 
 void expectComplete(ConstraintsManager* manager) {
     ASSERT_NE(manager, nullptr);
-    TarvikTestPeer peer(*manager);
-    EXPECT_TRUE(peer.exceptions());
-    EXPECT_EQ(peer.supportedDevices().size(), 2U);
-    EXPECT_THAT(peer.bsCables(), SizeIs(2));
-    EXPECT_THAT(peer.deviceIdcodes(), SizeIs(1));
-    EXPECT_THAT(peer.operationOrders(), SizeIs(32));
-    EXPECT_THAT(peer.spiNames(), SizeIs(4));
-    EXPECT_THAT(peer.spiProperties(), SizeIs(1));
-    EXPECT_THAT(peer.multibootTypes(), SizeIs(12));
+    auto& members = TarvikTestPeer::members(*manager);
+    EXPECT_TRUE(members.m_exceptions);
+    EXPECT_EQ(members.m_supportedDevices.size(), 2U);
+    EXPECT_THAT(members.m_bsCables, SizeIs(2));
+    EXPECT_THAT(members.m_deviceIdcodes, SizeIs(1));
+    EXPECT_THAT(members.m_operationOrders, SizeIs(32));
+    EXPECT_THAT(members.m_spiNames, SizeIs(4));
+    EXPECT_THAT(members.m_spiProperties, SizeIs(1));
+    EXPECT_THAT(members.m_multibootTypes, SizeIs(12));
 }
 
 TEST(OutOfMemory, ForTheObjectItselfGivesNull) {
@@ -85,6 +86,46 @@ TEST(OutOfMemory, AtAnyAllocationOfTheStartUpPassesOutAndTheNextCallWorks) {
         }
     }
     EXPECT_GT(passedOut, 50);
+}
+
+TEST(OutOfMemory, WhileALoadReadsPropertiesKeepsThoseBeforeIt) {
+    constexpr int PROPERTIES = 50;
+    const auto nameOf = [](int number) { return "P" + std::to_string(number); };
+    const auto valueOf = [](int number) {
+        return "value number " + std::to_string(number) + " is longer than short texts are";
+    };
+    Files files = DATABASES;
+    files["kestrel.acd"] = "PROPERTY = ";
+    for (int number = 0; number < PROPERTIES; ++number) {
+        files["kestrel.acd"] += (number == 0 ? "" : ":") + nameOf(number) + "," + valueOf(number);
+    }
+    int mostKept = 0;
+    bool happened = true;
+    for (long allocation = 1; happened; ++allocation) {
+        SCOPED_TRACE(allocation);
+        ManagerFixture fixture(files);
+        fixture->setExceptions(false);
+        try {
+            const auto failing = FailingAllocations::atNumber(allocation);
+            fixture.members().loadDeviceData("kestrel", {});
+            happened = failing.happened();
+        } catch (const std::bad_alloc&) {
+        }
+        // The same family again: every property up to some place is there, and none after it.
+        int found = 0;
+        while (found < PROPERTIES &&
+               holds(fixture->getDeviceStringProperties("kestrel", nameOf(found).c_str()),
+                     valueOf(found).c_str())) {
+            ++found;
+        }
+        for (int number = found; number < PROPERTIES; ++number) {
+            EXPECT_EQ(fixture->getDeviceStringProperty("kestrel", nameOf(number).c_str()), nullptr) << number;
+        }
+        EXPECT_TRUE(happened || found == PROPERTIES);
+        mostKept = happened && found < PROPERTIES ? std::max(mostKept, found) : mostKept;
+        ASSERT_FALSE(HasFailure());
+    }
+    EXPECT_EQ(mostKept, PROPERTIES - 1);
 }
 
 } // namespace

@@ -1,5 +1,5 @@
 // Which boundary-scan operations a device offers through an output: getBsdlOperations.
-#include "QueryFixture.h"
+#include "Members.h"
 
 #include <gmock/gmock.h>
 
@@ -20,7 +20,7 @@ const Files DATABASES = {
 } // namespace
 
 TEST(BsdlOperations, EachAllowedOperationIsABit) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getBsdlOperations("dev1", PARALLEL), maskOf(19, 20));
     EXPECT_EQ(manager->getBsdlOperations("dev1_p", OUTPUT_TYPE::USB2), maskOf(19));
     EXPECT_EQ(manager->getBsdlOperations("fam1", OUTPUT_TYPE::SVF), 0);
@@ -28,12 +28,12 @@ TEST(BsdlOperations, EachAllowedOperationIsABit) {
 }
 
 TEST(BsdlOperations, TheLastOperationIsTheSignBit) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getBsdlOperations("dev1", OUTPUT_TYPE::STAPL), -2147483647 - 1);
 }
 
 TEST(BsdlOperations, EachFamilyHasItsOwnBlock) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getBsdlOperations("dev2", PARALLEL), maskOf(21));
     EXPECT_EQ(manager->getBsdlOperations("dev1", PARALLEL), maskOf(19, 20));
 }
@@ -46,7 +46,7 @@ TEST(BsdlOperations, EveryCellIsItsOwn) {
                  ConstraintsManager::operationType2String(TARVIKNS::OP_TYPE{operation}).c_str() + "," +
                  outputs[operation % 5];
     }
-    ManagerOver manager(
+    ManagerFixture manager(
         Files{{"base.acd", "DEVICE_SUPPORTED = a,m,spi,z\nPROGRAM_OPTION_PACKAGE = a,m,spi,z\n"},
               {"a.acd", ""},
               {"m.acd", entry + "\n"},
@@ -63,7 +63,7 @@ TEST(BsdlOperations, EveryCellIsItsOwn) {
 }
 
 TEST(BsdlOperations, OutputsAboveTheTableGiveADebugMessageNegativeOnesNothing) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     for (const bool exceptions : {true, false}) {
         manager->setExceptions(exceptions);
         for (const int output : BOUNDARY_VALUES) {
@@ -80,8 +80,8 @@ TEST(BsdlOperations, OutputsAboveTheTableGiveADebugMessageNegativeOnesNothing) {
 }
 
 TEST(BsdlOperations, AnUnsupportedFamilyIsRaisedBeforeTheRangeIsTested) {
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = spi\nPROGRAM_OPTION_PACKAGE = fam3,spi\n"},
-                              {"fam3.acd", "[dev3]\n"}});
+    ManagerFixture manager(Files{{"base.acd", "DEVICE_SUPPORTED = spi\nPROGRAM_OPTION_PACKAGE = fam3,spi\n"},
+                                 {"fam3.acd", "[dev3]\n"}});
     for (const int output : BOUNDARY_VALUES) {
         expectRaises<OutOfRangeException>(
             1999, [&] { return manager->getBsdlOperations("dev3", OUTPUT_TYPE{output}); });
@@ -90,8 +90,8 @@ TEST(BsdlOperations, AnUnsupportedFamilyIsRaisedBeforeTheRangeIsTested) {
 }
 
 TEST(BsdlOperations, AnUnsupportedFamilyHasNoneWhileExceptionsAreOff) {
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = spi\nPROGRAM_OPTION_PACKAGE = spi\n"},
-                              {"fam3.acd", "BSDL_OPERATION = CLAMP,PARALLEL\n[dev3]\n"}});
+    ManagerFixture manager(Files{{"base.acd", "DEVICE_SUPPORTED = spi\nPROGRAM_OPTION_PACKAGE = spi\n"},
+                                 {"fam3.acd", "BSDL_OPERATION = CLAMP,PARALLEL\n[dev3]\n"}});
     manager->setExceptions(false);
     for (int output = -1; output < 5; ++output) {
         EXPECT_EQ(manager->getBsdlOperations("dev3", OUTPUT_TYPE{output}), 0);
@@ -103,20 +103,20 @@ TEST(BsdlOperations, AnUnsupportedFamilyHasNoneWhileExceptionsAreOff) {
 }
 
 TEST(BsdlOperations, AnSpiFlashAnswersFromTheSpiFamilyByItsWholeName) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getBsdlOperations("flash1", PARALLEL), maskOf(0));
     EXPECT_EQ(manager->getBsdlOperations("FLASH_2", PARALLEL), maskOf(0));
 }
 
 TEST(BsdlOperations, LoadingIsDecidedByTheLoadedOperations) {
     // "spi" has its operations since the start-up, but not its properties: those don't count here.
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     static_cast<void>(manager->getBsdlOperations("FLASH1", PARALLEL));
-    EXPECT_TRUE(manager.peer().loadedFamilies().empty());
+    EXPECT_TRUE(manager.members().m_loadedFamilies.empty());
 }
 
 TEST(BsdlOperations, AFamilyWhosePropertiesFailedToLoadIsTriedAgain) {
-    ManagerOver manager(
+    ManagerFixture manager(
         Files{{"base.acd", "DEVICE_SUPPORTED = fam1,spi\nPROGRAM_OPTION_PACKAGE = fam1,spi\n"},
               {"fam1.acd",
                "PROPERTY = BROKEN\nOPERATION = VERIFY,Bscan,PARALLEL\nBSDL_OPERATION = CLAMP,PARALLEL\n"}});
@@ -126,24 +126,24 @@ TEST(BsdlOperations, AFamilyWhosePropertiesFailedToLoadIsTriedAgain) {
 }
 
 TEST(BsdlOperations, AFamilyWithAPackageIsNoFamily) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     expectRaises<OutOfRangeException>(1999, [&] { return manager->getBsdlOperations("fam1_x", PARALLEL); });
     expectRaises<OutOfRangeException>(1999, [&] { return manager->getBsdlOperations("fam1_x", PARALLEL); });
 }
 
 TEST(BsdlOperations, AnUnknownDeviceRaisesAsPackageThenAsFamily) {
     // "base" is tried again: what failed first is not in the list that is asked here.
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     expectRaises<OutOfRangeException>(2024, [&] { return manager->getBsdlOperations("nobody", PARALLEL); });
-    EXPECT_FALSE(holds(manager.peer().operationsLoaded(), "base"));
+    EXPECT_FALSE(holds(manager.members().m_operationsLoaded, "base"));
     expectRaises<OutOfRangeException>(1999, [&] { return manager->getBsdlOperations("nobody", PARALLEL); });
-    EXPECT_TRUE(holds(manager.peer().operationsLoaded(), "base"));
+    EXPECT_TRUE(holds(manager.members().m_operationsLoaded, "base"));
     expectRaises<OutOfRangeException>(1999, [&] { return manager->getBsdlOperations("nobody", PARALLEL); });
 }
 
 TEST(BsdlOperations, ANullDeviceIsTheEmptyName) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     manager->setExceptions(false);
     EXPECT_EQ(manager->getBsdlOperations(nullptr, PARALLEL), 0);
-    EXPECT_TRUE(manager.peer().deviceFamilyCache().contains(StringBase("")));
+    EXPECT_TRUE(manager.members().m_deviceFamilyCache.contains(StringBase("")));
 }

@@ -1,5 +1,5 @@
 // May a device, in a package, be configured in a mode: checkConstraints(mode, device, package).
-#include "QueryFixture.h"
+#include "Members.h"
 
 #include <gmock/gmock.h>
 
@@ -36,19 +36,19 @@ Files slaveSerialBut(const std::string& parts) {
 } // namespace
 
 TEST(DeviceChecks, ADeviceOfAListedFamilyIsSilentlyAllowed) {
-    ManagerOver manager(oneFamilyPerMode());
+    ManagerFixture manager(oneFamilyPerMode());
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::SS, "dev1", nullptr));
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
 TEST(DeviceChecks, ARefusalNamesTheDeviceAndTheMode) {
-    ManagerOver manager(oneFamilyPerMode());
+    ManagerFixture manager(oneFamilyPerMode());
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SM, "dev1", nullptr));
     EXPECT_THAT(manager.messages(), ElementsAre(info(229, "dev1 is not supported in Select Map mode\n")));
 }
 
 TEST(DeviceChecks, EachModeHasItsOwnFamilies) {
-    ManagerOver manager(oneFamilyPerMode());
+    ManagerFixture manager(oneFamilyPerMode());
     for (int mode = 0; mode < 9; ++mode) {
         for (int family = 0; family < 9; ++family) {
             const bool expected = mode == 5 || mode == 8 || mode == family;
@@ -60,27 +60,27 @@ TEST(DeviceChecks, EachModeHasItsOwnFamilies) {
 }
 
 TEST(DeviceChecks, AFamilyCountsAsItsOwnDevice) {
-    ManagerOver manager(oneFamilyPerMode());
+    ManagerFixture manager(oneFamilyPerMode());
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::SS, "fam1", nullptr));
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, "fam2", nullptr));
 }
 
 TEST(DeviceChecks, AnUnknownDeviceCountsAsBase) {
-    ManagerOver manager(Files{{"base.acd", "BS = o:f,base\nSS = o:f,fam1\n"}});
+    ManagerFixture manager(Files{{"base.acd", "BS = o:f,base\nSS = o:f,fam1\n"}});
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::BS, "nobody", nullptr));
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, "nobody", nullptr));
     EXPECT_THAT(manager.messages(), ElementsAre(info(229, "nobody is not supported in Slave Serial mode\n")));
 }
 
 TEST(DeviceChecks, AnExcludedPackageIsRefused) {
-    ManagerOver manager(slaveSerialBut("SS_dev1_pkg1"));
+    ManagerFixture manager(slaveSerialBut("SS_dev1_pkg1"));
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, "dev1", "pkg1"));
     EXPECT_THAT(manager.messages(),
                 ElementsAre(info(229, "dev1_pkg1 is not supported in Slave Serial mode\n")));
 }
 
 TEST(DeviceChecks, AnExclusionHoldsForItsModeAndPackageAlone) {
-    ManagerOver manager(slaveSerialBut("SS_dev1_pkg1"));
+    ManagerFixture manager(slaveSerialBut("SS_dev1_pkg1"));
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::BS, "dev1", "pkg1"));
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::SS, "dev1", "pkg2"));
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::SS, "a", "pkg1"));
@@ -88,7 +88,7 @@ TEST(DeviceChecks, AnExclusionHoldsForItsModeAndPackageAlone) {
 }
 
 TEST(DeviceChecks, ThePackageArgumentReplacesTheNamesOwn) {
-    ManagerOver manager(slaveSerialBut("SS_dev1_pkg1"));
+    ManagerFixture manager(slaveSerialBut("SS_dev1_pkg1"));
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, "dev1_pkg9", "pkg1"));
     EXPECT_THAT(manager.messages(),
                 ElementsAre(info(229, "dev1_pkg1 is not supported in Slave Serial mode\n")));
@@ -96,48 +96,48 @@ TEST(DeviceChecks, ThePackageArgumentReplacesTheNamesOwn) {
 }
 
 TEST(DeviceChecks, WithoutAPackageNoExclusionCounts) {
-    ManagerOver manager(slaveSerialBut("SS_dev1_pkg1,SS_dev1_,SS_dev1"));
+    ManagerFixture manager(slaveSerialBut("SS_dev1_pkg1,SS_dev1_,SS_dev1"));
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::SS, "dev1", nullptr));
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::SS, "dev1_pkg1", nullptr));
 }
 
 TEST(DeviceChecks, AnEmptyPackageIsAPackage) {
-    ManagerOver manager(slaveSerialBut("SS_dev1_"));
+    ManagerFixture manager(slaveSerialBut("SS_dev1_"));
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, "dev1", ""));
     EXPECT_THAT(manager.messages(), ElementsAre(info(229, "dev1_ is not supported in Slave Serial mode\n")));
 }
 
 TEST(DeviceChecks, ExclusionsAreCaseSensitive) {
-    ManagerOver manager(slaveSerialBut("SS_dev1_PKG1,ss_dev1_pkg1,SS_DEV1_pkg1"));
+    ManagerFixture manager(slaveSerialBut("SS_dev1_PKG1,ss_dev1_pkg1,SS_DEV1_pkg1"));
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::SS, "dev1", "pkg1"));
 }
 
 TEST(DeviceChecks, TheRefusedPartIsTheCutDeviceWithoutAPackage) {
-    ManagerOver manager(oneFamilyPerMode());
+    ManagerFixture manager(oneFamilyPerMode());
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SM, "dev1_pkg9", nullptr));
     EXPECT_THAT(manager.messages(), ElementsAre(info(229, "dev1 is not supported in Select Map mode\n")));
 }
 
 TEST(DeviceChecks, ANameIsCutAtItsFirstUnderscore) {
-    ManagerOver manager(slaveSerialBut("SM_a_x"));
+    ManagerFixture manager(slaveSerialBut("SM_a_x"));
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SM, "a_b_c", "x"));
     EXPECT_THAT(manager.messages(), ElementsAre(info(229, "a_x is not supported in Select Map mode\n")));
 }
 
 TEST(DeviceChecks, ANameThatBeginsWithAnUnderscoreIsEmpty) {
-    ManagerOver manager(oneFamilyPerMode());
+    ManagerFixture manager(oneFamilyPerMode());
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, "_dev1", "p"));
     EXPECT_THAT(manager.messages(), ElementsAre(info(229, "_p is not supported in Slave Serial mode\n")));
 }
 
 TEST(DeviceChecks, ANullDeviceIsTheEmptyName) {
-    ManagerOver manager(oneFamilyPerMode());
+    ManagerFixture manager(oneFamilyPerMode());
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, static_cast<const char*>(nullptr), nullptr));
     EXPECT_THAT(manager.messages(), ElementsAre(info(229, " is not supported in Slave Serial mode\n")));
 }
 
 TEST(DeviceChecks, PercentSignsInNamesAreText) {
-    ManagerOver manager(oneFamilyPerMode());
+    ManagerFixture manager(oneFamilyPerMode());
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, "50%s%n", "%%d"));
     EXPECT_THAT(manager.messages(),
                 ElementsAre(info(229, "50%s%n_%%d is not supported in Slave Serial mode\n")));
@@ -146,27 +146,27 @@ TEST(DeviceChecks, PercentSignsInNamesAreText) {
 TEST(DeviceChecks, SpiModeAcceptsEveryDeviceUnseen) {
     auto files = oneFamilyPerMode();
     files["base.acd"] += "NOT_SUPPORTED_PART_IN_MODE = SPI_dev1_p,SPI_spi_p\n";
-    ManagerOver manager(files);
-    const auto cached = manager.peer().deviceFamilyCache().size();
+    ManagerFixture manager(files);
+    const auto cached = manager.members().m_deviceFamilyCache.size();
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::SPI, "dev1", "p"));
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::SPI, "nobody", nullptr));
-    EXPECT_EQ(manager.peer().deviceFamilyCache().size(), cached);
+    EXPECT_EQ(manager.members().m_deviceFamilyCache.size(), cached);
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
 TEST(DeviceChecks, TheFormatterModeAcceptsEveryDeviceUnseen) {
     auto files = oneFamilyPerMode();
     files["base.acd"] += "NOT_SUPPORTED_PART_IN_MODE = PFF_dev1_p\n";
-    ManagerOver manager(files);
-    const auto cached = manager.peer().deviceFamilyCache().size();
+    ManagerFixture manager(files);
+    const auto cached = manager.members().m_deviceFamilyCache.size();
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::PFF, "dev1", "p"));
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::PFF, "nobody", nullptr));
-    EXPECT_EQ(manager.peer().deviceFamilyCache().size(), cached);
+    EXPECT_EQ(manager.members().m_deviceFamilyCache.size(), cached);
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
 TEST(DeviceChecks, AValueThatIsNoModeIsRaisedWhileExceptionsAreOn) {
-    ManagerOver manager(oneFamilyPerMode());
+    ManagerFixture manager(oneFamilyPerMode());
     for (const int mode : {-2147483647 - 1, -1, 9, 10, 31, 32, 2147483647}) {
         expectRaises<OutOfRangeException>(
             644, [&] { return manager->checkConstraints(MODE_TYPE{mode}, "dev0", nullptr); });
@@ -175,7 +175,7 @@ TEST(DeviceChecks, AValueThatIsNoModeIsRaisedWhileExceptionsAreOn) {
 }
 
 TEST(DeviceChecks, AValueThatIsNoModeIsRefusedWhileExceptionsAreOff) {
-    ManagerOver manager(oneFamilyPerMode());
+    ManagerFixture manager(oneFamilyPerMode());
     manager->setExceptions(false);
     for (const int mode : {-2147483647 - 1, -1, 9, 10, 31, 32, 2147483647}) {
         EXPECT_FALSE(manager->checkConstraints(MODE_TYPE{mode}, "dev0", nullptr));
@@ -187,16 +187,16 @@ TEST(DeviceChecks, AValueThatIsNoModeIsRefusedWhileExceptionsAreOff) {
 
 TEST(DeviceChecks, AnExclusionIsTestedBeforeTheModeIsKnownToBeOne) {
     // A value that is no mode has the key name "BS".
-    ManagerOver manager(slaveSerialBut("BS_dev1_pkg1"));
+    ManagerFixture manager(slaveSerialBut("BS_dev1_pkg1"));
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE{9}, "dev1", "pkg1"));
     EXPECT_THAT(manager.messages(),
                 ElementsAre(info(229, "dev1_pkg1 is not supported in Prom File Formatter mode\n")));
 }
 
 TEST(DeviceChecks, AnExcludedPartIsNotResolved) {
-    ManagerOver manager(slaveSerialBut("SS_dev1_pkg1"));
+    ManagerFixture manager(slaveSerialBut("SS_dev1_pkg1"));
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, "dev1", "pkg1"));
-    EXPECT_FALSE(manager.peer().deviceFamilyCache().contains(StringBase("dev1")));
+    EXPECT_FALSE(manager.members().m_deviceFamilyCache.contains(StringBase("dev1")));
 }
 
 TEST(DeviceChecks, TheDisplayNameOfEachRefusingMode) {
@@ -204,7 +204,7 @@ TEST(DeviceChecks, TheDisplayNameOfEachRefusingMode) {
                                               {2, "Select Map mode"},         {3, "Boundary Scan File mode"},
                                               {4, "Destop Programming mode"}, {6, "Kite Compact Flash  mode"},
                                               {7, "Kite MPM  mode"}};
-    ManagerOver manager(oneFamilyPerMode());
+    ManagerFixture manager(oneFamilyPerMode());
     for (const auto& [mode, name] : names) {
         EXPECT_FALSE(manager->checkConstraints(MODE_TYPE{mode}, "dev5", nullptr));
         EXPECT_THAT(manager.messages(), ElementsAre(info(229, "dev5 is not supported in " + name + "\n")));

@@ -1,5 +1,5 @@
 // Which operations a device offers in a mode through an output: getDeviceOperations.
-#include "QueryFixture.h"
+#include "Members.h"
 
 #include <gmock/gmock.h>
 
@@ -27,7 +27,7 @@ const Files DATABASES = {
 } // namespace
 
 TEST(DeviceOperations, EachAllowedOperationIsABit) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getDeviceOperations("dev1", BS, PARALLEL), maskOf(0));
     EXPECT_EQ(manager->getDeviceOperations("dev1", BS, USB2), maskOf(0, 3));
     EXPECT_EQ(manager->getDeviceOperations("dev1", MODE_TYPE::SS, PARALLEL), maskOf(4));
@@ -38,7 +38,7 @@ TEST(DeviceOperations, EachAllowedOperationIsABit) {
 }
 
 TEST(DeviceOperations, TheLastOperationIsTheSignBit) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getDeviceOperations("dev1", MODE_TYPE::SM, OUTPUT_TYPE::STAPL), -2147483647 - 1);
 }
 
@@ -48,34 +48,34 @@ TEST(DeviceOperations, AllOperationsAtOnceFillTheMask) {
         entry += ConstraintsManager::operationType2String(OP_TYPE{operation}).c_str();
         entry += operation < 31 ? ",SPI,STAPL:" : ",SPI,STAPL\n";
     }
-    ManagerOver manager(
+    ManagerFixture manager(
         Files{{"base.acd", "DEVICE_SUPPORTED = spi\nPROGRAM_OPTION_PACKAGE = spi\n"}, {"spi.acd", entry}});
     EXPECT_EQ(manager->getDeviceOperations("", SPI, OUTPUT_TYPE::STAPL), -1);
     EXPECT_EQ(manager->getDeviceOperations("", SPI, OUTPUT_TYPE::SVF), 0);
 }
 
 TEST(DeviceOperations, EachFamilyHasItsOwnBlock) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getDeviceOperations("dev2", BS, PARALLEL), maskOf(21));
     EXPECT_EQ(manager->getDeviceOperations("dev1", BS, PARALLEL), maskOf(0));
     EXPECT_EQ(manager->getDeviceOperations("dev2", BS, PARALLEL), maskOf(21));
 }
 
 TEST(DeviceOperations, APackageBehindTheNameChangesNothing) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getDeviceOperations("dev1_pkg_x", BS, USB2), maskOf(0, 3));
     EXPECT_EQ(manager->getDeviceOperations("DEV1", BS, USB2), maskOf(0, 3));
 }
 
 TEST(DeviceOperations, AFamilyAnswersForItself) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getDeviceOperations("fam1", BS, USB2), maskOf(0, 3));
-    EXPECT_TRUE(manager.peer().deviceFamilyCache().empty());
+    EXPECT_TRUE(manager.members().m_deviceFamilyCache.empty());
 }
 
 TEST(DeviceOperations, AFamilyWithAPackageIsNoFamily) {
     // The cut name is supported, so the name is not resolved; but no family has the whole name.
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     expectRaises<OutOfRangeException>(1999, [&] { return manager->getDeviceOperations("fam1_x", BS, USB2); });
     manager->setExceptions(false);
     EXPECT_EQ(manager->getDeviceOperations("fam1_x", BS, USB2), 0);
@@ -83,28 +83,28 @@ TEST(DeviceOperations, AFamilyWithAPackageIsNoFamily) {
 }
 
 TEST(DeviceOperations, SpiModeAnswersForSpiWhateverTheDevice) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     for (const char* device : {"dev1", "nobody", "", "fam1_x", static_cast<const char*>(nullptr)}) {
         EXPECT_EQ(manager->getDeviceOperations(device, SPI, PARALLEL), maskOf(6));
     }
-    EXPECT_TRUE(manager.peer().loadedFamilies().empty());
-    EXPECT_TRUE(manager.peer().deviceFamilyCache().empty());
+    EXPECT_TRUE(manager.members().m_loadedFamilies.empty());
+    EXPECT_TRUE(manager.members().m_deviceFamilyCache.empty());
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
 TEST(DeviceOperations, AnSpiFlashAnswersFromTheSpiFamilyInEveryMode) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getDeviceOperations("flash1", BS, PARALLEL), maskOf(24));
 }
 
 TEST(DeviceOperations, TheWholeNameIsResolved) {
     // "FLASH_2" is an SPI flash, "FLASH" is nothing.
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getDeviceOperations("FLASH_2", BS, PARALLEL), maskOf(24));
 }
 
 TEST(DeviceOperations, ModesWithoutARowAreSilentlyZero) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     for (const bool exceptions : {true, false}) {
         manager->setExceptions(exceptions);
         for (const int mode : BOUNDARY_VALUES) {
@@ -117,7 +117,7 @@ TEST(DeviceOperations, ModesWithoutARowAreSilentlyZero) {
 }
 
 TEST(DeviceOperations, OutputsWithoutACellAreSilentlyZero) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     for (const MODE_TYPE mode : {BS, SPI}) {
         for (const int output : BOUNDARY_VALUES) {
             if (output < 0 || output > 4) {
@@ -141,10 +141,11 @@ TEST(DeviceOperations, EveryCellIsItsOwn) {
                      outputs[output];
         }
     }
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = a,spi,z\nPROGRAM_OPTION_PACKAGE = a,spi,z\n"},
-                              {"a.acd", ""},
-                              {"spi.acd", entry + "\n"},
-                              {"z.acd", ""}});
+    ManagerFixture manager(
+        Files{{"base.acd", "DEVICE_SUPPORTED = a,spi,z\nPROGRAM_OPTION_PACKAGE = a,spi,z\n"},
+              {"a.acd", ""},
+              {"spi.acd", entry + "\n"},
+              {"z.acd", ""}});
     for (int mode = 0; mode < 6; ++mode) {
         for (int output = 0; output < 5; ++output) {
             EXPECT_EQ(manager->getDeviceOperations("spi", MODE_TYPE{mode}, OUTPUT_TYPE{output}),
@@ -159,36 +160,36 @@ TEST(DeviceOperations, EveryCellIsItsOwn) {
 }
 
 TEST(DeviceOperations, TheFamilyIsLoadedOnceAndTheDeviceNotAtAll) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     static_cast<void>(manager->getDeviceOperations("dev1", BS, PARALLEL));
     static_cast<void>(manager->getDeviceOperations("dev1", BS, PARALLEL));
-    EXPECT_THAT(textsOf(manager.peer().loadedFamilies()), ElementsAre("fam1"));
-    EXPECT_THAT(textsOf(manager.peer().operationsLoaded()), ElementsAre("spi", "fam1"));
-    EXPECT_THAT(textsOf(manager.peer().programOptionsLoaded()), ElementsAre("spi", "fam1"));
+    EXPECT_THAT(texts(manager.members().m_loadedFamilies), ElementsAre("fam1"));
+    EXPECT_THAT(texts(manager.members().m_operationsLoaded), ElementsAre("spi", "fam1"));
+    EXPECT_THAT(texts(manager.members().m_programOptionsLoaded), ElementsAre("spi", "fam1"));
 }
 
 TEST(DeviceOperations, LoadingIsDecidedByTheLoadedProperties) {
     // "spi" has its operations since the start-up, but not its properties: those alone count here.
-    ManagerOver manager(DATABASES);
-    EXPECT_FALSE(holds(manager.peer().loadedFamilies(), "spi"));
+    ManagerFixture manager(DATABASES);
+    EXPECT_FALSE(holds(manager.members().m_loadedFamilies, "spi"));
     static_cast<void>(manager->getDeviceOperations("FLASH1", BS, PARALLEL));
-    EXPECT_TRUE(holds(manager.peer().loadedFamilies(), "spi"));
+    EXPECT_TRUE(holds(manager.members().m_loadedFamilies, "spi"));
 }
 
 TEST(DeviceOperations, AFamilyWhosePropertiesFailedToLoadHasNoOperations) {
-    ManagerOver manager(
+    ManagerFixture manager(
         Files{{"base.acd", "DEVICE_SUPPORTED = fam1,spi\nPROGRAM_OPTION_PACKAGE = fam1,spi\n"},
               {"fam1.acd", "PROPERTY = BROKEN\nOPERATION = VERIFY,Bscan,PARALLEL\n"}});
     expectRaises<DataMismatchException>(1011,
                                         [&] { return manager->getDeviceOperations("fam1", BS, PARALLEL); });
     EXPECT_EQ(manager->getDeviceOperations("fam1", BS, PARALLEL), 0);
-    EXPECT_TRUE(holds(manager.peer().loadedFamilies(), "fam1"));
-    EXPECT_FALSE(holds(manager.peer().operationsLoaded(), "fam1"));
+    EXPECT_TRUE(holds(manager.members().m_loadedFamilies, "fam1"));
+    EXPECT_FALSE(holds(manager.members().m_operationsLoaded, "fam1"));
 }
 
 TEST(DeviceOperations, AnUnsupportedFamilyIsRaisedBeforeTheRangesAreTested) {
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = spi\nPROGRAM_OPTION_PACKAGE = fam3,spi\n"},
-                              {"fam3.acd", "[dev3]\n"}});
+    ManagerFixture manager(Files{{"base.acd", "DEVICE_SUPPORTED = spi\nPROGRAM_OPTION_PACKAGE = fam3,spi\n"},
+                                 {"fam3.acd", "[dev3]\n"}});
     for (const int mode : BOUNDARY_VALUES) {
         if (mode != 5) {
             expectRaises<OutOfRangeException>(
@@ -203,8 +204,8 @@ TEST(DeviceOperations, AnUnsupportedFamilyIsRaisedBeforeTheRangesAreTested) {
 }
 
 TEST(DeviceOperations, AnUnsupportedFamilyHasNoOperationsWhileExceptionsAreOff) {
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = spi\nPROGRAM_OPTION_PACKAGE = spi\n"},
-                              {"fam3.acd", "OPERATION = VERIFY,Bscan,PARALLEL\n[dev3]\n"}});
+    ManagerFixture manager(Files{{"base.acd", "DEVICE_SUPPORTED = spi\nPROGRAM_OPTION_PACKAGE = spi\n"},
+                                 {"fam3.acd", "OPERATION = VERIFY,Bscan,PARALLEL\n[dev3]\n"}});
     manager->setExceptions(false);
     for (int mode = -1; mode < 10; ++mode) {
         for (int output = -1; output < 10; ++output) {
@@ -215,8 +216,8 @@ TEST(DeviceOperations, AnUnsupportedFamilyHasNoOperationsWhileExceptionsAreOff) 
 }
 
 TEST(DeviceOperations, SpiModeIsRaisedWhereSpiIsNotSupported) {
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = fam1\nPROGRAM_OPTION_PACKAGE = fam1\n"},
-                              {"fam1.acd", "OPERATION = VERIFY,SPI,PARALLEL\n[dev1]\n"}});
+    ManagerFixture manager(Files{{"base.acd", "DEVICE_SUPPORTED = fam1\nPROGRAM_OPTION_PACKAGE = fam1\n"},
+                                 {"fam1.acd", "OPERATION = VERIFY,SPI,PARALLEL\n[dev1]\n"}});
     expectRaises<OutOfRangeException>(1999,
                                       [&] { return manager->getDeviceOperations("dev1", SPI, PARALLEL); });
     expectRaises<OutOfRangeException>(
@@ -227,7 +228,7 @@ TEST(DeviceOperations, SpiModeIsRaisedWhereSpiIsNotSupported) {
 
 TEST(DeviceOperations, AnUnknownDeviceRaisesFirstAsPackageThenAsFamily) {
     // Its family "base" is loaded once, and fails at its program options; what is loaded is not tried again.
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     expectRaises<OutOfRangeException>(2024,
                                       [&] { return manager->getDeviceOperations("nobody", BS, PARALLEL); });
     expectRaises<OutOfRangeException>(1999,
@@ -238,22 +239,23 @@ TEST(DeviceOperations, AnUnknownDeviceRaisesFirstAsPackageThenAsFamily) {
 }
 
 TEST(DeviceOperations, ANullDeviceIsTheEmptyName) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     manager->setExceptions(false);
     EXPECT_EQ(manager->getDeviceOperations(nullptr, BS, PARALLEL), 0);
-    EXPECT_TRUE(manager.peer().deviceFamilyCache().contains(StringBase("")));
+    EXPECT_TRUE(manager.members().m_deviceFamilyCache.contains(StringBase("")));
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
 TEST(DeviceOperations, TheBaseDatabaseCanBeAFamilyForUnknownDevices) {
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = base,spi\nPROGRAM_OPTION_PACKAGE = base,spi\n"
-                                           "OPERATION = READIDCODE,Bscan,PARALLEL\n"}});
+    ManagerFixture manager(
+        Files{{"base.acd", "DEVICE_SUPPORTED = base,spi\nPROGRAM_OPTION_PACKAGE = base,spi\n"
+                           "OPERATION = READIDCODE,Bscan,PARALLEL\n"}});
     EXPECT_EQ(manager->getDeviceOperations("nobody", BS, PARALLEL), maskOf(9));
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
 TEST(DeviceOperations, ABrokenRecordKeepsTheCellsBeforeIt) {
-    ManagerOver manager(Files{
+    ManagerFixture manager(Files{
         {"base.acd", "DEVICE_SUPPORTED = fam1,spi\nPROGRAM_OPTION_PACKAGE = fam1,spi\n"},
         {"fam1.acd", "OPERATION = VERIFY,Bscan,PARALLEL:NOSUCH,Bscan,PARALLEL:ERASE,Bscan,PARALLEL\n"}});
     expectRaises<OutOfRangeException>(1631,

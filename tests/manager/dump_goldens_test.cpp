@@ -1,6 +1,6 @@
 // The dumps of the demonstration database, all of it loaded, against the files in tests/data/dumps. Where a
 // difference is meant (the database was changed), TARVIK_RENEW_GOLDEN=1 in the environment writes the files anew.
-#include "QueryFixture.h"
+#include "Members.h"
 
 #include <TarvikSmokeMgr.h>
 
@@ -32,8 +32,8 @@ std::string packageIn(const std::string& name, const std::string& device,
 }
 
 // Asks for every device, and for each of its packages that has program options of its own.
-void loadEverything(const ManagerOver& manager) {
-    const auto names = textsOf(manager.peer().programOptionPackages());
+void loadEverything(const ManagerFixture& manager) {
+    const auto names = texts(manager.members().m_programOptionPackages);
     for (const std::string& family : AcdStore::families()) {
         const auto devices = AcdStore::devices(family);
         for (const std::string& device : devices) {
@@ -48,7 +48,7 @@ void loadEverything(const ManagerOver& manager) {
             }
         }
     }
-    for (const std::string& name : textsOf(manager.peer().supportedDevices())) {
+    for (const std::string& name : texts(manager.members().m_supportedDevices)) {
         static_cast<void>(manager->getDeviceOperations(name.c_str(), BS, PARALLEL));
     }
 }
@@ -76,7 +76,7 @@ protected:
         return {recorder.text().c_str(), recorder.text().GetLength()};
     }
 
-    ManagerOver m_manager{std::vector<std::string>{SOURCE_DIRECTORY + "/database"}};
+    ManagerFixture m_manager{SearchPath(SOURCE_DIRECTORY + "/database")};
 };
 
 } // namespace

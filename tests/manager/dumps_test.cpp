@@ -1,6 +1,6 @@
 // The dumps of the tables and of the cached families: every byte of them, with and without a recorder.
 #include "DumpFormat.h"
-#include "QueryFixture.h"
+#include "Members.h"
 
 #include <TarvikSmokeMgr.h>
 
@@ -30,7 +30,7 @@ const Files DATABASES = {
 
 using Dump = void (ConstraintsManager::*)(TarvikSmokeMgr*);
 
-std::string recorded(const ManagerOver& manager, Dump dump) {
+std::string recorded(const ManagerFixture& manager, Dump dump) {
     TarvikSmokeMgr recorder;
     ((*manager).*dump)(&recorder);
     return {recorder.text().c_str(), recorder.text().GetLength()};
@@ -63,14 +63,14 @@ dump::Pieces programOptionsOfA() {
            row("b", OPTION_CELLS, {}) + row("spi", OPTION_CELLS, {});
 }
 
-void loadA(const ManagerOver& manager) {
+void loadA(const ManagerFixture& manager) {
     static_cast<void>(manager->getDeviceOperations("a", MODE_TYPE::BS, OUTPUT_TYPE::PARALLEL));
 }
 
 } // namespace
 
 TEST(Dumps, TheFirstLinesOfTheOperationsByHand) {
-    ManagerOver manager(Files{{"base.acd", ""}});
+    ManagerFixture manager(Files{{"base.acd", ""}});
     const std::string text = recorded(manager, &ConstraintsManager::dumpOperationsTable);
     const std::size_t line = 15 + 32 * 60 + 1;
     ASSERT_EQ(text.size(), 3 * line);
@@ -84,7 +84,7 @@ TEST(Dumps, TheFirstLinesOfTheOperationsByHand) {
 }
 
 TEST(Dumps, TheFirstLinesOfTheBoundaryScanOperationsByHand) {
-    ManagerOver manager(Files{{"base.acd", ""}});
+    ManagerFixture manager(Files{{"base.acd", ""}});
     const std::string text = recorded(manager, &ConstraintsManager::dumpBsdlOperationsTable);
     const std::size_t line = 15 + 32 * 10 + 1;
     ASSERT_EQ(text.size(), 2 * line);
@@ -93,47 +93,47 @@ TEST(Dumps, TheFirstLinesOfTheBoundaryScanOperationsByHand) {
 }
 
 TEST(Dumps, TheOperationsOfAFamily) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     loadA(manager);
     EXPECT_EQ(recorded(manager, &ConstraintsManager::dumpOperationsTable), joined(operationsOfA()));
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
 TEST(Dumps, TheBoundaryScanOperationsOfAFamily) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     loadA(manager);
     EXPECT_EQ(recorded(manager, &ConstraintsManager::dumpBsdlOperationsTable), joined(bsdlOperationsOfA()));
 }
 
 TEST(Dumps, TheProgramOptionsOfAFamily) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     loadA(manager);
     EXPECT_EQ(recorded(manager, &ConstraintsManager::dumpProgramOptionsTable), joined(programOptionsOfA()));
 }
 
 TEST(Dumps, WithoutARecorderEveryPieceOfTheOperationsIsAMessage) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     loadA(manager);
     manager->dumpOperationsTable(nullptr);
     EXPECT_EQ(manager.messages(), issued(operationsOfA()));
 }
 
 TEST(Dumps, WithoutARecorderEveryPieceOfTheBoundaryScanOperationsIsAMessage) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     loadA(manager);
     manager->dumpBsdlOperationsTable(nullptr);
     EXPECT_EQ(manager.messages(), issued(bsdlOperationsOfA()));
 }
 
 TEST(Dumps, WithoutARecorderEveryPieceOfTheProgramOptionsIsAMessage) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     loadA(manager);
     manager->dumpProgramOptionsTable(nullptr);
     EXPECT_EQ(manager.messages(), issued(programOptionsOfA()));
 }
 
 TEST(Dumps, APieceTellsItsOriginInFull) {
-    ManagerOver manager(Files{{"base.acd", ""}});
+    ManagerFixture manager(Files{{"base.acd", ""}});
     std::set<std::string> origins;
     Port_MsgManData::setSink([&](const Port_MsgManData::Message& message) {
         origins.insert(std::string(message.product) + " " + std::string(message.source));
@@ -143,7 +143,7 @@ TEST(Dumps, APieceTellsItsOriginInFull) {
 }
 
 TEST(Dumps, EmptyListsGiveTheHeadersAlone) {
-    ManagerOver manager(Files{{"base.acd", ""}});
+    ManagerFixture manager(Files{{"base.acd", ""}});
     EXPECT_EQ(recorded(manager, &ConstraintsManager::dumpOperationsTable),
               joined(dump::moddedHeader(dump::OPERATIONS)));
     EXPECT_EQ(recorded(manager, &ConstraintsManager::dumpBsdlOperationsTable), joined(dump::bsdlHeader()));
@@ -152,20 +152,20 @@ TEST(Dumps, EmptyListsGiveTheHeadersAlone) {
 }
 
 TEST(Dumps, WithoutCachedFamiliesNothingIsDumped) {
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = spi\n"}});
+    ManagerFixture manager(Files{{"base.acd", "DEVICE_SUPPORTED = spi\n"}});
     EXPECT_EQ(recorded(manager, &ConstraintsManager::dumpCachedDeviceFamilies), "");
     manager->dumpCachedDeviceFamilies(nullptr);
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
 TEST(Dumps, TheStartUpCachesSpiWhereItIsNotSupported) {
-    ManagerOver manager(Files{{"base.acd", ""}});
+    ManagerFixture manager(Files{{"base.acd", ""}});
     EXPECT_EQ(recorded(manager, &ConstraintsManager::dumpCachedDeviceFamilies),
               "Device spi belongs to spi\n");
 }
 
 TEST(Dumps, WithoutABaseDatabaseTheHeadersStandToo) {
-    ManagerOver manager(Files{});
+    ManagerFixture manager(Files{});
     EXPECT_EQ(recorded(manager, &ConstraintsManager::dumpOperationsTable),
               joined(dump::moddedHeader(dump::OPERATIONS)));
     EXPECT_EQ(recorded(manager, &ConstraintsManager::dumpBsdlOperationsTable), joined(dump::bsdlHeader()));
@@ -174,17 +174,17 @@ TEST(Dumps, WithoutABaseDatabaseTheHeadersStandToo) {
 }
 
 TEST(Dumps, NothingIsLoadedForADump) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(recorded(manager, &ConstraintsManager::dumpOperationsTable),
               joined(dump::moddedHeader(dump::OPERATIONS) + row("a", OPERATION_CELLS, {}) +
                      row("a_name_of_16_byte", OPERATION_CELLS, {}) +
                      row("exactly_15_byte", OPERATION_CELLS, {}) + row("spi", OPERATION_CELLS, {})));
-    EXPECT_TRUE(manager.peer().loadedFamilies().empty());
-    EXPECT_TRUE(manager.peer().deviceFamilyCache().empty());
+    EXPECT_TRUE(manager.members().m_loadedFamilies.empty());
+    EXPECT_TRUE(manager.members().m_deviceFamilyCache.empty());
 }
 
 TEST(Dumps, ANameIsCutAndPaddedToFifteenBytes) {
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = ,x,0123456789abcde,0123456789abcdef\n"}});
+    ManagerFixture manager(Files{{"base.acd", "DEVICE_SUPPORTED = ,x,0123456789abcde,0123456789abcdef\n"}});
     const std::string zeros = joined(row("", BSDL_CELLS, {})).substr(15);
     EXPECT_EQ(recorded(manager, &ConstraintsManager::dumpBsdlOperationsTable),
               joined(dump::bsdlHeader()) + "               " + zeros + "0123456789abcde" + zeros +
@@ -193,7 +193,7 @@ TEST(Dumps, ANameIsCutAndPaddedToFifteenBytes) {
 
 TEST(Dumps, APieceIsHandedOverAsAFormat) {
     // The cell is padded with the name as it stands; then the sink reads "%%" as "%", and drops nothing else.
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = 50%%x,a%s%n%d,cut_in_percen%%t\n"}});
+    ManagerFixture manager(Files{{"base.acd", "DEVICE_SUPPORTED = 50%%x,a%s%n%d,cut_in_percen%%t\n"}});
     const std::string zeros = joined(row("", BSDL_CELLS, {})).substr(15);
     EXPECT_EQ(recorded(manager, &ConstraintsManager::dumpBsdlOperationsTable),
               joined(dump::bsdlHeader()) + "50%x          " + zeros + "a%s%n%d        " + zeros +
@@ -201,7 +201,7 @@ TEST(Dumps, APieceIsHandedOverAsAFormat) {
 }
 
 TEST(Dumps, APieceIsHandedOverAsAFormatWithoutARecorderToo) {
-    ManagerOver manager(Files{{"base.acd", "PROGRAM_OPTION_PACKAGE = 50%%x,a%s%n%d,fourteen_bytes%%\n"}});
+    ManagerFixture manager(Files{{"base.acd", "PROGRAM_OPTION_PACKAGE = 50%%x,a%s%n%d,fourteen_bytes%%\n"}});
     manager->dumpProgramOptionsTable(nullptr);
     const auto messages = manager.messages();
     const std::size_t header = dump::moddedHeader(dump::OPTIONS).size();
@@ -215,13 +215,13 @@ TEST(Dumps, APieceIsHandedOverAsAFormatWithoutARecorderToo) {
 TEST(Dumps, BytesOver127AreBytes) {
     // A name of two-byte characters is cut inside the eighth.
     const std::string name = "\xc3\xa4\xc3\xa4\xc3\xa4\xc3\xa4\xc3\xa4\xc3\xa4\xc3\xa4\xc3\xa4";
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = " + name + "\n"}});
+    ManagerFixture manager(Files{{"base.acd", "DEVICE_SUPPORTED = " + name + "\n"}});
     const std::string text = recorded(manager, &ConstraintsManager::dumpBsdlOperationsTable);
     EXPECT_EQ(text.substr(joined(dump::bsdlHeader()).size(), 16), name.substr(0, 15) + "0");
 }
 
 TEST(Dumps, CachedFamiliesInTheOrderOfTheDevices) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     for (const char* device : {"zebra", "Dev1_x", "DEV1", "a"}) {
         static_cast<void>(manager->getPartFamily(device));
     }
@@ -230,7 +230,7 @@ TEST(Dumps, CachedFamiliesInTheOrderOfTheDevices) {
 }
 
 TEST(Dumps, EachCachedFamilyIsOnePieceWithoutARecorder) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     static_cast<void>(manager->getPartFamily("zebra"));
     static_cast<void>(manager->getPartFamily("dev1"));
     manager->dumpCachedDeviceFamilies(nullptr);
@@ -239,7 +239,7 @@ TEST(Dumps, EachCachedFamilyIsOnePieceWithoutARecorder) {
 }
 
 TEST(Dumps, CachedNamesOfAnyLengthWithPercentSigns) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     const std::string name(1000, 'x');
     manager->addCachedDeviceFamily((name + "%%").c_str(), "100%s");
     EXPECT_EQ(recorded(manager, &ConstraintsManager::dumpCachedDeviceFamilies),
@@ -249,7 +249,7 @@ TEST(Dumps, CachedNamesOfAnyLengthWithPercentSigns) {
 }
 
 TEST(Dumps, DumpsOfOneRecorderFollowEachOther) {
-    ManagerOver manager(Files{{"base.acd", ""}});
+    ManagerFixture manager(Files{{"base.acd", ""}});
     TarvikSmokeMgr recorder;
     manager->dumpBsdlOperationsTable(&recorder);
     manager->dumpBsdlOperationsTable(&recorder);
@@ -257,7 +257,7 @@ TEST(Dumps, DumpsOfOneRecorderFollowEachOther) {
 }
 
 TEST(Dumps, AFailingSinkPassesThrough) {
-    ManagerOver manager(Files{{"base.acd", ""}});
+    ManagerFixture manager(Files{{"base.acd", ""}});
     struct Refusal {};
     int pieces = 0;
     Port_MsgManData::setSink([&](const Port_MsgManData::Message&) {
@@ -270,28 +270,28 @@ TEST(Dumps, AFailingSinkPassesThrough) {
 }
 
 TEST(NamesByPosition, EachPositionHasItsName) {
-    ManagerOver manager(DATABASES);
-    EXPECT_STREQ(manager.peer().supportedDeviceNameAt(0).c_str(), "a");
-    EXPECT_STREQ(manager.peer().supportedDeviceNameAt(3).c_str(), "spi");
-    EXPECT_STREQ(manager.peer().programOptionPackageNameAt(1).c_str(), "b");
+    ManagerFixture manager(DATABASES);
+    EXPECT_STREQ(manager.members().supportedDeviceNameAt(0).c_str(), "a");
+    EXPECT_STREQ(manager.members().supportedDeviceNameAt(3).c_str(), "spi");
+    EXPECT_STREQ(manager.members().programOptionPackageNameAt(1).c_str(), "b");
 }
 
 TEST(NamesByPosition, PositionsOutOfRangeAreRaisedWhileExceptionsAreOn) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     for (const int position : {4, 5, 2147483647, -1, -2147483647 - 1}) {
         expectRaises<OutOfRangeException>(1959,
-                                          [&] { return manager.peer().supportedDeviceNameAt(position); });
+                                          [&] { return manager.members().supportedDeviceNameAt(position); });
         expectRaises<OutOfRangeException>(
-            1975, [&] { return manager.peer().programOptionPackageNameAt(position); });
+            1975, [&] { return manager.members().programOptionPackageNameAt(position); });
     }
-    expectRaises<OutOfRangeException>(1975, [&] { return manager.peer().programOptionPackageNameAt(3); });
+    expectRaises<OutOfRangeException>(1975, [&] { return manager.members().programOptionPackageNameAt(3); });
 }
 
 TEST(NamesByPosition, PositionsOutOfRangeAreEmptyWhileExceptionsAreOff) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     manager->setExceptions(false);
     for (const int position : {4, 5, 2147483647, -1, -2147483647 - 1}) {
-        EXPECT_STREQ(manager.peer().supportedDeviceNameAt(position).c_str(), "");
-        EXPECT_STREQ(manager.peer().programOptionPackageNameAt(position).c_str(), "");
+        EXPECT_STREQ(manager.members().supportedDeviceNameAt(position).c_str(), "");
+        EXPECT_STREQ(manager.members().programOptionPackageNameAt(position).c_str(), "");
     }
 }

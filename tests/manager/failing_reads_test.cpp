@@ -1,4 +1,4 @@
-#include "CoreFixtures.h"
+#include "Members.h"
 
 #include <functional>
 #include <new>
@@ -82,9 +82,9 @@ struct FailedStart {
     FailedStart(const char* key, short index) { g_beforeRead = failingAt(key, index, fault()); }
     ~FailedStart() { g_beforeRead = nullptr; }
 };
-struct FailedSession : FailedStart, ManagerSession {
+struct FailedSession : FailedStart, ManagerFixture {
     explicit FailedSession(const char* key, short index = 0)
-        : FailedStart(key, index), ManagerSession(DATABASES) {
+        : FailedStart(key, index), ManagerFixture(DATABASES) {
         g_beforeRead = nullptr;
     }
 };
@@ -93,32 +93,32 @@ struct FailedSession : FailedStart, ManagerSession {
 enum Step { SUPPORTED_LISTS, MODE_OUTPUTS, MODE_DEVICES, IDCODES, NOT_SUPPORTED, TABLES, SPI_NAMES, ALL };
 
 /// The steps before `end` have filled their members, those from it on have not.
-void expectStepsBefore(Step end, TarvikTestPeer& peer) {
+void expectStepsBefore(Step end, TarvikTestPeer::Members& members) {
     const auto done = [&](Step step) { return step < end ? 1U : 0U; };
-    EXPECT_EQ(peer.supportedDevices().size(), done(SUPPORTED_LISTS));
-    EXPECT_EQ(peer.programOptionPackages().size(), done(SUPPORTED_LISTS));
-    EXPECT_THAT(peer.bsCables(), SizeIs(done(MODE_OUTPUTS)));
-    EXPECT_THAT(peer.pffCables(), SizeIs(done(MODE_OUTPUTS)));
-    EXPECT_EQ(peer.bsDevices().size(), done(MODE_DEVICES));
-    EXPECT_EQ(peer.pffDevices().size(), done(MODE_DEVICES));
-    EXPECT_THAT(peer.deviceIdcodes(), SizeIs(done(IDCODES)));
-    EXPECT_EQ(peer.notSupportedPartInMode().size(), done(NOT_SUPPORTED));
-    EXPECT_EQ(peer.operationTable()->blocks(), done(TABLES));
-    EXPECT_EQ(peer.bsdlOperationTable()->blocks(), done(TABLES));
-    EXPECT_EQ(peer.programOptionTable()->blocks(), done(TABLES));
-    EXPECT_THAT(peer.operationOrders(), SizeIs(done(TABLES) * 32));
-    EXPECT_THAT(peer.programOptionOrders(), SizeIs(done(TABLES) * 24));
-    EXPECT_THAT(peer.spiFamilies(), SizeIs(done(SPI_NAMES)));
+    EXPECT_EQ(members.m_supportedDevices.size(), done(SUPPORTED_LISTS));
+    EXPECT_EQ(members.m_programOptionPackages.size(), done(SUPPORTED_LISTS));
+    EXPECT_THAT(members.m_bsCables, SizeIs(done(MODE_OUTPUTS)));
+    EXPECT_THAT(members.m_pffCables, SizeIs(done(MODE_OUTPUTS)));
+    EXPECT_EQ(members.m_bsDevices.size(), done(MODE_DEVICES));
+    EXPECT_EQ(members.m_pffDevices.size(), done(MODE_DEVICES));
+    EXPECT_THAT(members.m_deviceIdcodes, SizeIs(done(IDCODES)));
+    EXPECT_EQ(members.m_notSupportedPartInMode.size(), done(NOT_SUPPORTED));
+    EXPECT_EQ(members.m_operationTable.blocks(), done(TABLES));
+    EXPECT_EQ(members.m_bsdlOperationTable.blocks(), done(TABLES));
+    EXPECT_EQ(members.m_programOptionTable.blocks(), done(TABLES));
+    EXPECT_THAT(members.m_operationOrders, SizeIs(done(TABLES) * 32));
+    EXPECT_THAT(members.m_programOptionOrders, SizeIs(done(TABLES) * 24));
+    EXPECT_THAT(members.m_spiFamilies, SizeIs(done(SPI_NAMES)));
 }
 
 /// What every start-up that a fault ended has in common.
-void expectUsableAfterOneReport(ManagerSession& session) {
-    EXPECT_TRUE(session.peer.exceptions());
-    const auto messages = session.messages.take();
+void expectUsableAfterOneReport(ManagerFixture& session) {
+    EXPECT_TRUE(session.members().m_exceptions);
+    const auto messages = session.messages();
     ASSERT_THAT(messages, SizeIs(1));
     EXPECT_EQ(messages[0].line, 4711);
     EXPECT_THAT(messages[0].text, HasSubstr("DataMismatchException"));
-    EXPECT_EQ(text(session.manager.getPartFamily("KS50")), "kestrel");
+    EXPECT_EQ(text(session->getPartFamily("KS50")), "kestrel");
 }
 
 TEST(ReadOrder, OfTheStartUp) {
@@ -131,7 +131,7 @@ TEST(ReadOrder, OfTheStartUp) {
             latest = key;
         }
     };
-    ManagerSession session(DATABASES);
+    ManagerFixture session(DATABASES);
     g_beforeRead = nullptr;
     EXPECT_EQ(keys,
               "DEVICE_SUPPORTED PROGRAM_OPTION_PACKAGE "
@@ -146,108 +146,108 @@ TEST(ReadOrder, OfTheStartUp) {
               "TYPE_MB_BPI_SERIAL_LEAD TYPE_MB_BPI_SERIAL_CHAIN "
               "TYPE_MB_BPI_PARALLEL_LEAD TYPE_MB_BPI_PARALLEL_CHAIN "
               "TYPE_MB_QPRM_NONE_LEAD TYPE_MB_QPRM_NONE_CHAIN ");
-    expectStepsBefore(ALL, session.peer);
+    expectStepsBefore(ALL, session.members());
 }
 
 TEST(ReadOrder, SecondCallReadsNothing) {
-    ManagerSession session(DATABASES);
+    ManagerFixture session(DATABASES);
     g_beforeRead = [](const std::string& key, short) { ADD_FAILURE() << key; };
-    EXPECT_EQ(ConstraintsManager::getConstraintsManager(), &session.manager);
+    EXPECT_EQ(ConstraintsManager::getConstraintsManager(), &*session);
     g_beforeRead = nullptr;
 }
 
 TEST(ReadOrder, LoadedDataIsNotReadAgain) {
-    ManagerSession session(DATABASES);
-    session.peer.loadDeviceData("KS50", nullptr);
+    ManagerFixture session(DATABASES);
+    session.members().loadDeviceData("KS50", {});
     g_beforeRead = [](const std::string& key, short) { ADD_FAILURE() << key; };
-    session.peer.loadDeviceData("KS50", nullptr);
-    session.peer.loadDeviceData("kestrel", nullptr);
+    session.members().loadDeviceData("KS50", {});
+    session.members().loadDeviceData("kestrel", {});
     g_beforeRead = nullptr;
 }
 
 TEST(FailedStartUp, AtTheSupportedListsLeavesEverythingEmpty) {
     FailedSession session("DEVICE_SUPPORTED");
-    expectStepsBefore(SUPPORTED_LISTS, session.peer);
-    EXPECT_NE(session.peer.devKey(), nullptr);
+    expectStepsBefore(SUPPORTED_LISTS, session.members());
+    EXPECT_NE(session.members().m_devKey, nullptr);
     expectUsableAfterOneReport(session);
 }
 
 TEST(FailedStartUp, AtTheModeOutputsKeepsTheLists) {
     FailedSession session("BS");
-    expectStepsBefore(MODE_OUTPUTS, session.peer);
+    expectStepsBefore(MODE_OUTPUTS, session.members());
     expectUsableAfterOneReport(session);
 }
 
 TEST(FailedStartUp, AtTheModeDevicesKeepsTheOutputs) {
     FailedSession session("BS", 1);
-    expectStepsBefore(MODE_DEVICES, session.peer);
+    expectStepsBefore(MODE_DEVICES, session.members());
     expectUsableAfterOneReport(session);
 }
 
 TEST(FailedStartUp, AtTheIdcodesKeepsTheModeTables) {
     FailedSession session("IDCODE");
-    expectStepsBefore(IDCODES, session.peer);
-    EXPECT_THAT(session.peer.deviceFamilyCache(), IsEmpty());
+    expectStepsBefore(IDCODES, session.members());
+    EXPECT_THAT(session.members().m_deviceFamilyCache, IsEmpty());
     expectUsableAfterOneReport(session);
 }
 
 TEST(FailedStartUp, AtTheNotSupportedPartsKeepsTheIdcodes) {
     FailedSession session("NOT_SUPPORTED_PART_IN_MODE");
-    expectStepsBefore(NOT_SUPPORTED, session.peer);
+    expectStepsBefore(NOT_SUPPORTED, session.members());
     expectUsableAfterOneReport(session);
 }
 
 TEST(FailedStartUp, AtTheSpiNamesKeepsTablesAndOrders) {
     FailedSession session("DEVICE_FAMILY");
-    expectStepsBefore(SPI_NAMES, session.peer);
-    EXPECT_THAT(session.peer.operationsLoaded(), IsEmpty());
+    expectStepsBefore(SPI_NAMES, session.members());
+    EXPECT_THAT(session.members().m_operationsLoaded, IsEmpty());
     expectUsableAfterOneReport(session);
 }
 
 TEST(FailedStartUp, AtTheClassListsKeepsTheSpiNames) {
     FailedSession session("AT1_DEVICES");
-    expectStepsBefore(ALL, session.peer);
-    EXPECT_THAT(session.peer.spiNames(), SizeIs(3));
-    EXPECT_THAT(session.peer.spiProperties(), IsEmpty());
+    expectStepsBefore(ALL, session.members());
+    EXPECT_THAT(session.members().m_spiNames, SizeIs(3));
+    EXPECT_THAT(session.members().m_spiProperties, IsEmpty());
     expectUsableAfterOneReport(session);
 }
 
 TEST(FailedStartUp, AtTheSpiPropertiesKeepsTheClassLists) {
     FailedSession session("FLASHES_PROPERTY");
-    EXPECT_THAT(session.peer.at1Devices(), SizeIs(1));
-    EXPECT_THAT(session.peer.spiProperties(), IsEmpty());
-    EXPECT_THAT(session.peer.operationsLoaded(), IsEmpty());
+    EXPECT_THAT(session.members().m_at1Devices, SizeIs(1));
+    EXPECT_THAT(session.members().m_spiProperties, IsEmpty());
+    EXPECT_THAT(session.members().m_operationsLoaded, IsEmpty());
     expectUsableAfterOneReport(session);
 }
 
 TEST(FailedStartUp, AtTheSpiOperationsCountsThemAsNotLoaded) {
     FailedSession session("OPERATION");
-    EXPECT_THAT(session.peer.spiProperties(), SizeIs(1));
-    EXPECT_THAT(session.peer.operationsLoaded(), IsEmpty());
+    EXPECT_THAT(session.members().m_spiProperties, SizeIs(1));
+    EXPECT_THAT(session.members().m_operationsLoaded, IsEmpty());
     expectUsableAfterOneReport(session);
 }
 
 TEST(FailedStartUp, AtTheSpiBsdlOperationsCountsTheOperationsAsLoaded) {
     FailedSession session("BSDL_OPERATION");
-    EXPECT_THAT(texts(session.peer.operationsLoaded()), ElementsAre("spi"));
-    EXPECT_THAT(session.peer.programOptionsLoaded(), IsEmpty());
+    EXPECT_THAT(texts(session.members().m_operationsLoaded), ElementsAre("spi"));
+    EXPECT_THAT(session.members().m_programOptionsLoaded, IsEmpty());
     expectUsableAfterOneReport(session);
 }
 
 TEST(FailedStartUp, AtTheMultibootTypesCountsTheOptionsAsLoaded) {
     FailedSession session("TYPE_BPI_SERIAL_LEAD");
-    EXPECT_THAT(texts(session.peer.programOptionsLoaded()), ElementsAre("spi"));
-    EXPECT_THAT(session.peer.multibootTypes(), IsEmpty());
+    EXPECT_THAT(texts(session.members().m_programOptionsLoaded), ElementsAre("spi"));
+    EXPECT_THAT(session.members().m_multibootTypes, IsEmpty());
     expectUsableAfterOneReport(session);
 }
 
 TEST(FailedStartUp, AsksTheExceptionItselfToReportOnce) {
     g_beforeRead = failingAt("IDCODE", 0, CountingException());
-    ManagerSession session(DATABASES);
+    ManagerFixture session(DATABASES);
     g_beforeRead = nullptr;
     EXPECT_EQ(CountingException::s_reports, 1);
-    EXPECT_THAT(session.messages.take(), IsEmpty());
-    expectStepsBefore(IDCODES, session.peer);
+    EXPECT_THAT(session.messages(), IsEmpty());
+    expectStepsBefore(IDCODES, session.members());
 }
 
 TEST(FailedCreation, AnyOtherExceptionPassesOutAndTheNextCallTriesAgain) {
@@ -266,21 +266,58 @@ TEST(FailedCreation, AnyOtherExceptionPassesOutAndTheNextCallTriesAgain) {
     }
     g_beforeRead = nullptr;
     EXPECT_THAT(recorder.take(), IsEmpty());
-    ManagerSession session(DATABASES);
-    expectStepsBefore(ALL, session.peer);
-    EXPECT_THAT(session.peer.multibootTypes(), SizeIs(12));
+    ManagerFixture session(DATABASES);
+    expectStepsBefore(ALL, session.members());
+    EXPECT_THAT(session.members().m_multibootTypes, SizeIs(12));
 }
 
 TEST(FailedLoading, PassesOutWhateverTheSwitchSaysAndIsNotRepeated) {
     for (const char* key : {"PROPERTY", "PROPERTIES", "OPERATION", "BSDL_OPERATION", "PROGRAM_OPTION"}) {
         SCOPED_TRACE(key);
-        ManagerSession session(DATABASES);
-        session.manager.setExceptions(false);
+        ManagerFixture session(DATABASES);
+        session->setExceptions(false);
         g_beforeRead = failingAt(key, 0, fault());
-        EXPECT_THROW(session.peer.loadDeviceData("kestrel", nullptr), DataMismatchException);
-        EXPECT_NO_THROW(session.peer.loadDeviceData("kestrel", nullptr));
+        EXPECT_THROW(session.members().loadDeviceData("kestrel", {}), DataMismatchException);
+        EXPECT_NO_THROW(session.members().loadDeviceData("kestrel", {}));
         g_beforeRead = nullptr;
-        EXPECT_THAT(session.messages.take(), IsEmpty());
+        EXPECT_THAT(session.messages(), IsEmpty());
+    }
+}
+
+/// Turns exceptions at the first read of a record's number `index` of `key`.
+void turnExceptionsAt(ConstraintsManager& manager, const std::string& key, short index, bool exceptions) {
+    g_beforeRead = [&manager, key, index, exceptions](const std::string& read, short at) {
+        if (read == key && at == index) {
+            manager.setExceptions(exceptions);
+        }
+    };
+}
+
+struct FaultyRecord {
+    const char* key;
+    const char* records; ///< the second one is faulty
+    int location;
+};
+constexpr FaultyRecord FAULTY_RECORDS[] = {
+    {"PROPERTY", "VENDOR,Korvel:BROKEN", 1011},          {"PROPERTIES", "MODES,1,BS:BROKEN,1", 1051},
+    {"OPERATION", "PROGRAM,BS,USB2:VERIFY,BS", 1649},    {"BSDL_OPERATION", "BYPASS,USB2:HIGHZ", 1695},
+    {"PROGRAM_OPTION", "ERASE,BS,USB2:VERIFY,BS", 1750},
+};
+
+TEST(ExceptionsSwitch, TurnedWhileALoadReadsDecidesAboutTheRestOfThatLoad) {
+    for (const FaultyRecord& faulty : FAULTY_RECORDS) {
+        SCOPED_TRACE(faulty.key);
+        Files files = DATABASES;
+        files["kestrel.acd"] = std::string(faulty.key) + " = " + faulty.records + "\n";
+        for (const bool exceptions : {false, true}) {
+            ManagerFixture fixture(files);
+            fixture->setExceptions(!exceptions);
+            turnExceptionsAt(*fixture, faulty.key, 1, exceptions);
+            const int raised =
+                raisedLine<DataMismatchException>([&] { fixture.members().loadDeviceData("kestrel", {}); });
+            EXPECT_EQ(raised, exceptions ? faulty.location : -1);
+            g_beforeRead = nullptr;
+        }
     }
 }
 

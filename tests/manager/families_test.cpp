@@ -1,4 +1,4 @@
-#include "CoreFixtures.h"
+#include "Members.h"
 
 #include <Port_MsgManData.h>
 
@@ -14,17 +14,17 @@ using testing::Pair;
 namespace {
 
 /// Two families with devices, and an SPI flash database.
-struct FamilySession : ManagerSession {
+struct FamilySession : ManagerFixture {
     FamilySession()
-        : ManagerSession({{"base.acd", "DEVICE_SUPPORTED = kestrel,spi\n"},
+        : ManagerFixture({{"base.acd", "DEVICE_SUPPORTED = kestrel,spi\n"},
                           {"kestrel.acd", "[KS50]\n[KS100]\n[FLASH9]\n"},
                           {"Osprey.acd", "[OS1]\n[KS50_X]\n"},
                           {"spi.acd", "DEVICE_FAMILY = FLASHES\n"
                                       "FLASHES_DEVICES = FLASH1,FLASH9,FLASH2_X,small\n"}}) {}
 
-    std::string familyOf(const char* device) { return text(manager.getPartFamily(device)); }
-    std::map<std::string, std::string> cache() { return entries(peer.deviceFamilyCache()); }
-    void seed(const char* device, const char* family) { manager.addCachedDeviceFamily(device, family); }
+    std::string familyOf(const char* device) { return text((*this)->getPartFamily(device)); }
+    std::map<std::string, std::string> cache() { return entries(members().m_deviceFamilyCache); }
+    void seed(const char* device, const char* family) { (*this)->addCachedDeviceFamily(device, family); }
 };
 
 TEST(PartFamily, OfADeviceIsTheFamilyThatHoldsIt) {
@@ -32,19 +32,19 @@ TEST(PartFamily, OfADeviceIsTheFamilyThatHoldsIt) {
     EXPECT_EQ(session.familyOf("KS50"), "kestrel");
     EXPECT_EQ(session.familyOf("KS100"), "kestrel");
     EXPECT_EQ(session.familyOf("OS1"), "Osprey");
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(PartFamily, OfALookUpThatRaisesIsEmpty) {
     const DatabaseDirectory directory;
     directory.makeDirectory("unreadable.acd");
     FamilySession session;
-    session.peer.partFamily() = "former";
+    session.members().m_partFamily = "former";
     // The scan for devices reports what it can't read.
     AcdStore::setSearchPath({directory.path()});
     Port_MsgManData::setSink([](const Port_MsgManData::Message&) { throw std::runtime_error("no room"); });
-    EXPECT_THROW(static_cast<void>(session.manager.getPartFamily("KS50")), std::runtime_error);
-    EXPECT_EQ(text(session.peer.partFamily()), "");
+    EXPECT_THROW(static_cast<void>(session->getPartFamily("KS50")), std::runtime_error);
+    EXPECT_EQ(text(session.members().m_partFamily), "");
 }
 
 TEST(PartFamily, IsFoundInAnyCase) {
@@ -67,7 +67,7 @@ TEST(PartFamily, OfAnUnknownDeviceIsBaseSilently) {
         EXPECT_EQ(session.familyOf(device), "base") << device;
     }
     EXPECT_EQ(session.familyOf(nullptr), "base");
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(PartFamily, IsThatOfTheBaseName) {
@@ -123,14 +123,14 @@ TEST(PartFamily, OfSpiIsSpiInAnyCase) {
 
 TEST(PartFamily, OfSpiIsSpiWithoutAnSpiDatabase) {
     for (const char* name : {"spi", "SPI", "sPi"}) {
-        BaseSession session("DEVICE_SUPPORTED = spi\n");
-        EXPECT_EQ(text(session.manager.getPartFamily(name)), "spi");
+        ManagerFixture session(Base{"DEVICE_SUPPORTED = spi\n"});
+        EXPECT_EQ(text(session->getPartFamily(name)), "spi");
     }
 }
 
 TEST(PartFamily, SpiWithAPackageIsNotSpiWithoutAnSpiDatabase) {
-    BaseSession session("DEVICE_SUPPORTED = spi\n");
-    EXPECT_EQ(text(session.manager.getPartFamily("spi_x")), "base");
+    ManagerFixture session(Base{"DEVICE_SUPPORTED = spi\n"});
+    EXPECT_EQ(text(session->getPartFamily("spi_x")), "base");
 }
 
 TEST(PartFamily, IsCachedUnderTheLowerCasedBaseName) {
@@ -145,15 +145,15 @@ TEST(PartFamily, IsCachedUnderTheLowerCasedBaseName) {
 
 TEST(PartFamily, CacheAnswersBeforeDatabaseAndSpiNames) {
     FamilySession session;
-    session.peer.deviceFamilyCache()[StringBase("ks50")] = "elsewhere";
-    session.peer.deviceFamilyCache()[StringBase("flash1")] = "elsewhere";
+    session.members().m_deviceFamilyCache[StringBase("ks50")] = "elsewhere";
+    session.members().m_deviceFamilyCache[StringBase("flash1")] = "elsewhere";
     EXPECT_EQ(session.familyOf("KS50_PQ"), "elsewhere");
     EXPECT_EQ(session.familyOf("FLASH1"), "elsewhere");
 }
 
 TEST(PartFamily, CachedEmptyTextCountsAsAMissAndIsOverwritten) {
     FamilySession session;
-    session.peer.deviceFamilyCache()[StringBase("ks50")] = "";
+    session.members().m_deviceFamilyCache[StringBase("ks50")] = "";
     EXPECT_EQ(session.familyOf("KS50"), "kestrel");
     EXPECT_THAT(session.cache(), ElementsAre(Pair("ks50", "kestrel")));
 }
@@ -161,34 +161,34 @@ TEST(PartFamily, CachedEmptyTextCountsAsAMissAndIsOverwritten) {
 TEST(PartFamily, IsLeftInTheResultBuffer) {
     FamilySession session;
     EXPECT_EQ(session.familyOf("KS50"), "kestrel");
-    EXPECT_EQ(text(session.peer.partFamily()), "kestrel");
+    EXPECT_EQ(text(session.members().m_partFamily), "kestrel");
     EXPECT_EQ(session.familyOf("nobody"), "base");
-    EXPECT_EQ(text(session.peer.partFamily()), "base");
+    EXPECT_EQ(text(session.members().m_partFamily), "base");
     EXPECT_EQ(session.familyOf("KS50"), "kestrel");
-    EXPECT_EQ(text(session.peer.partFamily()), "kestrel");
+    EXPECT_EQ(text(session.members().m_partFamily), "kestrel");
 }
 
 TEST(PartFamily, IsACopyThatLaterQuestionsLeaveAlone) {
     FamilySession session;
-    const StringBase family = session.manager.getPartFamily("KS50");
+    const StringBase family = session->getPartFamily("KS50");
     EXPECT_EQ(session.familyOf("nobody"), "base");
     EXPECT_EQ(text(family), "kestrel");
 }
 
 TEST(PartFamily, OfTheResultBufferItself) {
     FamilySession session;
-    session.peer.partFamily() = "KS50_a_package_that_is_longer_than_any_short_text";
-    EXPECT_EQ(session.familyOf(session.peer.partFamily().c_str()), "kestrel");
+    session.members().m_partFamily = "KS50_a_package_that_is_longer_than_any_short_text";
+    EXPECT_EQ(session.familyOf(session.members().m_partFamily.c_str()), "kestrel");
     EXPECT_THAT(session.cache(), ElementsAre(Pair("ks50", "kestrel")));
-    EXPECT_EQ(session.familyOf(session.peer.partFamily().c_str()), "kestrel");
+    EXPECT_EQ(session.familyOf(session.members().m_partFamily.c_str()), "kestrel");
 }
 
 TEST(PartFamily, OfAnSpiFlashInTheResultBufferItself) {
     FamilySession session;
-    session.peer.partFamily() = "flash2_x";
-    EXPECT_EQ(session.familyOf(session.peer.partFamily().c_str()), "spi");
-    session.peer.partFamily() = "FLASH1";
-    EXPECT_EQ(session.familyOf(session.peer.partFamily().c_str()), "spi");
+    session.members().m_partFamily = "flash2_x";
+    EXPECT_EQ(session.familyOf(session.members().m_partFamily.c_str()), "spi");
+    session.members().m_partFamily = "FLASH1";
+    EXPECT_EQ(session.familyOf(session.members().m_partFamily.c_str()), "spi");
 }
 
 TEST(PartFamily, OfAVeryLongName) {
@@ -199,7 +199,7 @@ TEST(PartFamily, OfAVeryLongName) {
 
 TEST(PartFamily, DoesNotDependOnTheExceptionsSwitch) {
     FamilySession session;
-    session.manager.setExceptions(false);
+    session->setExceptions(false);
     EXPECT_EQ(session.familyOf("KS50"), "kestrel");
     EXPECT_EQ(session.familyOf("nobody"), "base");
     EXPECT_EQ(session.familyOf("FLASH1"), "spi");
@@ -208,8 +208,8 @@ TEST(PartFamily, DoesNotDependOnTheExceptionsSwitch) {
 TEST(PartFamily, LoadsNothing) {
     FamilySession session;
     EXPECT_EQ(session.familyOf("KS50"), "kestrel");
-    EXPECT_THAT(session.peer.loadedFamilies(), IsEmpty());
-    EXPECT_THAT(texts(session.peer.operationsLoaded()), ElementsAre("spi"));
+    EXPECT_THAT(session.members().m_loadedFamilies, IsEmpty());
+    EXPECT_THAT(texts(session.members().m_operationsLoaded), ElementsAre("spi"));
 }
 
 TEST(Seeding, SavesTheResolution) {
@@ -230,7 +230,7 @@ TEST(Seeding, LeavesTheResultBufferAlone) {
     FamilySession session;
     EXPECT_EQ(session.familyOf("KS50"), "kestrel");
     session.seed("dev", "fam");
-    EXPECT_EQ(text(session.peer.partFamily()), "kestrel");
+    EXPECT_EQ(text(session.members().m_partFamily), "kestrel");
 }
 
 TEST(Seeding, IsRefusedWhileTheLatestResolutionIsItselfCached) {
@@ -266,16 +266,16 @@ TEST(Seeding, OfACachedNameOverwrites) {
 TEST(Seeding, EmptyValueOfTheLatestResolutionDoesNotRefuse) {
     FamilySession session;
     EXPECT_EQ(session.familyOf("KS50"), "kestrel");
-    session.peer.deviceFamilyCache()[StringBase("kestrel")] = "";
+    session.members().m_deviceFamilyCache[StringBase("kestrel")] = "";
     session.seed("dev", "fam");
     EXPECT_THAT(session.cache(), Contains(Pair("dev", "fam")));
 }
 
 TEST(Seeding, IsRefusedRightAfterAStartUpThatResolvedSpi) {
-    BaseSession session("");
-    EXPECT_EQ(text(session.peer.partFamily()), "spi");
-    session.manager.addCachedDeviceFamily("dev", "fam");
-    EXPECT_THAT(entries(session.peer.deviceFamilyCache()), ElementsAre(Pair("spi", "spi")));
+    ManagerFixture session(Base{""});
+    EXPECT_EQ(text(session.members().m_partFamily), "spi");
+    session->addCachedDeviceFamily("dev", "fam");
+    EXPECT_THAT(entries(session.members().m_deviceFamilyCache), ElementsAre(Pair("spi", "spi")));
 }
 
 TEST(Seeding, NullDeviceIsTheEmptyName) {
@@ -294,41 +294,41 @@ TEST(Seeding, NullFamilyIsTheEmptyTextWhichIsNoAnswer) {
 TEST(Seeding, WithTheResultBufferItself) {
     FamilySession session;
     EXPECT_EQ(session.familyOf("KS50"), "kestrel");
-    session.seed(session.peer.partFamily().c_str(), session.peer.partFamily().c_str());
+    session.seed(session.members().m_partFamily.c_str(), session.members().m_partFamily.c_str());
     EXPECT_THAT(session.cache(), ElementsAre(Pair("kestrel", "kestrel"), Pair("ks50", "kestrel")));
 }
 
 TEST(KorvelDevice, IsADeviceWhoseFamilyIsKnown) {
     FamilySession session;
-    EXPECT_TRUE(session.manager.isKorvelDevice("KS50"));
-    EXPECT_TRUE(session.manager.isKorvelDevice("ks50_PQ"));
-    EXPECT_TRUE(session.manager.isKorvelDevice("kestrel"));
-    EXPECT_TRUE(session.manager.isKorvelDevice("FLASH1"));
-    EXPECT_FALSE(session.manager.isKorvelDevice("nobody"));
-    EXPECT_FALSE(session.manager.isKorvelDevice("base"));
-    EXPECT_FALSE(session.manager.isKorvelDevice(""));
-    EXPECT_FALSE(session.manager.isKorvelDevice(nullptr));
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_TRUE(session->isKorvelDevice("KS50"));
+    EXPECT_TRUE(session->isKorvelDevice("ks50_PQ"));
+    EXPECT_TRUE(session->isKorvelDevice("kestrel"));
+    EXPECT_TRUE(session->isKorvelDevice("FLASH1"));
+    EXPECT_FALSE(session->isKorvelDevice("nobody"));
+    EXPECT_FALSE(session->isKorvelDevice("base"));
+    EXPECT_FALSE(session->isKorvelDevice(""));
+    EXPECT_FALSE(session->isKorvelDevice(nullptr));
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(KorvelDevice, ComparesCaseIncluded) {
     FamilySession session;
     session.seed("dev", "BASE");
-    EXPECT_TRUE(session.manager.isKorvelDevice("dev"));
+    EXPECT_TRUE(session->isKorvelDevice("dev"));
 }
 
 TEST(FamilyName, IsANameThatResolvesToItselfExactly) {
     FamilySession session;
-    EXPECT_TRUE(session.peer.isFamilyName("kestrel"));
-    EXPECT_TRUE(session.peer.isFamilyName("Osprey"));
-    EXPECT_TRUE(session.peer.isFamilyName("spi"));
-    EXPECT_TRUE(session.peer.isFamilyName("base"));
-    EXPECT_FALSE(session.peer.isFamilyName("KESTREL"));
-    EXPECT_FALSE(session.peer.isFamilyName("osprey"));
-    EXPECT_FALSE(session.peer.isFamilyName("KS50"));
-    EXPECT_FALSE(session.peer.isFamilyName("kestrel_x"));
-    EXPECT_FALSE(session.peer.isFamilyName("nobody"));
-    EXPECT_FALSE(session.peer.isFamilyName(""));
+    EXPECT_TRUE(session.members().isFamilyName("kestrel"));
+    EXPECT_TRUE(session.members().isFamilyName("Osprey"));
+    EXPECT_TRUE(session.members().isFamilyName("spi"));
+    EXPECT_TRUE(session.members().isFamilyName("base"));
+    EXPECT_FALSE(session.members().isFamilyName("KESTREL"));
+    EXPECT_FALSE(session.members().isFamilyName("osprey"));
+    EXPECT_FALSE(session.members().isFamilyName("KS50"));
+    EXPECT_FALSE(session.members().isFamilyName("kestrel_x"));
+    EXPECT_FALSE(session.members().isFamilyName("nobody"));
+    EXPECT_FALSE(session.members().isFamilyName(""));
 }
 
 } // namespace

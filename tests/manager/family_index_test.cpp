@@ -1,4 +1,6 @@
-#include "CoreFixtures.h"
+#include "Members.h"
+
+#include <StringViews.h>
 
 // The position of a family among the supported ones.
 
@@ -8,45 +10,45 @@ using testing::Pair;
 
 namespace {
 
-struct IndexSession : ManagerSession {
+struct IndexSession : ManagerFixture {
     IndexSession()
-        : ManagerSession({{"base.acd", "DEVICE_SUPPORTED = merlin,kestrel,Osprey,spi\n"},
+        : ManagerFixture({{"base.acd", "DEVICE_SUPPORTED = merlin,kestrel,Osprey,spi\n"},
                           {"kestrel.acd", "[KS50]\n"},
                           {"merlin.acd", "[ME1]\n"},
                           {"sparrow.acd", "[SP1]\n"},
                           {"spi.acd", "DEVICE_FAMILY = FLASHES\n"}}) {}
 
     int raises(const char* name) {
-        return raisedLine<OutOfRangeException>([&] { (void)peer.familyIndex(name); });
+        return raisedLine<OutOfRangeException>([&] { (void)members().familyIndex(name); });
     }
 };
 
 TEST(FamilyIndex, OfAFamilyIsItsPositionInByteOrder) {
     IndexSession session;
-    EXPECT_EQ(session.peer.familyIndex("Osprey"), 0U);
-    EXPECT_EQ(session.peer.familyIndex("kestrel"), 1U);
-    EXPECT_EQ(session.peer.familyIndex("merlin"), 2U);
-    EXPECT_EQ(session.peer.familyIndex("spi"), 3U);
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_EQ(session.members().familyIndex("Osprey"), 0U);
+    EXPECT_EQ(session.members().familyIndex("kestrel"), 1U);
+    EXPECT_EQ(session.members().familyIndex("merlin"), 2U);
+    EXPECT_EQ(session.members().familyIndex("spi"), 3U);
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(FamilyIndex, OfADeviceIsThatOfItsFamily) {
     IndexSession session;
-    EXPECT_EQ(session.peer.familyIndex("KS50"), 1U);
-    EXPECT_EQ(session.peer.familyIndex("ME1_PQ"), 2U);
-    EXPECT_EQ(session.peer.familyIndex("FLASHES"), 3U);
+    EXPECT_EQ(session.members().familyIndex("KS50"), 1U);
+    EXPECT_EQ(session.members().familyIndex("ME1_PQ"), 2U);
+    EXPECT_EQ(session.members().familyIndex("FLASHES"), 3U);
 }
 
 TEST(FamilyIndex, OfAFamilyNeedsNoResolution) {
     IndexSession session;
-    EXPECT_EQ(session.peer.familyIndex("kestrel"), 1U);
-    EXPECT_THAT(session.peer.deviceFamilyCache(), IsEmpty());
+    EXPECT_EQ(session.members().familyIndex("kestrel"), 1U);
+    EXPECT_THAT(session.members().m_deviceFamilyCache, IsEmpty());
 }
 
 TEST(FamilyIndex, OfASupportedFamilyInAnotherCaseIsFoundThroughItsResolution) {
     IndexSession session;
-    EXPECT_EQ(session.peer.familyIndex("KESTREL"), 1U);
-    EXPECT_THAT(entries(session.peer.deviceFamilyCache()), ElementsAre(Pair("kestrel", "kestrel")));
+    EXPECT_EQ(session.members().familyIndex("KESTREL"), 1U);
+    EXPECT_THAT(entries(session.members().m_deviceFamilyCache), ElementsAre(Pair("kestrel", "kestrel")));
 }
 
 TEST(FamilyIndex, OfASupportedFamilyWithASuffixIsNotFound) {
@@ -54,7 +56,7 @@ TEST(FamilyIndex, OfASupportedFamilyWithASuffixIsNotFound) {
     for (const char* name : {"kestrel_x", "kestrel_", "merlin_a_b"}) {
         EXPECT_EQ(session.raises(name), 1999) << name;
     }
-    EXPECT_THAT(session.peer.deviceFamilyCache(), IsEmpty());
+    EXPECT_THAT(session.members().m_deviceFamilyCache, IsEmpty());
 }
 
 TEST(FamilyIndex, OfANameThatNoListHoldsRaises) {
@@ -62,49 +64,50 @@ TEST(FamilyIndex, OfANameThatNoListHoldsRaises) {
     for (const char* name : {"sparrow", "SP1", "nobody", "base", "", "osprey"}) {
         EXPECT_EQ(session.raises(name), 1999) << name;
     }
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(FamilyIndex, IsOnePastTheLastWhileExceptionsAreOff) {
     IndexSession session;
-    session.manager.setExceptions(false);
+    session->setExceptions(false);
     for (const char* name : {"sparrow", "SP1", "nobody", "base", "", "kestrel_x"}) {
-        EXPECT_EQ(session.peer.familyIndex(name), 4U) << name;
+        EXPECT_EQ(session.members().familyIndex(name), 4U) << name;
     }
-    EXPECT_EQ(session.peer.familyIndex(nullptr), 4U);
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_EQ(session.members().familyIndex(view(static_cast<const char*>(nullptr))), 4U);
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(FamilyIndex, IsZeroWithoutSupportedFamilies) {
-    BaseSession session("");
-    session.manager.setExceptions(false);
-    EXPECT_EQ(session.peer.familyIndex("kestrel"), 0U);
+    ManagerFixture session(Base{""});
+    session->setExceptions(false);
+    EXPECT_EQ(session.members().familyIndex("kestrel"), 0U);
 }
 
 TEST(FamilyIndex, OfUnknownDevicesIsThatOfBaseWhereBaseIsSupported) {
-    BaseSession session("DEVICE_SUPPORTED = kestrel,base\n");
-    EXPECT_EQ(session.peer.familyIndex("nobody"), 0U);
-    EXPECT_EQ(session.peer.familyIndex("base"), 0U);
+    ManagerFixture session(Base{"DEVICE_SUPPORTED = kestrel,base\n"});
+    EXPECT_EQ(session.members().familyIndex("nobody"), 0U);
+    EXPECT_EQ(session.members().familyIndex("base"), 0U);
 }
 
 TEST(FamilyIndex, FollowsTheFamilyCache) {
     IndexSession session;
-    session.manager.addCachedDeviceFamily("nobody", "merlin");
-    EXPECT_EQ(session.peer.familyIndex("NOBODY_PQ"), 2U);
+    session->addCachedDeviceFamily("nobody", "merlin");
+    EXPECT_EQ(session.members().familyIndex("NOBODY_PQ"), 2U);
 }
 
 TEST(FamilyIndex, OfTheResultBufferItself) {
     IndexSession session;
-    EXPECT_EQ(text(session.manager.getPartFamily("KS50")), "kestrel");
-    EXPECT_EQ(session.peer.familyIndex(session.peer.partFamily().c_str()), 1U);
-    session.peer.partFamily() = "ME1_PQ";
-    EXPECT_EQ(session.peer.familyIndex(session.peer.partFamily().c_str()), 2U);
+    EXPECT_EQ(text(session->getPartFamily("KS50")), "kestrel");
+    EXPECT_EQ(session.members().familyIndex(session.members().m_partFamily.c_str()), 1U);
+    session.members().m_partFamily = "ME1_PQ";
+    EXPECT_EQ(session.members().familyIndex(session.members().m_partFamily.c_str()), 2U);
 }
 
 TEST(FamilyIndex, OfASupportedNameThatHoldsAnUnderscore) {
-    BaseSession session("DEVICE_SUPPORTED = kestrel,kestrel_x,sparrow_x\n");
-    EXPECT_EQ(session.peer.familyIndex("kestrel_x"), 1U);
-    EXPECT_EQ(raisedLine<OutOfRangeException>([&] { (void)session.peer.familyIndex("sparrow_x"); }), 1999);
+    ManagerFixture session(Base{"DEVICE_SUPPORTED = kestrel,kestrel_x,sparrow_x\n"});
+    EXPECT_EQ(session.members().familyIndex("kestrel_x"), 1U);
+    EXPECT_EQ(raisedLine<OutOfRangeException>([&] { (void)session.members().familyIndex("sparrow_x"); }),
+              1999);
 }
 
 } // namespace

@@ -1,4 +1,4 @@
-#include "CoreFixtures.h"
+#include "Members.h"
 
 #include <cstdint>
 
@@ -23,18 +23,18 @@ TEST(Lifecycle, EveryCallGivesTheSameManager) {
 }
 
 TEST(Lifecycle, StartsUpOnce) {
-    ManagerSession session({{"base.acd", ""}, {"spi.acd", "PROGRAM_OPTION = OTP,SPI,USB2\n"}});
-    EXPECT_THAT(session.messages.take(), SizeIs(1));
-    EXPECT_EQ(ConstraintsManager::getConstraintsManager(), &session.manager);
-    EXPECT_THAT(session.messages.take(), IsEmpty());
-    EXPECT_THAT(session.manager.getOperationOrders(), SizeIs(32));
+    ManagerFixture session({{"base.acd", ""}, {"spi.acd", "PROGRAM_OPTION = OTP,SPI,USB2\n"}});
+    EXPECT_THAT(session.messages(), SizeIs(1));
+    EXPECT_EQ(ConstraintsManager::getConstraintsManager(), &*session);
+    EXPECT_THAT(session.messages(), IsEmpty());
+    EXPECT_THAT(session->getOperationOrders(), SizeIs(32));
 }
 
 TEST(Lifecycle, LaterCallKeepsTheExceptionsSwitch) {
-    BaseSession session("");
-    session.manager.setExceptions(false);
+    ManagerFixture session(Base{""});
+    session->setExceptions(false);
     (void)ConstraintsManager::getConstraintsManager();
-    EXPECT_FALSE(session.peer.exceptions());
+    EXPECT_FALSE(session.members().m_exceptions);
 }
 
 TEST(Lifecycle, RemovalLeavesThePointerAsItStands) {
@@ -47,8 +47,8 @@ TEST(Lifecycle, RemovalLeavesThePointerAsItStands) {
 TEST(Lifecycle, RemovalWithoutAManagerDoesNothing) {
     ConstraintsManager::RemoveConstraintsManager();
     EXPECT_EQ(TarvikTestPeer::instance(), nullptr);
-    BaseSession session("");
-    EXPECT_THAT(session.manager.getOperationOrders(), SizeIs(32));
+    ManagerFixture session(Base{""});
+    EXPECT_THAT(session->getOperationOrders(), SizeIs(32));
 }
 
 TEST(Lifecycle, RemovalAfterAStartUpThatBuiltNoTables) {
@@ -58,125 +58,150 @@ TEST(Lifecycle, RemovalAfterAStartUpThatBuiltNoTables) {
     ConstraintsManager::RemoveConstraintsManager();
 }
 
+TEST(Lifecycle, AMessageSinkThatAsksForTheManagerDuringTheStartUpGetsNull) {
+    AcdStore::setMemoryFiles({{"base.acd", ""}, {"spi.acd", "PROGRAM_OPTION = OTP,SPI,USB2\n"}});
+    std::vector<ConstraintsManager*> answers;
+    Port_MsgManData::setSink([&](const Port_MsgManData::Message&) {
+        ASSERT_LT(answers.size(), 10U);
+        answers.push_back(ConstraintsManager::getConstraintsManager());
+    });
+    ConstraintsManager* const manager = ConstraintsManager::getConstraintsManager();
+    EXPECT_NE(manager, nullptr);
+    EXPECT_THAT(answers, ElementsAre(nullptr));
+
+    EXPECT_EQ(manager->operationType2String(TARVIKNS::NO_OPERATION), StringBase(""));
+    EXPECT_THAT(answers, ElementsAre(nullptr, manager));
+    TarvikTestPeer::reset();
+}
+
 TEST(Exceptions, AreOnAfterTheStartUp) {
-    BaseSession session("");
-    EXPECT_TRUE(session.peer.exceptions());
+    ManagerFixture session(Base{""});
+    EXPECT_TRUE(session.members().m_exceptions);
 }
 
 TEST(Exceptions, SwitchStoresItsArgumentAndNothingElse) {
-    BaseSession session("");
-    session.manager.setExceptions(false);
-    EXPECT_FALSE(session.peer.exceptions());
-    session.manager.setExceptions(false);
-    EXPECT_FALSE(session.peer.exceptions());
-    session.manager.setExceptions(true);
-    EXPECT_TRUE(session.peer.exceptions());
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    ManagerFixture session(Base{""});
+    session->setExceptions(false);
+    EXPECT_FALSE(session.members().m_exceptions);
+    session->setExceptions(false);
+    EXPECT_FALSE(session.members().m_exceptions);
+    session->setExceptions(true);
+    EXPECT_TRUE(session.members().m_exceptions);
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(Orders, OperationsAreThoseFrom0To31InAscendingOrder) {
-    BaseSession session("");
+    ManagerFixture session(Base{""});
     int value = 0;
-    for (const TARVIKNS::OP_TYPE operation : session.manager.getOperationOrders()) {
+    for (const TARVIKNS::OP_TYPE operation : session->getOperationOrders()) {
         EXPECT_EQ(static_cast<int>(operation), value++);
     }
     EXPECT_EQ(value, 32);
 }
 
 TEST(Orders, OptionsAreThoseFrom0To23InAscendingOrder) {
-    BaseSession session("");
+    ManagerFixture session(Base{""});
     int value = 0;
-    for (const TARVIKNS::PROGRAM_OPTION option : session.manager.getProgramOptionOrders()) {
+    for (const TARVIKNS::PROGRAM_OPTION option : session->getProgramOptionOrders()) {
         EXPECT_EQ(static_cast<int>(option), value++);
     }
     EXPECT_EQ(value, 24);
 }
 
 TEST(Orders, AreTheManagersOwn) {
-    BaseSession session("");
-    EXPECT_EQ(&session.manager.getOperationOrders(), &session.peer.operationOrders());
-    EXPECT_EQ(&session.manager.getProgramOptionOrders(), &session.peer.programOptionOrders());
+    ManagerFixture session(Base{""});
+    EXPECT_EQ(&session->getOperationOrders(), &session.members().m_operationOrders);
+    EXPECT_EQ(&session->getProgramOptionOrders(), &session.members().m_programOptionOrders);
 }
 
+using ModeLookUp = const NameSet* (TarvikTestPeer::Members::*)(MODE_TYPE) const;
+
+/// The two look-ups, and where each raises.
+const std::map<int, ModeLookUp> MODE_LOOK_UPS{{583, &TarvikTestPeer::Members::dumpedModeDeviceSet},
+                                              {644, &TarvikTestPeer::Members::checkedModeDeviceSet}};
+
 TEST(ModeLookUp, GivesTheSetOfEachMode) {
-    BaseSession session("BS = outs:fams,kestrel\n");
-    const auto sets = modeDevices(session.peer);
-    for (int mode = 0; mode < 9; ++mode) {
-        EXPECT_EQ(session.peer.modeDeviceSet(MODE_TYPE{mode}, 583), sets[static_cast<std::size_t>(mode)]);
-        EXPECT_EQ(session.peer.modeDeviceSet(MODE_TYPE{mode}, 644), sets[static_cast<std::size_t>(mode)]);
+    ManagerFixture session(Base{"BS = outs:fams,kestrel\n"});
+    const auto sets = modeDevices(session.members());
+    for (const auto& [location, lookUp] : MODE_LOOK_UPS) {
+        for (int mode = 0; mode < 9; ++mode) {
+            EXPECT_EQ((session.members().*lookUp)(MODE_TYPE{mode}), sets[static_cast<std::size_t>(mode)]);
+        }
     }
 }
 
 TEST(ModeLookUp, RaisesAtItsLocationForAValueThatIsNoMode) {
-    BaseSession session("");
+    ManagerFixture session(Base{""});
     for (const int mode : {9, -1, 2147483647, -2147483647 - 1}) {
-        for (const int location : {583, 644}) {
-            EXPECT_EQ(raisedLine<OutOfRangeException>(
-                          [&] { (void)session.peer.modeDeviceSet(MODE_TYPE{mode}, location); }),
-                      location);
+        for (const auto& [location, lookUp] : MODE_LOOK_UPS) {
+            EXPECT_EQ(
+                raisedLine<OutOfRangeException>([&] { (void)(session.members().*lookUp)(MODE_TYPE{mode}); }),
+                location);
         }
     }
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(ModeLookUp, GivesNothingWhileExceptionsAreOff) {
-    BaseSession session("");
-    session.manager.setExceptions(false);
+    ManagerFixture session(Base{""});
+    session->setExceptions(false);
     for (const int mode : {9, -1, 2147483647, -2147483647 - 1}) {
-        EXPECT_EQ(session.peer.modeDeviceSet(MODE_TYPE{mode}, 583), nullptr);
-        EXPECT_EQ(session.peer.modeDeviceSet(MODE_TYPE{mode}, 644), nullptr);
+        for (const auto& [location, lookUp] : MODE_LOOK_UPS) {
+            EXPECT_EQ((session.members().*lookUp)(MODE_TYPE{mode}), nullptr);
+        }
     }
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(Members, WithoutDataAreEmpty) {
-    BaseSession session("");
-    TarvikTestPeer& peer = session.peer;
-    for (const auto* outputs : modeOutputs(peer)) {
+    ManagerFixture session(Base{""});
+    TarvikTestPeer::Members& members = session.members();
+    for (const auto* outputs : modeOutputs(members)) {
         EXPECT_THAT(*outputs, IsEmpty());
     }
-    for (const auto* devices : modeDevices(peer)) {
+    for (const auto* devices : modeDevices(members)) {
         EXPECT_EQ(devices->size(), 0U);
     }
-    EXPECT_EQ(peer.supportedDevices().size(), 0U);
-    EXPECT_EQ(peer.programOptionPackages().size(), 0U);
-    EXPECT_EQ(peer.notSupportedPartInMode().size(), 0U);
-    EXPECT_THAT(peer.deviceIdcodes(), IsEmpty());
-    EXPECT_THAT(peer.loadedFamilies(), IsEmpty());
-    EXPECT_THAT(peer.deviceProperties(), IsEmpty());
-    EXPECT_THAT(peer.programOptionPackageIndex(), IsEmpty());
-    EXPECT_THAT(peer.operationOptions(), IsEmpty());
-    EXPECT_THAT(peer.spiNames(), IsEmpty());
-    EXPECT_THAT(peer.spiFamilies(), IsEmpty());
-    EXPECT_THAT(peer.spiProperties(), IsEmpty());
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_EQ(members.m_supportedDevices.size(), 0U);
+    EXPECT_EQ(members.m_programOptionPackages.size(), 0U);
+    EXPECT_EQ(members.m_notSupportedPartInMode.size(), 0U);
+    EXPECT_THAT(members.m_deviceIdcodes, IsEmpty());
+    EXPECT_THAT(members.m_loadedFamilies, IsEmpty());
+    EXPECT_THAT(members.m_deviceProperties, IsEmpty());
+    EXPECT_THAT(members.m_programOptionPackageIndex, IsEmpty());
+    EXPECT_THAT(members.m_operationOptions, IsEmpty());
+    EXPECT_THAT(members.m_spiNames, IsEmpty());
+    EXPECT_THAT(members.m_spiFamilies, IsEmpty());
+    EXPECT_THAT(members.m_spiProperties, IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(Members, TablesAreSizedByTheirLists) {
-    BaseSession session("DEVICE_SUPPORTED = a,b,c,a\nPROGRAM_OPTION_PACKAGE = x,y\n");
-    EXPECT_EQ(session.peer.operationTable()->blocks(), 3U);
-    EXPECT_EQ(session.peer.bsdlOperationTable()->blocks(), 3U);
-    EXPECT_EQ(session.peer.programOptionTable()->blocks(), 2U);
+    ManagerFixture session(Base{"DEVICE_SUPPORTED = a,b,c,a\nPROGRAM_OPTION_PACKAGE = x,y\n"});
+    EXPECT_EQ(session.members().m_operationTable.blocks(), 3U);
+    EXPECT_EQ(session.members().m_bsdlOperationTable.blocks(), 3U);
+    EXPECT_EQ(session.members().m_programOptionTable.blocks(), 2U);
 }
 
 TEST(Members, TablesOfNothingHaveNoBlocks) {
-    BaseSession session("");
-    EXPECT_EQ(session.peer.operationTable()->blocks(), 0U);
-    EXPECT_EQ(session.peer.bsdlOperationTable()->blocks(), 0U);
-    EXPECT_EQ(session.peer.programOptionTable()->blocks(), 0U);
+    ManagerFixture session(Base{""});
+    EXPECT_EQ(session.members().m_operationTable.blocks(), 0U);
+    EXPECT_EQ(session.members().m_bsdlOperationTable.blocks(), 0U);
+    EXPECT_EQ(session.members().m_programOptionTable.blocks(), 0U);
 }
 
 TEST(Members, CellsStartFalse) {
-    BaseSession session("DEVICE_SUPPORTED = a,b\nPROGRAM_OPTION_PACKAGE = x,y\n");
-    EXPECT_THAT(operationCells(session.peer), IsEmpty());
-    EXPECT_THAT(bsdlOperationCells(session.peer), IsEmpty());
-    EXPECT_THAT(programOptionCells(session.peer), IsEmpty());
+    ManagerFixture session(Base{"DEVICE_SUPPORTED = a,b\nPROGRAM_OPTION_PACKAGE = x,y\n"});
+    EXPECT_THAT(operationCells(session.members()), IsEmpty());
+    EXPECT_THAT(bsdlOperationCells(session.members()), IsEmpty());
+    EXPECT_THAT(programOptionCells(session.members()), IsEmpty());
 }
 
 TEST(Members, BaseAccessorOutlivesTheStartUp) {
-    BaseSession session("DEVICE_SUPPORTED = kestrel\n");
-    ASSERT_NE(session.peer.devKey(), nullptr);
-    EXPECT_STREQ(session.peer.devKey()->getstringbykey("DEVICE_SUPPORTED", ",", 0, nullptr, 0), "kestrel");
+    ManagerFixture session(Base{"DEVICE_SUPPORTED = kestrel\n"});
+    ASSERT_NE(session.members().m_devKey, nullptr);
+    EXPECT_STREQ(session.members().m_devKey->getstringbykey("DEVICE_SUPPORTED", ",", 0, nullptr, 0),
+                 "kestrel");
 }
 
 } // namespace

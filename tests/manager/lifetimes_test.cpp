@@ -1,5 +1,5 @@
 // What the queries return by reference or pointer stays in place however much is loaded behind it.
-#include "QueryFixture.h"
+#include "Members.h"
 
 #include <gmock/gmock.h>
 
@@ -28,7 +28,7 @@ Files manyDevices() {
 } // namespace
 
 TEST(Lifetimes, WhatWasReturnedStaysThroughManyLoads) {
-    ManagerOver manager(manyDevices());
+    ManagerFixture manager(manyDevices());
     const auto& names = manager->getDeviceStringProperties("device0", "NAME");
     const auto& shared = manager->getDeviceStringProperties("device0", "SHARED");
     const auto& options = manager->getDeviceOperationOptions("device0", "ERASE", MODE_TYPE::BS);
@@ -49,8 +49,8 @@ TEST(Lifetimes, WhatWasReturnedStaysThroughManyLoads) {
     EXPECT_EQ(manager->getDeviceStringProperty("device0", "SHARED"), familys);
     EXPECT_EQ(manager->getDeviceStringProperty("FLASH1", "NAME"), flash);
 
-    EXPECT_THAT(textsOf(names), ElementsAre("device0 is longer than sixteen bytes"));
-    EXPECT_THAT(textsOf(options), ElementsAre("quick", "slow"));
+    EXPECT_THAT(texts(names), ElementsAre("device0 is longer than sixteen bytes"));
+    EXPECT_THAT(texts(options), ElementsAre("quick", "slow"));
     EXPECT_STREQ(name, "device0 is longer than sixteen bytes");
     EXPECT_STREQ(familys, "a value of the family that is no short text");
     EXPECT_STREQ(flash, "the name of the flash");
@@ -58,22 +58,51 @@ TEST(Lifetimes, WhatWasReturnedStaysThroughManyLoads) {
 }
 
 TEST(Lifetimes, AQuestionAskedTwiceLoadsNothingMore) {
-    ManagerOver manager(manyDevices());
+    ManagerFixture manager(manyDevices());
     static_cast<void>(manager->getDeviceStringProperties("device0", "NAME"));
-    const auto properties = manager.peer().deviceProperties().size();
-    const auto loaded = manager.peer().loadedFamilies().size();
+    const auto properties = manager.members().m_deviceProperties.size();
+    const auto loaded = manager.members().m_loadedFamilies.size();
     static_cast<void>(manager->getDeviceStringProperties("device0", "NAME"));
     static_cast<void>(manager->getDeviceStringProperties("device0", "SHARED"));
-    EXPECT_EQ(manager.peer().deviceProperties().size(), properties);
-    EXPECT_EQ(manager.peer().loadedFamilies().size(), loaded);
+    EXPECT_EQ(manager.members().m_deviceProperties.size(), properties);
+    EXPECT_EQ(manager.members().m_loadedFamilies.size(), loaded);
 }
 
 TEST(Lifetimes, ArgumentsMayBeTextsOfTheManagerItself) {
     // A returned text is a valid argument, even where the answer changes the place it was read from.
-    ManagerOver manager(manyDevices());
-    const StringBase& family = manager.peer().partFamily();
+    ManagerFixture manager(manyDevices());
+    const StringBase& family = manager.members().m_partFamily;
     static_cast<void>(manager->getPartFamily("device0"));
     EXPECT_STREQ(manager->getDeviceStringProperty(family.c_str(), "SHARED"),
                  "a value of the family that is no short text");
     EXPECT_STREQ(manager->getPartFamily(family.c_str()).c_str(), "fam1");
+}
+
+TEST(Lifetimes, WhatWasReturnedStaysWhenAnotherOwnersPropertyTakesItsKey) {
+    ManagerFixture manager(
+        Files{{"base.acd", "DEVICE_SUPPORTED = fam1,spi\nPROGRAM_OPTION_PACKAGE = fam1,spi\n"},
+              {"fam1.acd", "[KS50]\nPROPERTY = PINS,144\nPROPERTIES = pq208_PINS,2,207,208\n"
+                           "[KS50_pq208]\nPROPERTY = PINS,a value that is longer than short texts are\n"}});
+    const auto& held = manager->getDeviceStringProperties("KS50", "pq208_PINS");
+    const char* const heldText = manager->getDeviceStringProperty("KS50", "pq208_PINS");
+    // The returned text is the argument of the very question that replaces it.
+    EXPECT_STREQ(manager->getDeviceStringProperty("KS50_pq208", "PINS"),
+                 "a value that is longer than short texts are");
+    EXPECT_THAT(texts(held), ElementsAre("207", "208"));
+    EXPECT_STREQ(heldText, "207");
+    EXPECT_STREQ(manager->getDeviceStringProperty("KS50", "pq208_PINS"),
+                 "a value that is longer than short texts are");
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("KS50", "pq208_PINS")),
+                ElementsAre("a value that is longer than short texts are"));
+}
+
+TEST(Lifetimes, AReturnedTextMayBeTheKeyOfTheQuestionThatReplacesIt) {
+    ManagerFixture manager(
+        Files{{"base.acd", "DEVICE_SUPPORTED = fam1,spi\nPROGRAM_OPTION_PACKAGE = fam1,spi\n"},
+              {"fam1.acd",
+               "[a]\nPROPERTY = b_key_that_is_longer_than_short_texts,key_that_is_longer_than_short_texts\n"
+               "[a_b]\nPROPERTY = key_that_is_longer_than_short_texts,another value of some length\n"}});
+    const char* const key = manager->getDeviceStringProperty("a", "b_key_that_is_longer_than_short_texts");
+    EXPECT_STREQ(manager->getDeviceStringProperty("a_b", key), "another value of some length");
+    EXPECT_STREQ(key, "key_that_is_longer_than_short_texts");
 }

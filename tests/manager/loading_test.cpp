@@ -1,4 +1,6 @@
-#include "CoreFixtures.h"
+#include "Members.h"
+
+#include <StringViews.h>
 
 // Loading on demand: what one question about a device brings into memory, in which order, and only once.
 
@@ -9,22 +11,24 @@ using testing::Pair;
 namespace {
 
 /// A manager over a base database with the given lists and more files.
-struct LoadingSession : ManagerSession {
+struct LoadingSession : ManagerFixture {
     LoadingSession(const std::string& supported, const std::string& packages, Files files)
-        : ManagerSession(
+        : ManagerFixture(
               withBase("DEVICE_SUPPORTED = " + supported + "\nPROGRAM_OPTION_PACKAGE = " + packages + "\n",
                        std::move(files))) {}
 
-    void load(const char* device, const char* package = nullptr) { peer.loadDeviceData(device, package); }
+    void load(std::string_view device, std::string_view package = {}) {
+        members().loadDeviceData(device, package);
+    }
     template <typename Exception>
-    int raises(const char* device, const char* package = nullptr) {
+    int raises(std::string_view device, std::string_view package = {}) {
         return raisedLine<Exception>([&] { load(device, package); });
     }
 
-    auto owners() { return texts(peer.loadedFamilies()); }
-    auto operationsLoaded() { return texts(peer.operationsLoaded()); }
-    auto optionsLoaded() { return texts(peer.programOptionsLoaded()); }
-    auto properties() { return lists(peer.deviceProperties()); }
+    auto owners() { return texts(members().m_loadedFamilies); }
+    auto operationsLoaded() { return texts(members().m_operationsLoaded); }
+    auto optionsLoaded() { return texts(members().m_programOptionsLoaded); }
+    auto properties() { return lists(members().m_deviceProperties); }
 
 private:
     static Files withBase(const std::string& base, Files files) {
@@ -53,10 +57,10 @@ TEST(Loading, OfADeviceBringsTheDeviceAndItsFamily) {
     EXPECT_THAT(session.properties(),
                 testing::UnorderedElementsAre(Pair("KS50_PINS", ElementsAre("144")),
                                               Pair("kestrel_VENDOR", ElementsAre("Korvel"))));
-    EXPECT_THAT(operationCells(session.peer), ElementsAre(Cell{0, 0, 0, 2}));
-    EXPECT_THAT(bsdlOperationCells(session.peer), ElementsAre(Cell{0, 19, 0, 3}));
-    EXPECT_THAT(programOptionCells(session.peer), ElementsAre(Cell{0, 0, 0, 2}));
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(operationCells(session.members()), ElementsAre(Cell{0, 0, 0, 2}));
+    EXPECT_THAT(bsdlOperationCells(session.members()), ElementsAre(Cell{0, 19, 0, 3}));
+    EXPECT_THAT(programOptionCells(session.members()), ElementsAre(Cell{0, 0, 0, 2}));
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(Loading, OfAFamilyBringsTheFamilyAlone) {
@@ -65,7 +69,7 @@ TEST(Loading, OfAFamilyBringsTheFamilyAlone) {
     EXPECT_THAT(session.owners(), ElementsAre("kestrel"));
     EXPECT_THAT(session.operationsLoaded(), ElementsAre("spi", "kestrel"));
     EXPECT_THAT(session.optionsLoaded(), ElementsAre("spi", "kestrel"));
-    EXPECT_THAT(operationCells(session.peer), ElementsAre(Cell{0, 0, 0, 2}));
+    EXPECT_THAT(operationCells(session.members()), ElementsAre(Cell{0, 0, 0, 2}));
 }
 
 TEST(Loading, OfASecondDeviceAddsItsOwnDataAlone) {
@@ -82,14 +86,14 @@ TEST(Loading, HappensOnce) {
                            {{"kestrel.acd", "OPERATION = PROGRAM,BS,usb2\n"
                                             "BSDL_OPERATION = BYPASS,svf\n"
                                             "PROGRAM_OPTION = ERASE,BS,zorva\n[KS50]\n"}});
-    session.manager.setExceptions(false);
+    session->setExceptions(false);
     session.load("KS50");
-    EXPECT_THAT(session.messages.take(),
+    EXPECT_THAT(session.messages(),
                 ElementsAre(debug("kestrel out   = zorva\n"), debug("kestrel out   = usb2\n"),
                             debug("kestrel out   = svf\n")));
     session.load("KS50");
     session.load("kestrel");
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
     EXPECT_THAT(session.operationsLoaded(), ElementsAre("spi", "kestrel"));
     EXPECT_THAT(session.optionsLoaded(), ElementsAre("spi", "kestrel"));
 }
@@ -99,9 +103,9 @@ TEST(Loading, OfAFamilyReadsOperationsThenBsdlOperationsThenOptions) {
                            {{"kestrel.acd", "OPERATION = PROGRAM,BS,usb2\n"
                                             "BSDL_OPERATION = BYPASS,svf\n"
                                             "PROGRAM_OPTION = ERASE,BS,zorva\n"}});
-    session.manager.setExceptions(false);
+    session->setExceptions(false);
     session.load("kestrel");
-    EXPECT_THAT(session.messages.take(),
+    EXPECT_THAT(session.messages(),
                 ElementsAre(debug("kestrel out   = usb2\n"), debug("kestrel out   = svf\n"),
                             debug("kestrel out   = zorva\n")));
 }
@@ -123,15 +127,15 @@ TEST(Loading, OfADeviceWithAPackageTakesTheWholeNameAsOwner) {
 
 TEST(Loading, OfAFamilyWithASuffixTakesTheWholeNameAsFamily) {
     LoadingSession session("kestrel", "kestrel", {{"kestrel.acd", KESTREL}});
-    session.manager.setExceptions(false);
+    session->setExceptions(false);
     session.load("kestrel_x");
     EXPECT_THAT(session.owners(), ElementsAre("kestrel_x"));
     EXPECT_THAT(session.operationsLoaded(), ElementsAre("spi", "kestrel_x"));
     EXPECT_THAT(session.optionsLoaded(), ElementsAre("spi", "kestrel_x"));
     EXPECT_THAT(session.properties()["kestrel_x_VENDOR"], ElementsAre("Korvel"));
-    EXPECT_THAT(operationCells(session.peer), IsEmpty());
-    EXPECT_THAT(programOptionCells(session.peer), IsEmpty());
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(operationCells(session.members()), IsEmpty());
+    EXPECT_THAT(programOptionCells(session.members()), IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(Loading, OfAFamilyWithASuffixRaisesAtEachTableOnce) {
@@ -146,18 +150,18 @@ TEST(Loading, TakesTheFamilyThatHoldsTheSectionRatherThanTheResolvedOne) {
                            {{"kestrel.acd", KESTREL},
                             {"osprey.acd", "OPERATION = VERIFY,SS,SVF\n[KS50_X]\nPROPERTY = PINS,7\n"}});
     session.load("KS50_X");
-    EXPECT_EQ(text(session.manager.getPartFamily("KS50_X")), "kestrel");
+    EXPECT_EQ(text(session->getPartFamily("KS50_X")), "kestrel");
     EXPECT_THAT(session.owners(), ElementsAre("KS50_X", "osprey"));
     EXPECT_THAT(session.operationsLoaded(), ElementsAre("spi", "osprey"));
     EXPECT_THAT(session.optionsLoaded(), ElementsAre("spi", "kestrel", "osprey"));
     EXPECT_THAT(session.properties()["KS50_X_PINS"], ElementsAre("7"));
-    EXPECT_THAT(operationCells(session.peer), ElementsAre(Cell{1, 3, 1, 3}));
+    EXPECT_THAT(operationCells(session.members()), ElementsAre(Cell{1, 3, 1, 3}));
 }
 
 TEST(Loading, TakesNoNoticeOfASeededFamily) {
     LoadingSession session("kestrel,osprey,spi", "kestrel,osprey",
                            {{"kestrel.acd", KESTREL}, {"osprey.acd", ""}});
-    session.manager.addCachedDeviceFamily("ks50", "osprey");
+    session->addCachedDeviceFamily("ks50", "osprey");
     session.load("KS50");
     EXPECT_THAT(session.owners(), ElementsAre("KS50", "kestrel"));
     EXPECT_THAT(session.optionsLoaded(), ElementsAre("spi", "osprey", "kestrel"));
@@ -168,12 +172,12 @@ TEST(Loading, OfAnSpiFlashThatIsNoSectionLoadsTheBaseFamily) {
                            {{"base.acd", "OPERATION = PROGRAM,BS,USB2\nPROPERTY = VENDOR,any\n"},
                             {"spi.acd", "DEVICE_FAMILY = FLASHES\nFLASHES_DEVICES = FLASH1\n"}});
     session.load("FLASH1");
-    EXPECT_EQ(text(session.manager.getPartFamily("FLASH1")), "spi");
+    EXPECT_EQ(text(session->getPartFamily("FLASH1")), "spi");
     EXPECT_THAT(session.owners(), ElementsAre("FLASH1", "base"));
     EXPECT_THAT(session.operationsLoaded(), ElementsAre("spi", "base"));
     EXPECT_THAT(session.optionsLoaded(), ElementsAre("spi", "base"));
     EXPECT_THAT(session.properties(), ElementsAre(Pair("base_VENDOR", ElementsAre("any"))));
-    EXPECT_THAT(operationCells(session.peer), ElementsAre(Cell{0, 0, 0, 2}));
+    EXPECT_THAT(operationCells(session.members()), ElementsAre(Cell{0, 0, 0, 2}));
 }
 
 TEST(Loading, OfAnSpiFlashRaisesWhereBaseIsNotSupported) {
@@ -187,7 +191,7 @@ TEST(Loading, OfAnSpiFlashThatIsASectionTooLoadsThatSectionsFamily) {
     LoadingSession session("kestrel,spi", "kestrel,spi",
                            {{"kestrel.acd", KESTREL}, {"spi.acd", "DEVICE_FAMILY = KS50\n"}});
     session.load("KS50");
-    EXPECT_EQ(text(session.manager.getPartFamily("KS50")), "spi");
+    EXPECT_EQ(text(session->getPartFamily("KS50")), "spi");
     EXPECT_THAT(session.owners(), ElementsAre("KS50", "kestrel"));
     EXPECT_THAT(session.operationsLoaded(), ElementsAre("spi", "kestrel"));
     EXPECT_THAT(session.optionsLoaded(), ElementsAre("spi", "kestrel"));
@@ -196,20 +200,20 @@ TEST(Loading, OfAnSpiFlashThatIsASectionTooLoadsThatSectionsFamily) {
 TEST(Loading, OfAnUnknownDeviceLoadsTheBaseFamily) {
     LoadingSession session("kestrel", "kestrel",
                            {{"base.acd", "PROPERTY = VENDOR,any\nOPERATION = PROGRAM,BS,USB2\n"}});
-    session.manager.setExceptions(false);
+    session->setExceptions(false);
     session.load("nobody");
     EXPECT_THAT(session.owners(), ElementsAre("base", "nobody"));
     EXPECT_THAT(session.operationsLoaded(), ElementsAre("spi", "base"));
     EXPECT_THAT(session.optionsLoaded(), ElementsAre("spi", "base"));
     EXPECT_THAT(session.properties(), ElementsAre(Pair("base_VENDOR", ElementsAre("any"))));
-    EXPECT_THAT(operationCells(session.peer), IsEmpty());
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(operationCells(session.members()), IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(Loading, OfNullIsThatOfTheEmptyName) {
     LoadingSession session("kestrel", "kestrel", {});
-    session.manager.setExceptions(false);
-    session.load(nullptr);
+    session->setExceptions(false);
+    session.load(view(static_cast<const char*>(nullptr)));
     EXPECT_THAT(session.owners(), ElementsAre("", "base"));
 }
 
@@ -217,7 +221,7 @@ TEST(Loading, OfSpiReadsNoTableTwice) {
     LoadingSession session("spi", "spi",
                            {{"spi.acd", "OPERATION = PROGRAM,SPI,USB2\nPROGRAM_OPTION = ERASE,SPI,USB2\n"
                                         "PROPERTY = VENDOR,any\n"}});
-    EXPECT_THAT(operationCells(session.peer), ElementsAre(Cell{0, 0, 5, 2}));
+    EXPECT_THAT(operationCells(session.members()), ElementsAre(Cell{0, 0, 5, 2}));
     session.load("spi");
     EXPECT_THAT(session.owners(), ElementsAre("spi"));
     EXPECT_THAT(session.operationsLoaded(), ElementsAre("spi"));
@@ -232,7 +236,7 @@ TEST(OptionOwner, IsTheDeviceWithItsPackageWhereTheyAreListedTogether) {
     session.load("KS50", "PQ");
     EXPECT_THAT(session.optionsLoaded(), ElementsAre("spi", "KS50PQ", "kestrel"));
     EXPECT_THAT(session.owners(), ElementsAre("KS50", "kestrel"));
-    EXPECT_THAT(programOptionCells(session.peer), ElementsAre(Cell{0, 1, 1, 3}, Cell{1, 0, 0, 2}));
+    EXPECT_THAT(programOptionCells(session.members()), ElementsAre(Cell{0, 1, 1, 3}, Cell{1, 0, 0, 2}));
 }
 
 TEST(OptionOwner, IsTheDeviceWhereItIsListedAndNoPackageIsGiven) {
@@ -262,7 +266,7 @@ TEST(OptionOwner, FirstDeviceOfAFamilyGivesTheFamilyItsOptions) {
     session.load("KS50");
     session.load("KS100");
     session.load("kestrel");
-    EXPECT_THAT(programOptionCells(session.peer), ElementsAre(Cell{0, 1, 1, 3}));
+    EXPECT_THAT(programOptionCells(session.members()), ElementsAre(Cell{0, 1, 1, 3}));
 }
 
 TEST(OptionOwner, OfAFamilyTakesNoNoticeOfThePackage) {
@@ -286,7 +290,7 @@ TEST(FailedLoading, DeviceOfAnUnlistedFamilyRaisesForItsOptionsThenForItsFamilyT
     EXPECT_EQ(session.raises<OutOfRangeException>("KS50"), 1999);
     EXPECT_THAT(session.operationsLoaded(), ElementsAre("spi", "kestrel"));
     EXPECT_EQ(session.raises<TarvikException>("KS50"), -1);
-    EXPECT_THAT(operationCells(session.peer), IsEmpty());
+    EXPECT_THAT(operationCells(session.members()), IsEmpty());
 }
 
 TEST(FailedLoading, BadOperationEntryIsNotReadAgain) {
@@ -298,9 +302,9 @@ TEST(FailedLoading, BadOperationEntryIsNotReadAgain) {
     EXPECT_THAT(session.operationsLoaded(), ElementsAre("spi", "kestrel"));
     EXPECT_THAT(session.optionsLoaded(), ElementsAre("spi"));
     EXPECT_EQ(session.raises<TarvikException>("kestrel"), -1);
-    EXPECT_THAT(operationCells(session.peer), ElementsAre(Cell{0, 4, 0, 2}));
-    EXPECT_THAT(bsdlOperationCells(session.peer), IsEmpty());
-    EXPECT_THAT(programOptionCells(session.peer), ElementsAre(Cell{0, 0, 0, 2}));
+    EXPECT_THAT(operationCells(session.members()), ElementsAre(Cell{0, 4, 0, 2}));
+    EXPECT_THAT(bsdlOperationCells(session.members()), IsEmpty());
+    EXPECT_THAT(programOptionCells(session.members()), ElementsAre(Cell{0, 0, 0, 2}));
 }
 
 TEST(FailedLoading, BadBsdlOperationEntryIsNotReadAgain) {
@@ -308,7 +312,7 @@ TEST(FailedLoading, BadBsdlOperationEntryIsNotReadAgain) {
                            {{"kestrel.acd", "OPERATION = ERASE,BS,USB2\nBSDL_OPERATION = BYPASS\n"}});
     EXPECT_EQ(session.raises<DataMismatchException>("kestrel"), 1695);
     EXPECT_EQ(session.raises<TarvikException>("kestrel"), -1);
-    EXPECT_THAT(operationCells(session.peer), ElementsAre(Cell{0, 4, 0, 2}));
+    EXPECT_THAT(operationCells(session.members()), ElementsAre(Cell{0, 4, 0, 2}));
 }
 
 TEST(FailedLoading, BadOptionEntryIsNotReadAgain) {
@@ -316,13 +320,13 @@ TEST(FailedLoading, BadOptionEntryIsNotReadAgain) {
         "kestrel", "kestrel",
         {{"kestrel.acd", "OPERATION = ERASE,BS,USB2\n"
                          "PROGRAM_OPTION = ERASE,BS,USB2:OTP,BS,USB2:VERIFY,BS,USB2\n[KS50]\n"}});
-    session.manager.setExceptions(false);
+    session->setExceptions(false);
     EXPECT_EQ(session.raises<DataMismatchException>("KS50"), 1500);
     EXPECT_THAT(session.optionsLoaded(), ElementsAre("spi", "kestrel"));
     EXPECT_THAT(session.operationsLoaded(), ElementsAre("spi"));
     EXPECT_EQ(session.raises<TarvikException>("KS50"), -1);
-    EXPECT_THAT(programOptionCells(session.peer), ElementsAre(Cell{0, 0, 0, 2}));
-    EXPECT_THAT(operationCells(session.peer), ElementsAre(Cell{0, 4, 0, 2}));
+    EXPECT_THAT(programOptionCells(session.members()), ElementsAre(Cell{0, 0, 0, 2}));
+    EXPECT_THAT(operationCells(session.members()), ElementsAre(Cell{0, 4, 0, 2}));
 }
 
 TEST(FailedLoading, BadPropertyEntryIsNotReadAgain) {
@@ -337,7 +341,7 @@ TEST(FailedLoading, BadPropertyEntryIsNotReadAgain) {
     EXPECT_THAT(properties.at("kestrel_A"), ElementsAre("1"));
     EXPECT_EQ(properties.count("kestrel_C"), 0U);
     EXPECT_EQ(properties.count("kestrel_D"), 0U);
-    EXPECT_THAT(operationCells(session.peer), ElementsAre(Cell{0, 4, 0, 2}));
+    EXPECT_THAT(operationCells(session.members()), ElementsAre(Cell{0, 4, 0, 2}));
 }
 
 TEST(FailedLoading, OfADevicesPropertiesComesBeforeAnythingOfItsFamily) {
@@ -353,9 +357,9 @@ TEST(FailedLoading, UnreadableFamilyPassesThroughEvenWhileExceptionsAreOff) {
     const DatabaseDirectory directory;
     directory.writeFile("base.acd", "DEVICE_SUPPORTED = kestrel\nPROGRAM_OPTION_PACKAGE = kestrel\n");
     directory.makeDirectory("kestrel.acd");
-    ManagerSession session(directory);
-    session.manager.setExceptions(false);
-    EXPECT_THROW(session.peer.loadDeviceData("kestrel", nullptr), DataNotFoundException);
+    ManagerFixture session(directory);
+    session->setExceptions(false);
+    EXPECT_THROW(session.members().loadDeviceData("kestrel", {}), DataNotFoundException);
 }
 
 } // namespace

@@ -1,5 +1,5 @@
 // Managers besides the one of the process: each starts from scratch, and none sees what another one was asked.
-#include "QueryFixture.h"
+#include "Members.h"
 
 #include <ManagerFactory.h>
 
@@ -42,9 +42,9 @@ TEST_F(ManagerFactoryTest, MakesManagersThatShareNoState) {
     const ManagerFactory::Manager fresh = ManagerFactory::make();
     asked->addCachedDeviceFamily("dev1", "fam2");
     EXPECT_EQ(operations(*asked, "dev1"), maskOf(3));
-    EXPECT_TRUE(TarvikTestPeer(*fresh).deviceFamilyCache().empty());
-    EXPECT_TRUE(TarvikTestPeer(*fresh).loadedFamilies().empty());
-    EXPECT_STREQ(TarvikTestPeer(*fresh).partFamily().c_str(), "");
+    EXPECT_TRUE(TarvikTestPeer::members(*fresh).m_deviceFamilyCache.empty());
+    EXPECT_TRUE(TarvikTestPeer::members(*fresh).m_loadedFamilies.empty());
+    EXPECT_STREQ(TarvikTestPeer::members(*fresh).m_partFamily.c_str(), "");
     EXPECT_EQ(operations(*fresh, "dev1"), maskOf(0));
 }
 
@@ -74,7 +74,7 @@ TEST_F(ManagerFactoryTest, ReportsAFaultOfTheStartUpAndMakesAManagerAllTheSame) 
     AcdStore::setMemoryFiles({{"base.acd", ""}, {"spi.acd", "OPERATION = NONSENSE,Bscan,USB2\n"}});
     const ManagerFactory::Manager manager = ManagerFactory::make();
     EXPECT_NE(manager, nullptr);
-    EXPECT_TRUE(TarvikTestPeer(*manager).exceptions());
+    EXPECT_TRUE(TarvikTestPeer::members(*manager).m_exceptions);
 }
 
 // Applications can't make managers of their own.

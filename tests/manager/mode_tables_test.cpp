@@ -1,4 +1,4 @@
-#include "CoreFixtures.h"
+#include "Members.h"
 
 // The nine mode tables: which outputs and which families the base database lists for each mode.
 
@@ -21,102 +21,103 @@ std::vector<int> values(const std::set<OUTPUT_TYPE>& outputs) {
 
 TEST(ModeTables, EachKeyFillsTheSetsOfItsMode) {
     for (std::size_t mode = 0; mode < MODES; ++mode) {
-        BaseSession session(std::string(MODE_KEYS[mode]) + " = outs,USB2:fams,kestrel\n");
+        ManagerFixture session(Base{std::string(MODE_KEYS[mode]) + " = outs,USB2:fams,kestrel\n"});
         for (std::size_t other = 0; other < MODES; ++other) {
             SCOPED_TRACE(std::string(MODE_KEYS[mode]) + " seen in " + MODE_KEYS[other]);
             if (other == mode) {
-                EXPECT_THAT(values(*modeOutputs(session.peer)[other]), ElementsAre(2));
-                EXPECT_THAT(texts(*modeDevices(session.peer)[other]), ElementsAre("kestrel"));
+                EXPECT_THAT(values(*modeOutputs(session.members())[other]), ElementsAre(2));
+                EXPECT_THAT(texts(*modeDevices(session.members())[other]), ElementsAre("kestrel"));
             } else {
-                EXPECT_THAT(values(*modeOutputs(session.peer)[other]), IsEmpty());
-                EXPECT_THAT(texts(*modeDevices(session.peer)[other]), IsEmpty());
+                EXPECT_THAT(values(*modeOutputs(session.members())[other]), IsEmpty());
+                EXPECT_THAT(texts(*modeDevices(session.members())[other]), IsEmpty());
             }
         }
-        EXPECT_THAT(session.messages.take(), IsEmpty());
+        EXPECT_THAT(session.messages(), IsEmpty());
     }
 }
 
 TEST(ModeTables, KeysAreMatchedExactly) {
-    BaseSession session("bs = outs,USB2:fams,kestrel\nBscan = outs,USB2:fams,kestrel\n");
-    EXPECT_THAT(session.peer.bsCables(), IsEmpty());
-    EXPECT_EQ(session.peer.bsDevices().size(), 0U);
+    ManagerFixture session(Base{"bs = outs,USB2:fams,kestrel\nBscan = outs,USB2:fams,kestrel\n"});
+    EXPECT_THAT(session.members().m_bsCables, IsEmpty());
+    EXPECT_EQ(session.members().m_bsDevices.size(), 0U);
 }
 
 TEST(ModeTables, OutputNamesGiveTheirValues) {
-    BaseSession session("BS = outs,EXPRESSQSVF,EXPRESSSVF,STAPL,SVF,USB2,ZORVA,PARALLEL\n");
-    EXPECT_THAT(values(session.peer.bsCables()), ElementsAre(0, 1, 2, 3, 4, 6, 7));
+    ManagerFixture session(Base{"BS = outs,EXPRESSQSVF,EXPRESSSVF,STAPL,SVF,USB2,ZORVA,PARALLEL\n"});
+    EXPECT_THAT(values(session.members().m_bsCables), ElementsAre(0, 1, 2, 3, 4, 6, 7));
 }
 
 TEST(ModeTables, OutputListedTwiceCountsOnce) {
-    BaseSession session("BS = outs,PARALLEL,PARALLEL,USB2:fams,kestrel,merlin,kestrel\n");
-    EXPECT_THAT(values(session.peer.bsCables()), ElementsAre(0, 2));
-    EXPECT_THAT(texts(session.peer.bsDevices()), ElementsAre("kestrel", "merlin"));
+    ManagerFixture session(Base{"BS = outs,PARALLEL,PARALLEL,USB2:fams,kestrel,merlin,kestrel\n"});
+    EXPECT_THAT(values(session.members().m_bsCables), ElementsAre(0, 2));
+    EXPECT_THAT(texts(session.members().m_bsDevices), ElementsAre("kestrel", "merlin"));
 }
 
 TEST(ModeTables, UnknownOutputIsStoredAs9Silently) {
     for (const char* name : {"QSVF", "NULLCABLE", "NONE", "usb2", "Usb2", "nonsense", "", " USB2", "%s"}) {
-        BaseSession session(std::string("BS = outs,") + name + ":fams\n");
-        EXPECT_THAT(values(session.peer.bsCables()), ElementsAre(9)) << name;
-        EXPECT_THAT(session.messages.take(), IsEmpty());
+        ManagerFixture session(Base{std::string("BS = outs,") + name + ":fams\n"});
+        EXPECT_THAT(values(session.members().m_bsCables), ElementsAre(9)) << name;
+        EXPECT_THAT(session.messages(), IsEmpty());
     }
 }
 
 TEST(ModeTables, UnknownOutputDoesNotEndTheList) {
-    BaseSession session("BS = outs,USB2,nonsense,,PARALLEL\n");
-    EXPECT_THAT(values(session.peer.bsCables()), ElementsAre(0, 2, 9));
+    ManagerFixture session(Base{"BS = outs,USB2,nonsense,,PARALLEL\n"});
+    EXPECT_THAT(values(session.members().m_bsCables), ElementsAre(0, 2, 9));
 }
 
 TEST(ModeTables, LabelsAreNotUsed) {
-    BaseSession session("BS = PARALLEL,USB2:kestrel,merlin\n");
-    EXPECT_THAT(values(session.peer.bsCables()), ElementsAre(2));
-    EXPECT_THAT(texts(session.peer.bsDevices()), ElementsAre("merlin"));
+    ManagerFixture session(Base{"BS = PARALLEL,USB2:kestrel,merlin\n"});
+    EXPECT_THAT(values(session.members().m_bsCables), ElementsAre(2));
+    EXPECT_THAT(texts(session.members().m_bsDevices), ElementsAre("merlin"));
 }
 
 TEST(ModeTables, LabelsMayBeEmpty) {
-    BaseSession session("BS = ,USB2:,kestrel\n");
-    EXPECT_THAT(values(session.peer.bsCables()), ElementsAre(2));
-    EXPECT_THAT(texts(session.peer.bsDevices()), ElementsAre("kestrel"));
+    ManagerFixture session(Base{"BS = ,USB2:,kestrel\n"});
+    EXPECT_THAT(values(session.members().m_bsCables), ElementsAre(2));
+    EXPECT_THAT(texts(session.members().m_bsDevices), ElementsAre("kestrel"));
 }
 
 TEST(ModeTables, EmptyFirstItemDoesNotHinderTheSecond) {
-    BaseSession session("BS = :fams,kestrel\n");
-    EXPECT_THAT(session.peer.bsCables(), IsEmpty());
-    EXPECT_THAT(texts(session.peer.bsDevices()), ElementsAre("kestrel"));
+    ManagerFixture session(Base{"BS = :fams,kestrel\n"});
+    EXPECT_THAT(session.members().m_bsCables, IsEmpty());
+    EXPECT_THAT(texts(session.members().m_bsDevices), ElementsAre("kestrel"));
 }
 
 TEST(ModeTables, MissingSecondItemLeavesTheFamiliesEmpty) {
-    BaseSession session("BS = outs,USB2\n");
-    EXPECT_THAT(values(session.peer.bsCables()), ElementsAre(2));
-    EXPECT_EQ(session.peer.bsDevices().size(), 0U);
+    ManagerFixture session(Base{"BS = outs,USB2\n"});
+    EXPECT_THAT(values(session.members().m_bsCables), ElementsAre(2));
+    EXPECT_EQ(session.members().m_bsDevices.size(), 0U);
 }
 
 TEST(ModeTables, FurtherItemsAreNotRead) {
-    BaseSession session("BS = outs,USB2:fams,kestrel:more,SVF,merlin\n");
-    EXPECT_THAT(values(session.peer.bsCables()), ElementsAre(2));
-    EXPECT_THAT(texts(session.peer.bsDevices()), ElementsAre("kestrel"));
+    ManagerFixture session(Base{"BS = outs,USB2:fams,kestrel:more,SVF,merlin\n"});
+    EXPECT_THAT(values(session.members().m_bsCables), ElementsAre(2));
+    EXPECT_THAT(texts(session.members().m_bsDevices), ElementsAre("kestrel"));
 }
 
 TEST(ModeTables, MissingOrEmptyKeyLeavesBothSetsEmptyAndTheOthersFilled) {
     for (const char* entry : {"", "SM =\n", "SM = outs:fams\n", "SM = :\n"}) {
-        BaseSession session(std::string("SS = outs,USB2:fams,kestrel\n") + entry +
-                            "BSFILE = outs,SVF:fams,merlin\n");
-        EXPECT_THAT(session.peer.smCables(), IsEmpty()) << entry;
-        EXPECT_EQ(session.peer.smDevices().size(), 0U) << entry;
-        EXPECT_THAT(values(session.peer.ssCables()), ElementsAre(2));
-        EXPECT_THAT(values(session.peer.bsFileCables()), ElementsAre(3));
-        EXPECT_THAT(texts(session.peer.bsFileDevices()), ElementsAre("merlin"));
-        EXPECT_THAT(session.messages.take(), IsEmpty());
+        ManagerFixture session(
+            Base{std::string("SS = outs,USB2:fams,kestrel\n") + entry + "BSFILE = outs,SVF:fams,merlin\n"});
+        EXPECT_THAT(session.members().m_smCables, IsEmpty()) << entry;
+        EXPECT_EQ(session.members().m_smDevices.size(), 0U) << entry;
+        EXPECT_THAT(values(session.members().m_ssCables), ElementsAre(2));
+        EXPECT_THAT(values(session.members().m_bsFileCables), ElementsAre(3));
+        EXPECT_THAT(texts(session.members().m_bsFileDevices), ElementsAre("merlin"));
+        EXPECT_THAT(session.messages(), IsEmpty());
     }
 }
 
 TEST(ModeTables, FamilyNamesAreTakenExactlyAsStored) {
-    BaseSession session("BS = outs:fams,Kestrel, merlin ,,KESTREL,%n\n");
-    EXPECT_THAT(texts(session.peer.bsDevices()), ElementsAre("", " merlin ", "%n", "KESTREL", "Kestrel"));
+    ManagerFixture session(Base{"BS = outs:fams,Kestrel, merlin ,,KESTREL,%n\n"});
+    EXPECT_THAT(texts(session.members().m_bsDevices),
+                ElementsAre("", " merlin ", "%n", "KESTREL", "Kestrel"));
 }
 
 TEST(ModeTables, FamiliesNeedNotBeSupported) {
-    BaseSession session("DEVICE_SUPPORTED = merlin\nBS = outs:fams,kestrel\n");
-    EXPECT_THAT(texts(session.peer.bsDevices()), ElementsAre("kestrel"));
+    ManagerFixture session(Base{"DEVICE_SUPPORTED = merlin\nBS = outs:fams,kestrel\n"});
+    EXPECT_THAT(texts(session.members().m_bsDevices), ElementsAre("kestrel"));
 }
 
 TEST(ModeTables, FieldsBehindIndex32767DoNotExist) {
@@ -124,10 +125,10 @@ TEST(ModeTables, FieldsBehindIndex32767DoNotExist) {
     for (int field = 1; field < 32767; ++field) {
         outputs += ",PARALLEL";
     }
-    BaseSession session(outputs + ",USB2,SVF:fams," + numberedList("d", 40000) + "\n");
-    EXPECT_THAT(values(session.peer.bsCables()), ElementsAre(0, 2));
-    EXPECT_EQ(session.peer.bsDevices().size(), 32767U);
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    ManagerFixture session(Base{outputs + ",USB2,SVF:fams," + numberedList("d", 40000) + "\n"});
+    EXPECT_THAT(values(session.members().m_bsCables), ElementsAre(0, 2));
+    EXPECT_EQ(session.members().m_bsDevices.size(), 32767U);
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 } // namespace

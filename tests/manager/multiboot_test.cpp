@@ -1,4 +1,4 @@
-#include "CoreFixtures.h"
+#include "Members.h"
 
 // The six flash class lists, the twelve multiboot types, the question about them and their dump.
 
@@ -8,12 +8,12 @@ using testing::SizeIs;
 
 namespace {
 
-struct MultibootSession : ManagerSession {
+struct MultibootSession : ManagerFixture {
     explicit MultibootSession(const std::string& spi)
-        : ManagerSession({{"base.acd", ""}, {"spi.acd", spi}}) {}
+        : ManagerFixture({{"base.acd", ""}, {"spi.acd", spi}}) {}
 
     bool supports(const char* device, const char* typePrefix, const char* width, bool lead) {
-        return manager.isMbBpiSpiSupport(device, typePrefix, width, lead);
+        return (*this)->isMbBpiSpiSupport(device, typePrefix, width, lead);
     }
 };
 
@@ -47,35 +47,35 @@ BPI1_DEVICES = d,,e
 BPI2_DEVICES = f
 BPI3_DEVICES = g
 )");
-    EXPECT_THAT(texts(session.peer.at1Devices()), ElementsAre("a2", "a1", "a2"));
-    EXPECT_THAT(texts(session.peer.st1Devices()), ElementsAre("b"));
-    EXPECT_THAT(texts(session.peer.st2Devices()), ElementsAre("c"));
-    EXPECT_THAT(texts(session.peer.bpi1Devices()), ElementsAre("d", "", "e"));
-    EXPECT_THAT(texts(session.peer.bpi2Devices()), ElementsAre("f"));
-    EXPECT_THAT(texts(session.peer.bpi3Devices()), ElementsAre("g"));
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(texts(session.members().m_at1Devices), ElementsAre("a2", "a1", "a2"));
+    EXPECT_THAT(texts(session.members().m_st1Devices), ElementsAre("b"));
+    EXPECT_THAT(texts(session.members().m_st2Devices), ElementsAre("c"));
+    EXPECT_THAT(texts(session.members().m_bpi1Devices), ElementsAre("d", "", "e"));
+    EXPECT_THAT(texts(session.members().m_bpi2Devices), ElementsAre("f"));
+    EXPECT_THAT(texts(session.members().m_bpi3Devices), ElementsAre("g"));
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(FlashClassLists, WithoutTheirKeysAreEmpty) {
     MultibootSession session("AT1_DEVICES =\n");
-    EXPECT_THAT(session.peer.at1Devices(), IsEmpty());
-    EXPECT_THAT(session.peer.st1Devices(), IsEmpty());
-    EXPECT_THAT(session.peer.st2Devices(), IsEmpty());
-    EXPECT_THAT(session.peer.bpi1Devices(), IsEmpty());
-    EXPECT_THAT(session.peer.bpi2Devices(), IsEmpty());
-    EXPECT_THAT(session.peer.bpi3Devices(), IsEmpty());
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(session.members().m_at1Devices, IsEmpty());
+    EXPECT_THAT(session.members().m_st1Devices, IsEmpty());
+    EXPECT_THAT(session.members().m_st2Devices, IsEmpty());
+    EXPECT_THAT(session.members().m_bpi1Devices, IsEmpty());
+    EXPECT_THAT(session.members().m_bpi2Devices, IsEmpty());
+    EXPECT_THAT(session.members().m_bpi3Devices, IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(FlashClassLists, EndAtIndex32767) {
     MultibootSession session("AT1_DEVICES = " + numberedList("d", 40000) + "\n");
-    EXPECT_THAT(session.peer.at1Devices(), SizeIs(32768));
+    EXPECT_THAT(session.members().m_at1Devices, SizeIs(32768));
 }
 
 TEST(MultibootTypes, AreAlwaysTheTwelve) {
     for (const char* spi : {"", "TYPE_BPI_NONE_LEAD = KS50\nTYPE_MB_QPRM_NONE_LEAD =\n"}) {
         MultibootSession session(spi);
-        const auto types = lists(session.peer.multibootTypes());
+        const auto types = lists(session.members().m_multibootTypes);
         EXPECT_THAT(types, SizeIs(12));
         for (const TypeRow& row : TYPES) {
             ASSERT_EQ(types.count(row.name), 1U) << row.name;
@@ -87,7 +87,7 @@ TEST(MultibootTypes, AreAlwaysTheTwelve) {
 TEST(MultibootTypes, HoldTheirDevicesInFileOrder) {
     for (const TypeRow& row : TYPES) {
         MultibootSession session(std::string(row.name) + " = z,a,,z, b\n");
-        for (const auto& [name, devices] : lists(session.peer.multibootTypes())) {
+        for (const auto& [name, devices] : lists(session.members().m_multibootTypes)) {
             if (name == row.name) {
                 EXPECT_THAT(devices, ElementsAre("z", "a", "", "z", " b"));
             } else {
@@ -104,10 +104,10 @@ TEST(MultibootTypes, EndAtIndex32767) {
 }
 
 TEST(MultibootTypes, AreReadFromTheSpiDatabaseAlone) {
-    BaseSession session("TYPE_BPI_SERIAL_LEAD = KS50\nAT1_DEVICES = F1\n");
-    EXPECT_FALSE(session.manager.isMbBpiSpiSupport("KS50", "TYPE_BPI", "SERIAL", true));
-    EXPECT_THAT(session.peer.at1Devices(), IsEmpty());
-    EXPECT_THAT(session.peer.multibootTypes(), SizeIs(12));
+    ManagerFixture session(Base{"TYPE_BPI_SERIAL_LEAD = KS50\nAT1_DEVICES = F1\n"});
+    EXPECT_FALSE(session->isMbBpiSpiSupport("KS50", "TYPE_BPI", "SERIAL", true));
+    EXPECT_THAT(session.members().m_at1Devices, IsEmpty());
+    EXPECT_THAT(session.members().m_multibootTypes, SizeIs(12));
 }
 
 TEST(MultibootSupport, IsThatOfTheOneTypeThatTheArgumentsName) {
@@ -132,7 +132,7 @@ TEST(MultibootSupport, IsFalseForOtherDevices) {
     for (const char* device : {"", "KS5", "KS500", "KS50_PQ"}) {
         EXPECT_FALSE(session.supports(device, "TYPE_MB_SPI", "NONE", true)) << device;
     }
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(MultibootSupport, IsFalseForTypesThatAreNone) {
@@ -141,7 +141,7 @@ TEST(MultibootSupport, IsFalseForTypesThatAreNone) {
     EXPECT_FALSE(session.supports("KS50", "TYPE_MB_SPI", "SERIAL", true));
     EXPECT_FALSE(session.supports("KS50", "", "", true));
     EXPECT_FALSE(session.supports("KS50", "TYPE_MB_SPI_NONE", "LEAD", true));
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(MultibootSupport, JoinsPrefixAndWidthWithAnUnderscore) {
@@ -161,7 +161,7 @@ TEST(MultibootSupport, NullTextsAreEmptyTexts) {
 
 TEST(MultibootDump, ListsTheTypesInByteOrderAPieceAtATime) {
     MultibootSession session("TYPE_BPI_SERIAL_LEAD = z,50%d\nTYPE_MB_QPRM_NONE_CHAIN = %s%n\n");
-    session.manager.dumpMbBpiSpi();
+    session->dumpMbBpiSpi();
     std::vector<IssuedMessage> expected;
     for (const char* piece : {"TYPE_BPI_PARALLEL_CHAIN:",
                               "\n",
@@ -192,15 +192,15 @@ TEST(MultibootDump, ListsTheTypesInByteOrderAPieceAtATime) {
                               "\n"}) {
         expected.push_back(status(piece));
     }
-    EXPECT_EQ(withoutLines(session.messages.take()), expected);
+    EXPECT_EQ(withoutLines(session.messages()), expected);
 }
 
 TEST(MultibootDump, OfAStartUpThatDidNotReachTheTypesIsEmpty) {
     MultibootSession session("PROGRAM_OPTION = OTP,SPI,USB2\nTYPE_BPI_SERIAL_LEAD = KS50\n");
-    (void)session.messages.take();
-    EXPECT_THAT(session.peer.multibootTypes(), IsEmpty());
-    session.manager.dumpMbBpiSpi();
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    (void)session.messages();
+    EXPECT_THAT(session.members().m_multibootTypes, IsEmpty());
+    session->dumpMbBpiSpi();
+    EXPECT_THAT(session.messages(), IsEmpty());
     EXPECT_FALSE(session.supports("KS50", "TYPE_BPI", "SERIAL", true));
 }
 

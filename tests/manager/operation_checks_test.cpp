@@ -1,5 +1,5 @@
 // May an operation run on a device, in a mode, through an output: checkConstraints with five arguments.
-#include "QueryFixture.h"
+#include "Members.h"
 
 #include <gmock/gmock.h>
 
@@ -26,7 +26,7 @@ const Files DATABASES = {
 } // namespace
 
 TEST(OperationChecks, AnAllowedOperationIsSilent) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_TRUE(manager->checkConstraints(BS, PARALLEL, "dev1", VERIFY, nullptr));
     EXPECT_TRUE(
         manager->checkConstraints(MODE_TYPE::DP770, OUTPUT_TYPE::STAPL, "dev1_p", OP_TYPE::EXPRESSQSVF, ""));
@@ -34,7 +34,7 @@ TEST(OperationChecks, AnAllowedOperationIsSilent) {
 }
 
 TEST(OperationChecks, ARefusalIsSilentToo) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_FALSE(manager->checkConstraints(BS, PARALLEL, "dev2", VERIFY, nullptr));
     EXPECT_FALSE(manager->checkConstraints(BS, OUTPUT_TYPE::USB2, "dev1", VERIFY, nullptr));
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, PARALLEL, "dev1", VERIFY, nullptr));
@@ -43,16 +43,16 @@ TEST(OperationChecks, ARefusalIsSilentToo) {
 }
 
 TEST(OperationChecks, TheFamilyArgumentHasNoEffect) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     for (const char* family : {"fam2", "nobody", "", "%s", static_cast<const char*>(nullptr)}) {
         EXPECT_TRUE(manager->checkConstraints(BS, PARALLEL, "dev1", VERIFY, family));
         EXPECT_FALSE(manager->checkConstraints(BS, PARALLEL, "dev2", VERIFY, family));
     }
-    EXPECT_THAT(textsOf(manager.peer().operationsLoaded()), ElementsAre("spi", "fam1", "fam2"));
+    EXPECT_THAT(texts(manager.members().m_operationsLoaded), ElementsAre("spi", "fam1", "fam2"));
 }
 
 TEST(OperationChecks, ModesOutOfRangeGiveADebugMessage) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     for (const bool exceptions : {true, false}) {
         manager->setExceptions(exceptions);
         for (const int mode : BOUNDARY_VALUES) {
@@ -69,7 +69,7 @@ TEST(OperationChecks, ModesOutOfRangeGiveADebugMessage) {
 }
 
 TEST(OperationChecks, OutputsOutOfRangeGiveADebugMessageWithoutTheParenthesis) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     for (const MODE_TYPE mode : {BS, SPI}) {
         for (const int output : BOUNDARY_VALUES) {
             EXPECT_EQ(manager->checkConstraints(mode, OUTPUT_TYPE{output}, "dev1", VERIFY, nullptr),
@@ -86,7 +86,7 @@ TEST(OperationChecks, OutputsOutOfRangeGiveADebugMessageWithoutTheParenthesis) {
 }
 
 TEST(OperationChecks, OperationsOutOfRangeGiveADebugMessageThatIsMisspelt) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     for (const MODE_TYPE mode : {BS, SPI}) {
         for (const int operation : BOUNDARY_VALUES) {
             EXPECT_FALSE(manager->checkConstraints(mode, PARALLEL, "dev1", OP_TYPE{operation}, nullptr));
@@ -101,7 +101,7 @@ TEST(OperationChecks, OperationsOutOfRangeGiveADebugMessageThatIsMisspelt) {
 }
 
 TEST(OperationChecks, ModeThenOutputThenOperationAreTested) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE{8}, OUTPUT_TYPE{7}, "dev1", OP_TYPE{32}, nullptr));
     EXPECT_FALSE(manager->checkConstraints(BS, OUTPUT_TYPE{7}, "dev1", OP_TYPE{32}, nullptr));
     EXPECT_FALSE(manager->checkConstraints(BS, PARALLEL, "dev1", OP_TYPE{32}, nullptr));
@@ -111,8 +111,8 @@ TEST(OperationChecks, ModeThenOutputThenOperationAreTested) {
 }
 
 TEST(OperationChecks, TheRangesAreTestedBeforeTheFamilyIsLookedUp) {
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = spi\nPROGRAM_OPTION_PACKAGE = fam3,spi\n"},
-                              {"fam3.acd", "[dev3]\n"}});
+    ManagerFixture manager(Files{{"base.acd", "DEVICE_SUPPORTED = spi\nPROGRAM_OPTION_PACKAGE = fam3,spi\n"},
+                                 {"fam3.acd", "[dev3]\n"}});
     const auto check = [&](int mode, int output, int operation) {
         return manager->checkConstraints(MODE_TYPE{mode}, OUTPUT_TYPE{output}, "dev3", OP_TYPE{operation},
                                          nullptr);
@@ -128,8 +128,8 @@ TEST(OperationChecks, TheRangesAreTestedBeforeTheFamilyIsLookedUp) {
 }
 
 TEST(OperationChecks, AnUnsupportedFamilyIsRefusedWhileExceptionsAreOff) {
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = spi\nPROGRAM_OPTION_PACKAGE = spi\n"},
-                              {"fam3.acd", "OPERATION = VERIFY,Bscan,PARALLEL\n[dev3]\n"}});
+    ManagerFixture manager(Files{{"base.acd", "DEVICE_SUPPORTED = spi\nPROGRAM_OPTION_PACKAGE = spi\n"},
+                                 {"fam3.acd", "OPERATION = VERIFY,Bscan,PARALLEL\n[dev3]\n"}});
     manager->setExceptions(false);
     EXPECT_FALSE(manager->checkConstraints(BS, PARALLEL, "dev3", VERIFY, nullptr));
     EXPECT_FALSE(manager->checkConstraints(BS, PARALLEL, "dev3", OP_TYPE{31}, "fam3"));
@@ -137,17 +137,18 @@ TEST(OperationChecks, AnUnsupportedFamilyIsRefusedWhileExceptionsAreOff) {
 }
 
 TEST(OperationChecks, SpiModeAnswersForSpiWhateverTheDevice) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     for (const char* device : {"dev1", "nobody", "", static_cast<const char*>(nullptr)}) {
         EXPECT_TRUE(manager->checkConstraints(SPI, PARALLEL, device, VERIFY, nullptr));
         EXPECT_FALSE(manager->checkConstraints(SPI, PARALLEL, device, OP_TYPE::ERASE, nullptr));
     }
-    EXPECT_TRUE(manager.peer().loadedFamilies().empty());
-    EXPECT_TRUE(manager.peer().deviceFamilyCache().empty());
+    EXPECT_TRUE(manager.members().m_loadedFamilies.empty());
+    EXPECT_TRUE(manager.members().m_deviceFamilyCache.empty());
 }
 
 TEST(OperationChecks, SpiModeIsRaisedLastWhereSpiIsNotSupported) {
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = fam1\nPROGRAM_OPTION_PACKAGE = fam1,spi\n"}});
+    ManagerFixture manager(
+        Files{{"base.acd", "DEVICE_SUPPORTED = fam1\nPROGRAM_OPTION_PACKAGE = fam1,spi\n"}});
     EXPECT_FALSE(manager->checkConstraints(SPI, OUTPUT_TYPE{5}, "x", VERIFY, nullptr));
     EXPECT_FALSE(manager->checkConstraints(SPI, PARALLEL, "x", OP_TYPE{32}, nullptr));
     expectRaises<OutOfRangeException>(
@@ -158,14 +159,14 @@ TEST(OperationChecks, SpiModeIsRaisedLastWhereSpiIsNotSupported) {
 
 TEST(OperationChecks, TheCutNameIsResolved) {
     // "FLASH_2" is an SPI flash, but "FLASH" is nothing; getDeviceOperations resolves the whole name.
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     manager->setExceptions(false);
     EXPECT_FALSE(manager->checkConstraints(BS, PARALLEL, "FLASH_2", VERIFY, nullptr));
     EXPECT_TRUE(manager->checkConstraints(BS, PARALLEL, "FLASH1", VERIFY, nullptr));
 }
 
 TEST(OperationChecks, AFamilyWithAPackageIsNoFamily) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     expectRaises<OutOfRangeException>(
         1999, [&] { return manager->checkConstraints(BS, PARALLEL, "fam1_x", VERIFY, nullptr); });
     manager->setExceptions(false);
@@ -174,13 +175,13 @@ TEST(OperationChecks, AFamilyWithAPackageIsNoFamily) {
 }
 
 TEST(OperationChecks, LoadingIsDecidedByTheLoadedOperations) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_TRUE(manager->checkConstraints(BS, PARALLEL, "FLASH1", VERIFY, nullptr));
-    EXPECT_TRUE(manager.peer().loadedFamilies().empty());
+    EXPECT_TRUE(manager.members().m_loadedFamilies.empty());
 }
 
 TEST(OperationChecks, AFamilyWhosePropertiesFailedToLoadIsTriedAgain) {
-    ManagerOver manager(
+    ManagerFixture manager(
         Files{{"base.acd", "DEVICE_SUPPORTED = fam1,spi\nPROGRAM_OPTION_PACKAGE = fam1,spi\n"},
               {"fam1.acd", "PROPERTY = BROKEN\nOPERATION = VERIFY,Bscan,PARALLEL\n"}});
     expectRaises<DataMismatchException>(

@@ -1,4 +1,4 @@
-#include "CoreFixtures.h"
+#include "ManagerFixture.h"
 
 #include <climits>
 
@@ -266,9 +266,9 @@ TEST(OptionNames, RaisingIsSilent) {
 }
 
 TEST(OptionNames, RaiseWhateverTheExceptionsSwitchSays) {
-    BaseSession session("");
+    ManagerFixture session(Base{""});
     for (const bool exceptions : {false, true}) {
-        session.manager.setExceptions(exceptions);
+        session->setExceptions(exceptions);
         EXPECT_EQ(readingOptionRaises("nonsense"), 1500);
         EXPECT_EQ(readingOptionRaises("OTP"), 1500);
         EXPECT_EQ(namingOptionRaises(24), 1413);

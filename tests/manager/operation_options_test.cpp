@@ -1,6 +1,6 @@
 // What a device's properties say of its operations: checkConstraints(device, mode, operation, family) and
 // getDeviceOperationOptions.
-#include "QueryFixture.h"
+#include "Members.h"
 
 #include <gmock/gmock.h>
 
@@ -22,7 +22,7 @@ Files family(const std::string& text) {
 } // namespace
 
 TEST(OperationProperty, AnOperationMayRunInTheModesThatItsPropertyLists) {
-    ManagerOver manager(family("[dev1]\nPROPERTIES = PROGRAM,2,BS,KITECF:VERIFY,1,SPI\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTIES = PROGRAM,2,BS,KITECF:VERIFY,1,SPI\n"));
     EXPECT_TRUE(manager->checkConstraints("dev1", BS, OP_TYPE::PROGRAM, nullptr));
     EXPECT_TRUE(manager->checkConstraints("dev1", MODE_TYPE::KITECF, OP_TYPE::PROGRAM, nullptr));
     EXPECT_FALSE(manager->checkConstraints("dev1", MODE_TYPE::SPI, OP_TYPE::PROGRAM, nullptr));
@@ -34,7 +34,7 @@ TEST(OperationProperty, AnOperationMayRunInTheModesThatItsPropertyLists) {
 TEST(OperationProperty, EachModeIsMatchedByItsKeyName) {
     const char* const keys[] = {"BS", "SS", "SM", "BSFILE", "DP770", "SPI", "KITECF", "KITEMPM", "PFF"};
     for (int listed = 0; listed < 9; ++listed) {
-        ManagerOver manager(family("[dev1]\nPROPERTY = ERASE," + std::string(keys[listed]) + "\n"));
+        ManagerFixture manager(family("[dev1]\nPROPERTY = ERASE," + std::string(keys[listed]) + "\n"));
         for (int mode = 0; mode < 9; ++mode) {
             EXPECT_EQ(manager->checkConstraints("dev1", MODE_TYPE{mode}, OP_TYPE::ERASE, nullptr),
                       mode == listed);
@@ -43,7 +43,7 @@ TEST(OperationProperty, EachModeIsMatchedByItsKeyName) {
 }
 
 TEST(OperationProperty, AValueThatIsNoModeCountsAsBoundaryScan) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = PROGRAM,BS:VERIFY,SS\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = PROGRAM,BS:VERIFY,SS\n"));
     for (const int mode : {-2147483647 - 1, -1, 9, 10, 31, 32, 2147483647}) {
         EXPECT_TRUE(manager->checkConstraints("dev1", MODE_TYPE{mode}, OP_TYPE::PROGRAM, nullptr)) << mode;
         EXPECT_FALSE(manager->checkConstraints("dev1", MODE_TYPE{mode}, OP_TYPE::VERIFY, nullptr)) << mode;
@@ -51,25 +51,25 @@ TEST(OperationProperty, AValueThatIsNoModeCountsAsBoundaryScan) {
 }
 
 TEST(OperationProperty, ModesAndOperationsAreMatchedCaseIncluded) {
-    ManagerOver manager(family("[dev1]\nPROPERTIES = PROGRAM,3,bs,Bs,Bscan:program,1,BS\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTIES = PROGRAM,3,bs,Bs,Bscan:program,1,BS\n"));
     EXPECT_FALSE(manager->checkConstraints("dev1", BS, OP_TYPE::PROGRAM, nullptr));
 }
 
 TEST(OperationProperty, TheNameIsCut) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = PROGRAM,BS\n[dev1_x]\nPROPERTY = PROGRAM,SS\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = PROGRAM,BS\n[dev1_x]\nPROPERTY = PROGRAM,SS\n"));
     EXPECT_TRUE(manager->checkConstraints("dev1_x", BS, OP_TYPE::PROGRAM, nullptr));
     EXPECT_FALSE(manager->checkConstraints("dev1_x", MODE_TYPE::SS, OP_TYPE::PROGRAM, nullptr));
-    EXPECT_FALSE(holds(manager.peer().loadedFamilies(), "dev1_x"));
+    EXPECT_FALSE(holds(manager.members().m_loadedFamilies, "dev1_x"));
 }
 
 TEST(OperationProperty, AFamilysPropertyHoldsForItsDevices) {
-    ManagerOver manager(family("PROPERTY = PROGRAM,BS\n[dev1]\n[dev2]\nPROPERTY = PROGRAM,SS\n"));
+    ManagerFixture manager(family("PROPERTY = PROGRAM,BS\n[dev1]\n[dev2]\nPROPERTY = PROGRAM,SS\n"));
     EXPECT_TRUE(manager->checkConstraints("dev1", BS, OP_TYPE::PROGRAM, nullptr));
     EXPECT_FALSE(manager->checkConstraints("dev2", BS, OP_TYPE::PROGRAM, nullptr));
 }
 
 TEST(OperationProperty, TheFamilyArgumentHasNoEffect) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = PROGRAM,BS\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = PROGRAM,BS\n"));
     for (const char* named : {"fam2", "nobody", "", "%s", static_cast<const char*>(nullptr)}) {
         EXPECT_TRUE(manager->checkConstraints("dev1", BS, OP_TYPE::PROGRAM, named));
         EXPECT_FALSE(manager->checkConstraints("fam1", BS, OP_TYPE::PROGRAM, named));
@@ -77,7 +77,7 @@ TEST(OperationProperty, TheFamilyArgumentHasNoEffect) {
 }
 
 TEST(OperationProperty, AnUnknownDeviceIsSilentlyFalse) {
-    ManagerOver manager(family(""));
+    ManagerFixture manager(family(""));
     EXPECT_FALSE(manager->checkConstraints("nobody", BS, OP_TYPE::PROGRAM, nullptr));
     EXPECT_FALSE(manager->checkConstraints(static_cast<const char*>(nullptr), BS, OP_TYPE::PROGRAM, nullptr));
     EXPECT_THAT(manager.messages(), IsEmpty());
@@ -85,7 +85,7 @@ TEST(OperationProperty, AnUnknownDeviceIsSilentlyFalse) {
 
 TEST(OperationProperty, AValueThatIsNoOperationHasTheEmptyName) {
     // The conversion of the operation speaks, the check itself does not.
-    ManagerOver manager(family("[dev1]\nPROPERTY = ,BS:PROGRAM,BS\n[dev2]\nPROPERTY = PROGRAM,BS\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = ,BS:PROGRAM,BS\n[dev2]\nPROPERTY = PROGRAM,BS\n"));
     for (const int operation : {-2147483647 - 1, -1, 32, 2147483647}) {
         EXPECT_TRUE(manager->checkConstraints("dev1", BS, OP_TYPE{operation}, nullptr));
         EXPECT_FALSE(manager->checkConstraints("dev2", BS, OP_TYPE{operation}, nullptr));
@@ -97,97 +97,95 @@ TEST(OperationProperty, AValueThatIsNoOperationHasTheEmptyName) {
 }
 
 TEST(OperationOptions, AnOperationsOptionsInAListedMode) {
-    ManagerOver manager(family("[dev1]\nPROPERTIES = PROGRAM,1,BS:OP_PROGRAM,2,slow,fast\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceOperationOptions("dev1", "PROGRAM", BS)),
+    ManagerFixture manager(family("[dev1]\nPROPERTIES = PROGRAM,1,BS:OP_PROGRAM,2,slow,fast\n"));
+    EXPECT_THAT(texts(manager->getDeviceOperationOptions("dev1", "PROGRAM", BS)),
                 ElementsAre("fast", "slow"));
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
 TEST(OperationOptions, AnUnlistedModeHasNoneEvenWhereThereAreSome) {
-    ManagerOver manager(family("[dev1]\nPROPERTIES = PROGRAM,1,BS:OP_PROGRAM,1,fast:OP_PROGRAM_SS,1,x\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTIES = PROGRAM,1,BS:OP_PROGRAM,1,fast:OP_PROGRAM_SS,1,x\n"));
     const auto& options = manager->getDeviceOperationOptions("dev1", "PROGRAM", MODE_TYPE::SS);
-    EXPECT_EQ(&options, &manager.peer().operationOptions());
+    EXPECT_EQ(&options, &manager.members().m_operationOptions);
     EXPECT_TRUE(options.empty());
 }
 
 TEST(OperationOptions, WithoutCommonOptionsTheModesOwnCount) {
-    ManagerOver manager(
+    ManagerFixture manager(
         family("[dev1]\nPROPERTIES = PROGRAM,2,BS,SS:OP_PROGRAM_BS,1,scan:OP_PROGRAM_SS,1,serial\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceOperationOptions("dev1", "PROGRAM", BS)), ElementsAre("scan"));
-    EXPECT_THAT(textsOf(manager->getDeviceOperationOptions("dev1", "PROGRAM", MODE_TYPE::SS)),
+    EXPECT_THAT(texts(manager->getDeviceOperationOptions("dev1", "PROGRAM", BS)), ElementsAre("scan"));
+    EXPECT_THAT(texts(manager->getDeviceOperationOptions("dev1", "PROGRAM", MODE_TYPE::SS)),
                 ElementsAre("serial"));
 }
 
 TEST(OperationOptions, CommonOptionsComeBeforeTheModesOwn) {
-    ManagerOver manager(
+    ManagerFixture manager(
         family("[dev1]\nPROPERTIES = PROGRAM,1,BS:OP_PROGRAM_BS,1,scan:OP_PROGRAM,1,common\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceOperationOptions("dev1", "PROGRAM", BS)), ElementsAre("common"));
+    EXPECT_THAT(texts(manager->getDeviceOperationOptions("dev1", "PROGRAM", BS)), ElementsAre("common"));
 }
 
 TEST(OperationOptions, TheFamilysCommonOptionsComeBeforeTheDevicesOwnOfTheMode) {
-    ManagerOver manager(family("PROPERTIES = OP_PROGRAM,1,common\n"
-                               "[dev1]\nPROPERTIES = PROGRAM,1,BS:OP_PROGRAM_BS,1,scan\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceOperationOptions("dev1", "PROGRAM", BS)), ElementsAre("common"));
+    ManagerFixture manager(family("PROPERTIES = OP_PROGRAM,1,common\n"
+                                  "[dev1]\nPROPERTIES = PROGRAM,1,BS:OP_PROGRAM_BS,1,scan\n"));
+    EXPECT_THAT(texts(manager->getDeviceOperationOptions("dev1", "PROGRAM", BS)), ElementsAre("common"));
 }
 
 TEST(OperationOptions, EmptyCommonOptionsAreNone) {
-    ManagerOver manager(family("[dev1]\nPROPERTIES = PROGRAM,1,BS:OP_PROGRAM,0:OP_PROGRAM_BS,1,scan\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceOperationOptions("dev1", "PROGRAM", BS)), ElementsAre("scan"));
+    ManagerFixture manager(family("[dev1]\nPROPERTIES = PROGRAM,1,BS:OP_PROGRAM,0:OP_PROGRAM_BS,1,scan\n"));
+    EXPECT_THAT(texts(manager->getDeviceOperationOptions("dev1", "PROGRAM", BS)), ElementsAre("scan"));
 }
 
 TEST(OperationOptions, NeitherGivesTheEmptySet) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = PROGRAM,BS\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = PROGRAM,BS\n"));
     EXPECT_TRUE(manager->getDeviceOperationOptions("dev1", "PROGRAM", BS).empty());
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
 TEST(OperationOptions, TheOperationIsMatchedAsGivenButItsOptionsAreInUpperCase) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = Prog,BS:OP_PROG,upper:OP_Prog,mixed:PROGRAM,BS\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceOperationOptions("dev1", "Prog", BS)), ElementsAre("upper"));
-    EXPECT_THAT(textsOf(manager->getDeviceOperationOptions("dev1", "program", BS)), IsEmpty());
+    ManagerFixture manager(family("[dev1]\nPROPERTY = Prog,BS:OP_PROG,upper:OP_Prog,mixed:PROGRAM,BS\n"));
+    EXPECT_THAT(texts(manager->getDeviceOperationOptions("dev1", "Prog", BS)), ElementsAre("upper"));
+    EXPECT_THAT(texts(manager->getDeviceOperationOptions("dev1", "program", BS)), IsEmpty());
 }
 
 TEST(OperationOptions, OnlyAsciiIsTurnedToUpperCase) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = \xe4z,BS:OP_\xe4Z,found\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceOperationOptions("dev1", "\xe4z", BS)), ElementsAre("found"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = \xe4z,BS:OP_\xe4Z,found\n"));
+    EXPECT_THAT(texts(manager->getDeviceOperationOptions("dev1", "\xe4z", BS)), ElementsAre("found"));
 }
 
 TEST(OperationOptions, AnyTextMayBeAnOperation) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = my_own%s,BS:OP_MY_OWN%S_BS,x\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceOperationOptions("dev1", "my_own%s", BS)), ElementsAre("x"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = my_own%s,BS:OP_MY_OWN%S_BS,x\n"));
+    EXPECT_THAT(texts(manager->getDeviceOperationOptions("dev1", "my_own%s", BS)), ElementsAre("x"));
 }
 
 TEST(OperationOptions, ANullOperationIsTheEmptyText) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = ,BS:OP_,x\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceOperationOptions("dev1", nullptr, BS)), ElementsAre("x"));
-    EXPECT_THAT(textsOf(manager->getDeviceOperationOptions(nullptr, nullptr, BS)), IsEmpty());
+    ManagerFixture manager(family("[dev1]\nPROPERTY = ,BS:OP_,x\n"));
+    EXPECT_THAT(texts(manager->getDeviceOperationOptions("dev1", nullptr, BS)), ElementsAre("x"));
+    EXPECT_THAT(texts(manager->getDeviceOperationOptions(nullptr, nullptr, BS)), IsEmpty());
 }
 
 TEST(OperationOptions, AValueThatIsNoModeCountsAsBoundaryScan) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = ERASE,BS:OP_ERASE_BS,x\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = ERASE,BS:OP_ERASE_BS,x\n"));
     for (const int mode : {-2147483647 - 1, -1, 0, 9, 10, 2147483647}) {
-        EXPECT_THAT(textsOf(manager->getDeviceOperationOptions("dev1", "ERASE", MODE_TYPE{mode})),
+        EXPECT_THAT(texts(manager->getDeviceOperationOptions("dev1", "ERASE", MODE_TYPE{mode})),
                     ElementsAre("x"));
     }
 }
 
 TEST(OperationOptions, ModesWithoutATableHaveOptionsToo) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = ERASE,PFF:OP_ERASE_PFF,x\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceOperationOptions("dev1", "ERASE", MODE_TYPE::PFF)),
-                ElementsAre("x"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = ERASE,PFF:OP_ERASE_PFF,x\n"));
+    EXPECT_THAT(texts(manager->getDeviceOperationOptions("dev1", "ERASE", MODE_TYPE::PFF)), ElementsAre("x"));
 }
 
 TEST(OperationOptions, TheNameIsNotCut) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = ERASE,BS:OP_ERASE,whole\n"
-                               "[dev1_x]\nPROPERTY = ERASE,BS:OP_ERASE,package\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceOperationOptions("dev1_x", "ERASE", BS)), ElementsAre("package"));
-    EXPECT_TRUE(holds(manager.peer().loadedFamilies(), "dev1_x"));
-    EXPECT_FALSE(holds(manager.peer().loadedFamilies(), "dev1"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = ERASE,BS:OP_ERASE,whole\n"
+                                  "[dev1_x]\nPROPERTY = ERASE,BS:OP_ERASE,package\n"));
+    EXPECT_THAT(texts(manager->getDeviceOperationOptions("dev1_x", "ERASE", BS)), ElementsAre("package"));
+    EXPECT_TRUE(holds(manager.members().m_loadedFamilies, "dev1_x"));
+    EXPECT_FALSE(holds(manager.members().m_loadedFamilies, "dev1"));
 }
 
 TEST(OperationOptions, SpiModeHasNoPlaceOfItsOwn) {
     // Unlike the queries of the tables, this one answers for the device in SPI mode too.
-    ManagerOver manager(family("[dev1]\nPROPERTY = ERASE,SPI:OP_ERASE,x\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceOperationOptions("dev1", "ERASE", MODE_TYPE::SPI)),
-                ElementsAre("x"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = ERASE,SPI:OP_ERASE,x\n"));
+    EXPECT_THAT(texts(manager->getDeviceOperationOptions("dev1", "ERASE", MODE_TYPE::SPI)), ElementsAre("x"));
 }

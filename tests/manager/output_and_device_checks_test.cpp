@@ -1,5 +1,5 @@
 // May a device be configured in a mode through an output: checkConstraints(mode, output, device, package).
-#include "QueryFixture.h"
+#include "Members.h"
 
 #include <gmock/gmock.h>
 
@@ -19,44 +19,44 @@ const Files SLAVE_SERIAL = {
 } // namespace
 
 TEST(OutputAndDeviceChecks, BothAllowedIsSilent) {
-    ManagerOver manager(SLAVE_SERIAL);
+    ManagerFixture manager(SLAVE_SERIAL);
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::SS, OUTPUT_TYPE::PARALLEL, "dev1_x", "pkg2"));
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
 TEST(OutputAndDeviceChecks, ARefusedDeviceIsNamed) {
-    ManagerOver manager(SLAVE_SERIAL);
+    ManagerFixture manager(SLAVE_SERIAL);
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, OUTPUT_TYPE::PARALLEL, "dev2_x", nullptr));
     EXPECT_THAT(manager.messages(), ElementsAre(info(256, "dev2 is not supported in Slave Serial mode\n")));
 }
 
 TEST(OutputAndDeviceChecks, ARefusedPartIsNamedWithItsPackage) {
-    ManagerOver manager(SLAVE_SERIAL);
+    ManagerFixture manager(SLAVE_SERIAL);
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, OUTPUT_TYPE::PARALLEL, "dev1_pkg9", "pkg1"));
     EXPECT_THAT(manager.messages(),
                 ElementsAre(info(256, "dev1_pkg1 is not supported in Slave Serial mode\n")));
 }
 
 TEST(OutputAndDeviceChecks, ARefusedOutputIsNamed) {
-    ManagerOver manager(SLAVE_SERIAL);
+    ManagerFixture manager(SLAVE_SERIAL);
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, OUTPUT_TYPE::SVF, "dev1", nullptr));
     EXPECT_THAT(manager.messages(), ElementsAre(info(249, "SVF is not supported in Slave Serial mode\n")));
 }
 
 TEST(OutputAndDeviceChecks, TheOutputIsNamedWhenBothAreRefused) {
-    ManagerOver manager(SLAVE_SERIAL);
+    ManagerFixture manager(SLAVE_SERIAL);
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, OUTPUT_TYPE::SVF, "dev2", nullptr));
     EXPECT_THAT(manager.messages(), ElementsAre(info(249, "SVF is not supported in Slave Serial mode\n")));
 }
 
 TEST(OutputAndDeviceChecks, TheDeviceIsTestedBehindARefusedOutput) {
-    ManagerOver manager(SLAVE_SERIAL);
+    ManagerFixture manager(SLAVE_SERIAL);
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, OUTPUT_TYPE::SVF, "dev2", nullptr));
-    EXPECT_TRUE(manager.peer().deviceFamilyCache().contains(StringBase("dev2")));
+    EXPECT_TRUE(manager.members().m_deviceFamilyCache.contains(StringBase("dev2")));
 }
 
 TEST(OutputAndDeviceChecks, AValueThatIsNoModeIsRaisedBeforeAnyMessage) {
-    ManagerOver manager(SLAVE_SERIAL);
+    ManagerFixture manager(SLAVE_SERIAL);
     for (const int mode : {-2147483647 - 1, -1, 9, 10, 31, 32, 2147483647}) {
         expectRaises<OutOfRangeException>(644, [&] {
             return manager->checkConstraints(MODE_TYPE{mode}, OUTPUT_TYPE::PARALLEL, "dev1", nullptr);
@@ -66,7 +66,7 @@ TEST(OutputAndDeviceChecks, AValueThatIsNoModeIsRaisedBeforeAnyMessage) {
 }
 
 TEST(OutputAndDeviceChecks, AValueThatIsNoModeIsARefusedOutputWhileExceptionsAreOff) {
-    ManagerOver manager(SLAVE_SERIAL);
+    ManagerFixture manager(SLAVE_SERIAL);
     manager->setExceptions(false);
     for (const int mode : {-2147483647 - 1, -1, 9, 10, 31, 32, 2147483647}) {
         EXPECT_FALSE(manager->checkConstraints(MODE_TYPE{mode}, OUTPUT_TYPE::PARALLEL, "dev1", nullptr));
@@ -78,7 +78,7 @@ TEST(OutputAndDeviceChecks, AValueThatIsNoModeIsARefusedOutputWhileExceptionsAre
 
 TEST(OutputAndDeviceChecks, AnExcludedPartIsRefusedBeforeTheModeIsKnownToBeOne) {
     // A value that is no mode has the key name "BS".
-    ManagerOver manager(
+    ManagerFixture manager(
         Files{{"base.acd", "NOT_SUPPORTED_PART_IN_MODE = BS_dev1_pkg1\n"}, {"fam1.acd", "[dev1]\n"}});
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE{9}, OUTPUT_TYPE::SVF, "dev1", "pkg1"));
     EXPECT_THAT(manager.messages(),
@@ -86,7 +86,7 @@ TEST(OutputAndDeviceChecks, AnExcludedPartIsRefusedBeforeTheModeIsKnownToBeOne) 
 }
 
 TEST(OutputAndDeviceChecks, AValueThatIsNoOutputIsRefusedAsUnspecified) {
-    ManagerOver manager(SLAVE_SERIAL);
+    ManagerFixture manager(SLAVE_SERIAL);
     for (const int output : {-2147483647 - 1, -1, 9, 10, 31, 32, 2147483647}) {
         EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, OUTPUT_TYPE{output}, "dev1", nullptr));
         EXPECT_THAT(manager.messages(),
@@ -96,30 +96,31 @@ TEST(OutputAndDeviceChecks, AValueThatIsNoOutputIsRefusedAsUnspecified) {
 }
 
 TEST(OutputAndDeviceChecks, SpiModeTestsTheFamilySpiInPlaceOfTheDevice) {
-    ManagerOver allowing(Files{{"base.acd", "SPI = outs,USB2:fams,spi\n"}, {"fam1.acd", "[dev1]\n"}});
+    ManagerFixture allowing(Files{{"base.acd", "SPI = outs,USB2:fams,spi\n"}, {"fam1.acd", "[dev1]\n"}});
     EXPECT_TRUE(allowing->checkConstraints(MODE_TYPE::SPI, OUTPUT_TYPE::USB2, "dev1", nullptr));
     EXPECT_THAT(allowing.messages(), IsEmpty());
-    EXPECT_FALSE(allowing.peer().deviceFamilyCache().contains(StringBase("dev1")));
+    EXPECT_FALSE(allowing.members().m_deviceFamilyCache.contains(StringBase("dev1")));
 }
 
 TEST(OutputAndDeviceChecks, SpiModeRefusesWhereSpiIsNotListedButNamesTheDevice) {
-    ManagerOver manager(Files{{"base.acd", "SPI = outs,USB2:fams,fam1\n"}, {"fam1.acd", "[dev1]\n"}});
+    ManagerFixture manager(Files{{"base.acd", "SPI = outs,USB2:fams,fam1\n"}, {"fam1.acd", "[dev1]\n"}});
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SPI, OUTPUT_TYPE::USB2, "dev1_p", "q"));
     EXPECT_THAT(manager.messages(), ElementsAre(info(256, "dev1_q is not supported in SPI mode\n")));
 }
 
 TEST(OutputAndDeviceChecks, SpiModeTestsTheExclusionOfSpiInPlaceOfTheDevices) {
-    ManagerOver manager(Files{{"base.acd", "SPI = outs,USB2:fams,spi\n"
-                                           "NOT_SUPPORTED_PART_IN_MODE = SPI_spi_p,SPI_dev1_q\n"}});
+    ManagerFixture manager(Files{{"base.acd", "SPI = outs,USB2:fams,spi\n"
+                                              "NOT_SUPPORTED_PART_IN_MODE = SPI_spi_p,SPI_dev1_q\n"}});
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SPI, OUTPUT_TYPE::USB2, "dev1", "p"));
     EXPECT_THAT(manager.messages(), ElementsAre(info(256, "dev1_p is not supported in SPI mode\n")));
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::SPI, OUTPUT_TYPE::USB2, "dev1", "q"));
 }
 
 TEST(OutputAndDeviceChecks, TheFormatterModeAcceptsEveryOutputButTestsTheDevice) {
-    ManagerOver manager(Files{{"base.acd", "PFF = outs:fams,fam1\nNOT_SUPPORTED_PART_IN_MODE = PFF_dev1_p\n"},
-                              {"fam1.acd", "[dev1]\n"},
-                              {"fam2.acd", "[dev2]\n"}});
+    ManagerFixture manager(
+        Files{{"base.acd", "PFF = outs:fams,fam1\nNOT_SUPPORTED_PART_IN_MODE = PFF_dev1_p\n"},
+              {"fam1.acd", "[dev1]\n"},
+              {"fam2.acd", "[dev2]\n"}});
     for (const int output : BOUNDARY_VALUES) {
         EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::PFF, OUTPUT_TYPE{output}, "dev1", nullptr))
             << output;
@@ -141,7 +142,7 @@ TEST(OutputAndDeviceChecks, EachModeHasItsOwnFamilies) {
         files["base.acd"] += std::string(keys[mode]) + " = outs,SVF:fams," + family + "\n";
         files[family + ".acd"] = "[dev" + number + "]\n";
     }
-    ManagerOver manager(files);
+    ManagerFixture manager(files);
     for (int mode = 0; mode < 9; ++mode) {
         for (int family = 0; family < 9; ++family) {
             const std::string device = "dev" + std::to_string(family);
@@ -153,13 +154,13 @@ TEST(OutputAndDeviceChecks, EachModeHasItsOwnFamilies) {
 }
 
 TEST(OutputAndDeviceChecks, ANullDeviceIsTheEmptyName) {
-    ManagerOver manager(SLAVE_SERIAL);
+    ManagerFixture manager(SLAVE_SERIAL);
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, OUTPUT_TYPE::PARALLEL, nullptr, nullptr));
     EXPECT_THAT(manager.messages(), ElementsAre(info(256, " is not supported in Slave Serial mode\n")));
 }
 
 TEST(OutputAndDeviceChecks, AnEmptyPackageIsAPackage) {
-    ManagerOver manager(
+    ManagerFixture manager(
         Files{{"base.acd", "SS = outs,SVF:fams,fam1\nNOT_SUPPORTED_PART_IN_MODE = SS_dev1_\n"},
               {"fam1.acd", "[dev1]\n"}});
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, OUTPUT_TYPE::SVF, "dev1", ""));
@@ -168,11 +169,13 @@ TEST(OutputAndDeviceChecks, AnEmptyPackageIsAPackage) {
 }
 
 TEST(OutputAndDeviceChecks, TheFamilySetOfAMode) {
-    ManagerOver manager(SLAVE_SERIAL);
-    EXPECT_EQ(manager.peer().modeDeviceSet(MODE_TYPE::SS, 644), &manager.peer().ssDevices());
-    EXPECT_EQ(manager.peer().modeDeviceSet(MODE_TYPE::PFF, 583), &manager.peer().pffDevices());
-    expectRaises<OutOfRangeException>(583, [&] { return manager.peer().modeDeviceSet(MODE_TYPE{9}, 583); });
-    expectRaises<OutOfRangeException>(644, [&] { return manager.peer().modeDeviceSet(MODE_TYPE{-1}, 644); });
+    ManagerFixture manager(SLAVE_SERIAL);
+    EXPECT_EQ(manager.members().modeDeviceSet(MODE_TYPE::SS, 644), &manager.members().m_ssDevices);
+    EXPECT_EQ(manager.members().modeDeviceSet(MODE_TYPE::PFF, 583), &manager.members().m_pffDevices);
+    expectRaises<OutOfRangeException>(583,
+                                      [&] { return manager.members().modeDeviceSet(MODE_TYPE{9}, 583); });
+    expectRaises<OutOfRangeException>(644,
+                                      [&] { return manager.members().modeDeviceSet(MODE_TYPE{-1}, 644); });
     manager->setExceptions(false);
-    EXPECT_EQ(manager.peer().modeDeviceSet(MODE_TYPE{9}, 583), nullptr);
+    EXPECT_EQ(manager.members().modeDeviceSet(MODE_TYPE{9}, 583), nullptr);
 }

@@ -1,5 +1,5 @@
 // May a mode use an output: checkConstraints(mode, output).
-#include "QueryFixture.h"
+#include "ManagerFixture.h"
 
 #include <gmock/gmock.h>
 
@@ -23,20 +23,20 @@ const Files ONE_OUTPUT_PER_MODE = {{"base.acd", "BS = outs,PARALLEL,USB2:fams\n"
 } // namespace
 
 TEST(OutputChecks, AnAllowedOutputIsSilent) {
-    ManagerOver manager(ONE_OUTPUT_PER_MODE);
+    ManagerFixture manager(ONE_OUTPUT_PER_MODE);
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::BS, OUTPUT_TYPE::USB2));
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
 TEST(OutputChecks, ARefusalNamesTheOutputAndTheMode) {
-    ManagerOver manager(ONE_OUTPUT_PER_MODE);
+    ManagerFixture manager(ONE_OUTPUT_PER_MODE);
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::BS, OUTPUT_TYPE::ZORVA));
     EXPECT_THAT(manager.messages(),
                 ElementsAre(info(201, "ZORVA cable is not supported in Boundary Scan mode\n")));
 }
 
 TEST(OutputChecks, EachModeHasItsOwnOutputs) {
-    ManagerOver manager(ONE_OUTPUT_PER_MODE);
+    ManagerFixture manager(ONE_OUTPUT_PER_MODE);
     const std::vector<std::vector<int>> allowed = {{0, 2}, {1}, {3}, {4}, {6}, {7}, {9}, {2, 3}};
     for (int mode = 0; mode < 8; ++mode) {
         const auto& outputs = allowed[static_cast<std::size_t>(mode)];
@@ -52,7 +52,7 @@ TEST(OutputChecks, EachModeHasItsOwnDisplayName) {
     const char* const names[] = {"Boundary Scan mode",       "Slave Serial mode",       "Select Map mode",
                                  "Boundary Scan File mode",  "Destop Programming mode", "SPI mode",
                                  "Kite Compact Flash  mode", "Kite MPM  mode"};
-    ManagerOver manager(Files{{"base.acd", ""}});
+    ManagerFixture manager(Files{{"base.acd", ""}});
     for (int mode = 0; mode < 8; ++mode) {
         EXPECT_FALSE(manager->checkConstraints(MODE_TYPE{mode}, OUTPUT_TYPE::SVF));
         EXPECT_THAT(manager.messages(),
@@ -64,7 +64,7 @@ TEST(OutputChecks, EachOutputHasItsOwnDisplayName) {
     const char* const names[] = {
         "Parallel cable", "ZORVA cable", "USB2 cable",   "SVF",        "Stapl",
         "QSVF",           "Express SVF", "Express QSVF", "Null cable", "Unspecified cable"};
-    ManagerOver manager(Files{{"base.acd", ""}});
+    ManagerFixture manager(Files{{"base.acd", ""}});
     for (int output = 0; output < 10; ++output) {
         EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SPI, OUTPUT_TYPE{output}));
         EXPECT_THAT(manager.messages(),
@@ -73,7 +73,7 @@ TEST(OutputChecks, EachOutputHasItsOwnDisplayName) {
 }
 
 TEST(OutputChecks, TheFormatterModeAcceptsEveryOutput) {
-    ManagerOver manager(Files{{"base.acd", "PFF = outs,SVF:fams\n"}});
+    ManagerFixture manager(Files{{"base.acd", "PFF = outs,SVF:fams\n"}});
     for (const int output : BOUNDARY_VALUES) {
         EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::PFF, OUTPUT_TYPE{output})) << output;
     }
@@ -81,7 +81,7 @@ TEST(OutputChecks, TheFormatterModeAcceptsEveryOutput) {
 }
 
 TEST(OutputChecks, AValueThatIsNoModeIsRefusedAndNeverRaised) {
-    ManagerOver manager(ONE_OUTPUT_PER_MODE);
+    ManagerFixture manager(ONE_OUTPUT_PER_MODE);
     for (const bool exceptions : {true, false}) {
         manager->setExceptions(exceptions);
         for (const int mode : {-2147483647 - 1, -1, 9, 10, 31, 32, 2147483647}) {
@@ -95,7 +95,7 @@ TEST(OutputChecks, AValueThatIsNoModeIsRefusedAndNeverRaised) {
 }
 
 TEST(OutputChecks, AValueThatIsNoOutputIsRefusedAsUnspecified) {
-    ManagerOver manager(ONE_OUTPUT_PER_MODE);
+    ManagerFixture manager(ONE_OUTPUT_PER_MODE);
     for (const int output : {-2147483647 - 1, -1, 10, 31, 32, 2147483647}) {
         EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::KITECF, OUTPUT_TYPE{output})) << output;
         EXPECT_THAT(
@@ -106,13 +106,13 @@ TEST(OutputChecks, AValueThatIsNoOutputIsRefusedAsUnspecified) {
 }
 
 TEST(OutputChecks, AnUnrecognisedOutputNameAllowsTheUnspecifiedOutput) {
-    ManagerOver manager(Files{{"base.acd", "SM = outs,usb2:fams\n"}});
+    ManagerFixture manager(Files{{"base.acd", "SM = outs,usb2:fams\n"}});
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::SM, OUTPUT_TYPE::NONE));
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SM, OUTPUT_TYPE::USB2));
 }
 
 TEST(OutputChecks, OutputsWithoutADatabaseNameAreNeverAllowed) {
-    ManagerOver manager(Files{{"base.acd", "SM = outs,QSVF,NULLCABLE:fams\n"}});
+    ManagerFixture manager(Files{{"base.acd", "SM = outs,QSVF,NULLCABLE:fams\n"}});
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SM, OUTPUT_TYPE::QSVF));
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SM, OUTPUT_TYPE::NULLCABLE));
     EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::SM, OUTPUT_TYPE::NONE));
@@ -120,7 +120,7 @@ TEST(OutputChecks, OutputsWithoutADatabaseNameAreNeverAllowed) {
 
 TEST(OutputChecks, EachRefusalHasItsOwnTexts) {
     // The display names live in shared slots: a later refusal must not speak with an earlier one's names.
-    ManagerOver manager(Files{{"base.acd", ""}});
+    ManagerFixture manager(Files{{"base.acd", ""}});
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, OUTPUT_TYPE::STAPL));
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::DP770, OUTPUT_TYPE::QSVF));
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, OUTPUT_TYPE::STAPL));
@@ -131,7 +131,7 @@ TEST(OutputChecks, EachRefusalHasItsOwnTexts) {
 }
 
 TEST(OutputChecks, ARefusalTellsItsOriginInFull) {
-    ManagerOver manager(Files{{"base.acd", ""}});
+    ManagerFixture manager(Files{{"base.acd", ""}});
     std::vector<std::string> origins;
     Port_MsgManData::setSink([&](const Port_MsgManData::Message& message) {
         origins.emplace_back(message.product);

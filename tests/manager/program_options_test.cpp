@@ -1,5 +1,5 @@
 // Which programming options a device offers in a mode through an output: getProgramOptions.
-#include "QueryFixture.h"
+#include "Members.h"
 
 #include <gmock/gmock.h>
 
@@ -27,19 +27,19 @@ const Files DATABASES = {
 } // namespace
 
 TEST(ProgramOptions, ADeviceHasItsFamilysOptions) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getProgramOptions("dev3", BS, PARALLEL, nullptr), maskOf(0));
     EXPECT_EQ(manager->getProgramOptions("dev3_x", BS, PARALLEL, "y"), maskOf(0));
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
 TEST(ProgramOptions, AListedDeviceAndPackageHaveOptionsOfTheirOwn) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getProgramOptions("dev1", BS, PARALLEL, "pq"), maskOf(1));
 }
 
 TEST(ProgramOptions, TheSameDeviceWithoutThePackageHasItsFamilys) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getProgramOptions("dev1", BS, PARALLEL, nullptr), maskOf(0));
     EXPECT_EQ(manager->getProgramOptions("dev1", BS, PARALLEL, "zz"), maskOf(0));
     EXPECT_EQ(manager->getProgramOptions("dev1", BS, PARALLEL, "pq"), maskOf(1));
@@ -47,75 +47,75 @@ TEST(ProgramOptions, TheSameDeviceWithoutThePackageHasItsFamilys) {
 }
 
 TEST(ProgramOptions, DeviceAndPackageAreJoinedBare) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     manager->setExceptions(false);
     EXPECT_EQ(manager->getProgramOptions("dev", BS, PARALLEL, "1pq"), 0);
-    EXPECT_TRUE(holds(manager.peer().programOptionsLoaded(), "dev1pq"));
+    EXPECT_TRUE(holds(manager.members().m_programOptionsLoaded, "dev1pq"));
     EXPECT_EQ(manager->getProgramOptions("dev1_", BS, PARALLEL, "pq"), maskOf(0)) << "dev1_pq is not listed";
 }
 
 TEST(ProgramOptions, AListedDeviceNeedsNoPackage) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getProgramOptions("dev2", BS, PARALLEL, nullptr), maskOf(2));
     EXPECT_EQ(manager->getProgramOptions("dev2", BS, PARALLEL, ""), maskOf(2));
 }
 
 TEST(ProgramOptions, AListedDeviceKeepsItsOptionsInAnUnlistedPackage) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getProgramOptions("dev2", BS, PARALLEL, "zz"), maskOf(2));
 }
 
 TEST(ProgramOptions, AFamilyIgnoresThePackage) {
     // "fam1pq" is listed, but a name that is its own family is never joined with a package.
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getProgramOptions("fam1", BS, PARALLEL, "pq"), maskOf(0));
-    EXPECT_FALSE(holds(manager.peer().programOptionsLoaded(), "fam1pq"));
+    EXPECT_FALSE(holds(manager.members().m_programOptionsLoaded, "fam1pq"));
 }
 
 TEST(ProgramOptions, NamesOfPackagesAreCaseSensitive) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getProgramOptions("DEV1", BS, PARALLEL, "pq"), maskOf(0));
     EXPECT_EQ(manager->getProgramOptions("dev1", BS, PARALLEL, "PQ"), maskOf(0));
 }
 
 TEST(ProgramOptions, ADeviceThatLooksForPackagesLoadsThemOnce) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     static_cast<void>(manager->getProgramOptions("dev1", BS, PARALLEL, "pq"));
     static_cast<void>(manager->getProgramOptions("dev1", BS, PARALLEL, "pq"));
-    EXPECT_THAT(textsOf(manager.peer().programOptionsLoaded()), ElementsAre("spi", "dev1pq", "fam1"));
-    EXPECT_THAT(textsOf(manager.peer().loadedFamilies()), ElementsAre("dev1", "fam1"));
+    EXPECT_THAT(texts(manager.members().m_programOptionsLoaded), ElementsAre("spi", "dev1pq", "fam1"));
+    EXPECT_THAT(texts(manager.members().m_loadedFamilies), ElementsAre("dev1", "fam1"));
 }
 
 TEST(ProgramOptions, ADeviceWithoutOptionsOfItsOwnLoadsItsFamilyAlone) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     static_cast<void>(manager->getProgramOptions("dev1", BS, PARALLEL, nullptr));
-    EXPECT_THAT(textsOf(manager.peer().programOptionsLoaded()), ElementsAre("spi", "fam1"));
-    EXPECT_THAT(textsOf(manager.peer().loadedFamilies()), ElementsAre("fam1"));
+    EXPECT_THAT(texts(manager.members().m_programOptionsLoaded), ElementsAre("spi", "fam1"));
+    EXPECT_THAT(texts(manager.members().m_loadedFamilies), ElementsAre("fam1"));
 }
 
 TEST(ProgramOptions, LoadingIsDecidedByTheLoadedOptions) {
-    ManagerOver manager(DATABASES);
-    manager.peer().programOptionsLoaded().push_back("fam1");
+    ManagerFixture manager(DATABASES);
+    manager.members().m_programOptionsLoaded.push_back("fam1");
     EXPECT_EQ(manager->getProgramOptions("dev3", BS, PARALLEL, nullptr), 0);
-    EXPECT_TRUE(manager.peer().loadedFamilies().empty());
+    EXPECT_TRUE(manager.members().m_loadedFamilies.empty());
 }
 
 TEST(ProgramOptions, SpiModeAnswersForSpiWhateverTheDevice) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     for (const char* device : {"dev1", "nobody", "", static_cast<const char*>(nullptr)}) {
         EXPECT_EQ(manager->getProgramOptions(device, SPI, PARALLEL, "pq"), maskOf(10));
     }
-    EXPECT_TRUE(manager.peer().loadedFamilies().empty());
-    EXPECT_TRUE(manager.peer().deviceFamilyCache().empty());
+    EXPECT_TRUE(manager.members().m_loadedFamilies.empty());
+    EXPECT_TRUE(manager.members().m_deviceFamilyCache.empty());
 }
 
 TEST(ProgramOptions, AnSpiFlashAnswersFromTheSpiFamilyInEveryMode) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getProgramOptions("flash1", BS, PARALLEL, nullptr), maskOf(13));
 }
 
 TEST(ProgramOptions, ModesOutOfRangeGiveADebugMessage) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     for (const bool exceptions : {true, false}) {
         manager->setExceptions(exceptions);
         for (const int mode : BOUNDARY_VALUES) {
@@ -135,7 +135,7 @@ TEST(ProgramOptions, ModesOutOfRangeGiveADebugMessage) {
 }
 
 TEST(ProgramOptions, OutputsOutOfRangeGiveADebugMessage) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     for (const MODE_TYPE mode : {BS, SPI}) {
         for (const int output : BOUNDARY_VALUES) {
             const bool inRange = output >= 0 && output <= 4;
@@ -154,17 +154,17 @@ TEST(ProgramOptions, OutputsOutOfRangeGiveADebugMessage) {
 }
 
 TEST(ProgramOptions, TheModeIsTestedBeforeTheOutput) {
-    ManagerOver manager(DATABASES);
+    ManagerFixture manager(DATABASES);
     EXPECT_EQ(manager->getProgramOptions("dev3", MODE_TYPE::KITECF, OUTPUT_TYPE::QSVF, nullptr), 0);
     EXPECT_THAT(manager.messages(), ElementsAre(debug("Mode is out of range -- 6.\n")));
 }
 
 TEST(ProgramOptions, TheRangesAreTestedBeforeThePackageIsLookedUp) {
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = fam3,spi\nPROGRAM_OPTION_PACKAGE = spi\n"},
-                              {"fam3.acd", "[dev3]\n"}});
+    ManagerFixture manager(Files{{"base.acd", "DEVICE_SUPPORTED = fam3,spi\nPROGRAM_OPTION_PACKAGE = spi\n"},
+                                 {"fam3.acd", "[dev3]\n"}});
     expectRaises<OutOfRangeException>(
         2024, [&] { return manager->getProgramOptions("dev3", BS, PARALLEL, nullptr); });
-    EXPECT_TRUE(holds(manager.peer().programOptionsLoaded(), "fam3"))
+    EXPECT_TRUE(holds(manager.members().m_programOptionsLoaded, "fam3"))
         << "what failed to load is not tried again";
 
     EXPECT_EQ(manager->getProgramOptions("dev3", MODE_TYPE{6}, PARALLEL, nullptr), 0);
@@ -177,8 +177,8 @@ TEST(ProgramOptions, TheRangesAreTestedBeforeThePackageIsLookedUp) {
 }
 
 TEST(ProgramOptions, AnUnlistedFamilyHasNoOptionsWhileExceptionsAreOff) {
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = fam3,spi\nPROGRAM_OPTION_PACKAGE = spi\n"},
-                              {"fam3.acd", "PROGRAM_OPTION = ERASE,Bscan,PARALLEL\n[dev3]\n"}});
+    ManagerFixture manager(Files{{"base.acd", "DEVICE_SUPPORTED = fam3,spi\nPROGRAM_OPTION_PACKAGE = spi\n"},
+                                 {"fam3.acd", "PROGRAM_OPTION = ERASE,Bscan,PARALLEL\n[dev3]\n"}});
     manager->setExceptions(false);
     for (int mode = 0; mode < 6; ++mode) {
         for (int output = 0; output < 5; ++output) {
@@ -189,7 +189,7 @@ TEST(ProgramOptions, AnUnlistedFamilyHasNoOptionsWhileExceptionsAreOff) {
 }
 
 TEST(ProgramOptions, SpiModeIsRaisedWhereSpiIsNotListed) {
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = spi\nPROGRAM_OPTION_PACKAGE = fam1\n"}});
+    ManagerFixture manager(Files{{"base.acd", "DEVICE_SUPPORTED = spi\nPROGRAM_OPTION_PACKAGE = fam1\n"}});
     expectRaises<OutOfRangeException>(
         2024, [&] { return manager->getProgramOptions("x", SPI, PARALLEL, nullptr); });
     EXPECT_EQ(manager->getProgramOptions("x", SPI, OUTPUT_TYPE{5}, nullptr), 0);
@@ -210,10 +210,11 @@ TEST(ProgramOptions, EveryCellIsItsOwn) {
                      outputs[output];
         }
     }
-    ManagerOver manager(Files{{"base.acd", "DEVICE_SUPPORTED = a,spi,z\nPROGRAM_OPTION_PACKAGE = a,spi,z\n"},
-                              {"a.acd", ""},
-                              {"spi.acd", entry + "\n"},
-                              {"z.acd", ""}});
+    ManagerFixture manager(
+        Files{{"base.acd", "DEVICE_SUPPORTED = a,spi,z\nPROGRAM_OPTION_PACKAGE = a,spi,z\n"},
+              {"a.acd", ""},
+              {"spi.acd", entry + "\n"},
+              {"z.acd", ""}});
     for (int mode = 0; mode < 6; ++mode) {
         for (int output = 0; output < 5; ++output) {
             EXPECT_EQ(manager->getProgramOptions("spi", MODE_TYPE{mode}, OUTPUT_TYPE{output}, nullptr),
@@ -229,7 +230,7 @@ TEST(ProgramOptions, EveryCellIsItsOwn) {
 }
 
 TEST(ProgramOptions, AnUnknownOptionIsRaisedWhateverTheSwitchSays) {
-    ManagerOver manager(
+    ManagerFixture manager(
         Files{{"base.acd", "DEVICE_SUPPORTED = fam1,spi\nPROGRAM_OPTION_PACKAGE = fam1,spi\n"},
               {"fam1.acd", "PROGRAM_OPTION = ERASE,Bscan,PARALLEL:OTP,Bscan,PARALLEL\n"}});
     manager->setExceptions(false);

@@ -1,4 +1,4 @@
-#include "CoreFixtures.h"
+#include "Members.h"
 
 // The "PROPERTY" and "PROPERTIES" entries: which values they leave in the property table.
 
@@ -11,15 +11,15 @@ using testing::UnorderedElementsAre;
 namespace {
 
 /// A manager with one family that has the given entries.
-struct PropertySession : ManagerSession {
+struct PropertySession : ManagerFixture {
     explicit PropertySession(const std::string& entries)
-        : ManagerSession({{"base.acd", "DEVICE_SUPPORTED = kestrel\nPROGRAM_OPTION_PACKAGE = kestrel\n"},
+        : ManagerFixture({{"base.acd", "DEVICE_SUPPORTED = kestrel\nPROGRAM_OPTION_PACKAGE = kestrel\n"},
                           {"kestrel.acd", entries}}) {}
 
     auto load(bool exceptions = true) {
-        manager.setExceptions(exceptions);
-        peer.loadDeviceData("kestrel", nullptr);
-        return lists(peer.deviceProperties());
+        (*this)->setExceptions(exceptions);
+        members().loadDeviceData("kestrel", {});
+        return lists(members().m_deviceProperties);
     }
     int raises() {
         return raisedLine<DataMismatchException>([&] { (void)load(); });
@@ -30,7 +30,7 @@ TEST(PropertyEntries, EachGivesOneValue) {
     PropertySession session("PROPERTY = VENDOR,Korvel:IRLENGTH,6\n");
     EXPECT_THAT(session.load(), UnorderedElementsAre(Pair("kestrel_VENDOR", ElementsAre("Korvel")),
                                                      Pair("kestrel_IRLENGTH", ElementsAre("6"))));
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(PropertyEntries, NamesAndValuesAreTakenExactlyAsStored) {
@@ -53,7 +53,7 @@ TEST(PropertyEntries, LaterEntryReplacesTheEarlier) {
 TEST(PropertyEntries, MissingValueRaises) {
     PropertySession session("PROPERTY = A,1:B:C,3\n");
     EXPECT_EQ(session.raises(), 1011);
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(PropertyEntries, MissingValueIsTheEmptyTextWhileExceptionsAreOff) {
@@ -61,7 +61,7 @@ TEST(PropertyEntries, MissingValueIsTheEmptyTextWhileExceptionsAreOff) {
     EXPECT_THAT(session.load(false),
                 UnorderedElementsAre(Pair("kestrel_A", ElementsAre("1")), Pair("kestrel_B", ElementsAre("")),
                                      Pair("kestrel_C", ElementsAre("3"))));
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(PropertyEntries, EmptyValueIsAValue) {
@@ -80,7 +80,7 @@ TEST(PropertyEntries, MissingOrEmptyEntryGivesNothing) {
     for (const char* entry : {"", "PROPERTY =\nPROPERTIES =\n"}) {
         PropertySession session(entry);
         EXPECT_THAT(session.load(), IsEmpty());
-        EXPECT_THAT(session.messages.take(), IsEmpty());
+        EXPECT_THAT(session.messages(), IsEmpty());
     }
 }
 
@@ -97,7 +97,7 @@ TEST(PropertiesEntries, GiveAsManyValuesAsTheySay) {
     EXPECT_THAT(session.load(),
                 UnorderedElementsAre(Pair("kestrel_A", ElementsAre("x", "y")),
                                      Pair("kestrel_B", ElementsAre("z")), Pair("kestrel_C", IsEmpty())));
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(PropertiesEntries, ValuesBehindTheCountAreNotRead) {
@@ -127,8 +127,8 @@ TEST(PropertiesEntries, MissingCountIs0) {
 TEST(PropertiesEntries, MissingValueRaises) {
     PropertySession session("PROPERTIES = A,1,x:B,3,x,y:C,1,z\n");
     EXPECT_EQ(session.raises(), 1051);
-    EXPECT_THAT(session.messages.take(), IsEmpty());
-    const auto properties = lists(session.peer.deviceProperties());
+    EXPECT_THAT(session.messages(), IsEmpty());
+    const auto properties = lists(session.members().m_deviceProperties);
     EXPECT_THAT(properties.at("kestrel_A"), ElementsAre("x"));
     EXPECT_EQ(properties.count("kestrel_C"), 0U);
 }
@@ -137,7 +137,7 @@ TEST(PropertiesEntries, MissingValueIsTheEmptyTextWhileExceptionsAreOff) {
     PropertySession session("PROPERTIES = A,4,x,y:B,1,z\n");
     EXPECT_THAT(session.load(false), UnorderedElementsAre(Pair("kestrel_A", ElementsAre("", "x", "y")),
                                                           Pair("kestrel_B", ElementsAre("z"))));
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(PropertiesEntries, HugeCountCostsNoMoreThanTheValues) {
@@ -174,31 +174,31 @@ TEST(PropertiesEntries, ReplaceThoseOfTheSameNameWhole) {
 }
 
 TEST(PropertyOwners, KeepTheirPropertiesApart) {
-    ManagerSession session(
+    ManagerFixture session(
         {{"base.acd", "DEVICE_SUPPORTED = kestrel\nPROGRAM_OPTION_PACKAGE = kestrel\n"},
          {"kestrel.acd", "PROPERTY = A,1\n[KS50]\nPROPERTY = A,2\n[KS100]\nPROPERTY = A,3\n"}});
-    session.peer.loadDeviceData("KS50", nullptr);
-    session.peer.loadDeviceData("KS100", nullptr);
-    EXPECT_THAT(lists(session.peer.deviceProperties()),
+    session.members().loadDeviceData("KS50", {});
+    session.members().loadDeviceData("KS100", {});
+    EXPECT_THAT(lists(session.members().m_deviceProperties),
                 UnorderedElementsAre(Pair("kestrel_A", ElementsAre("1")), Pair("KS50_A", ElementsAre("2")),
                                      Pair("KS100_A", ElementsAre("3"))));
 }
 
 TEST(PropertyOwners, JoinedToTheSameKeyShareAnEntry) {
-    ManagerSession session({{"base.acd", "DEVICE_SUPPORTED = a\nPROGRAM_OPTION_PACKAGE = a\n"},
+    ManagerFixture session({{"base.acd", "DEVICE_SUPPORTED = a\nPROGRAM_OPTION_PACKAGE = a\n"},
                             {"a.acd", "PROPERTY = b_c,1\n"},
                             {"a_b.acd", "PROPERTY = c,2\n"}});
-    session.manager.setExceptions(false);
-    session.peer.loadDeviceData("a", nullptr);
-    EXPECT_THAT(lists(session.peer.deviceProperties()), ElementsAre(Pair("a_b_c", ElementsAre("1"))));
-    session.peer.loadDeviceData("a_b", nullptr);
-    EXPECT_THAT(lists(session.peer.deviceProperties()), ElementsAre(Pair("a_b_c", ElementsAre("2"))));
+    session->setExceptions(false);
+    session.members().loadDeviceData("a", {});
+    EXPECT_THAT(lists(session.members().m_deviceProperties), ElementsAre(Pair("a_b_c", ElementsAre("1"))));
+    session.members().loadDeviceData("a_b", {});
+    EXPECT_THAT(lists(session.members().m_deviceProperties), ElementsAre(Pair("a_b_c", ElementsAre("2"))));
 }
 
 TEST(PropertyOwners, ManyKeepTheirTable) {
     PropertySession session("PROPERTY = " + numberedList("p", 1000, ",1:") + ",1\n");
     EXPECT_THAT(session.load(), SizeIs(1000));
-    EXPECT_GE(session.peer.deviceProperties().bucketCount(), 1000U);
+    EXPECT_GE(session.members().m_deviceProperties.bucketCount(), 1000U);
 }
 
 } // namespace

@@ -1,5 +1,5 @@
 // The values of a device's properties: getDeviceStringProperties and getDeviceBoolProperty.
-#include "QueryFixture.h"
+#include "Members.h"
 
 #include <gmock/gmock.h>
 
@@ -19,29 +19,29 @@ Files family(const std::string& text) {
 } // namespace
 
 TEST(PropertySets, ADevicesOwnValueHidesItsFamilys) {
-    ManagerOver manager(family("PROPERTY = K,theirs\n[dev1]\nPROPERTY = K,mine\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "K")), ElementsAre("mine"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("fam1", "K")), ElementsAre("theirs"));
+    ManagerFixture manager(family("PROPERTY = K,theirs\n[dev1]\nPROPERTY = K,mine\n"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev1", "K")), ElementsAre("mine"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("fam1", "K")), ElementsAre("theirs"));
 }
 
 TEST(PropertySets, WithoutAValueOfItsOwnTheFamilysCounts) {
-    ManagerOver manager(family("PROPERTY = K,theirs\n[dev1]\nPROPERTY = L,mine\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "K")), ElementsAre("theirs"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("fam1", "L")), IsEmpty());
+    ManagerFixture manager(family("PROPERTY = K,theirs\n[dev1]\nPROPERTY = L,mine\n"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev1", "K")), ElementsAre("theirs"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("fam1", "L")), IsEmpty());
 }
 
 TEST(PropertySets, ValuesAreInByteOrder) {
-    ManagerOver manager(family("[dev1]\nPROPERTIES = K,5,b,\xff,B,ab,a\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "K")),
+    ManagerFixture manager(family("[dev1]\nPROPERTIES = K,5,b,\xff,B,ab,a\n"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev1", "K")),
                 ElementsAre("B", "a", "ab", "b", "\xff"));
 }
 
 TEST(PropertySets, NothingFoundIsTheSharedEmptySetAndSilent) {
-    ManagerOver manager(family("[dev1]\n"));
-    EXPECT_EQ(&manager->getDeviceStringProperties("dev1", "K"), &manager.peer().operationOptions());
-    EXPECT_EQ(&manager->getDeviceStringProperties("fam1", "K"), &manager.peer().operationOptions());
-    EXPECT_EQ(&manager->getDeviceStringProperties("nobody", "K"), &manager.peer().operationOptions());
-    EXPECT_TRUE(manager.peer().operationOptions().empty());
+    ManagerFixture manager(family("[dev1]\n"));
+    EXPECT_EQ(&manager->getDeviceStringProperties("dev1", "K"), &manager.members().m_operationOptions);
+    EXPECT_EQ(&manager->getDeviceStringProperties("fam1", "K"), &manager.members().m_operationOptions);
+    EXPECT_EQ(&manager->getDeviceStringProperties("nobody", "K"), &manager.members().m_operationOptions);
+    EXPECT_TRUE(manager.members().m_operationOptions.empty());
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
@@ -53,9 +53,9 @@ TEST(PropertySets, NamesThatMeetInTheTableStayApart) {
     for (int index = 0; index < COUNT; ++index) {
         text += (index == 0 ? "P" : ":P") + number(index) + ',' + number(index);
     }
-    ManagerOver manager(family(text + '\n'));
+    ManagerFixture manager(family(text + '\n'));
     const auto values = [&](const char* device, const std::string& key) {
-        return textsOf(manager->getDeviceStringProperties(device, key.c_str()));
+        return texts(manager->getDeviceStringProperties(device, key.c_str()));
     };
     for (int index = 0; index < COUNT; ++index) {
         EXPECT_THAT(values("dev10", 'P' + number(index)), ElementsAre(number(index)));
@@ -67,8 +67,8 @@ TEST(PropertySets, NamesThatMeetInTheTableStayApart) {
 
 // Device, underscore and key of each have the same checksum, by which they are looked up.
 TEST(PropertySets, NamesOfTheSameChecksumStayApart) {
-    ManagerOver manager(family("[dev1]\n[dev10]\nPROPERTY = PROPERTY1,stored\n[dev20]\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev10", "PROPERTY1")), ElementsAre("stored"));
+    ManagerFixture manager(family("[dev1]\n[dev10]\nPROPERTY = PROPERTY1,stored\n[dev20]\n"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev10", "PROPERTY1")), ElementsAre("stored"));
     const std::pair<const char*, const char*> others[] = {
         {"dev10", "UIHZAFBK"},   // shorter
         {"dev10", "PNPTQAIZB"},  // of the same device
@@ -77,114 +77,115 @@ TEST(PropertySets, NamesOfTheSameChecksumStayApart) {
     for (const auto& [device, key] : others) {
         const std::string joined = std::string(device) + '_' + key;
         ASSERT_EQ(StringBase(joined.c_str()).CRC32(), StringBase("dev10_PROPERTY1").CRC32());
-        EXPECT_THAT(textsOf(manager->getDeviceStringProperties(device, key)), IsEmpty());
+        EXPECT_THAT(texts(manager->getDeviceStringProperties(device, key)), IsEmpty());
     }
 }
 
 TEST(PropertySets, PropertiesOfTheSameChecksumAreBothKept) {
-    ManagerOver manager(family("[dev10]\nPROPERTY = PROPERTY1,first:PNPTQAIZB,second\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev10", "PROPERTY1")), ElementsAre("first"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev10", "PNPTQAIZB")), ElementsAre("second"));
+    ManagerFixture manager(family("[dev10]\nPROPERTY = PROPERTY1,first:PNPTQAIZB,second\n"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev10", "PROPERTY1")), ElementsAre("first"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev10", "PNPTQAIZB")), ElementsAre("second"));
 }
 
 TEST(PropertySets, KeysAreCaseSensitive) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = K,v\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "k")), IsEmpty());
+    ManagerFixture manager(family("[dev1]\nPROPERTY = K,v\n"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev1", "k")), IsEmpty());
 }
 
 TEST(PropertySets, TheNameIsNeitherCutNorTurnedToAnotherCase) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = K,v\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1_p", "K")), ElementsAre("v"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("DEV1", "K")), ElementsAre("v"));
-    EXPECT_THAT(textsOf(manager.peer().loadedFamilies()), ElementsAre("DEV1", "dev1_p", "fam1"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = K,v\n"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev1_p", "K")), ElementsAre("v"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("DEV1", "K")), ElementsAre("v"));
+    EXPECT_THAT(texts(manager.members().m_loadedFamilies), ElementsAre("DEV1", "dev1_p", "fam1"));
 }
 
 TEST(PropertySets, TheWholeNameFindsItsOwnDevice) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = K,v\n[dev1_p]\nPROPERTY = K,packaged\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1_p", "K")), ElementsAre("packaged"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1_q", "K")), ElementsAre("v"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = K,v\n[dev1_p]\nPROPERTY = K,packaged\n"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev1_p", "K")), ElementsAre("packaged"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev1_q", "K")), ElementsAre("v"));
 }
 
 TEST(PropertySets, AnEmptyValueOfItsOwnHidesTheFamilys) {
-    ManagerOver manager(family("PROPERTY = K,theirs\n[dev1]\nPROPERTIES = K,0\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "K")), IsEmpty());
-    EXPECT_NE(&manager->getDeviceStringProperties("dev1", "K"), &manager.peer().operationOptions());
+    ManagerFixture manager(family("PROPERTY = K,theirs\n[dev1]\nPROPERTIES = K,0\n"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev1", "K")), IsEmpty());
+    EXPECT_NE(&manager->getDeviceStringProperties("dev1", "K"), &manager.members().m_operationOptions);
 }
 
 TEST(PropertySets, NullTextsAreEmptyTexts) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = ,unnamed\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", nullptr)), ElementsAre("unnamed"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "")), ElementsAre("unnamed"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties(nullptr, "K")), IsEmpty());
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties(nullptr, nullptr)), IsEmpty());
+    ManagerFixture manager(family("[dev1]\nPROPERTY = ,unnamed\n"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev1", nullptr)), ElementsAre("unnamed"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev1", "")), ElementsAre("unnamed"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties(nullptr, "K")), IsEmpty());
+    EXPECT_THAT(texts(manager->getDeviceStringProperties(nullptr, nullptr)), IsEmpty());
 }
 
 TEST(PropertySets, DeviceAndKeyAreJoinedByAnUnderscore) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = A_B,v\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "A_B")), ElementsAre("v"));
-    EXPECT_TRUE(manager.peer().deviceProperties().begin()->key == "dev1_A_B");
+    ManagerFixture manager(family("[dev1]\nPROPERTY = A_B,v\n"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev1", "A_B")), ElementsAre("v"));
+    EXPECT_TRUE((*manager.members().m_deviceProperties.begin()).key == "dev1_A_B");
 }
 
 TEST(PropertySets, AnUnknownDeviceIsAnsweredFromTheBaseDatabase) {
     auto files = family("");
     files["base.acd"] += "PROPERTY = K,base value\n";
-    ManagerOver manager(files);
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("nobody", "K")), ElementsAre("base value"));
+    ManagerFixture manager(files);
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("nobody", "K")), ElementsAre("base value"));
 }
 
 TEST(PropertySets, OnlyOneStepUpIsTaken) {
-    ManagerOver manager(family("[dev1]\n"));
+    ManagerFixture manager(family("[dev1]\n"));
     manager->addCachedDeviceFamily("fam1", "fam2");
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("fam1", "ONLY2")), ElementsAre("second"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "ONLY2")), IsEmpty());
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("fam1", "ONLY2")), ElementsAre("second"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev1", "ONLY2")), IsEmpty());
 }
 
 TEST(PropertySets, AFamilyThatTheCacheNamesIsLoaded) {
-    ManagerOver manager(family(""));
+    ManagerFixture manager(family(""));
     manager->addCachedDeviceFamily("nobody", "fam2");
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("nobody", "ONLY2")), ElementsAre("second"));
-    EXPECT_TRUE(holds(manager.peer().loadedFamilies(), "fam2"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("nobody", "ONLY2")), ElementsAre("second"));
+    EXPECT_TRUE(holds(manager.members().m_loadedFamilies, "fam2"));
 }
 
 TEST(PropertySets, LoadingIsDecidedByTheLoadedProperties) {
-    ManagerOver manager(family("PROPERTY = K,v\n[dev1]\nPROPERTY = K,w\n"));
-    manager.peer().loadedFamilies().insert(StringBase("dev1"));
-    manager.peer().loadedFamilies().insert(StringBase("fam1"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "K")), IsEmpty());
-    EXPECT_TRUE(manager.peer().deviceProperties().empty());
+    ManagerFixture manager(family("PROPERTY = K,v\n[dev1]\nPROPERTY = K,w\n"));
+    manager.members().m_loadedFamilies.insert(StringBase("dev1"));
+    manager.members().m_loadedFamilies.insert(StringBase("fam1"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev1", "K")), IsEmpty());
+    EXPECT_TRUE(manager.members().m_deviceProperties.empty());
 }
 
 TEST(PropertySets, AFailureToLoadPassesThroughAndIsNotTriedAgain) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = GOOD,v:BROKEN\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = GOOD,v:BROKEN\n"));
     expectRaises<DataMismatchException>(
         1011, [&] { return manager->getDeviceStringProperties("dev1", "GOOD").size(); });
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "GOOD")), ElementsAre("v"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "BROKEN")), IsEmpty());
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev1", "GOOD")), ElementsAre("v"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev1", "BROKEN")), IsEmpty());
 }
 
 TEST(PropertySets, ASeveralValuedPropertyCutShortIsRaised) {
-    ManagerOver manager(family("[dev1]\nPROPERTIES = K,2,only\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTIES = K,2,only\n"));
     expectRaises<DataMismatchException>(
         1051, [&] { return manager->getDeviceStringProperties("dev1", "K").size(); });
 }
 
 TEST(PropertySets, MissingValuesAreEmptyTextsWhileExceptionsAreOff) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = BROKEN\nPROPERTIES = K,2,only\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = BROKEN\nPROPERTIES = K,2,only\n"));
     manager->setExceptions(false);
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "BROKEN")), ElementsAre(""));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("dev1", "K")), ElementsAre("", "only"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev1", "BROKEN")), ElementsAre(""));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("dev1", "K")), ElementsAre("", "only"));
 }
 
 TEST(PropertySets, AnSpiFlashIsLookedUpLikeAnyOtherName) {
     auto files = family("");
     files["spi.acd"] =
         "DEVICE_FAMILY = AT\nAT_DEVICES = FLASH1\nFLASH1_PROPERTY = K,catalogue\nPROPERTY = K,table\n";
-    ManagerOver manager(files);
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("FLASH1", "K")), ElementsAre("table"));
+    ManagerFixture manager(files);
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("FLASH1", "K")), ElementsAre("table"));
 }
 
 TEST(BoolProperty, OnlyTheExactTextIsTrue) {
-    ManagerOver manager(family("[dev1]\nPROPERTIES = A,1,TRUE:B,1,true:C,1,True:D,1,TRUE :E,1,1:F,0:G,1,\n"));
+    ManagerFixture manager(
+        family("[dev1]\nPROPERTIES = A,1,TRUE:B,1,true:C,1,True:D,1,TRUE :E,1,1:F,0:G,1,\n"));
     EXPECT_TRUE(manager->getDeviceBoolProperty("dev1", "A"));
     for (const char* key : {"B", "C", "D", "E", "F", "G"}) {
         EXPECT_FALSE(manager->getDeviceBoolProperty("dev1", key)) << key;
@@ -193,12 +194,12 @@ TEST(BoolProperty, OnlyTheExactTextIsTrue) {
 }
 
 TEST(BoolProperty, AnyOfSeveralValuesMayBeTrue) {
-    ManagerOver manager(family("[dev1]\nPROPERTIES = K,3,FALSE,TRUE,zzz\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTIES = K,3,FALSE,TRUE,zzz\n"));
     EXPECT_TRUE(manager->getDeviceBoolProperty("dev1", "K"));
 }
 
 TEST(BoolProperty, AMissingPropertyIsSilentlyFalse) {
-    ManagerOver manager(family("[dev1]\n"));
+    ManagerFixture manager(family("[dev1]\n"));
     EXPECT_FALSE(manager->getDeviceBoolProperty("dev1", "K"));
     EXPECT_FALSE(manager->getDeviceBoolProperty("nobody", "K"));
     EXPECT_FALSE(manager->getDeviceBoolProperty(nullptr, nullptr));
@@ -206,7 +207,7 @@ TEST(BoolProperty, AMissingPropertyIsSilentlyFalse) {
 }
 
 TEST(BoolProperty, TheFamilysValueCountsOnlyWithoutOneOfItsOwn) {
-    ManagerOver manager(family("PROPERTY = K,TRUE\n[dev1]\n[dev2]\nPROPERTY = K,FALSE\n"));
+    ManagerFixture manager(family("PROPERTY = K,TRUE\n[dev1]\n[dev2]\nPROPERTY = K,FALSE\n"));
     EXPECT_TRUE(manager->getDeviceBoolProperty("dev1", "K"));
     EXPECT_FALSE(manager->getDeviceBoolProperty("dev2", "K"));
 }
@@ -215,7 +216,7 @@ TEST(BoolProperty, AnSpiFlashIsLookedUpInTheOrdinaryTable) {
     auto files = family("");
     files["spi.acd"] = "DEVICE_FAMILY = AT\nAT_DEVICES = FLASH1\nFLASH1_PROPERTY = CATALOGUE,TRUE\n"
                        "PROPERTY = TABLE,TRUE\n";
-    ManagerOver manager(files);
+    ManagerFixture manager(files);
     EXPECT_FALSE(manager->getDeviceBoolProperty("FLASH1", "CATALOGUE"));
     EXPECT_TRUE(manager->getDeviceBoolProperty("FLASH1", "TABLE"));
 }

@@ -1,4 +1,4 @@
-#include "CoreFixtures.h"
+#include "Members.h"
 
 // The hash table of the properties by itself.
 
@@ -11,7 +11,7 @@ using testing::Pair;
 constexpr PropertyValues::Owner OWNER{};
 
 void add(PropertyTable& table, std::string_view owner, const std::string& name, const char* value) {
-    std::vector<PropertyTable::Found> found;
+    std::vector<ParsedProperty> found;
     found.push_back({name.c_str(), PropertyValues(value, OWNER)});
     table.assign(owner, std::move(found));
 }
@@ -63,7 +63,7 @@ TEST(PropertyTable, TellsTextsOfTheSameChecksumApart) {
 TEST(PropertyTable, TakesOfTheSameNameTheLastWhereverItStands) {
     for (const int between : {0, 1, 31, 32, 100}) {
         PropertyTable table;
-        std::vector<PropertyTable::Found> found;
+        std::vector<ParsedProperty> found;
         found.push_back({"A", PropertyValues("1", OWNER)});
         for (int number = 0; number < between; ++number) {
             found.push_back({("B" + std::to_string(number)).c_str(), PropertyValues("x", OWNER)});
@@ -91,6 +91,29 @@ TEST(PropertyTable, FindsEachOfManyAndLeavesThemWhereTheyAre) {
         EXPECT_EQ(table.find("dev", name), places[static_cast<std::size_t>(number)]);
         EXPECT_EQ(valueOf(table, "dev", name), name);
     }
+}
+
+TEST(PropertyTable, KeepsReplacedEntriesAsTheyAre) {
+    PropertyTable table;
+    add(table, "a", "b_c", "1");
+    const PropertyValues* const replaced = table.find("a", "b_c");
+    const char* const text = replaced->first().c_str();
+    const auto& set = replaced->set();
+    add(table, "a_b", "c", "2");
+    EXPECT_NE(table.find("a", "b_c"), replaced);
+    EXPECT_STREQ(text, "1");
+    EXPECT_THAT(texts(set), ElementsAre("1"));
+    EXPECT_EQ(table.size(), 1U);
+}
+
+TEST(PropertyTable, HoldsKeysOfAnyLength) {
+    PropertyTable table;
+    for (const std::size_t length : {0U, 1U, 4094U, 4095U, 4096U, 10000U, 5U}) {
+        const std::string name(length, 'x');
+        add(table, "dev", name, name.c_str());
+        EXPECT_EQ(valueOf(table, "dev", name), name);
+    }
+    EXPECT_EQ(table.size(), 7U);
 }
 
 TEST(PropertyTable, GivesItsEntriesInTheOrderInWhichTheyCame) {

@@ -1,5 +1,5 @@
 // The one value of a device's property: getDeviceStringProperty and getDeviceLongProperty.
-#include "QueryFixture.h"
+#include "Members.h"
 
 #include <gmock/gmock.h>
 
@@ -24,19 +24,19 @@ IssuedMessage notFound(const std::string& key, const std::string& device) {
 } // namespace
 
 TEST(PropertyValues, ADevicesOwnValueHidesItsFamilys) {
-    ManagerOver manager(family("PROPERTY = K,theirs\n[dev1]\nPROPERTY = K,mine\n"));
+    ManagerFixture manager(family("PROPERTY = K,theirs\n[dev1]\nPROPERTY = K,mine\n"));
     EXPECT_STREQ(manager->getDeviceStringProperty("dev1", "K"), "mine");
     EXPECT_STREQ(manager->getDeviceStringProperty("fam1", "K"), "theirs");
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
 TEST(PropertyValues, WithoutAValueOfItsOwnTheFamilysCounts) {
-    ManagerOver manager(family("PROPERTY = K,theirs\n[dev1]\n"));
+    ManagerFixture manager(family("PROPERTY = K,theirs\n[dev1]\n"));
     EXPECT_STREQ(manager->getDeviceStringProperty("dev1", "K"), "theirs");
 }
 
 TEST(PropertyValues, OfSeveralTheSmallestInByteOrderCounts) {
-    ManagerOver manager(family("[dev1]\nPROPERTIES = K,2,B,A:L,3,b,B,\x80:M,2,\x80,z:N,2,ab,a\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTIES = K,2,B,A:L,3,b,B,\x80:M,2,\x80,z:N,2,ab,a\n"));
     EXPECT_STREQ(manager->getDeviceStringProperty("dev1", "K"), "A");
     EXPECT_STREQ(manager->getDeviceStringProperty("dev1", "L"), "B");
     EXPECT_STREQ(manager->getDeviceStringProperty("dev1", "M"), "z");
@@ -44,27 +44,27 @@ TEST(PropertyValues, OfSeveralTheSmallestInByteOrderCounts) {
 }
 
 TEST(PropertyValues, AnEmptyValueIsFound) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = K,\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = K,\n"));
     EXPECT_STREQ(manager->getDeviceStringProperty("dev1", "K"), "");
     EXPECT_EQ(manager->getDeviceLongProperty("dev1", "K"), 0);
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
 TEST(PropertyValues, AMissingOneIsReportedAndNullWhileExceptionsAreOff) {
-    ManagerOver manager(family("[dev1]\n"));
+    ManagerFixture manager(family("[dev1]\n"));
     manager->setExceptions(false);
     EXPECT_EQ(manager->getDeviceStringProperty("dev1", "K"), nullptr);
     EXPECT_THAT(manager.messages(), ElementsAre(notFound("K", "dev1")));
 }
 
 TEST(PropertyValues, AMissingOneIsReportedThenRaisedWhileExceptionsAreOn) {
-    ManagerOver manager(family("[dev1]\n"));
+    ManagerFixture manager(family("[dev1]\n"));
     expectRaises<DataNotFoundException>(437, [&] { return manager->getDeviceStringProperty("dev1", "K"); });
     EXPECT_THAT(manager.messages(), ElementsAre(notFound("K", "dev1")));
 }
 
 TEST(PropertyValues, TheReportNamesTheDeviceAsGiven) {
-    ManagerOver manager(family("[dev1]\n"));
+    ManagerFixture manager(family("[dev1]\n"));
     manager->setExceptions(false);
     EXPECT_EQ(manager->getDeviceStringProperty("DEV1_p_q", "k%s"), nullptr);
     EXPECT_EQ(manager->getDeviceStringProperty("fam1", "K"), nullptr);
@@ -75,7 +75,7 @@ TEST(PropertyValues, TheReportNamesTheDeviceAsGiven) {
 }
 
 TEST(PropertyValues, NullTextsAreEmptyTextsThatTheReportTellsFromThem) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = ,unnamed\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = ,unnamed\n"));
     manager->setExceptions(false);
     EXPECT_STREQ(manager->getDeviceStringProperty("dev1", nullptr), "unnamed");
     EXPECT_EQ(manager->getDeviceStringProperty(nullptr, nullptr), nullptr);
@@ -84,14 +84,14 @@ TEST(PropertyValues, NullTextsAreEmptyTextsThatTheReportTellsFromThem) {
 }
 
 TEST(PropertyValues, KeysAreCaseSensitive) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = K,v\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = K,v\n"));
     manager->setExceptions(false);
     EXPECT_EQ(manager->getDeviceStringProperty("dev1", "k"), nullptr);
     EXPECT_THAT(manager.messages(), ElementsAre(notFound("k", "dev1")));
 }
 
 TEST(PropertyValues, TheSecondLookAtTheFamilyReachesTheFamilysOwnFamily) {
-    ManagerOver manager(family("[dev1]\n"));
+    ManagerFixture manager(family("[dev1]\n"));
     manager->addCachedDeviceFamily("fam1", "fam2");
     EXPECT_TRUE(manager->getDeviceStringProperties("dev1", "ONLY2").empty());
     EXPECT_STREQ(manager->getDeviceStringProperty("dev1", "ONLY2"), "second");
@@ -99,13 +99,13 @@ TEST(PropertyValues, TheSecondLookAtTheFamilyReachesTheFamilysOwnFamily) {
 }
 
 TEST(PropertyValues, TheSecondLookAtTheFamilySeesBehindAnEmptyValue) {
-    ManagerOver manager(family("PROPERTY = K,theirs\n[dev1]\nPROPERTIES = K,0\n"));
+    ManagerFixture manager(family("PROPERTY = K,theirs\n[dev1]\nPROPERTIES = K,0\n"));
     EXPECT_TRUE(manager->getDeviceStringProperties("dev1", "K").empty());
     EXPECT_STREQ(manager->getDeviceStringProperty("dev1", "K"), "theirs");
 }
 
 TEST(PropertyValues, NoValuesAtAllAreMissing) {
-    ManagerOver manager(family("PROPERTIES = K,0\n[dev1]\nPROPERTIES = K,0\n"));
+    ManagerFixture manager(family("PROPERTIES = K,0\n[dev1]\nPROPERTIES = K,0\n"));
     manager->setExceptions(false);
     for (const char* const name : {"fam1", "dev1", "fam1", "dev1"}) {
         EXPECT_EQ(manager->getDeviceStringProperty(name, "K"), nullptr);
@@ -114,15 +114,15 @@ TEST(PropertyValues, NoValuesAtAllAreMissing) {
 }
 
 TEST(PropertyValues, TheFamilyIsLeftAsTheOneResolvedLatest) {
-    ManagerOver manager(family("PROPERTY = K,theirs\n[dev1]\nPROPERTIES = K,0\n"));
+    ManagerFixture manager(family("PROPERTY = K,theirs\n[dev1]\nPROPERTIES = K,0\n"));
     EXPECT_STREQ(manager->getDeviceStringProperty("dev1", "K"), "theirs");
-    manager.peer().partFamily() = "something else";
+    manager.members().m_partFamily = "something else";
     EXPECT_STREQ(manager->getDeviceStringProperty("dev1", "K"), "theirs");
-    EXPECT_STREQ(manager.peer().partFamily().c_str(), "fam1");
+    EXPECT_STREQ(manager.members().m_partFamily.c_str(), "fam1");
 }
 
 TEST(PropertyValues, AnSpiFlashAnswersFromItsCatalogue) {
-    ManagerOver manager(family(""));
+    ManagerFixture manager(family(""));
     EXPECT_STREQ(manager->getDeviceStringProperty("FLASH1", "NAME"), "flash");
     EXPECT_STREQ(manager->getDeviceStringProperty("flash1", "name"), "flash");
     EXPECT_EQ(manager->getDeviceStringProperty("FLASH1", "NAME"),
@@ -130,40 +130,40 @@ TEST(PropertyValues, AnSpiFlashAnswersFromItsCatalogue) {
 }
 
 TEST(PropertyValues, AnSpiFlashAnswersFromItsCatalogueWhateverElseIsLoaded) {
-    ManagerOver manager(family("[FLASH1]\nPROPERTY = NAME,ordinary\n"));
-    EXPECT_THAT(textsOf(manager->getDeviceStringProperties("FLASH1", "NAME")), ElementsAre("ordinary"));
+    ManagerFixture manager(family("[FLASH1]\nPROPERTY = NAME,ordinary\n"));
+    EXPECT_THAT(texts(manager->getDeviceStringProperties("FLASH1", "NAME")), ElementsAre("ordinary"));
     EXPECT_STREQ(manager->getDeviceStringProperty("FLASH1", "NAME"), "flash");
 }
 
 TEST(PropertyValues, AnSpiFlashWithoutThePropertyIsEmptyAndSilent) {
-    ManagerOver manager(family(""));
+    ManagerFixture manager(family(""));
     EXPECT_STREQ(manager->getDeviceStringProperty("FLASH1", "TABLE"), "");
     EXPECT_EQ(manager->getDeviceLongProperty("FLASH1", "TABLE"), 0);
     EXPECT_THAT(manager.messages(), IsEmpty());
-    EXPECT_TRUE(manager.peer().loadedFamilies().empty());
+    EXPECT_TRUE(manager.members().m_loadedFamilies.empty());
 }
 
 TEST(PropertyValues, AnSpiFlashIsKnownByItsWholeName) {
-    ManagerOver manager(family(""));
+    ManagerFixture manager(family(""));
     manager->setExceptions(false);
     EXPECT_EQ(manager->getDeviceStringProperty("FLASH1_p", "NAME"), nullptr);
     EXPECT_THAT(manager.messages(), ElementsAre(notFound("NAME", "FLASH1_p")));
 }
 
 TEST(PropertyValues, AnSpiFamilyIsAnSpiFlash) {
-    ManagerOver manager(family(""));
+    ManagerFixture manager(family(""));
     EXPECT_STREQ(manager->getDeviceStringProperty("at", "NOTHING"), "");
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
 TEST(PropertyValues, AFailureToLoadPassesThroughWithoutAReport) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = BROKEN\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = BROKEN\n"));
     expectRaises<DataMismatchException>(1011, [&] { return manager->getDeviceStringProperty("dev1", "K"); });
     EXPECT_THAT(manager.messages(), IsEmpty());
 }
 
 TEST(LongProperty, TheValueIsReadAsADecimalNumber) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = A,42:B,-1:C,+7:D,  12x9:E,x:F,0x10:G,007\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = A,42:B,-1:C,+7:D,  12x9:E,x:F,0x10:G,007\n"));
     const std::map<const char*, long> expected = {{"A", 42}, {"B", -1}, {"C", 7}, {"D", 12},
                                                   {"E", 0},  {"F", 0},  {"G", 7}};
     for (const auto& [key, value] : expected) {
@@ -173,8 +173,8 @@ TEST(LongProperty, TheValueIsReadAsADecimalNumber) {
 }
 
 TEST(LongProperty, TheValueStaysWithin32Bits) {
-    ManagerOver manager(family("[dev1]\nPROPERTY = A,2147483647:B,2147483648:C,-2147483648:D,-2147483649:"
-                               "E,99999999999999999999999999\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTY = A,2147483647:B,2147483648:C,-2147483648:D,-2147483649:"
+                                  "E,99999999999999999999999999\n"));
     EXPECT_EQ(manager->getDeviceLongProperty("dev1", "A"), 2147483647L);
     EXPECT_EQ(manager->getDeviceLongProperty("dev1", "B"), 2147483647L);
     EXPECT_EQ(manager->getDeviceLongProperty("dev1", "C"), -2147483648L);
@@ -183,25 +183,25 @@ TEST(LongProperty, TheValueStaysWithin32Bits) {
 }
 
 TEST(LongProperty, OfSeveralTheSmallestInByteOrderCounts) {
-    ManagerOver manager(family("[dev1]\nPROPERTIES = K,2,9,10\n"));
+    ManagerFixture manager(family("[dev1]\nPROPERTIES = K,2,9,10\n"));
     EXPECT_EQ(manager->getDeviceLongProperty("dev1", "K"), 10);
 }
 
 TEST(LongProperty, AMissingOneIsReportedAndMinusOneWhileExceptionsAreOff) {
-    ManagerOver manager(family("[dev1]\n"));
+    ManagerFixture manager(family("[dev1]\n"));
     manager->setExceptions(false);
     EXPECT_EQ(manager->getDeviceLongProperty("dev1", "K"), -1);
     EXPECT_THAT(manager.messages(), ElementsAre(notFound("K", "dev1")));
 }
 
 TEST(LongProperty, AMissingOneIsReportedThenRaisedWhileExceptionsAreOn) {
-    ManagerOver manager(family("[dev1]\n"));
+    ManagerFixture manager(family("[dev1]\n"));
     expectRaises<DataNotFoundException>(437, [&] { return manager->getDeviceLongProperty("dev1", "K"); });
     EXPECT_THAT(manager.messages(), ElementsAre(notFound("K", "dev1")));
 }
 
 TEST(LongProperty, AnSpiFlashAnswersFromItsCatalogue) {
-    ManagerOver manager(family(""));
+    ManagerFixture manager(family(""));
     EXPECT_EQ(manager->getDeviceLongProperty("FLASH1", "DENSITY"), 4096);
     EXPECT_EQ(manager->getDeviceLongProperty("FLASH1", "NEGATIVE"), -7);
 }

@@ -1,4 +1,4 @@
-#include "CoreFixtures.h"
+#include "Members.h"
 
 #include <random>
 #include <sstream>
@@ -56,7 +56,7 @@ std::string answers(ConstraintsManager& manager, const char* device, const char*
         try {
             out << question() << '\n';
         } catch (const TarvikException& exception) {
-            out << exception.what() << ' ' << exception.line() << '\n';
+            out << exception.typeName() << ' ' << exception.line() << '\n';
         }
     };
     const auto list = [](const ConstraintsManager::TextSet& set) {
@@ -124,18 +124,18 @@ getSpiDeviceLongProperty: 0
 isMbBpiSpiSupport: 0
 )";
 
-void expectToAnswerNothing(ManagerSession& session) {
-    EXPECT_TRUE(session.peer.exceptions());
-    (void)answers(session.manager, "KS50", "VENDOR"); // may raise, each as it does, but nothing else
-    session.manager.setExceptions(false);
-    EXPECT_EQ(answers(session.manager, "KS50", "VENDOR"), NOTHING);
-    EXPECT_THAT(session.manager.getAllDeviceIdcodes(), IsEmpty());
+void expectToAnswerNothing(ManagerFixture& session) {
+    EXPECT_TRUE(session.members().m_exceptions);
+    (void)answers(*session, "KS50", "VENDOR"); // may raise, each as it does, but nothing else
+    session->setExceptions(false);
+    EXPECT_EQ(answers(*session, "KS50", "VENDOR"), NOTHING);
+    EXPECT_THAT(session->getAllDeviceIdcodes(), IsEmpty());
     TarvikSmokeMgr* const none = nullptr;
-    session.manager.dumpOperationsTable(none);
-    session.manager.dumpBsdlOperationsTable(none);
-    session.manager.dumpProgramOptionsTable(none);
-    session.manager.dumpCachedDeviceFamilies(none);
-    session.manager.dumpMbBpiSpi();
+    session->dumpOperationsTable(none);
+    session->dumpBsdlOperationsTable(none);
+    session->dumpProgramOptionsTable(none);
+    session->dumpCachedDeviceFamilies(none);
+    session->dumpMbBpiSpi();
 }
 
 /// Bytes of all values, the same at every run.
@@ -149,90 +149,89 @@ std::string randomBytes(unsigned seed) {
 }
 
 TEST(IncompleteDatabase, WithAllKeysAnswers) {
-    ManagerSession session(
+    ManagerFixture session(
         {{"base.acd", all(BASE_LINES)}, {"spi.acd", all(SPI_LINES)}, {"kestrel.acd", KESTREL}});
-    EXPECT_THAT(session.messages.take(), IsEmpty());
-    EXPECT_EQ(session.manager.getDeviceOperations("KS50", MODE_TYPE::BS, OUTPUT_TYPE::USB2), 1);
-    EXPECT_EQ(session.manager.getDeviceOperations("KS50", MODE_TYPE::SPI, OUTPUT_TYPE::USB2), 1);
-    EXPECT_EQ(session.manager.getProgramOptions("KS50", MODE_TYPE::BS, OUTPUT_TYPE::USB2, nullptr), 1);
-    EXPECT_STREQ(session.manager.getSpiDeviceStringProperty("FLASH1", "SIZE"), "4");
+    EXPECT_THAT(session.messages(), IsEmpty());
+    EXPECT_EQ(session->getDeviceOperations("KS50", MODE_TYPE::BS, OUTPUT_TYPE::USB2), 1);
+    EXPECT_EQ(session->getDeviceOperations("KS50", MODE_TYPE::SPI, OUTPUT_TYPE::USB2), 1);
+    EXPECT_EQ(session->getProgramOptions("KS50", MODE_TYPE::BS, OUTPUT_TYPE::USB2, nullptr), 1);
+    EXPECT_STREQ(session->getSpiDeviceStringProperty("FLASH1", "SIZE"), "4");
 }
 
 TEST(IncompleteDatabase, WithoutAnyOneBaseKeyGivesAUsableManager) {
     for (std::size_t line = 0; line < BASE_LINES.size(); ++line) {
         SCOPED_TRACE(BASE_LINES[line]);
-        ManagerSession session(
+        ManagerFixture session(
             {{"base.acd", without(BASE_LINES, line)}, {"spi.acd", all(SPI_LINES)}, {"kestrel.acd", KESTREL}});
-        EXPECT_THAT(session.messages.take(), IsEmpty());
-        EXPECT_TRUE(session.peer.exceptions());
-        EXPECT_THAT(session.manager.getOperationOrders(), SizeIs(32));
-        EXPECT_THAT(session.peer.multibootTypes(), SizeIs(12));
-        EXPECT_EQ(text(session.manager.getPartFamily("KS50")), "kestrel");
-        session.manager.setExceptions(false);
-        EXPECT_EQ(session.manager.getDeviceOperations("KS50", MODE_TYPE::BS, OUTPUT_TYPE::USB2),
-                  line == 0 ? 0 : 1);
-        EXPECT_EQ(session.manager.getProgramOptions("KS50", MODE_TYPE::BS, OUTPUT_TYPE::USB2, nullptr),
+        EXPECT_THAT(session.messages(), IsEmpty());
+        EXPECT_TRUE(session.members().m_exceptions);
+        EXPECT_THAT(session->getOperationOrders(), SizeIs(32));
+        EXPECT_THAT(session.members().m_multibootTypes, SizeIs(12));
+        EXPECT_EQ(text(session->getPartFamily("KS50")), "kestrel");
+        session->setExceptions(false);
+        EXPECT_EQ(session->getDeviceOperations("KS50", MODE_TYPE::BS, OUTPUT_TYPE::USB2), line == 0 ? 0 : 1);
+        EXPECT_EQ(session->getProgramOptions("KS50", MODE_TYPE::BS, OUTPUT_TYPE::USB2, nullptr),
                   line == 1 ? 0 : 1);
-        EXPECT_STREQ(session.manager.getDeviceStringProperty("KS50", "VENDOR"), "Korvel");
+        EXPECT_STREQ(session->getDeviceStringProperty("KS50", "VENDOR"), "Korvel");
     }
 }
 
 TEST(IncompleteDatabase, WithoutAnyOneSpiKeyGivesAUsableManager) {
     for (std::size_t line = 0; line < SPI_LINES.size(); ++line) {
         SCOPED_TRACE(SPI_LINES[line]);
-        ManagerSession session(
+        ManagerFixture session(
             {{"base.acd", all(BASE_LINES)}, {"spi.acd", without(SPI_LINES, line)}, {"kestrel.acd", KESTREL}});
-        EXPECT_THAT(session.messages.take(), IsEmpty());
-        EXPECT_TRUE(session.peer.exceptions());
-        EXPECT_THAT(session.peer.multibootTypes(), SizeIs(12));
-        EXPECT_EQ(session.manager.getDeviceOperations("KS50", MODE_TYPE::BS, OUTPUT_TYPE::USB2), 1);
-        EXPECT_EQ(text(session.manager.getPartFamily("KS50")), "kestrel");
+        EXPECT_THAT(session.messages(), IsEmpty());
+        EXPECT_TRUE(session.members().m_exceptions);
+        EXPECT_THAT(session.members().m_multibootTypes, SizeIs(12));
+        EXPECT_EQ(session->getDeviceOperations("KS50", MODE_TYPE::BS, OUTPUT_TYPE::USB2), 1);
+        EXPECT_EQ(text(session->getPartFamily("KS50")), "kestrel");
     }
 }
 
 TEST(NonsenseDatabase, MissingBaseAnswersNothing) {
-    ManagerSession session(Files{});
+    ManagerFixture session(Files{});
     expectToAnswerNothing(session);
 }
 
 TEST(NonsenseDatabase, EmptyBaseAnswersNothing) {
-    BaseSession session("");
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    ManagerFixture session(Base{""});
+    EXPECT_THAT(session.messages(), IsEmpty());
     expectToAnswerNothing(session);
 }
 
 TEST(NonsenseDatabase, BaseOfRandomBytesAnswersNothing) {
     for (unsigned seed = 0; seed < 10; ++seed) {
-        BaseSession session(randomBytes(seed));
+        ManagerFixture session(Base{randomBytes(seed)});
         expectToAnswerNothing(session);
     }
 }
 
 TEST(NonsenseDatabase, EmptySpiLeavesTheOthersAnswers) {
-    ManagerSession session({{"base.acd", all(BASE_LINES)}, {"spi.acd", ""}, {"kestrel.acd", KESTREL}});
-    EXPECT_THAT(session.messages.take(), IsEmpty());
-    EXPECT_TRUE(session.peer.exceptions());
-    EXPECT_EQ(session.manager.getDeviceOperations("KS50", MODE_TYPE::BS, OUTPUT_TYPE::USB2), 1);
-    EXPECT_EQ(session.manager.getDeviceOperations("KS50", MODE_TYPE::SPI, OUTPUT_TYPE::USB2), 0);
+    ManagerFixture session({{"base.acd", all(BASE_LINES)}, {"spi.acd", ""}, {"kestrel.acd", KESTREL}});
+    EXPECT_THAT(session.messages(), IsEmpty());
+    EXPECT_TRUE(session.members().m_exceptions);
+    EXPECT_EQ(session->getDeviceOperations("KS50", MODE_TYPE::BS, OUTPUT_TYPE::USB2), 1);
+    EXPECT_EQ(session->getDeviceOperations("KS50", MODE_TYPE::SPI, OUTPUT_TYPE::USB2), 0);
 }
 
 TEST(NonsenseDatabase, SpiOfRandomBytesLeavesTheOthersAnswers) {
     for (unsigned seed = 100; seed < 110; ++seed) {
-        ManagerSession session(
+        ManagerFixture session(
             {{"base.acd", all(BASE_LINES)}, {"spi.acd", randomBytes(seed)}, {"kestrel.acd", KESTREL}});
-        EXPECT_TRUE(session.peer.exceptions());
-        EXPECT_THAT(session.peer.spiNames(), IsEmpty());
-        EXPECT_THAT(session.peer.multibootTypes(), SizeIs(12));
-        EXPECT_EQ(session.manager.getDeviceOperations("KS50", MODE_TYPE::BS, OUTPUT_TYPE::USB2), 1);
-        EXPECT_EQ(session.manager.getDeviceOperations("KS50", MODE_TYPE::SPI, OUTPUT_TYPE::USB2), 0);
+        EXPECT_TRUE(session.members().m_exceptions);
+        EXPECT_THAT(session.members().m_spiNames, IsEmpty());
+        EXPECT_THAT(session.members().m_multibootTypes, SizeIs(12));
+        EXPECT_EQ(session->getDeviceOperations("KS50", MODE_TYPE::BS, OUTPUT_TYPE::USB2), 1);
+        EXPECT_EQ(session->getDeviceOperations("KS50", MODE_TYPE::SPI, OUTPUT_TYPE::USB2), 0);
     }
 }
 
 TEST(NonsenseDatabase, FamilyOfRandomBytesOffersNothing) {
     for (unsigned seed = 200; seed < 210; ++seed) {
-        ManagerSession session({{"base.acd", all(BASE_LINES)}, {"kestrel.acd", randomBytes(seed)}});
-        EXPECT_EQ(session.manager.getDeviceOperations("kestrel", MODE_TYPE::BS, OUTPUT_TYPE::USB2), 0);
-        EXPECT_EQ(session.manager.getProgramOptions("kestrel", MODE_TYPE::BS, OUTPUT_TYPE::USB2, nullptr), 0);
+        ManagerFixture session({{"base.acd", all(BASE_LINES)}, {"kestrel.acd", randomBytes(seed)}});
+        EXPECT_EQ(session->getDeviceOperations("kestrel", MODE_TYPE::BS, OUTPUT_TYPE::USB2), 0);
+        EXPECT_EQ(session->getProgramOptions("kestrel", MODE_TYPE::BS, OUTPUT_TYPE::USB2, nullptr), 0);
     }
 }
 
@@ -240,20 +239,20 @@ TEST(NonsenseDatabase, CutShortAnywhereGivesAManager) {
     const std::string base = all(BASE_LINES);
     const std::string spi = all(SPI_LINES);
     for (std::size_t length = 0; length < base.size(); length += 7) {
-        ManagerSession session({{"base.acd", base.substr(0, length)}, {"spi.acd", spi.substr(0, length)}});
-        EXPECT_TRUE(session.peer.exceptions());
-        EXPECT_EQ(text(session.manager.getPartFamily("nobody")), "base");
-        (void)answers(session.manager, "FLASH1", "SIZE");
+        ManagerFixture session({{"base.acd", base.substr(0, length)}, {"spi.acd", spi.substr(0, length)}});
+        EXPECT_TRUE(session.members().m_exceptions);
+        EXPECT_EQ(text(session->getPartFamily("nobody")), "base");
+        (void)answers(*session, "FLASH1", "SIZE");
     }
 }
 
 TEST(NullTexts, AnswerAsEmptyTextsInEveryMethod) {
     for (const bool exceptions : {false, true}) {
         const auto ask = [&](const char* device, const char* other) {
-            ManagerSession session(
+            ManagerFixture session(
                 {{"base.acd", all(BASE_LINES)}, {"spi.acd", all(SPI_LINES)}, {"kestrel.acd", KESTREL}});
-            session.manager.setExceptions(exceptions);
-            return answers(session.manager, device, other);
+            session->setExceptions(exceptions);
+            return answers(*session, device, other);
         };
         EXPECT_EQ(ask(nullptr, nullptr), ask("", ""));
         EXPECT_EQ(ask("KS50", nullptr), ask("KS50", ""));
@@ -262,10 +261,10 @@ TEST(NullTexts, AnswerAsEmptyTextsInEveryMethod) {
 }
 
 TEST(NullTexts, NullPackageIsNoPackageAndAnEmptyOneIs) {
-    ManagerSession session({{"base.acd", "SS = outs:fams,kestrel\nNOT_SUPPORTED_PART_IN_MODE = SS_KS50_\n"},
+    ManagerFixture session({{"base.acd", "SS = outs:fams,kestrel\nNOT_SUPPORTED_PART_IN_MODE = SS_KS50_\n"},
                             {"kestrel.acd", "[KS50]\n"}});
-    EXPECT_TRUE(session.manager.checkConstraints(MODE_TYPE::SS, "KS50", static_cast<const char*>(nullptr)));
-    EXPECT_FALSE(session.manager.checkConstraints(MODE_TYPE::SS, "KS50", ""));
+    EXPECT_TRUE(session->checkConstraints(MODE_TYPE::SS, "KS50", static_cast<const char*>(nullptr)));
+    EXPECT_FALSE(session->checkConstraints(MODE_TYPE::SS, "KS50", ""));
 }
 
 } // namespace

@@ -1,4 +1,4 @@
-#include "CoreFixtures.h"
+#include "Members.h"
 
 // Whether a name is an SPI flash, its class, and its properties with the fallback to the class.
 
@@ -6,44 +6,44 @@ using testing::IsEmpty;
 
 namespace {
 
-struct FlashSession : ManagerSession {
-    explicit FlashSession(const std::string& spi) : ManagerSession({{"base.acd", ""}, {"spi.acd", spi}}) {}
+struct FlashSession : ManagerFixture {
+    explicit FlashSession(const std::string& spi) : ManagerFixture({{"base.acd", ""}, {"spi.acd", spi}}) {}
 
     std::string property(const char* device, const char* name) {
-        return manager.getSpiDeviceStringProperty(device, name);
+        return (*this)->getSpiDeviceStringProperty(device, name);
     }
-    std::string classOf(const char* device) { return text(peer.spiDeviceClass(device)); }
+    std::string classOf(const char* device) { return text(members().spiDeviceClass(device)); }
 };
 
 TEST(SpiDevices, NamesAreFoundInAnyCase) {
     FlashSession session("DEVICE_FAMILY = FLASHES\nFLASHES_DEVICES = FLASH25A,FLASH26\n");
     for (const char* name : {"FLASH25A", "flash25a", "Flash25A", "flash26", "FLASHES", "flashes"}) {
-        EXPECT_TRUE(session.manager.isSpiDevice(name)) << name;
+        EXPECT_TRUE(session->isSpiDevice(name)) << name;
     }
 }
 
 TEST(SpiDevices, OtherNamesAreNone) {
     FlashSession session("DEVICE_FAMILY = FLASHES\nFLASHES_DEVICES = FLASH25A\n");
     for (const char* name : {"", "FLASH25", "FLASH25AB", "FLASH25A_SO8", "spi", "KS50"}) {
-        EXPECT_FALSE(session.manager.isSpiDevice(name)) << name;
+        EXPECT_FALSE(session->isSpiDevice(name)) << name;
     }
-    EXPECT_FALSE(session.manager.isSpiDevice(nullptr));
-    EXPECT_FALSE(session.manager.isSpiDevice(StringBase("FLASH25A\0x", 10)));
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_FALSE(session->isSpiDevice(nullptr));
+    EXPECT_FALSE(session->isSpiDevice(StringBase("FLASH25A\0x", 10)));
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(SpiDevices, LowerCaseEntryCanNeverMatch) {
     FlashSession session("DEVICE_FAMILY = flashes,\xe4\nflashes_DEVICES = Flash1\n");
-    EXPECT_FALSE(session.manager.isSpiDevice("flashes"));
-    EXPECT_FALSE(session.manager.isSpiDevice("FLASHES"));
-    EXPECT_FALSE(session.manager.isSpiDevice("Flash1"));
-    EXPECT_TRUE(session.manager.isSpiDevice("\xe4"));
+    EXPECT_FALSE(session->isSpiDevice("flashes"));
+    EXPECT_FALSE(session->isSpiDevice("FLASHES"));
+    EXPECT_FALSE(session->isSpiDevice("Flash1"));
+    EXPECT_TRUE(session->isSpiDevice("\xe4"));
 }
 
 TEST(SpiDevices, ArgumentIsLeftAlone) {
     FlashSession session("DEVICE_FAMILY = FLASHES\n");
     const StringBase name("flashes");
-    EXPECT_TRUE(session.manager.isSpiDevice(name));
+    EXPECT_TRUE(session->isSpiDevice(name));
     EXPECT_EQ(text(name), "flashes");
 }
 
@@ -165,20 +165,20 @@ TEST(SpiDeviceProperties, AreEmptyForUnknownNamesAndKeysSilently) {
     EXPECT_EQ(session.property("F1", "WIDTH"), "");
     EXPECT_EQ(session.property("nobody", "WIDTH"), "");
     EXPECT_EQ(session.property("", ""), "");
-    EXPECT_STREQ(session.manager.getSpiDeviceStringProperty(nullptr, nullptr), "");
-    EXPECT_STREQ(session.manager.getSpiDeviceStringProperty("F1SIZE", nullptr), "4");
-    EXPECT_STREQ(session.manager.getSpiDeviceStringProperty(nullptr, "F1SIZE"), "4");
-    EXPECT_FALSE(session.manager.getSpiDeviceBoolProperty(nullptr, nullptr));
-    EXPECT_EQ(session.manager.getSpiDeviceLongProperty(nullptr, nullptr), 0);
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_STREQ(session->getSpiDeviceStringProperty(nullptr, nullptr), "");
+    EXPECT_STREQ(session->getSpiDeviceStringProperty("F1SIZE", nullptr), "4");
+    EXPECT_STREQ(session->getSpiDeviceStringProperty(nullptr, "F1SIZE"), "4");
+    EXPECT_FALSE(session->getSpiDeviceBoolProperty(nullptr, nullptr));
+    EXPECT_EQ(session->getSpiDeviceLongProperty(nullptr, nullptr), 0);
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(SpiDeviceProperties, TextLivesAsLongAsTheManager) {
     FlashSession session("DEVICE_FAMILY = F1,F2\nF1_PROPERTY = SIZE,4\nF2_PROPERTY = SIZE,8\n");
-    const char* const size = session.manager.getSpiDeviceStringProperty("F1", "SIZE");
-    const char* const nothing = session.manager.getSpiDeviceStringProperty("F1", "WIDTH");
-    EXPECT_STREQ(session.manager.getSpiDeviceStringProperty("F2", "SIZE"), "8");
-    EXPECT_STREQ(session.manager.getSpiDeviceStringProperty("F2", "WIDTH"), "");
+    const char* const size = session->getSpiDeviceStringProperty("F1", "SIZE");
+    const char* const nothing = session->getSpiDeviceStringProperty("F1", "WIDTH");
+    EXPECT_STREQ(session->getSpiDeviceStringProperty("F2", "SIZE"), "8");
+    EXPECT_STREQ(session->getSpiDeviceStringProperty("F2", "WIDTH"), "");
     EXPECT_STREQ(size, "4");
     EXPECT_STREQ(nothing, "");
 }
@@ -188,32 +188,32 @@ TEST(SpiDeviceProperties, AsBooleansAreTrueInAnyCase) {
         "DEVICE_FAMILY = F1,ST1\nF1_PROPERTY = A,TRUE:B,true:C,True:D,yes:E,1:F,:G,TRUE :H,FALSE\n"
         "ST1_DEVICES = F1\nST1_PROPERTY = I,TRUE\n");
     for (const char* key : {"A", "B", "C", "I", "a"}) {
-        EXPECT_TRUE(session.manager.getSpiDeviceBoolProperty("F1", key)) << key;
+        EXPECT_TRUE(session->getSpiDeviceBoolProperty("F1", key)) << key;
     }
     for (const char* key : {"D", "E", "F", "G", "H", "missing"}) {
-        EXPECT_FALSE(session.manager.getSpiDeviceBoolProperty("F1", key)) << key;
+        EXPECT_FALSE(session->getSpiDeviceBoolProperty("F1", key)) << key;
     }
 }
 
 TEST(SpiDeviceProperties, AsNumbersAreDecimal) {
     FlashSession session("DEVICE_FAMILY = F1,ST1\nF1_PROPERTY = A,64:B,-7:C, 12kB:D,nonsense:E,:F,0x10:"
                          "G,99999999999:H,-99999999999\nST1_DEVICES = F1\nST1_PROPERTY = I,9\n");
-    EXPECT_EQ(session.manager.getSpiDeviceLongProperty("F1", "A"), 64);
-    EXPECT_EQ(session.manager.getSpiDeviceLongProperty("F1", "B"), -7);
-    EXPECT_EQ(session.manager.getSpiDeviceLongProperty("F1", "C"), 12);
-    EXPECT_EQ(session.manager.getSpiDeviceLongProperty("F1", "D"), 0);
-    EXPECT_EQ(session.manager.getSpiDeviceLongProperty("F1", "E"), 0);
-    EXPECT_EQ(session.manager.getSpiDeviceLongProperty("F1", "F"), 0);
-    EXPECT_EQ(session.manager.getSpiDeviceLongProperty("F1", "G"), 2147483647);
-    EXPECT_EQ(session.manager.getSpiDeviceLongProperty("F1", "H"), -2147483647 - 1);
-    EXPECT_EQ(session.manager.getSpiDeviceLongProperty("F1", "I"), 9);
-    EXPECT_EQ(session.manager.getSpiDeviceLongProperty("F1", "missing"), 0);
+    EXPECT_EQ(session->getSpiDeviceLongProperty("F1", "A"), 64);
+    EXPECT_EQ(session->getSpiDeviceLongProperty("F1", "B"), -7);
+    EXPECT_EQ(session->getSpiDeviceLongProperty("F1", "C"), 12);
+    EXPECT_EQ(session->getSpiDeviceLongProperty("F1", "D"), 0);
+    EXPECT_EQ(session->getSpiDeviceLongProperty("F1", "E"), 0);
+    EXPECT_EQ(session->getSpiDeviceLongProperty("F1", "F"), 0);
+    EXPECT_EQ(session->getSpiDeviceLongProperty("F1", "G"), 2147483647);
+    EXPECT_EQ(session->getSpiDeviceLongProperty("F1", "H"), -2147483647 - 1);
+    EXPECT_EQ(session->getSpiDeviceLongProperty("F1", "I"), 9);
+    EXPECT_EQ(session->getSpiDeviceLongProperty("F1", "missing"), 0);
 }
 
 TEST(SpiDeviceProperties, DoNotDependOnTheExceptionsSwitch) {
     FlashSession session("DEVICE_FAMILY = F1\nF1_PROPERTY = SIZE,4\n");
     for (const bool exceptions : {false, true}) {
-        session.manager.setExceptions(exceptions);
+        session->setExceptions(exceptions);
         EXPECT_EQ(session.property("F1", "SIZE"), "4");
         EXPECT_EQ(session.property("F1", "WIDTH"), "");
     }

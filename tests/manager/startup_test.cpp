@@ -1,4 +1,4 @@
-#include "CoreFixtures.h"
+#include "Members.h"
 
 // The start-up pass: what faults of the databases end it, and what then is there.
 
@@ -20,49 +20,49 @@ NOT_SUPPORTED_PART_IN_MODE = SS_KS50_PQ
 )";
 
 /// All that the steps before the SPI catalogue fill.
-void expectBaseLoaded(TarvikTestPeer& peer) {
-    EXPECT_THAT(texts(peer.supportedDevices()), ElementsAre("kestrel", "spi"));
-    EXPECT_THAT(texts(peer.programOptionPackages()), ElementsAre("kestrel", "spi"));
-    EXPECT_THAT(peer.bsCables(), ElementsAre(TARVIKNS::OUTPUT_TYPE::USB2));
-    EXPECT_THAT(texts(peer.bsDevices()), ElementsAre("kestrel"));
-    EXPECT_THAT(entries(peer.deviceIdcodes()), ElementsAre(Pair("KS50", "0x1")));
-    EXPECT_THAT(texts(peer.notSupportedPartInMode()), ElementsAre("SS_KS50_PQ"));
-    EXPECT_EQ(peer.operationTable()->blocks(), 2U);
-    EXPECT_EQ(peer.bsdlOperationTable()->blocks(), 2U);
-    EXPECT_EQ(peer.programOptionTable()->blocks(), 2U);
-    EXPECT_THAT(peer.operationOrders(), SizeIs(32));
-    EXPECT_THAT(peer.programOptionOrders(), SizeIs(24));
+void expectBaseLoaded(TarvikTestPeer::Members& members) {
+    EXPECT_THAT(texts(members.m_supportedDevices), ElementsAre("kestrel", "spi"));
+    EXPECT_THAT(texts(members.m_programOptionPackages), ElementsAre("kestrel", "spi"));
+    EXPECT_THAT(members.m_bsCables, ElementsAre(TARVIKNS::OUTPUT_TYPE::USB2));
+    EXPECT_THAT(texts(members.m_bsDevices), ElementsAre("kestrel"));
+    EXPECT_THAT(entries(members.m_deviceIdcodes), ElementsAre(Pair("KS50", "0x1")));
+    EXPECT_THAT(texts(members.m_notSupportedPartInMode), ElementsAre("SS_KS50_PQ"));
+    EXPECT_EQ(members.m_operationTable.blocks(), 2U);
+    EXPECT_EQ(members.m_bsdlOperationTable.blocks(), 2U);
+    EXPECT_EQ(members.m_programOptionTable.blocks(), 2U);
+    EXPECT_THAT(members.m_operationOrders, SizeIs(32));
+    EXPECT_THAT(members.m_programOptionOrders, SizeIs(24));
 }
 
 TEST(StartUp, OnGoodDataIsSilentAndFillsEverything) {
-    ManagerSession session({{"base.acd", BASE}, {"spi.acd", "DEVICE_FAMILY = FLASH1\n"}});
-    expectBaseLoaded(session.peer);
-    EXPECT_THAT(texts(session.peer.spiNames()), ElementsAre("FLASH1"));
-    EXPECT_THAT(session.peer.multibootTypes(), SizeIs(12));
-    EXPECT_TRUE(session.peer.exceptions());
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    ManagerFixture session({{"base.acd", BASE}, {"spi.acd", "DEVICE_FAMILY = FLASH1\n"}});
+    expectBaseLoaded(session.members());
+    EXPECT_THAT(texts(session.members().m_spiNames), ElementsAre("FLASH1"));
+    EXPECT_THAT(session.members().m_multibootTypes, SizeIs(12));
+    EXPECT_TRUE(session.members().m_exceptions);
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(StartUp, ReadsNoFamilyButSpi) {
-    ManagerSession session(
+    ManagerFixture session(
         {{"base.acd", BASE}, {"kestrel.acd", "OPERATION = PROGRAM,BS,USB2\nPROPERTY = A,1\n"}});
-    EXPECT_THAT(texts(session.peer.operationsLoaded()), ElementsAre("spi"));
-    EXPECT_THAT(texts(session.peer.programOptionsLoaded()), ElementsAre("spi"));
-    EXPECT_THAT(session.peer.loadedFamilies(), IsEmpty());
-    EXPECT_THAT(session.peer.deviceProperties(), IsEmpty());
-    EXPECT_THAT(operationCells(session.peer), IsEmpty());
+    EXPECT_THAT(texts(session.members().m_operationsLoaded), ElementsAre("spi"));
+    EXPECT_THAT(texts(session.members().m_programOptionsLoaded), ElementsAre("spi"));
+    EXPECT_THAT(session.members().m_loadedFamilies, IsEmpty());
+    EXPECT_THAT(session.members().m_deviceProperties, IsEmpty());
+    EXPECT_THAT(operationCells(session.members()), IsEmpty());
 }
 
 TEST(StartUp, TakesEntriesOfTheBaseDatabaseForNoFamilys) {
-    ManagerSession session(
+    ManagerFixture session(
         {{"base.acd", std::string(BASE) + "OPERATION = PROGRAM,BS,USB2\nPROGRAM_OPTION = OTP\n"}});
-    EXPECT_THAT(operationCells(session.peer), IsEmpty());
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    EXPECT_THAT(operationCells(session.members()), IsEmpty());
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(StartUp, OptionThatCannotBeReadEndsItBeforeTheMultibootTypes) {
     for (const char* option : {"OTP", "RS_PIN0", "nonsense", ""}) {
-        ManagerSession session({{"base.acd", BASE},
+        ManagerFixture session({{"base.acd", BASE},
                                 {"spi.acd", std::string("DEVICE_FAMILY = FLASH1\n"
                                                         "FLASH1_PROPERTY = SIZE,4\n"
                                                         "BPI3_DEVICES = F\n"
@@ -71,23 +71,23 @@ TEST(StartUp, OptionThatCannotBeReadEndsItBeforeTheMultibootTypes) {
                                                         "TYPE_BPI_SERIAL_LEAD = KS50\n"
                                                         "PROGRAM_OPTION = ERASE,SPI,USB2:") +
                                                 option + ",SPI,USB2:VERIFY,SPI,USB2\n"}});
-        expectBaseLoaded(session.peer);
-        EXPECT_THAT(texts(session.peer.spiNames()), ElementsAre("FLASH1"));
-        EXPECT_THAT(entries(session.peer.spiProperties()), ElementsAre(Pair("FLASH1SIZE", "4")));
-        EXPECT_THAT(texts(session.peer.bpi3Devices()), ElementsAre("F"));
-        EXPECT_THAT(operationCells(session.peer), ElementsAre(Cell{1, 0, 5, 2}));
-        EXPECT_THAT(bsdlOperationCells(session.peer), ElementsAre(Cell{1, 19, 0, 3}));
-        EXPECT_THAT(programOptionCells(session.peer), ElementsAre(Cell{1, 0, 5, 2}));
-        EXPECT_THAT(texts(session.peer.operationsLoaded()), ElementsAre("spi"));
-        EXPECT_THAT(session.peer.programOptionsLoaded(), IsEmpty());
-        EXPECT_THAT(session.peer.multibootTypes(), IsEmpty());
-        EXPECT_TRUE(session.peer.exceptions());
+        expectBaseLoaded(session.members());
+        EXPECT_THAT(texts(session.members().m_spiNames), ElementsAre("FLASH1"));
+        EXPECT_THAT(entries(session.members().m_spiProperties), ElementsAre(Pair("FLASH1SIZE", "4")));
+        EXPECT_THAT(texts(session.members().m_bpi3Devices), ElementsAre("F"));
+        EXPECT_THAT(operationCells(session.members()), ElementsAre(Cell{1, 0, 5, 2}));
+        EXPECT_THAT(bsdlOperationCells(session.members()), ElementsAre(Cell{1, 19, 0, 3}));
+        EXPECT_THAT(programOptionCells(session.members()), ElementsAre(Cell{1, 0, 5, 2}));
+        EXPECT_THAT(texts(session.members().m_operationsLoaded), ElementsAre("spi"));
+        EXPECT_THAT(session.members().m_programOptionsLoaded, IsEmpty());
+        EXPECT_THAT(session.members().m_multibootTypes, IsEmpty());
+        EXPECT_TRUE(session.members().m_exceptions);
     }
 }
 
 TEST(StartUp, OptionThatCannotBeReadIsReportedOnce) {
-    ManagerSession session({{"base.acd", BASE}, {"spi.acd", "PROGRAM_OPTION = OTP,SPI,USB2\n"}});
-    const auto messages = session.messages.take();
+    ManagerFixture session({{"base.acd", BASE}, {"spi.acd", "PROGRAM_OPTION = OTP,SPI,USB2\n"}});
+    const auto messages = session.messages();
     ASSERT_THAT(messages, SizeIs(1));
     EXPECT_EQ(messages[0].channel, Port_MsgManData::Channel::INFO);
     EXPECT_EQ(messages[0].line, 1500);
@@ -95,12 +95,12 @@ TEST(StartUp, OptionThatCannotBeReadIsReportedOnce) {
 }
 
 TEST(StartUp, OptionsThatEndedItAreTriedOnceMoreAndNotAgain) {
-    ManagerSession session({{"base.acd", BASE}, {"spi.acd", "PROGRAM_OPTION = OTP,SPI,USB2\n"}});
+    ManagerFixture session({{"base.acd", BASE}, {"spi.acd", "PROGRAM_OPTION = OTP,SPI,USB2\n"}});
     const auto raised = [&] {
-        return raisedLine<DataMismatchException>([&] { session.peer.loadDeviceData("spi", nullptr); });
+        return raisedLine<DataMismatchException>([&] { session.members().loadDeviceData("spi", {}); });
     };
     EXPECT_EQ(raised(), 1500);
-    EXPECT_THAT(texts(session.peer.programOptionsLoaded()), ElementsAre("spi"));
+    EXPECT_THAT(texts(session.members().m_programOptionsLoaded), ElementsAre("spi"));
     EXPECT_EQ(raised(), -1);
 }
 
@@ -108,34 +108,34 @@ TEST(StartUp, UnreadableSpiDatabaseEndsItBeforeTheSpiCatalogue) {
     const DatabaseDirectory directory;
     directory.writeFile("base.acd", BASE);
     directory.makeDirectory("spi.acd");
-    ManagerSession session(directory);
-    expectBaseLoaded(session.peer);
-    EXPECT_THAT(session.peer.spiNames(), IsEmpty());
-    EXPECT_THAT(session.peer.operationsLoaded(), IsEmpty());
-    EXPECT_THAT(session.peer.programOptionsLoaded(), IsEmpty());
-    EXPECT_THAT(session.peer.multibootTypes(), IsEmpty());
-    EXPECT_THAT(session.peer.deviceFamilyCache(), IsEmpty());
-    EXPECT_TRUE(session.peer.exceptions());
-    const auto messages = session.messages.take();
+    ManagerFixture session(directory);
+    expectBaseLoaded(session.members());
+    EXPECT_THAT(session.members().m_spiNames, IsEmpty());
+    EXPECT_THAT(session.members().m_operationsLoaded, IsEmpty());
+    EXPECT_THAT(session.members().m_programOptionsLoaded, IsEmpty());
+    EXPECT_THAT(session.members().m_multibootTypes, IsEmpty());
+    EXPECT_THAT(session.members().m_deviceFamilyCache, IsEmpty());
+    EXPECT_TRUE(session.members().m_exceptions);
+    const auto messages = session.messages();
     ASSERT_THAT(messages, Not(IsEmpty()));
     EXPECT_EQ(messages.back().channel, Port_MsgManData::Channel::INFO);
     EXPECT_THAT(messages.back().text, HasSubstr("DataNotFoundException"));
 }
 
 TEST(StartUp, MissingBaseDatabaseLeavesAnEmptyManager) {
-    ManagerSession session(Files{{"spi.acd", "DEVICE_FAMILY = FLASH1\nTYPE_BPI_SERIAL_LEAD = KS50\n"}});
-    EXPECT_EQ(session.peer.devKey(), nullptr);
-    EXPECT_EQ(session.peer.supportedDevices().size(), 0U);
-    EXPECT_EQ(session.peer.operationTable()->blocks(), 0U);
-    EXPECT_EQ(session.peer.bsdlOperationTable()->blocks(), 0U);
-    EXPECT_EQ(session.peer.programOptionTable()->blocks(), 0U);
-    EXPECT_THAT(session.manager.getOperationOrders(), IsEmpty());
-    EXPECT_THAT(session.manager.getProgramOptionOrders(), IsEmpty());
-    EXPECT_THAT(session.peer.spiNames(), IsEmpty());
-    EXPECT_THAT(session.peer.operationsLoaded(), IsEmpty());
-    EXPECT_THAT(session.peer.multibootTypes(), IsEmpty());
-    EXPECT_TRUE(session.peer.exceptions());
-    const auto messages = session.messages.take();
+    ManagerFixture session(Files{{"spi.acd", "DEVICE_FAMILY = FLASH1\nTYPE_BPI_SERIAL_LEAD = KS50\n"}});
+    EXPECT_EQ(session.members().m_devKey, nullptr);
+    EXPECT_EQ(session.members().m_supportedDevices.size(), 0U);
+    EXPECT_EQ(session.members().m_operationTable.blocks(), 0U);
+    EXPECT_EQ(session.members().m_bsdlOperationTable.blocks(), 0U);
+    EXPECT_EQ(session.members().m_programOptionTable.blocks(), 0U);
+    EXPECT_THAT(session->getOperationOrders(), IsEmpty());
+    EXPECT_THAT(session->getProgramOptionOrders(), IsEmpty());
+    EXPECT_THAT(session.members().m_spiNames, IsEmpty());
+    EXPECT_THAT(session.members().m_operationsLoaded, IsEmpty());
+    EXPECT_THAT(session.members().m_multibootTypes, IsEmpty());
+    EXPECT_TRUE(session.members().m_exceptions);
+    const auto messages = session.messages();
     ASSERT_THAT(messages, Not(IsEmpty()));
     EXPECT_EQ(messages.back().channel, Port_MsgManData::Channel::INFO);
     EXPECT_THAT(messages.back().text, HasSubstr("DataNotFoundException"));
@@ -144,18 +144,18 @@ TEST(StartUp, MissingBaseDatabaseLeavesAnEmptyManager) {
 TEST(StartUp, UnreadableBaseDatabaseLeavesAnEmptyManager) {
     const DatabaseDirectory directory;
     directory.makeDirectory("base.acd");
-    ManagerSession session(directory);
-    EXPECT_EQ(session.peer.devKey(), nullptr);
-    EXPECT_EQ(session.peer.operationTable()->blocks(), 0U);
-    EXPECT_THAT(session.manager.getOperationOrders(), IsEmpty());
-    EXPECT_TRUE(session.peer.exceptions());
+    ManagerFixture session(directory);
+    EXPECT_EQ(session.members().m_devKey, nullptr);
+    EXPECT_EQ(session.members().m_operationTable.blocks(), 0U);
+    EXPECT_THAT(session->getOperationOrders(), IsEmpty());
+    EXPECT_TRUE(session.members().m_exceptions);
 }
 
 TEST(StartUp, AnyFaultLeavesOneManagerForAllLaterCalls) {
-    ManagerSession session(Files{});
-    (void)session.messages.take();
-    EXPECT_EQ(ConstraintsManager::getConstraintsManager(), &session.manager);
-    EXPECT_THAT(session.messages.take(), IsEmpty());
+    ManagerFixture session(Files{});
+    (void)session.messages();
+    EXPECT_EQ(ConstraintsManager::getConstraintsManager(), &*session);
+    EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 } // namespace

@@ -1,4 +1,4 @@
-#include "CoreFixtures.h"
+#include "ManagerFixture.h"
 
 #include <UT_STR.h>
 
@@ -154,11 +154,11 @@ TEST(OutputNames, ValueThatIsNoOutputHasNoName) {
 }
 
 TEST(DisplayNames, RefusalsShowTheModesDisplayName) {
-    BaseSession session("DEVICE_SUPPORTED = kestrel\n");
+    ManagerFixture session(Base{"DEVICE_SUPPORTED = kestrel\n"});
     for (const ModeRow& row : MODES) {
         if (row.mode != MODE_TYPE::PFF) {
-            EXPECT_FALSE(session.manager.checkConstraints(row.mode, OUTPUT_TYPE::PARALLEL));
-            EXPECT_THAT(session.messages.take(),
+            EXPECT_FALSE(session->checkConstraints(row.mode, OUTPUT_TYPE::PARALLEL));
+            EXPECT_THAT(session.messages(),
                         ElementsAre(info(201, std::string("Parallel cable is not supported in ") +
                                                   row.display + "\n")));
         }
@@ -166,36 +166,36 @@ TEST(DisplayNames, RefusalsShowTheModesDisplayName) {
 }
 
 TEST(DisplayNames, PromFileFormatterShowsWhereItRefusesADevice) {
-    BaseSession session("DEVICE_SUPPORTED = kestrel\n");
-    EXPECT_FALSE(session.manager.checkConstraints(MODE_TYPE::PFF, OUTPUT_TYPE::PARALLEL, "KS50", nullptr));
-    EXPECT_THAT(session.messages.take(),
+    ManagerFixture session(Base{"DEVICE_SUPPORTED = kestrel\n"});
+    EXPECT_FALSE(session->checkConstraints(MODE_TYPE::PFF, OUTPUT_TYPE::PARALLEL, "KS50", nullptr));
+    EXPECT_THAT(session.messages(),
                 ElementsAre(info(256, "KS50 is not supported in Prom File Formatter mode\n")));
 }
 
 TEST(DisplayNames, ValueThatIsNoModeShowsAsPromFileFormatter) {
-    BaseSession session("DEVICE_SUPPORTED = kestrel\n");
+    ManagerFixture session(Base{"DEVICE_SUPPORTED = kestrel\n"});
     for (const int value : {9, 10, -1, INT_MAX, INT_MIN}) {
-        EXPECT_FALSE(session.manager.checkConstraints(MODE_TYPE{value}, OUTPUT_TYPE::PARALLEL));
-        EXPECT_THAT(session.messages.take(),
+        EXPECT_FALSE(session->checkConstraints(MODE_TYPE{value}, OUTPUT_TYPE::PARALLEL));
+        EXPECT_THAT(session.messages(),
                     ElementsAre(info(201, "Parallel cable is not supported in Prom File Formatter mode\n")));
     }
 }
 
 TEST(DisplayNames, RefusalsShowTheOutputsDisplayName) {
-    BaseSession session("DEVICE_SUPPORTED = kestrel\n");
+    ManagerFixture session(Base{"DEVICE_SUPPORTED = kestrel\n"});
     for (const OutputRow& row : OUTPUTS) {
-        EXPECT_FALSE(session.manager.checkConstraints(MODE_TYPE::SS, row.output));
+        EXPECT_FALSE(session->checkConstraints(MODE_TYPE::SS, row.output));
         EXPECT_THAT(
-            session.messages.take(),
+            session.messages(),
             ElementsAre(info(201, std::string(row.display) + " is not supported in Slave Serial mode\n")));
     }
 }
 
 TEST(DisplayNames, ValueThatIsNoOutputShowsAsUnspecified) {
-    BaseSession session("DEVICE_SUPPORTED = kestrel\n");
+    ManagerFixture session(Base{"DEVICE_SUPPORTED = kestrel\n"});
     for (const int value : {10, -1, INT_MAX, INT_MIN}) {
-        EXPECT_FALSE(session.manager.checkConstraints(MODE_TYPE::BS, OUTPUT_TYPE{value}));
-        EXPECT_THAT(session.messages.take(),
+        EXPECT_FALSE(session->checkConstraints(MODE_TYPE::BS, OUTPUT_TYPE{value}));
+        EXPECT_THAT(session.messages(),
                     ElementsAre(info(201, "Unspecified cable is not supported in Boundary Scan mode\n")));
     }
 }

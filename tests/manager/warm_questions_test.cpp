@@ -1,4 +1,4 @@
-#include "QueryFixture.h"
+#include "Members.h"
 
 #include "host/database/CountedAllocations.h"
 
@@ -39,15 +39,15 @@ PROGRAM_OPTION = VERIFY,Bscan,USB2
 constexpr int PROGRAM = maskOf(0);
 constexpr int VERIFY = maskOf(3);
 
-int operations(const ManagerOver& manager, const char* device) {
+int operations(const ManagerFixture& manager, const char* device) {
     return manager->getDeviceOperations(device, MODE_TYPE::BS, OUTPUT_TYPE::USB2);
 }
 
-int options(const ManagerOver& manager, const char* device) {
+int options(const ManagerFixture& manager, const char* device) {
     return manager->getProgramOptions(device, MODE_TYPE::BS, OUTPUT_TYPE::USB2, nullptr);
 }
 
-bool mayProgram(const ManagerOver& manager, const char* device) {
+bool mayProgram(const ManagerFixture& manager, const char* device) {
     return manager->checkConstraints(MODE_TYPE::BS, OUTPUT_TYPE::USB2, device, OP_TYPE::PROGRAM, nullptr);
 }
 
@@ -59,7 +59,7 @@ std::size_t allocationsWhenWarm(Question question) {
 }
 
 TEST(WarmQuestions, AboutMasksAllocateNothing) {
-    const ManagerOver manager(DATABASES);
+    const ManagerFixture manager(DATABASES);
     EXPECT_EQ(allocationsWhenWarm([&] { EXPECT_EQ(operations(manager, "dev1"), PROGRAM); }), 0U);
     EXPECT_EQ(allocationsWhenWarm([&] { EXPECT_EQ(options(manager, "dev1"), maskOf(0)); }), 0U);
     EXPECT_EQ(allocationsWhenWarm([&] { EXPECT_TRUE(mayProgram(manager, "dev1")); }), 0U);
@@ -70,7 +70,7 @@ TEST(WarmQuestions, AboutMasksAllocateNothing) {
 
 TEST(WarmQuestions, AboutMasksOfLongNamesAllocateNothing) {
     // Each name is longer than short texts are, and asked about in one way only.
-    const ManagerOver manager(DATABASES);
+    const ManagerFixture manager(DATABASES);
     EXPECT_EQ(
         allocationsWhenWarm([&] { EXPECT_EQ(operations(manager, "longdevicenameforoperations"), PROGRAM); }),
         0U);
@@ -85,7 +85,7 @@ TEST(WarmQuestions, AboutMasksOfLongNamesAllocateNothing) {
 }
 
 TEST(WarmQuestions, AboutPropertiesAllocateNothing) {
-    const ManagerOver manager(DATABASES);
+    const ManagerFixture manager(DATABASES);
     for (const char* const key : {"A_PROPERTY", "VENDOR"}) {
         EXPECT_EQ(
             allocationsWhenWarm([&] { EXPECT_NE(manager->getDeviceStringProperty("dev1", key), nullptr); }),
@@ -99,36 +99,36 @@ TEST(WarmQuestions, AboutPropertiesAllocateNothing) {
 }
 
 TEST(WarmQuestions, LeaveTheLatestResolution) {
-    const ManagerOver manager(DATABASES);
+    const ManagerFixture manager(DATABASES);
     operations(manager, "dev1");
     options(manager, "dev1");
     for (const auto& question : {operations, options}) {
-        manager.peer().partFamily() = "something else";
+        manager.members().m_partFamily = "something else";
         question(manager, "dev1");
-        EXPECT_STREQ(manager.peer().partFamily().c_str(), "fam1");
+        EXPECT_STREQ(manager.members().m_partFamily.c_str(), "fam1");
     }
-    manager.peer().partFamily() = "something else";
+    manager.members().m_partFamily = "something else";
     mayProgram(manager, "dev1");
-    EXPECT_STREQ(manager.peer().partFamily().c_str(), "fam1");
+    EXPECT_STREQ(manager.members().m_partFamily.c_str(), "fam1");
 }
 
 TEST(WarmQuestions, AboutAFamilyLeaveTheLatestResolutionAlone) {
-    const ManagerOver manager(DATABASES);
+    const ManagerFixture manager(DATABASES);
     operations(manager, "fam1");
-    manager.peer().partFamily() = "something else";
+    manager.members().m_partFamily = "something else";
     EXPECT_EQ(operations(manager, "fam1"), PROGRAM);
-    EXPECT_STREQ(manager.peer().partFamily().c_str(), "something else");
+    EXPECT_STREQ(manager.members().m_partFamily.c_str(), "something else");
 }
 
 TEST(WarmQuestions, MayHoldTheLatestResolutionItself) {
-    const ManagerOver manager(DATABASES);
+    const ManagerFixture manager(DATABASES);
     operations(manager, "dev1");
-    manager.peer().partFamily() = "dev1";
-    EXPECT_EQ(operations(manager, manager.peer().partFamily().c_str()), PROGRAM);
+    manager.members().m_partFamily = "dev1";
+    EXPECT_EQ(operations(manager, manager.members().m_partFamily.c_str()), PROGRAM);
 }
 
 TEST(WarmQuestions, FollowAFamilyThatIsSeededLater) {
-    const ManagerOver manager(DATABASES);
+    const ManagerFixture manager(DATABASES);
     EXPECT_EQ(operations(manager, "dev1"), PROGRAM);
     EXPECT_EQ(options(manager, "dev1"), maskOf(0));
     manager->addCachedDeviceFamily("dev1", "fam2");
@@ -141,18 +141,18 @@ TEST(WarmQuestions, OfAFamilyThatIsSeededWithAnotherAnswerAlike) {
     // "fam3" is no supported family, but counts as "fam2": what is asked about "dev4" is answered for that.
     Files databases = DATABASES;
     databases["fam3.acd"] = "OPERATION = ERASE,Bscan,USB2\n[dev4]\n";
-    const ManagerOver manager(std::move(databases));
+    const ManagerFixture manager(std::move(databases));
     manager->setExceptions(false);
     manager->addCachedDeviceFamily("fam3", "fam2");
     EXPECT_EQ(operations(manager, "dev3"), VERIFY);
     const int first = operations(manager, "dev4");
-    manager.peer().partFamily() = "something else";
+    manager.members().m_partFamily = "something else";
     EXPECT_EQ(operations(manager, "dev4"), first);
-    EXPECT_STREQ(manager.peer().partFamily().c_str(), "fam2");
+    EXPECT_STREQ(manager.members().m_partFamily.c_str(), "fam2");
 }
 
 TEST(WarmQuestions, AboutADeviceOfAFamilyWithoutADatabaseAnswerAlike) {
-    const ManagerOver manager(DATABASES);
+    const ManagerFixture manager(DATABASES);
     manager->setExceptions(false);
     manager->addCachedDeviceFamily("dev1", "nowhere");
     for (int time = 0; time != 3; ++time) {
@@ -164,7 +164,7 @@ TEST(WarmQuestions, AboutADeviceOfAFamilyWithoutADatabaseAnswerAlike) {
 
 TEST(WarmQuestions, AboutTheEmptyNameAreAnsweredForTheFamilyOfThatName) {
     // An empty item is a name like any other.
-    const ManagerOver manager(
+    const ManagerFixture manager(
         Files{{"base.acd",
                "DEVICE_SUPPORTED = ,fam1\nPROGRAM_OPTION_PACKAGE = ,fam1\nOPERATION = VERIFY,Bscan,USB2\n"},
               {"fam1.acd", "OPERATION = PROGRAM,Bscan,USB2\n[dev1]\n"}});
@@ -177,7 +177,7 @@ TEST(WarmQuestions, AboutTheEmptyNameAreAnsweredForTheFamilyOfThatName) {
 
 TEST(WarmQuestions, FindTheOwnPropertyWhereNamesRunTogether) {
     // "a" with "b_c" and "a_b" with "c" are stored in the same place: the one that is loaded last stands there.
-    const ManagerOver manager(
+    const ManagerFixture manager(
         Files{{"base.acd", "DEVICE_SUPPORTED = fam1,spi\nPROGRAM_OPTION_PACKAGE = fam1,spi\n"},
               {"fam1.acd", "[a]\nPROPERTY = b_c,1\n[a_b]\nPROPERTY = c,2\n"}});
     EXPECT_STREQ(manager->getDeviceStringProperty("a", "b_c"), "1");

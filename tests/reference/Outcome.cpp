@@ -3,7 +3,7 @@
 
 #include "support/TarvikTestPeer.h"
 
-#include "PropertyTable.h"
+#include <Implementation.h>
 
 #include <tarvik/ConstraintsManager.h>
 
@@ -162,44 +162,44 @@ std::vector<Member> members(const Reference& reference) {
 }
 
 std::vector<Member> members(ConstraintsManager& manager) {
-    TarvikTestPeer peer(manager);
-    const std::vector<std::vector<StringBase>> classDevices{peer.at1Devices(),  peer.st1Devices(),
-                                                            peer.st2Devices(),  peer.bpi1Devices(),
-                                                            peer.bpi2Devices(), peer.bpi3Devices()};
+    auto& members = TarvikTestPeer::members(manager);
+    const std::vector<std::vector<StringBase>> classDevices{members.m_at1Devices,  members.m_st1Devices,
+                                                            members.m_st2Devices,  members.m_bpi1Devices,
+                                                            members.m_bpi2Devices, members.m_bpi3Devices};
     return {
-        {"m_bsCables", show(peer.bsCables())},
-        {"m_bsDevices", show(peer.bsDevices())},
-        {"m_ssCables", show(peer.ssCables())},
-        {"m_ssDevices", show(peer.ssDevices())},
-        {"m_smCables", show(peer.smCables())},
-        {"m_smDevices", show(peer.smDevices())},
-        {"m_bsFileCables", show(peer.bsFileCables())},
-        {"m_bsFileDevices", show(peer.bsFileDevices())},
-        {"m_dp770Cables", show(peer.dp770Cables())},
-        {"m_dp770Devices", show(peer.dp770Devices())},
-        {"m_spiCables", show(peer.spiCables())},
-        {"m_spiDevices", show(peer.spiDevices())},
-        {"m_kiteCfCables", show(peer.kiteCfCables())},
-        {"m_kiteCfDevices", show(peer.kiteCfDevices())},
-        {"m_kiteMpmCables", show(peer.kiteMpmCables())},
-        {"m_kiteMpmDevices", show(peer.kiteMpmDevices())},
-        {"m_pffCables", show(peer.pffCables())},
-        {"m_pffDevices", show(peer.pffDevices())},
-        {"m_supportedDevices", show(peer.supportedDevices())},
-        {"m_programOptionPackages", show(peer.programOptionPackages())},
-        {"m_notSupportedPartInMode", show(peer.notSupportedPartInMode())},
-        {"m_loadedFamilies", show(peer.loadedFamilies())},
-        {"m_operationsLoaded", show(peer.operationsLoaded())},
-        {"m_programOptionsLoaded", show(peer.programOptionsLoaded())},
-        {"m_deviceProperties", show(ordered(peer.deviceProperties()))},
-        {"m_deviceFamilyCache", show(peer.deviceFamilyCache())},
-        {"m_partFamily", show(peer.partFamily())},
-        {"m_spiProperties", show(peer.spiProperties())},
-        {"m_spiNames", show(peer.spiNames())},
-        {"m_spiFamilies", show(peer.spiFamilies())},
+        {"m_bsCables", show(members.m_bsCables)},
+        {"m_bsDevices", show(members.m_bsDevices)},
+        {"m_ssCables", show(members.m_ssCables)},
+        {"m_ssDevices", show(members.m_ssDevices)},
+        {"m_smCables", show(members.m_smCables)},
+        {"m_smDevices", show(members.m_smDevices)},
+        {"m_bsFileCables", show(members.m_bsFileCables)},
+        {"m_bsFileDevices", show(members.m_bsFileDevices)},
+        {"m_dp770Cables", show(members.m_dp770Cables)},
+        {"m_dp770Devices", show(members.m_dp770Devices)},
+        {"m_spiCables", show(members.m_spiCables)},
+        {"m_spiDevices", show(members.m_spiDevices)},
+        {"m_kiteCfCables", show(members.m_kiteCfCables)},
+        {"m_kiteCfDevices", show(members.m_kiteCfDevices)},
+        {"m_kiteMpmCables", show(members.m_kiteMpmCables)},
+        {"m_kiteMpmDevices", show(members.m_kiteMpmDevices)},
+        {"m_pffCables", show(members.m_pffCables)},
+        {"m_pffDevices", show(members.m_pffDevices)},
+        {"m_supportedDevices", show(members.m_supportedDevices)},
+        {"m_programOptionPackages", show(members.m_programOptionPackages)},
+        {"m_notSupportedPartInMode", show(members.m_notSupportedPartInMode)},
+        {"m_loadedFamilies", show(members.m_loadedFamilies)},
+        {"m_operationsLoaded", show(members.m_operationsLoaded)},
+        {"m_programOptionsLoaded", show(members.m_programOptionsLoaded)},
+        {"m_deviceProperties", show(ordered(members.m_deviceProperties))},
+        {"m_deviceFamilyCache", show(members.m_deviceFamilyCache)},
+        {"m_partFamily", show(members.m_partFamily)},
+        {"m_spiProperties", show(members.m_spiProperties)},
+        {"m_spiNames", show(members.m_spiNames)},
+        {"m_spiFamilies", show(members.m_spiFamilies)},
         {"the devices by class", show(classDevices)},
-        {"m_multibootTypes", show(peer.multibootTypes())},
-        {"m_operationOptions", show(peer.operationOptions())},
+        {"m_multibootTypes", show(members.m_multibootTypes)},
+        {"m_operationOptions", show(members.m_operationOptions)},
     };
 }
 

@@ -29,15 +29,10 @@ struct Candidate {
 
 using Words = std::vector<std::string>;
 
-Words joined(Words left, const Words& right) {
-    left.insert(left.end(), right.begin(), right.end());
-    return left;
-}
-
 Words modes() {
     Words all = vocabulary::modes();
-    for (std::size_t mode = 0; mode < vocabulary::modes().size(); ++mode) {
-        all = joined(std::move(all), vocabulary::otherModeTexts(static_cast<TARVIKNS::MODE_TYPE>(mode)));
+    for (const vocabulary::Word& word : vocabulary::words(vocabulary::Kind::MODE)) {
+        all.insert(all.end(), word.others.begin(), word.others.end());
     }
     return all;
 }
@@ -60,19 +55,44 @@ ConstraintsManager& manager() {
 
 /// The properties of a device and its family, or of all families when there is no device.
 Words properties(const PartialCommandLine& line) {
-    const Words owners = line.operands.empty()
-                             ? catalogue::families()
-                             : Words{device(line), plain(manager().getPartFamily(device(line).c_str()))};
+    const Words owners =
+        line.operands.empty()
+            ? catalogue::families()
+            : Words{device(line), toStdString(manager().getPartFamily(device(line).c_str()))};
     std::set<std::string> keys;
     for (const std::string& owner : owners) {
         addKeys(keys, owner, "PROPERTY");
         addKeys(keys, owner, "PROPERTIES");
-        addKeys(keys, "spi.acd", plain(UT_STR::Upper(owner.c_str())) + "_PROPERTY");
+        addKeys(keys, "spi.acd", toStdString(UT_STR::Upper(owner.c_str())) + "_PROPERTY");
     }
     return {keys.begin(), keys.end()};
 }
 
-Words propertiesToSet(const PartialCommandLine& line) {
+/// The values that any device has for a property.
+std::set<std::string> valuesOfProperty(const std::string& key) {
+    std::set<std::string> values;
+    for (const std::string& device : catalogue::names()) {
+        for (const StringBase& value : manager().getDeviceStringProperties(device.c_str(), key.c_str())) {
+            values.insert(toStdString(value));
+        }
+        if (manager().isSpiDevice(device.c_str())) {
+            values.insert(manager().getSpiDeviceStringProperty(device.c_str(), key.c_str()));
+        }
+    }
+    values.erase("");
+    return values;
+}
+
+/// "VENDOR=" for each property; after "VENDOR=" its values.
+Words assignments(const PartialCommandLine& line) {
+    const std::size_t equals = line.partialWord.find('=');
+    if (equals != std::string::npos) {
+        Words all;
+        for (const std::string& value : valuesOfProperty(line.partialWord.substr(0, equals))) {
+            all.push_back(line.partialWord.substr(0, equals + 1) + value);
+        }
+        return all;
+    }
     Words keys = properties(line);
     for (std::string& key : keys) {
         key += '=';
@@ -83,7 +103,7 @@ Words propertiesToSet(const PartialCommandLine& line) {
 Words packages(const PartialCommandLine& line) {
     Words all;
     for (const StringBase& package : manager().getDeviceStringProperties(device(line).c_str(), "PACKAGES")) {
-        all.push_back(plain(package));
+        all.push_back(toStdString(package));
     }
     return all;
 }
@@ -106,10 +126,12 @@ Words codes() {
 
 /// The words that an argument can have.
 /// @throw CommandError (NO) where a file's name is expected
-Words valuesOf(const PartialCommandLine& line, const Argument& argument) {
+Words valuesOf(const CommandLine& all, const PartialCommandLine& line, const Argument& argument) {
     switch (argument.kind) {
     case ValueKind::PATH:
         throw CommandError(ExitCode::NO, "a file's name");
+    case ValueKind::COMMAND:
+        return all.commandNames();
     case ValueKind::DEVICE:
         return catalogue::names();
     case ValueKind::FLASH:
@@ -129,7 +151,7 @@ Words valuesOf(const PartialCommandLine& line, const Argument& argument) {
     case ValueKind::PROPERTY:
         return properties(line);
     case ValueKind::PROPERTY_VALUE:
-        return propertiesToSet(line);
+        return assignments(line);
     case ValueKind::LINT_CODE:
         return codes();
     case ValueKind::TEXT:
@@ -166,10 +188,10 @@ void openDatabase(const PartialCommandLine& partial) {
     }
 }
 
-std::vector<Candidate> argumentsOf(const PartialCommandLine& partial) {
+std::vector<Candidate> argumentsOf(const CommandLine& line, const PartialCommandLine& partial) {
     openDatabase(partial);
     std::vector<Candidate> all;
-    for (const std::string& word : valuesOf(partial, *partial.argument)) {
+    for (const std::string& word : valuesOf(line, partial, *partial.argument)) {
         all.push_back({partial.prefix + word, ""});
     }
     return all;
@@ -180,7 +202,7 @@ std::vector<Candidate> candidates(const CommandLine& line, const PartialCommandL
         return optionsOf(line, partial.command);
     }
     if (partial.argument != nullptr) {
-        return argumentsOf(partial);
+        return argumentsOf(line, partial);
     }
     return partial.command == nullptr && partial.prefix.empty() ? commandsOf(line) : std::vector<Candidate>{};
 }

@@ -1,9 +1,9 @@
-# Completion of tarvik for bash. What may stand where is told by the tool itself: tarvik complete WORDS.
+# Completion of tarvik for bash. The tool itself lists the words: tarvik complete WORDS.
 
 _tarvik() {
     local line=${COMP_LINE:0:COMP_POINT} words reply status
 
-    # Bash takes words apart at "=" and ":"; the tool wants them whole, and bash only what is behind.
+    # Bash splits words at "=" and ":". The tool needs them whole; bash replaces the last part only.
     read -ra words <<<"$line"
     [[ $line == *[[:space:]] ]] && words+=("")
     local typed=${words[-1]} current=${COMP_WORDS[COMP_CWORD]}
@@ -16,13 +16,14 @@ _tarvik() {
         compopt -o default
         return
     fi
-    local word
+    local word cut=$((${#typed} - ${#current}))
     while IFS=$'\t' read -r word _; do
-        [[ -n $word ]] || continue
-        printf -v word %q "${word#"${typed%"$current"}"}"
+        # What was typed is cut by its length: it may differ in case.
+        [[ -n ${word:cut} ]] || continue
+        printf -v word %q "${word:cut}"
         COMPREPLY+=("$word")
     done <<<"$reply"
-    # What goes on behind "=" wants no blank.
+    # A value follows "=" without a blank.
     if [[ ${#COMPREPLY[@]} -eq 1 && ${COMPREPLY[0]} == *= ]]; then
         compopt -o nospace
     fi

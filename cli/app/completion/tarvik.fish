@@ -1,4 +1,4 @@
-# Completion of tarvik for fish. What may stand where is told by the tool itself: tarvik complete WORDS.
+# Completion of tarvik for fish. The tool itself lists the words: tarvik complete WORDS.
 
 function __tarvik_complete
     set -l words (commandline --tokenize --current-process --cut-at-cursor)

@@ -1,8 +1,6 @@
-// Rules about IDCODE: the codes by which devices are told apart on the cable.
+// Rules about IDCODE: the codes that identify devices on the cable.
 #include "lint/Findings.h"
 #include "lint/rules/RuleSets.h"
-
-#include <fmt/format.h>
 
 #include <algorithm>
 #include <cstdint>
@@ -16,39 +14,58 @@ namespace lint {
 namespace {
 
 constexpr Rule MALFORMED_CODE{
-    "D101", Level::ERROR, "IDCODE not of the form 0xHHHHHHHH",
-    "An IDCODE is \"0x\" and eight hexadecimal digits, with X for a digit that does not matter.",
+    "D101",
+    "malformed-idcode",
+    Severity::ERROR,
+    "IDCODE not of the form 0xHHHHHHHH",
+    R"(An IDCODE is "0x" and eight hexadecimal digits, with X for a digit that can have any value.)",
     "IDCODE = KS50,0x4104FB7"};
 constexpr Rule BIT_0_CLEAR{
-    "D102", Level::ERROR, "IDCODE with bit 0 clear",
-    "Bit 0 of an identification code is always 1, which tells it from the bypass register; so the "
-    "last digit is odd.",
+    "D102",
+    "idcode-bit-0-clear",
+    Severity::ERROR,
+    "IDCODE with bit 0 clear",
+    R"(Bit 0 of an identification code is always 1, which distinguishes it from the bypass register; so the last digit
+is odd.)",
     "IDCODE = KS50,0xX4104FB6"};
 constexpr Rule AMBIGUOUS_CODE{
-    "D103", Level::ERROR, "IDCODE of two devices",
-    "There is a code that both entries match, digits that do not matter considered, so the "
-    "devices can't be told apart.",
+    "D103",
+    "ambiguous-idcode",
+    Severity::ERROR,
+    "IDCODE of two devices",
+    R"(Some code matches both entries, their X digits considered, so the two devices cannot be distinguished.)",
     "IDCODE = KS50,0xX4104FB7:KS100,0x14104FB7"};
 constexpr Rule UNKNOWN_DEVICE{
-    "D104", Level::ERROR, "IDCODE of an unknown device",
-    "The name is none that a family's file has a section for, spelt so. Families and flashes "
-    "have no IDCODE.",
+    "D104",
+    "idcode-of-unknown-device",
+    Severity::ERROR,
+    "IDCODE of an unknown device",
+    R"(No family's file has a section of exactly this name. Families and flashes have no IDCODE.)",
     "IDCODE = ks50,0xX4104FB7"};
 constexpr Rule NO_CODE{
-    "D105", Level::ERROR, "device without an IDCODE",
-    "Each device of a family has an IDCODE of its own in base.acd; one without is never recognised on "
-    "the cable.",
+    "D105",
+    "no-idcode",
+    Severity::ERROR,
+    "device without an IDCODE",
+    R"(Each device of a family needs an IDCODE of its own in base.acd. A device without one is never recognised on the
+cable.)",
     "# no KS75 in IDCODE\n[KS75]"};
-constexpr Rule DEVICE_TWICE{"D106", Level::ERROR, "device given two IDCODEs",
-                            "A device that is given twice keeps the last code; the first is lost.",
+constexpr Rule DEVICE_TWICE{"D106",
+                            "two-idcodes",
+                            Severity::ERROR,
+                            "device with two IDCODEs",
+                            "Of two IDCODEs of one device the last counts; the first is lost.",
                             "IDCODE = KS50,0xX4104FB7:KS50,0xX4108FB7"};
 constexpr Rule MALFORMED_ENTRY{
-    "D107", Level::ERROR, "IDCODE entry that is not device and code",
-    "An entry is a device, \",\" and its code; entries stand between \":\". A missing code is none; "
-    "what stands behind it is never read.",
+    "D107",
+    "malformed-idcode-entry",
+    Severity::ERROR,
+    "IDCODE entry that is not device and code",
+    R"(An entry is a device, "," and its code; entries are separated by ":". Without a code the device has an empty
+one, and fields after the code are not read.)",
     "IDCODE = KS50,0xX4104FB7,KS100,0xX4108FB7"};
 
-/// A code, and which of its bits matter.
+/// A code; `mask` has the bits that are fixed.
 struct Pattern {
     std::uint32_t bits = 0;
     std::uint32_t mask = 0;
@@ -79,15 +96,15 @@ std::optional<Pattern> patternOf(std::string_view text) {
     return pattern;
 }
 
-/// Finds patterns that have a code in common. There are few different masks, however many codes there are.
-class Codes {
+/// Finds patterns that match a common code. There are few different masks, however many codes there are.
+class IdcodeIndex {
 public:
     struct Known {
         Pattern pattern;
         const Token* device;
     };
 
-    /// The device of a code that this one has a code in common with; null when there is none.
+    /// A device whose pattern matches a code that this one matches, too; null when there is none.
     const Token* find(const Pattern& pattern) {
         for (const std::uint32_t mask : m_masks) {
             const std::uint32_t common = mask & pattern.mask;
@@ -128,75 +145,88 @@ private:
     std::map<std::pair<std::uint32_t, std::uint32_t>, Index> m_indexes;
 };
 
-void checkCode(const Token& device, const Token& code, Codes& codes, Findings& findings) {
+void checkCode(const Token& device, const Token& code, bool counts, IdcodeIndex& codes, Findings& findings) {
     const std::optional<Pattern> pattern = patternOf(code.text);
     if (!pattern) {
-        findings.add(MALFORMED_CODE, code,
-                     fmt::format("{} is not 0x and eight hexadecimal digits or X", quoted(code.text)));
+        findings.add(MALFORMED_CODE, code, "{} is not 0x and eight hexadecimal digits or X",
+                     quoted(code.text));
         return;
     }
     if ((pattern->mask & 1U) != 0 && (pattern->bits & 1U) == 0) {
-        findings.add(BIT_0_CLEAR, code, fmt::format("bit 0 of {} is clear", quoted(code.text)));
+        findings.add(BIT_0_CLEAR, code, "bit 0 of {} is clear", quoted(code.text));
+    }
+    if (!counts) {
+        return;
     }
     if (const Token* const other = codes.find(*pattern); other != nullptr && other->text != device.text) {
-        findings.add(
-            AMBIGUOUS_CODE, code,
-            fmt::format("the IDCODE of {} matches that of {} too", quoted(device.text), quoted(other->text)));
+        findings.add(AMBIGUOUS_CODE, code, "the IDCODE of {} matches that of {} too", quoted(device.text),
+                     quoted(other->text));
     }
     codes.add({*pattern, &device});
 }
 
-void checkDevice(const Model& model, const Token& device, Findings& findings) {
+void checkDevice(const Model& model, const Token& device, const std::vector<Token>& used,
+                 Findings& findings) {
     if (model.device(device.text) != nullptr) {
         return;
     }
-    const bool isOther = model.isFamily(device.text) || model.isFlashInAnyCase(std::string(device.text));
-    findings.add(UNKNOWN_DEVICE, device,
-                 isOther ? fmt::format("{} is no device of a family, and has no IDCODE", quoted(device.text))
-                         : fmt::format("unknown device {}{}", quoted(device.text),
-                                       findings.didYouMean(device.text, model.deviceNames())));
+    if (model.isFamily(device.text) || model.isFlashInAnyCase(std::string(device.text))) {
+        findings.add(UNKNOWN_DEVICE, device, "{} is no device of a family, and has no IDCODE",
+                     quoted(device.text));
+    } else {
+        findings.add(UNKNOWN_DEVICE, device, "unknown device {}{}", quoted(device.text),
+                     findings.didYouMean(device.text, model.deviceNames(), used));
+    }
 }
 
 void check(const Model& model, Findings& findings) {
     std::map<std::string_view, const AcdLines*> withCode;
-    if (const Entry* const entry = model.baseEntry("IDCODE")) {
-        Codes codes;
-        for (const Record& record : entry->records) {
-            const Token& device = record.fields.front();
-            if (device.text.empty()) {
-                continue;
-            }
-            checkDevice(model, device, findings);
-            // A layer on top may well append another code.
-            const AcdLines*& file = withCode[device.text];
-            if (std::exchange(file, device.place.file) == device.place.file) {
-                findings.add(DEVICE_TWICE, device,
-                             fmt::format("the former IDCODE of {} is lost", quoted(device.text)));
-            }
-            if (record.fields.size() != 2) {
-                findings.add(MALFORMED_ENTRY, record.fields.size() < 2 ? device : record.fields[2],
-                             record.fields.size() < 2
-                                 ? fmt::format("no code behind {}", quoted(device.text))
-                                 : fmt::format("{} is never read: entries stand between \":\"",
-                                               quoted(record.fields[2].text)));
-            }
-            if (record.fields.size() > 1 && !record.fields[1].text.empty()) {
-                checkCode(device, record.fields[1], codes, findings);
-            }
+    // Only the last code of a device counts: a layer on top may give its former code to another device.
+    std::map<std::string_view, const Token*> last;
+    std::vector<Token> used;
+    for (const Item& item : model.baseKeys().items(schema::IDCODE)) {
+        last.insert_or_assign(item.fields.front().text, &item.fields.front());
+        used.push_back(item.fields.front());
+    }
+    IdcodeIndex codes;
+    for (const Item& item : model.baseKeys().items(schema::IDCODE)) {
+        const std::vector<Token>& fields = item.fields;
+        const Token& device = fields.front();
+        if (device.text.empty()) {
+            continue;
+        }
+        checkDevice(model, device, used, findings);
+        // A layer on top may append another code on purpose.
+        const AcdLines*& file = withCode[device.text];
+        if (std::exchange(file, device.location.file) == device.location.file) {
+            findings.add(DEVICE_TWICE, device, "the former IDCODE of {} is lost", quoted(device.text));
+        }
+        if (fields.size() < 2) {
+            findings.add(MALFORMED_ENTRY, device, "no code behind {}", quoted(device.text));
+        } else if (fields.size() > 2) {
+            findings.add(MALFORMED_ENTRY, fields[2], "{} is never read: entries stand between \":\"",
+                         quoted(fields[2].text));
+        }
+        if (fields.size() > 1 && !fields[1].text.empty()) {
+            checkCode(device, fields[1],
+                      last[device.text] == &device ||
+                          item.whole.location.file == last[device.text]->location.file,
+                      codes, findings);
         }
     }
     for (const auto& [name, device] : model.devices()) {
         if (!withCode.contains(name)) {
-            findings.add(NO_CODE, device.section->name,
-                         fmt::format("IDCODE of base.acd lacks the device {}", quoted(name)));
+            findings.add(NO_CODE, device.section->name, "IDCODE of base.acd lacks the device {}",
+                         quoted(name));
         }
     }
 }
 
 } // namespace
 
-Group idcodeRules() {
-    return {{&MALFORMED_CODE, &BIT_0_CLEAR, &AMBIGUOUS_CODE, &UNKNOWN_DEVICE, &NO_CODE, &DEVICE_TWICE,
+RuleSet idcodeRules() {
+    return {"IDCODEs",
+            {&MALFORMED_CODE, &BIT_0_CLEAR, &AMBIGUOUS_CODE, &UNKNOWN_DEVICE, &NO_CODE, &DEVICE_TWICE,
              &MALFORMED_ENTRY},
             check};
 }

@@ -1,12 +1,10 @@
-// Rules about keys: one that is set twice loses a value, one that nobody knows says nothing.
-#include "lint/Keys.h"
-
+// Rules about keys: one that is set twice loses a value, one that is unknown has no effect.
 #include "lint/Findings.h"
 #include "lint/rules/RuleSets.h"
 
 #include "text/Suggest.h"
 
-#include <fmt/format.h>
+#include <UT_STR.h>
 
 #include <algorithm>
 #include <map>
@@ -17,32 +15,38 @@ namespace lint {
 namespace {
 
 constexpr Rule DUPLICATE_KEY{
-    "K101", Level::ERROR, "key set twice in one section",
-    "In one section of one file the last \"=\" stands, and what the key had before is lost. Join the values, "
-    "or add to "
-    "the first with \"+=\". A layer on top may set a key anew; that is what layers are for.",
+    "K101",
+    "duplicate-key",
+    Severity::ERROR,
+    "key set twice in one section",
+    R"(In one section of one file the last "=" counts, and the former value of the key is lost. Join the values, or
+add to the first with "+=". A layer on top may set a key again; that is what layers are for.)",
     "PROPERTY = VENDOR,Korvel\nPROPERTY = KIND,FPGA"};
-constexpr Rule UNKNOWN_KEY{"K102", Level::WARNING, "key that nobody reads",
-                           "The manager reads a fixed set of keys, with case, and each only in its own "
-                           "place: mode lists and IDCODEs in "
-                           "base.acd, flashes in spi.acd, tables and properties in the families' files and "
-                           "their sections. Any other key is "
-                           "without effect.",
-                           "PROGRAM_OPTIONS = VERIFY,Bscan,USB2"};
-constexpr Rule NEVER_READ_OPERATIONS{"K201", Level::ERROR,
-                                     "operations of a device that DEVICE_SUPPORTED does not list",
-                                     "A section's OPERATION and BSDL_OPERATION are read only when "
-                                     "DEVICE_SUPPORTED of base.acd lists the device; all "
-                                     "others get their family's tables. List the device there (and in "
-                                     "PROGRAM_OPTION_PACKAGE), or drop the key.",
-                                     "[KS50]\nOPERATION = PROGRAM,Bscan,USB2"};
+constexpr Rule UNKNOWN_KEY{
+    "K102",
+    "unknown-key",
+    Severity::WARNING,
+    "key that is not read",
+    R"(The manager reads a fixed set of keys, case-sensitive, and each only in its own file: mode lists and IDCODEs in
+base.acd, flashes in spi.acd, tables and properties in the families' files and their sections. Any other key has
+no effect.)",
+    "PROGRAM_OPTIONS = VERIFY,Bscan,USB2"};
+constexpr Rule IGNORED_OPERATIONS{
+    "K201",
+    "ignored-operations",
+    Severity::ERROR,
+    "operations of a device that DEVICE_SUPPORTED does not list",
+    R"(A section's OPERATION and BSDL_OPERATION are read only if DEVICE_SUPPORTED of base.acd lists the device; all
+others get their family's tables. List the device there (and in PROGRAM_OPTION_PACKAGE), or remove the key.)",
+    "[KS50]\nOPERATION = PROGRAM,Bscan,USB2"};
 constexpr Rule LEAKING_OPTIONS{
-    "K202", Level::ERROR, "options of a device that PROGRAM_OPTION_PACKAGE does not list",
-    "The options of a section go to the table of the device when PROGRAM_OPTION_PACKAGE lists it by its bare "
-    "name. "
-    "Otherwise they go to the table of the whole family: whichever is asked for first fills it, so answers "
-    "depend on "
-    "the order of questions. Listing the device together with a package does not stop that.",
+    "K202",
+    "leaking-options",
+    Severity::ERROR,
+    "options of a device that PROGRAM_OPTION_PACKAGE does not list",
+    R"(The options of a section fill the table of the device if PROGRAM_OPTION_PACKAGE lists it by its bare name.
+Otherwise they fill the table of the whole family: the device or family that is asked for first fills it, so answers
+depend on the order of questions. Listing the device together with a package does not prevent that.)",
     "[KS50]\nPROGRAM_OPTION = VERIFY,Bscan,USB2"};
 
 void checkDuplicates(const Model& model, Findings& findings) {
@@ -60,8 +64,8 @@ void checkDuplicates(const Model& model, Findings& findings) {
                 const auto [known, isFirst] = lines.try_emplace({section, line.name}, line.line);
                 if (!isFirst && line.kind == AcdLines::Kind::ASSIGNMENT) {
                     findings.add(DUPLICATE_KEY, {line.name, {&file, line.line, line.column}},
-                                 fmt::format("the key {} is set again: what line {} gave is lost",
-                                             quoted(line.name), known->second));
+                                 "the key {} is set again: what line {} gave is lost", quoted(line.name),
+                                 known->second);
                 }
                 known->second = line.line;
             }
@@ -69,26 +73,35 @@ void checkDuplicates(const Model& model, Findings& findings) {
     }
 }
 
-const std::vector<std::string>& sectionKeys() {
-    static const std::vector<std::string> keys(FAMILY_KEYS.begin(), FAMILY_KEYS.end());
-    return keys;
+/// The keys that are read before the first section of a file.
+std::vector<std::string> knownKeys(const Model& model, schema::File kind) {
+    std::vector<std::string> all = schema::fixedKeys(kind);
+    if (kind == schema::File::SPI) {
+        for (const FlashList& family : model.flashFamilies()) {
+            all.push_back(schema::devicesKey(family.family.text));
+        }
+        for (const std::string& name : model.flashNames()) {
+            all.push_back(schema::propertyKey(name));
+        }
+    }
+    return all;
 }
 
-/// Where a key would be read that is not read here.
-std::string placeElsewhere(std::string_view key, Family::Kind kind) {
-    if (kind != Family::Kind::BASE && shapeOf(Family::Kind::BASE, key) != Shape::NONE) {
-        return "; it belongs to base.acd";
-    }
-    if (kind != Family::Kind::SPI && shapeOf(Family::Kind::SPI, key) != Shape::NONE) {
-        return "; it belongs to spi.acd";
+/// The file that a key belongs to, when it is another one.
+std::string fileHint(std::string_view key, schema::File kind) {
+    for (const auto& [other, name] :
+         {std::pair(schema::File::BASE, schema::BASE), {schema::File::SPI, schema::SPI}}) {
+        if (kind != other && schema::shapeOf(other, key) != schema::Shape::NONE) {
+            return fmt::format("; it belongs to {}", name);
+        }
     }
     return {};
 }
 
-/// Looks at the keys of one file.
+/// Checks the keys of the files of one family.
 class KeyCheck {
 public:
-    KeyCheck(const Model& model, const Family& family, Findings& findings)
+    KeyCheck(const Model& model, const FamilyData& family, Findings& findings)
         : m_kind(family.kind), m_own(knownKeys(model, family.kind)), m_findings(findings) {
         std::sort(m_own.begin(), m_own.end());
     }
@@ -102,10 +115,10 @@ public:
                 open = line.closesSection ? Open::NOTHING : open;
             } else if (open == Open::OWN && !isRead(line.name)) {
                 add(file, line, hint(line.name, m_own));
-            } else if (open == Open::SECTION && shapeInSection(line.name) == Shape::NONE) {
+            } else if (open == Open::SECTION && schema::shapeInSection(line.name) == schema::Shape::NONE) {
                 add(file, line,
                     isRead(line.name) ? "; it belongs before the first section"
-                                      : hint(line.name, sectionKeys()));
+                                      : hint(line.name, m_inSection));
             }
         }
     }
@@ -116,22 +129,23 @@ private:
     }
 
     [[nodiscard]] std::string hint(std::string_view key, const std::vector<std::string>& known) {
-        const std::string place = placeElsewhere(key, m_kind);
-        return place.empty() ? m_findings.didYouMean(key, known) : place;
+        const std::string file = fileHint(key, m_kind);
+        return file.empty() ? m_findings.didYouMean(key, known) : file;
     }
 
     void add(const AcdLines& file, const AcdLines::Line& line, const std::string& hint) {
         m_findings.add(UNKNOWN_KEY, {line.name, {&file, line.line, line.column}},
-                       fmt::format("nobody reads the key {} here{}", quoted(line.name), hint));
+                       "nobody reads the key {} here{}", quoted(line.name), hint);
     }
 
-    Family::Kind m_kind;
+    schema::File m_kind;
     std::vector<std::string> m_own;
+    std::vector<std::string> m_inSection = schema::fixedKeys(schema::File::FAMILY);
     Findings& m_findings;
 };
 
 void checkKnown(const Model& model, Findings& findings) {
-    for (const Family& family : model.families()) {
+    for (const FamilyData& family : model.families()) {
         KeyCheck check(model, family, findings);
         for (const AcdLines* file : family.files) {
             check.check(*file);
@@ -144,20 +158,20 @@ void checkSections(const Model& model, Findings& findings) {
         if (model.supported().contains(name)) {
             continue; // its tables are its own
         }
-        for (const char* const key : {"OPERATION", "BSDL_OPERATION"}) {
-            if (const Entry* const entry = device.section->find(key)) {
-                findings.add(NEVER_READ_OPERATIONS, entry->key,
-                             fmt::format("{} of {} is never read: DEVICE_SUPPORTED does not list the device",
-                                         key, quoted(name)));
+        for (const char* const key : {schema::OPERATION, schema::BSDL_OPERATION}) {
+            if (const Value* const value = device.section->find(key)) {
+                findings.add(IGNORED_OPERATIONS, value->key,
+                             "{} of {} is never read: DEVICE_SUPPORTED does not list the device", key,
+                             quoted(name));
             }
         }
-        const Entry* const options = device.section->find("PROGRAM_OPTION");
+        const Value* const options = device.section->find(schema::PROGRAM_OPTION);
         if (options != nullptr && !model.optionPackages().contains(name)) {
             findings.add(
                 LEAKING_OPTIONS, options->key,
-                fmt::format("the options of {} leak into those of family {}: PROGRAM_OPTION_PACKAGE does not "
-                            "list the device",
-                            quoted(name), quoted(device.family->name)));
+                "the options of {} leak into those of family {}: PROGRAM_OPTION_PACKAGE does not list the "
+                "device",
+                quoted(name), quoted(device.family->name));
         }
     }
 }
@@ -170,6 +184,8 @@ void check(const Model& model, Findings& findings) {
 
 } // namespace
 
-Group keyRules() { return {{&DUPLICATE_KEY, &UNKNOWN_KEY, &NEVER_READ_OPERATIONS, &LEAKING_OPTIONS}, check}; }
+RuleSet keyRules() {
+    return {"keys", {&DUPLICATE_KEY, &UNKNOWN_KEY, &IGNORED_OPERATIONS, &LEAKING_OPTIONS}, check};
+}
 
 } // namespace lint

@@ -1,9 +1,7 @@
-// Rules about lines that the reader can make nothing of: each costs the line, and is reported where it stands.
+// Rules about lines that the reader rejects: each costs the line and is reported at its place.
 #include "lint/rules/RuleSets.h"
 
 #include "lint/Findings.h"
-
-#include <fmt/format.h>
 
 #include <algorithm>
 
@@ -11,68 +9,110 @@ namespace lint {
 
 namespace {
 
-constexpr Rule NO_EQUALS_SIGN{"L101", Level::ERROR, "line without \"=\"",
-                              "A line is a comment, a header or an assignment. One that is none of them is "
-                              "dropped, with all that it goes on "
-                              "with. Often a \"\\\" is missing at the end of the line before.",
-                              "OPERATION = PROGRAM,Bscan,USB2:\n            VERIFY,Bscan,USB2"};
-constexpr Rule EMPTY_KEY{"L102", Level::ERROR, "no key before \"=\"",
-                         "An assignment begins with the key that it sets. Without one the line is dropped.",
-                         "= VENDOR,Korvel"};
+constexpr Rule NO_EQUALS_SIGN{
+    "L101",
+    "no-equals-sign",
+    Severity::ERROR,
+    R"(line without "=")",
+    R"(A line is a comment, a header or an assignment. Any other line is dropped, together with its continuation
+lines. Often a "\" is missing at the end of the line before.)",
+    "OPERATION = PROGRAM,Bscan,USB2:\n            VERIFY,Bscan,USB2"};
+constexpr Rule EMPTY_KEY{
+    "L102",
+    "empty-key",
+    Severity::ERROR,
+    R"(no key before "=")",
+    R"(An assignment begins with the key that it sets. Without one the line is dropped.)",
+    "= VENDOR,Korvel"};
 constexpr Rule BLANK_IN_KEY{
-    "L103", Level::ERROR, "blank in a key",
-    "A key is one word; only the blanks around it are dropped. The line is dropped. Often a value that "
-    "should have "
-    "gone on stands there instead, because the \"\\\" before it is missing or followed by a blank.",
+    "L103",
+    "blank-in-key",
+    Severity::ERROR,
+    "blank in a key",
+    R"(A key is one word; only the blanks around it are dropped. The line is dropped. Often the line was meant to
+continue a value, and the "\" before it is missing or followed by a blank.)",
     "BSDL OPERATION = BYPASS,USB2"};
 constexpr Rule NUL_BYTE{
-    "L104", Level::ERROR, "NUL byte",
-    "Values end at a NUL where applications read them, so a line that holds one is dropped. The "
-    "file was damaged, or written in an encoding of two bytes a character.",
+    "L104",
+    "nul-byte",
+    Severity::ERROR,
+    "NUL byte",
+    R"(Applications read a value up to its first NUL, so a line that contains one is dropped. The file is damaged,
+or it is in an encoding with two bytes per character.)",
     "PROPERTY = VENDOR,Kor<NUL>vel"};
 constexpr Rule LINE_TOO_LONG{
-    "L105", Level::ERROR, "line of more than 16 MiB",
-    "A line, with all that it goes on with, is dropped when it is longer than 16 MiB. Split it "
-    "by \"+=\".",
+    "L105",
+    "line-too-long",
+    Severity::ERROR,
+    "line of more than 16 MiB",
+    R"(A line that is longer than 16 MiB, its continuation lines included, is dropped. Split it with "+=".)",
     ""};
-constexpr Rule CONTINUED_AT_END{"L106", Level::ERROR, "file ends behind \"\\\"",
-                                "The last line says that it goes on, and does not: the file may have been "
-                                "cut short, so the line is dropped.",
-                                "PROPERTY = VENDOR,Korvel: \\"};
+constexpr Rule CONTINUED_AT_END{
+    "L106",
+    "continued-at-end",
+    Severity::ERROR,
+    R"(file ends after "\")",
+    R"(The last line says that it continues, but the file ends. The file may be incomplete, so the line is dropped.)",
+    "PROPERTY = VENDOR,Korvel: \\"};
 constexpr Rule UNCLOSED_HEADER{
-    "L107", Level::ERROR, "header without \"]\"",
-    "A line that begins with \"[\" opens a section. A malformed one is dropped, and so are "
-    "the keys up to the next header, lest they land on another device.",
+    "L107",
+    "unclosed-header",
+    Severity::ERROR,
+    R"(header without "]")",
+    R"(A line that begins with "[" opens a section. A malformed header is dropped, and so are the keys up to the
+next header, so that they do not become those of another device.)",
     "[KS50"};
 constexpr Rule EMPTY_NAME{
-    "L108", Level::ERROR, "header without a name",
-    "A section is that of a device, so it has a name. The header is dropped, and so are the keys "
-    "up to the next one.",
+    "L108",
+    "empty-name",
+    Severity::ERROR,
+    "header without a name",
+    R"(A section belongs to a device, so it needs a name. The header is dropped, and so are the keys up to the next
+header.)",
     "[]"};
 constexpr Rule BLANK_IN_NAME{
-    "L109", Level::ERROR, "blank in the name of a header",
-    "A device's name is one word, with no blanks around it either. The header is dropped, and "
-    "so are the keys up to the next one.",
+    "L109",
+    "blank-in-name",
+    Severity::ERROR,
+    "blank in the name of a header",
+    R"(The name of a device is one word, without blanks around it. The header is dropped, and so are the keys up to
+the next header.)",
     "[ KS50 ]"};
-constexpr Rule TEXT_BEHIND_HEADER{
-    "L110", Level::ERROR, "text behind a header",
-    "A header ends with its \"]\"; there are no comments behind it. The header is dropped, "
-    "and so are the keys up to the next one.",
+constexpr Rule TEXT_AFTER_HEADER{
+    "L110",
+    "text-after-header",
+    Severity::ERROR,
+    "text after a header",
+    R"(A header ends with its "]"; a comment cannot follow it. The header is dropped, and so are the keys up to the
+next header.)",
     "[KS50] # the smallest one"};
-
 constexpr Rule VALUE_TOO_LONG{
-    "L111", Level::ERROR, "value that would grow over 1 GiB",
-    "A value may grow up to 1 GiB by \"+=\", over all layers. A text that would make it longer is dropped.",
+    "L111",
+    "value-too-long",
+    Severity::ERROR,
+    "value of more than 1 GiB",
+    R"(A value can grow up to 1 GiB by "+=", all layers together. A text that would make it longer is dropped.)",
     ""};
+constexpr Rule SWALLOWED_LINE{
+    "L112",
+    "swallowed-line",
+    Severity::ERROR,
+    "continuation that looks like a header, a key or a comment",
+    R"(After a "\" at the end of a line the next line is part of the value, whatever it looks like: a header opens
+no section, a key sets nothing, and a comment is text. Remove the "\", or move the comment above the key.)",
+    "PROPERTY = PINS,140: \\\n[KS100]"};
 
-constexpr Rule SWALLOWED_LINE{"L112", Level::ERROR, "line that goes on into a header, a key or a comment",
-                              "Behind a \"\\\" at the end of a line the next line is part of the value, "
-                              "whatever it looks like: a header opens no section, a key sets nothing, and a "
-                              "comment is no comment. Drop the \"\\\", or move the comment above the key.",
-                              "PROPERTY = PINS,140: \\\n[KS100]"};
+constexpr Rule LONE_CR{
+    "L113",
+    "lone-cr",
+    Severity::WARNING,
+    "carriage return inside a line",
+    R"(Lines end in LF or CRLF; a CR anywhere else is part of the text. A file whose lines end in CR alone is a single
+line.)",
+    "PROPERTY = PINS,140<CR>PROPERTIES = PACKAGES,1,TQ100"};
 
-const Rule* ruleFor(AcdLines::ParseError fault) {
-    switch (fault) {
+const Rule* ruleFor(AcdLines::ParseError error) {
+    switch (error) {
     case AcdLines::ParseError::NO_EQUALS_SIGN:
         return &NO_EQUALS_SIGN;
     case AcdLines::ParseError::EMPTY_KEY:
@@ -92,14 +132,14 @@ const Rule* ruleFor(AcdLines::ParseError fault) {
     case AcdLines::ParseError::BLANK_IN_NAME:
         return &BLANK_IN_NAME;
     case AcdLines::ParseError::TEXT_BEHIND_HEADER:
-        return &TEXT_BEHIND_HEADER;
+        return &TEXT_AFTER_HEADER;
     case AcdLines::ParseError::NONE:
         break;
     }
     return nullptr;
 }
 
-/// Is this the beginning of `KEY =`?
+/// Does the text begin with `KEY =`?
 bool looksLikeKey(std::string_view text) {
     const std::size_t end = text.find_first_not_of("ABCDEFGHIJKLMNOPQRSTUVWXYZ0123456789_");
     if (end == 0 || end == text.npos) {
@@ -109,8 +149,8 @@ bool looksLikeKey(std::string_view text) {
     return text.starts_with('=') || text.starts_with("+=");
 }
 
-/// What a line looks like that is none of its own; null when it looks like a part of a value.
-const char* disguise(std::string_view text) {
+/// What a continuation line looks like, though it is none; null when it looks like a part of a value.
+const char* looksLike(std::string_view text) {
     if (text.starts_with('#')) {
         return "a comment";
     }
@@ -121,54 +161,63 @@ const char* disguise(std::string_view text) {
 }
 
 void checkSwallowed(const AcdLines& file, const AcdLines::Line& line, Findings& findings) {
-    for (const AcdLines::SourceSpan& fragment : line.spans) {
-        if (fragment.line == line.line) {
+    for (const AcdLines::SourceSpan& span : line.spans) {
+        if (span.line == line.line) {
             continue;
         }
-        const std::string_view text =
-            file.source(fragment.line)
-                .substr(std::min<std::size_t>(fragment.column - 1, file.source(fragment.line).size()));
-        if (const char* const what = disguise(text)) {
-            findings.add(
-                SWALLOWED_LINE, {text, {&file, fragment.line, fragment.column}},
-                fmt::format("this is no line of its own but part of the value of {}, though it looks like {}",
-                            quoted(line.name), what));
+        const std::string_view source = file.source(span.line);
+        const std::string_view text = source.substr(std::min<std::size_t>(span.column - 1, source.size()));
+        if (const char* const what = looksLike(text)) {
+            findings.add(SWALLOWED_LINE, {text, {&file, span.line, span.column}},
+                         "this is no line of its own but part of the value of {}, though it looks like {}",
+                         quoted(line.name), what);
         }
     }
 }
 
-void checkLengths(const Section& section, Findings& findings) {
-    for (const auto& [key, entry] : section.entries) {
-        for (const Token& text : entry.tooLong) {
-            findings.add(VALUE_TOO_LONG, text,
-                         fmt::format("the value of {} would grow over 1 GiB by this", quoted(key)));
-        }
+void checkReturns(const AcdLines& file, unsigned line, Findings& findings) {
+    const std::string_view text = file.source(line);
+    const std::size_t at = text.find('\r');
+    if (at + 1 < text.size() && at != text.npos) {
+        findings.addText(LONE_CR, {text.substr(at, 1), {&file, line, static_cast<unsigned>(at + 1)}},
+                         "the line does not end at this carriage return");
     }
 }
 
 void check(const Model& model, Findings& findings) {
     for (const AcdLines& file : model.files()) {
+        for (const AcdLines::Comment& comment : file.comments()) {
+            checkReturns(file, comment.line, findings);
+        }
         for (const AcdLines::Line& line : file.lines()) {
             if (const Rule* const rule = ruleFor(line.error)) {
-                findings.add(*rule, {{}, {&file, line.line, line.column}}, line.text);
+                findings.addText(*rule, {{}, {&file, line.line, line.column}}, line.text);
             }
             checkSwallowed(file, line, findings);
+            for (unsigned number = line.firstLine; number <= line.lastLine; ++number) {
+                checkReturns(file, number, findings);
+            }
         }
     }
-    for (const Family& family : model.families()) {
-        checkLengths(family.own, findings);
-        for (const Section& device : family.devices) {
-            checkLengths(device, findings);
-        }
+    for (const FamilyData& family : model.families()) {
+        family.forEachSection([&](const Section& section) {
+            for (const auto& [key, value] : section.values) {
+                for (const Token& text : value.oversizedAppends) {
+                    findings.add(VALUE_TOO_LONG, text, "the value of {} would grow over 1 GiB by this",
+                                 quoted(key));
+                }
+            }
+        });
     }
 }
 
 } // namespace
 
-Group lineRules() {
-    return {{&NO_EQUALS_SIGN, &EMPTY_KEY, &BLANK_IN_KEY, &NUL_BYTE, &LINE_TOO_LONG, &CONTINUED_AT_END,
-             &UNCLOSED_HEADER, &EMPTY_NAME, &BLANK_IN_NAME, &TEXT_BEHIND_HEADER, &VALUE_TOO_LONG,
-             &SWALLOWED_LINE},
+RuleSet lineRules() {
+    return {"lines",
+            {&NO_EQUALS_SIGN, &EMPTY_KEY, &BLANK_IN_KEY, &NUL_BYTE, &LINE_TOO_LONG, &CONTINUED_AT_END,
+             &UNCLOSED_HEADER, &EMPTY_NAME, &BLANK_IN_NAME, &TEXT_AFTER_HEADER, &VALUE_TOO_LONG,
+             &SWALLOWED_LINE, &LONE_CR},
             check};
 }
 

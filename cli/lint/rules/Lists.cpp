@@ -2,8 +2,6 @@
 #include "lint/Findings.h"
 #include "lint/rules/RuleSets.h"
 
-#include <fmt/format.h>
-
 #include <set>
 
 namespace lint {
@@ -11,125 +9,150 @@ namespace lint {
 namespace {
 
 constexpr Rule BLANK_AROUND_SEPARATOR{
-    "F101", Level::ERROR, "blank around a separator",
-    "Nothing is trimmed: a blank before or behind \",\" or \":\" is part of the item, which then equals no "
-    "name. Only the "
-    "blanks before a \"\\\" and those that the next line begins with are dropped.",
+    "F101",
+    "blank-around-separator",
+    Severity::ERROR,
+    "blank around a separator",
+    R"(Nothing is trimmed: a blank before or after "," or ":" is part of the item, which then equals no name. Only
+the blanks before a "\" and those at the start of the next line are dropped.)",
     "DEVICE_SUPPORTED = base, kestrel"};
 constexpr Rule TRAILING_SEPARATOR{
-    "F102", Level::ERROR, "separator at the end",
-    "A separator at the end of a list or of a record leaves an empty item behind it, "
-    "which is a text like any other and names nothing.",
+    "F102",
+    "trailing-separator",
+    Severity::ERROR,
+    "separator at the end",
+    R"(A separator at the end of a list or of a record adds an empty item, which is a text like any other and names
+nothing.)",
     "DEVICE_SUPPORTED = base,kestrel,"};
 constexpr Rule EMPTY_ITEM{
-    "F103", Level::ERROR, "empty item",
-    "Nothing between two separators is an empty text, not an absence: lists hold it as a name, "
-    "records read it as an operation, a mode or an output.",
+    "F103",
+    "empty-item",
+    Severity::ERROR,
+    "empty item",
+    R"(Two adjacent separators enclose an empty text, which is not the same as no item: a list contains it as a name,
+and a record reads it as an operation, a mode or an output.)",
     "DEVICE_SUPPORTED = base,,kestrel"};
-constexpr Rule DUPLICATE_ITEM{
-    "F104", Level::WARNING, "item listed twice",
-    "What is listed twice counts once. Where it was meant to be another item, that one is "
-    "missing.",
-    "DEVICE_SUPPORTED = base,kestrel,kestrel"};
+constexpr Rule DUPLICATE_ITEM{"F104",
+                              "duplicate-item",
+                              Severity::WARNING,
+                              "item listed twice",
+                              "An item that is listed twice has the effect of one. If it was meant to be "
+                              "another item, that one is missing.",
+                              "DEVICE_SUPPORTED = base,kestrel,kestrel"};
 constexpr Rule LIST_TOO_LONG{
-    "F105", Level::ERROR, "more than 32768 items",
-    "Items, and fields of an item, are counted up to 32767, beginning with 0. What stands "
-    "behind is never read.",
+    "F105",
+    "list-too-long",
+    Severity::ERROR,
+    "more than 32768 items",
+    "Items, and fields of an item, are numbered from 0 to 32767. Those after that are not read.",
     ""};
-
-constexpr Rule COMMENT_BEHIND_VALUE{
-    "F106", Level::WARNING, "comment behind a value",
-    "Comments stand on lines of their own: what looks like one behind a value is part of the value.",
+constexpr Rule COMMENT_AFTER_VALUE{
+    "F106",
+    "comment-after-value",
+    Severity::WARNING,
+    "comment after a value",
+    "A comment needs a line of its own. After a value it is part of the value.",
     "PROPERTY = PINS,140 # in the largest package"};
+
+constexpr Rule DOUBLED_OPERATOR{
+    "F107",
+    "doubled-operator",
+    Severity::WARNING,
+    R"("==" or "=+")",
+    R"(A line is split at its first "=", so what follows is part of the value. Appending is written "+=".)",
+    "PROPERTY == VENDOR,Korvel"};
 
 bool isBlank(char byte) { return byte == ' ' || byte == '\t'; }
 
-void checkPieces(const std::vector<Token>& pieces, Findings& findings) {
-    for (const Token& piece : pieces) {
-        if (piece.text.empty() && pieces.size() > 1) {
-            const bool isLast = &piece == &pieces.back();
-            findings.add(isLast ? TRAILING_SEPARATOR : EMPTY_ITEM, piece,
-                         isLast ? "a separator at the end leaves an empty item behind it" : "empty item");
-        } else if (!piece.text.empty() && (isBlank(piece.text.front()) || isBlank(piece.text.back()))) {
-            findings.add(BLANK_AROUND_SEPARATOR, piece,
-                         fmt::format("the blanks of {} are part of the text", quoted(piece.text)));
+bool isNumberOrFlag(std::string_view text) {
+    return text == "TRUE" || text == "FALSE" ||
+           (!text.empty() && text.find_first_not_of("0123456789.-") == text.npos);
+}
+
+/// A "#" between blanks begins a comment, and so does one at the end or after a number; "Kestrel #1" is a title.
+bool hasComment(std::string_view text) {
+    const std::size_t at = text.find('#');
+    if (at == text.npos) {
+        return false;
+    }
+    const std::string_view before = text.substr(0, at);
+    const std::string_view word = before.substr(0, before.find_last_not_of(" \t") + 1);
+    return at + 1 == text.size() || text.find(" # ") != text.npos || isNumberOrFlag(word);
+}
+
+void checkTexts(const std::vector<Token>& tokens, Findings& findings) {
+    for (const Token& token : tokens) {
+        const std::string_view text = token.text;
+        if (text.empty() && tokens.size() > 1) {
+            const bool isLast = &token == &tokens.back();
+            findings.addText(isLast ? TRAILING_SEPARATOR : EMPTY_ITEM, token,
+                             isLast ? "a separator at the end leaves an empty item behind it" : "empty item");
+        } else if (!text.empty() && (isBlank(text.front()) || isBlank(text.back()))) {
+            findings.add(BLANK_AROUND_SEPARATOR, token, "the blanks of {} are part of the text",
+                         quoted(text));
         }
-        if (piece.text.find(" # ") != piece.text.npos) {
-            findings.add(COMMENT_BEHIND_VALUE, piece,
-                         fmt::format("the comment is part of the text {}", quoted(piece.text)));
+        if (hasComment(text)) {
+            findings.add(COMMENT_AFTER_VALUE, token, "the comment is part of the text {}", quoted(text));
         }
     }
 }
 
-void checkSeparators(const Entry& entry, Findings& findings) {
-    if (entry.records.size() == 1) {
-        checkPieces(entry.records.front().fields, findings);
+void checkSeparators(const Value& value, Findings& findings) {
+    if (value.items.size() == 1) {
+        checkTexts(value.items.front().fields, findings);
         return;
     }
     std::vector<Token> wholes;
-    for (const Record& record : entry.records) {
-        if (record.fields.size() > 1) {
-            checkPieces(record.fields, findings);
+    for (const Item& item : value.items) {
+        if (item.fields.size() > 1) {
+            checkTexts(item.fields, findings);
         }
         // The blanks of a record's own fields are found above.
-        wholes.push_back(record.fields.size() > 1 ? Token{"record", record.whole.place} : record.whole);
+        wholes.push_back(item.fields.size() > 1 ? Token{"record", item.whole.location} : item.whole);
     }
-    checkPieces(wholes, findings);
+    checkTexts(wholes, findings);
 }
 
-void checkTwice(const std::vector<Token>& items, std::size_t first, Findings& findings) {
+void checkTwice(const Item& item, std::size_t first, Findings& findings) {
     std::set<std::string_view> seen;
-    for (std::size_t i = first; i < items.size(); ++i) {
-        if (!items[i].text.empty() && !seen.insert(items[i].text).second) {
-            findings.add(DUPLICATE_ITEM, items[i], fmt::format("{} is listed twice", quoted(items[i].text)));
-        }
-    }
-}
-
-/// The lists: flat ones, those of the modes behind their labels, the values of properties behind name and count.
-void checkTwice(std::string_view key, const Entry& entry, Family::Kind kind, Findings& findings) {
-    constexpr std::string_view RECORDS_WITHOUT_LISTS[] = {"OPERATION", "BSDL_OPERATION", "PROGRAM_OPTION",
-                                                          "PROPERTY", "IDCODE"};
-    if (entry.shape == Shape::LIST) {
-        checkTwice(entry.list(), 0, findings);
-    }
-    if (entry.shape != Shape::RECORDS || key.ends_with("_PROPERTY")) {
-        return;
-    }
-    for (const std::string_view other : RECORDS_WITHOUT_LISTS) {
-        if (key == other) {
-            return;
-        }
-    }
-    for (const Record& record : entry.records) {
-        checkTwice(record.fields, kind == Family::Kind::BASE && key != "PROPERTIES" ? 1 : 2, findings);
-    }
-}
-
-void checkSection(const Section& section, Family::Kind kind, Findings& findings) {
-    for (const auto& [key, entry] : section.entries) {
-        checkSeparators(entry, findings);
-        checkTwice(key, entry, kind, findings);
-        for (const Token& unseen : entry.unseen) {
-            findings.add(LIST_TOO_LONG, unseen, "items from here on are never read: there are 32768 before");
+    for (std::size_t i = first; i < item.fields.size(); ++i) {
+        const Token& token = item.fields[i];
+        if (!token.text.empty() && !seen.insert(token.text).second) {
+            findings.add(DUPLICATE_ITEM, token, "{} is listed twice", quoted(token.text));
         }
     }
 }
 
 void check(const Model& model, Findings& findings) {
-    for (const Family& family : model.families()) {
-        checkSection(family.own, family.kind, findings);
-        for (const Section& device : family.devices) {
-            checkSection(device, family.kind, findings);
-        }
+    for (const FamilyData& family : model.families()) {
+        family.forEachSection([&](const Section& section) {
+            for (const auto& [key, value] : section.values) {
+                checkSeparators(value, findings);
+                if (!value.items.empty()) {
+                    const Token& first = value.items.front().whole;
+                    if (first.text.starts_with('=') || first.text.starts_with('+')) {
+                        findings.add(DOUBLED_OPERATOR, first, "the value begins with \"{}\"",
+                                     first.text.front());
+                    }
+                }
+                for (const Item& item : value.items) {
+                    checkTwice(item, schema::firstListed(family.kind, key), findings);
+                }
+                for (const Token& token : value.truncatedItems) {
+                    findings.add(LIST_TOO_LONG, token,
+                                 "items from here on are never read: there are 32768 before");
+                }
+            }
+        });
     }
 }
 
 } // namespace
 
-Group listRules() {
-    return {{&BLANK_AROUND_SEPARATOR, &TRAILING_SEPARATOR, &EMPTY_ITEM, &DUPLICATE_ITEM, &LIST_TOO_LONG,
-             &COMMENT_BEHIND_VALUE},
+RuleSet listRules() {
+    return {"items and fields",
+            {&BLANK_AROUND_SEPARATOR, &TRAILING_SEPARATOR, &EMPTY_ITEM, &DUPLICATE_ITEM, &LIST_TOO_LONG,
+             &COMMENT_AFTER_VALUE, &DOUBLED_OPERATOR},
             check};
 }
 

@@ -4,8 +4,6 @@
 
 #include "model/Vocabulary.h"
 
-#include <fmt/format.h>
-
 #include <algorithm>
 
 namespace lint {
@@ -13,107 +11,132 @@ namespace lint {
 namespace {
 
 constexpr Rule UNKNOWN_MODE_OUTPUT{
-    "M101", Level::ERROR, "unknown output under a mode",
-    "Outputs are PARALLEL, ZORVA, USB2, SVF, STAPL, EXPRESSSVF and EXPRESSQSVF, in upper case. Any other "
-    "text counts as "
-    "the unspecified cable, silently: the mode then takes that in place of the one that was meant.",
+    "M101",
+    "unknown-mode-output",
+    Severity::ERROR,
+    "unknown output under a mode",
+    R"(Outputs are PARALLEL, ZORVA, USB2, SVF, STAPL, EXPRESSSVF and EXPRESSQSVF, in upper case. Any other text is
+silently read as the unspecified cable, and the mode then accepts that instead of the output that was meant.)",
     "BS = outputs,USB3:families,kestrel"};
-constexpr Rule UNKNOWN_MODE_FAMILY{"M102", Level::ERROR, "unknown family under a mode",
-                                   "The second item of a mode key lists families, spelt as their files are, "
-                                   "case included. A device can't stand there, "
-                                   "only its family; flashes count as family \"spi\".",
-                                   "BS = outputs,USB2:families,KS50"};
-constexpr Rule NO_LABEL{"M103", Level::ERROR, "mode list without a label",
-                        "The first field of either item is a label of your choice and is skipped. A list "
-                        "without one loses its first entry.",
-                        "BS = PARALLEL,USB2:families,kestrel"};
+constexpr Rule UNKNOWN_MODE_FAMILY{
+    "M102",
+    "unknown-mode-family",
+    Severity::ERROR,
+    "unknown family under a mode",
+    R"(The second item of a mode key lists families as their files are spelt, case included. A device cannot be listed,
+only its family; flashes belong to family "spi".)",
+    "BS = outputs,USB2:families,KS50"};
+constexpr Rule NO_LABEL{
+    "M103",
+    "no-label",
+    Severity::ERROR,
+    "mode list without a label",
+    R"(The first field of either item is a label of your choice and is skipped. A list without one loses its first
+entry.)",
+    "BS = PARALLEL,USB2:families,kestrel"};
 constexpr Rule NOT_TWO_ITEMS{
-    "M104", Level::ERROR, "mode key that is not two items",
-    "A mode key holds the outputs and, behind one \":\", the families. With one item the mode takes "
-    "no family; what stands in a third is never read.",
+    "M104",
+    "not-two-items",
+    Severity::ERROR,
+    "mode key that is not two items",
+    R"(A mode key holds the outputs and, after one ":", the families. With one item the mode accepts no family; a third
+item is not read.)",
     "BS = outputs,USB2,families,kestrel"};
 constexpr Rule MALFORMED_PART{
-    "M201", Level::ERROR, "excluded part that is not mode, device and package",
-    "A part is looked up as the mode's key, \"_\", the device, \"_\" and the package. Any other form "
-    "is never found; to exclude a device in all its packages, list each.",
+    "M201",
+    "malformed-part",
+    Severity::ERROR,
+    "excluded part that is not mode, device and package",
+    R"(A part is looked up as the mode's key, "_", the device, "_" and the package. Any other form is never found; to
+exclude a device in all its packages, list each of them.)",
     "NOT_SUPPORTED_PART_IN_MODE = SM_KS50"};
 constexpr Rule UNKNOWN_PART_MODE{
-    "M202", Level::ERROR, "excluded part with an unknown mode",
-    "The mode is given by its key: BS, SS, SM, BSFILE, DP770, SPI, KITECF, KITEMPM or PFF, "
-    "case included. A part with any other is never found.",
+    "M202",
+    "unknown-part-mode",
+    Severity::ERROR,
+    "excluded part with an unknown mode",
+    R"(The mode is written by its key: BS, SS, SM, BSFILE, DP770, SPI, KITECF, KITEMPM or PFF, case included. A part
+with any other mode is never found.)",
     "NOT_SUPPORTED_PART_IN_MODE = Smap_KS50_TQ100"};
 constexpr Rule UNKNOWN_PART_DEVICE{
-    "M203", Level::ERROR, "excluded part with an unknown device",
-    "The device is none that a family's file has a section for. Flashes, of which there are "
-    "no sections, may stand here too.",
+    "M203",
+    "unknown-part-device",
+    Severity::ERROR,
+    "excluded part with an unknown device",
+    R"(No family's file has a section for the device, and it is no flash either.)",
     "NOT_SUPPORTED_PART_IN_MODE = SM_KS55_TQ100"};
 constexpr Rule UNKNOWN_PART_PACKAGE{
-    "M204", Level::ERROR, "excluded part with a package that the device does not have",
-    "The package is none that the device's property PACKAGES lists, so nobody asks for "
-    "this part.",
+    "M204",
+    "unknown-part-package",
+    Severity::ERROR,
+    "excluded part with a package that the device does not have",
+    "The device's property PACKAGES does not list the package, so this part is never asked for.",
     "NOT_SUPPORTED_PART_IN_MODE = SM_KS50_TQ101"};
 
-bool isOutput(std::string_view text) {
-    const std::vector<std::string>& all = vocabulary::outputs();
-    return text != "QSVF" && text != "NULLCABLE" && text != "NONE" &&
-           std::find(all.begin(), all.end(), text) != all.end();
+constexpr Rule SPI_PART{
+    "M206",
+    "spi-part",
+    Severity::ERROR,
+    "excluded part in SPI mode that is not spi",
+    R"(In SPI mode every device is looked up as "spi", so only SPI_spi_PACKAGE is ever found. It excludes the package for
+all devices.)",
+    "NOT_SUPPORTED_PART_IN_MODE = SPI_OVD1_SO8"};
+
+bool contains(const std::vector<std::string>& all, std::string_view text) {
+    return std::find(all.begin(), all.end(), text) != all.end();
 }
 
-std::vector<std::string> readableOutputs() {
-    std::vector<std::string> all = vocabulary::outputs();
-    all.erase(std::remove_if(all.begin(), all.end(), [](const std::string& text) { return !isOutput(text); }),
-              all.end());
-    return all;
-}
-
-void checkLabel(const std::vector<Token>& fields, bool isEntry, Findings& findings) {
+void checkLabel(const Token& label, bool isEntry, Findings& findings) {
     if (isEntry) {
-        findings.add(
-            NO_LABEL, fields.front(),
-            fmt::format("{} stands where the label does, and is skipped", quoted(fields.front().text)));
+        findings.add(NO_LABEL, label, "{} stands where the label does, and is skipped", quoted(label.text));
     }
 }
 
-void checkMode(const Model& model, const Entry& entry, Findings& findings) {
-    if (entry.records.size() != 2) {
-        findings.add(NOT_TWO_ITEMS, entry.records.size() > 2 ? entry.records[2].whole : entry.key,
-                     entry.records.size() > 2 ? "what stands behind the families is never read"
-                                              : "no list of families behind the outputs");
-    }
-    if (entry.records.empty()) {
-        return;
-    }
-    const std::vector<Token>& outputs = entry.records[0].fields;
-    checkLabel(outputs, isOutput(outputs.front().text), findings);
+void checkOutputs(const std::vector<Token>& outputs, Findings& findings) {
+    checkLabel(outputs.front(), contains(schema::modeOutputs(), outputs.front().text), findings);
     for (std::size_t i = 1; i < outputs.size(); ++i) {
         const std::string_view text = outputs[i].text;
-        if (!text.empty() && !isOutput(text)) {
-            findings.add(UNKNOWN_MODE_OUTPUT, outputs[i],
-                         fmt::format("unknown output {}{}", quoted(text),
-                                     findings.didYouMean(text, readableOutputs())));
+        if (!text.empty() && !contains(schema::modeOutputs(), text)) {
+            findings.add(UNKNOWN_MODE_OUTPUT, outputs[i], "unknown output {}{}", quoted(text),
+                         findings.didYouMean(text, schema::modeOutputs(), outputs));
         }
     }
-    if (entry.records.size() < 2) {
-        return;
-    }
-    const std::vector<Token>& families = entry.records[1].fields;
-    checkLabel(families, model.isFamily(families.front().text), findings);
+}
+
+void checkFamilies(const Model& model, const std::vector<Token>& families, Findings& findings) {
+    checkLabel(families.front(), model.isFamily(families.front().text), findings);
     for (std::size_t i = 1; i < families.size(); ++i) {
         const std::string_view text = families[i].text;
         if (text.empty() || model.isFamily(text)) {
             continue;
         }
-        const Device* const device = model.device(text);
-        findings.add(UNKNOWN_MODE_FAMILY, families[i],
-                     device == nullptr ? fmt::format("unknown family {}{}", quoted(text),
-                                                     findings.didYouMean(text, model.familyNames()))
-                                       : fmt::format("{} is a device; only its family {} can stand here",
-                                                     quoted(text), quoted(device->family->name)));
+        if (const Device* const device = model.device(text)) {
+            findings.add(UNKNOWN_MODE_FAMILY, families[i],
+                         "{} is a device; only its family {} can stand here", quoted(text),
+                         quoted(device->family->name));
+        } else {
+            findings.add(UNKNOWN_MODE_FAMILY, families[i], "unknown family {}{}", quoted(text),
+                         findings.didYouMean(text, model.familyNames(), families));
+        }
     }
 }
 
-bool holds(const std::vector<std::string>& all, std::string_view text) {
-    return std::find(all.begin(), all.end(), text) != all.end();
+void checkMode(const Model& model, const Value& value, Findings& findings) {
+    const std::vector<Item>& items = value.items;
+    if (items.empty() && value.isReplaced) {
+        return; // a layer empties the key on purpose
+    }
+    if (items.size() > 2) {
+        findings.addText(NOT_TWO_ITEMS, items[2].whole, "what stands behind the families is never read");
+    } else if (items.size() < 2) {
+        findings.addText(NOT_TWO_ITEMS, value.key, "no list of families behind the outputs");
+    }
+    if (!items.empty()) {
+        checkOutputs(items[0].fields, findings);
+    }
+    if (items.size() > 1) {
+        checkFamilies(model, items[1].fields, findings);
+    }
 }
 
 void checkPart(const Model& model, const Token& part, Findings& findings) {
@@ -122,59 +145,62 @@ void checkPart(const Model& model, const Token& part, Findings& findings) {
     const std::size_t second = first == text.npos ? first : text.find('_', first + 1);
     if (second == text.npos || first == 0 || second == first + 1 || second + 1 == text.size() ||
         text.find('_', second + 1) != text.npos) {
-        findings.add(MALFORMED_PART, part, fmt::format("{} is not MODE_DEVICE_PACKAGE", quoted(text)));
+        findings.add(MALFORMED_PART, part, "{} is not MODE_DEVICE_PACKAGE", quoted(text));
         return;
     }
     const std::string_view mode = text.substr(0, first);
     const std::string_view name = text.substr(first + 1, second - first - 1);
     const std::string_view package = text.substr(second + 1);
-    if (!holds(vocabulary::modes(), mode)) {
-        findings.add(UNKNOWN_PART_MODE, part,
-                     fmt::format("unknown mode {} in {}{}", quoted(mode), quoted(text),
-                                 findings.didYouMean(mode, vocabulary::modes())));
+    if (!contains(vocabulary::modes(), mode)) {
+        findings.add(UNKNOWN_PART_MODE, part, "unknown mode {} in {}{}", quoted(mode), quoted(text),
+                     findings.didYouMean(mode, vocabulary::modes()));
     }
-    if (holds(model.flashNames(), name)) {
+    if (mode == "SPI") {
+        if (name != "spi") {
+            findings.add(SPI_PART, part, "never looked up: in SPI mode {} is; did you mean \"SPI_spi_{}\"?",
+                         quoted("spi"), package);
+        }
+        return;
+    }
+    if (contains(model.flashNames(), name)) {
         return;
     }
     const Device* const device = model.device(name);
     if (device == nullptr) {
-        findings.add(UNKNOWN_PART_DEVICE, part,
-                     fmt::format("unknown device {} in {}{}", quoted(name), quoted(text),
-                                 findings.didYouMean(name, model.deviceNames())));
+        findings.add(UNKNOWN_PART_DEVICE, part, "unknown device {} in {}{}", quoted(name), quoted(text),
+                     findings.didYouMean(name, model.deviceNames()));
         return;
     }
     std::vector<std::string> packages;
     for (const Token& known : model.packages(*device)) {
         packages.emplace_back(known.text);
     }
-    // Of a device that lists no packages nothing can be said.
-    if (!packages.empty() && !holds(packages, package)) {
-        findings.add(UNKNOWN_PART_PACKAGE, part,
-                     fmt::format("{} has no package {}{}", quoted(name), quoted(package),
-                                 findings.didYouMean(package, packages)));
+    // The packages of a device that lists none are unknown.
+    if (!packages.empty() && !contains(packages, package)) {
+        findings.add(UNKNOWN_PART_PACKAGE, part, "{} has no package {}{}", quoted(name), quoted(package),
+                     findings.didYouMean(package, packages));
     }
 }
 
 void check(const Model& model, Findings& findings) {
     for (const std::string& mode : vocabulary::modes()) {
-        if (const Entry* const entry = model.baseEntry(mode)) {
-            checkMode(model, *entry, findings);
+        if (const Value* const value = model.baseKeys().find(mode)) {
+            checkMode(model, *value, findings);
         }
     }
-    if (const Entry* const parts = model.baseEntry("NOT_SUPPORTED_PART_IN_MODE")) {
-        for (const Token& part : parts->list()) {
-            if (!part.text.empty()) {
-                checkPart(model, part, findings);
-            }
+    for (const Token& part : model.baseKeys().list(schema::NOT_SUPPORTED_PART_IN_MODE)) {
+        if (!part.text.empty()) {
+            checkPart(model, part, findings);
         }
     }
 }
 
 } // namespace
 
-Group modeRules() {
-    return {{&UNKNOWN_MODE_OUTPUT, &UNKNOWN_MODE_FAMILY, &NO_LABEL, &NOT_TWO_ITEMS, &MALFORMED_PART,
-             &UNKNOWN_PART_MODE, &UNKNOWN_PART_DEVICE, &UNKNOWN_PART_PACKAGE},
+RuleSet modeRules() {
+    return {"modes and excluded parts",
+            {&UNKNOWN_MODE_OUTPUT, &UNKNOWN_MODE_FAMILY, &NO_LABEL, &NOT_TWO_ITEMS, &MALFORMED_PART,
+             &UNKNOWN_PART_MODE, &UNKNOWN_PART_DEVICE, &UNKNOWN_PART_PACKAGE, &SPI_PART},
             check};
 }
 

@@ -1,146 +1,160 @@
-// Rules about PROPERTY, PROPERTIES and the _PROPERTY keys of flashes: names, counts and values that go together.
+// Rules about PROPERTY, PROPERTIES and the _PROPERTY keys of flashes: names, counts and values.
 #include "lint/Findings.h"
-#include "lint/Keys.h"
 #include "lint/rules/RuleSets.h"
 
 #include "model/Vocabulary.h"
+#include "text/Json.h"
 #include "text/Suggest.h"
 
-#include <fmt/format.h>
+#include <UT_STR.h>
 
 #include <algorithm>
 #include <charconv>
 #include <map>
 #include <optional>
-#include <set>
 #include <utility>
 
 namespace lint {
 
 namespace {
 
-constexpr Rule WRONG_COUNT{"P101", Level::ERROR, "count that is not the number of values",
-                           "PROPERTIES holds name, count and as many values. Values beyond the count are "
-                           "dropped silently; one that is missing "
-                           "raises DataMismatchException, and the rest of the properties is never read.",
-                           "PROPERTIES = PACKAGES,3,TQ100,TQ144"};
+constexpr Rule WRONG_COUNT{
+    "P101",
+    "wrong-count",
+    Severity::ERROR,
+    "count that is not the number of values",
+    R"(PROPERTIES holds name, count and as many values. Values beyond the count are silently dropped; a missing value
+raises DataMismatchException, and the rest of the properties is not read.)",
+    "PROPERTIES = PACKAGES,3,TQ100,TQ144"};
 constexpr Rule NO_COUNT{
-    "P102", Level::ERROR, "property without a count",
-    "The second field of a PROPERTIES entry is the number of its values, in decimal digits. What is no "
-    "number counts as 0, and all values are dropped.",
+    "P102",
+    "no-count",
+    Severity::ERROR,
+    "property without a count",
+    R"(The second field of a PROPERTIES entry is the number of its values, in decimal digits. Any other text is read as
+0, and all values are dropped.)",
     "PROPERTIES = PACKAGES,TQ100,TQ144"};
 constexpr Rule NO_VALUE{
-    "P103", Level::ERROR, "property without a value",
-    "A PROPERTY entry is a name and a value. A missing value raises DataMismatchException, and the rest "
-    "of the properties is never read; of a flash it is the empty text.",
+    "P103",
+    "no-value",
+    Severity::ERROR,
+    "property without a value",
+    R"(A PROPERTY entry is a name and a value. A missing value raises DataMismatchException, and the rest of the
+properties is not read; for a flash the value is the empty text.)",
     "PROPERTY = VENDOR:KIND,FPGA"};
 constexpr Rule SEVERAL_VALUES{
-    "P104", Level::ERROR, "several values in PROPERTY",
-    "A PROPERTY entry has one value; what stands behind it is never read. Entries stand between "
-    "\":\"; several values go into PROPERTIES, with their count.",
+    "P104",
+    "several-values",
+    Severity::ERROR,
+    "several values in PROPERTY",
+    R"(A PROPERTY entry has one value; further fields are not read. Entries are separated by ":"; several values go
+into PROPERTIES, with their count.)",
     "PROPERTY = PACKAGES,TQ100,TQ144"};
 constexpr Rule IN_BOTH_KEYS{
-    "P105", Level::ERROR, "one name in PROPERTY and PROPERTIES",
-    "Both keys share one set of names, and PROPERTIES is read last: the value in PROPERTY is "
-    "lost.",
+    "P105",
+    "in-both-keys",
+    Severity::ERROR,
+    "one name in PROPERTY and PROPERTIES",
+    "Both keys share one set of names, and PROPERTIES is read last: the value in PROPERTY is lost.",
     "PROPERTY   = PACKAGES,TQ100\nPROPERTIES = PACKAGES,1,TQ144"};
-constexpr Rule NAME_TWICE{"P106", Level::ERROR, "property given twice",
-                          "Of two entries of one name in one key the last stands; the other is lost.",
+constexpr Rule NAME_TWICE{"P106",
+                          "property-twice",
+                          Severity::ERROR,
+                          "property given twice",
+                          "Of two entries with one name in one key the last counts; the other is lost.",
                           "PROPERTY = VENDOR,Korvel:VENDOR,Orveth"};
+constexpr Rule FLAG_NOT_UPPER_CASE{
+    "P107",
+    "flag-not-upper-case",
+    Severity::WARNING,
+    "flag not in upper case",
+    R"(A flag is set by exactly TRUE: "true" means no. Only the properties of flashes in spi.acd are compared in any
+case.)",
+    "PROPERTY = FLASH,true"};
 constexpr Rule UNKNOWN_MODE_KEY{
-    "P201", Level::ERROR, "unknown mode in the property of an operation",
-    "A property that is named as an operation lists the keys of the modes that offer it: BS, "
-    "SS, SM, BSFILE, DP770, SPI, KITECF, KITEMPM, PFF. Any other text is never asked for.",
+    "P201",
+    "unknown-mode-key",
+    Severity::ERROR,
+    "unknown mode in the property of an operation",
+    R"(A property with the name of an operation lists the keys of the modes that offer it: BS, SS, SM, BSFILE, DP770,
+SPI, KITECF, KITEMPM, PFF. Any other text is never asked for.)",
     "PROPERTIES = PROGRAM,1,Bscan"};
 constexpr Rule UNKNOWN_OPTION_VALUE{
-    "P202", Level::ERROR, "unknown option in the property of an operation",
-    "OP_ and an operation list the options that go with it, by their key names in upper "
-    "case.",
+    "P202",
+    "unknown-option-value",
+    Severity::ERROR,
+    "unknown option in the property of an operation",
+    R"(OP_ and an operation list the options of that operation, by their key names in upper case.)",
     "PROPERTIES = OP_PROGRAM,1,VERFY"};
 constexpr Rule UNKNOWN_OPERATION_NAME{
-    "P203", Level::ERROR, "OP_ property that belongs to no operation",
-    "Options are looked for under OP_ and an operation, or OP_, an operation, \"_\" and a "
-    "mode key, in upper case. Any other name is never asked for.",
+    "P203",
+    "unknown-operation-name",
+    Severity::ERROR,
+    "OP_ property that belongs to no operation",
+    R"(Options are looked up under OP_ and an operation, or OP_, an operation, "_" and a mode key, in upper case. Any
+other name is never asked for.)",
     "PROPERTIES = OP_PROGRM,1,VERIFY"};
+constexpr Rule HIDDEN_OPTIONS{
+    "P204",
+    "hidden-options",
+    Severity::WARNING,
+    "options for one mode that are never looked at",
+    R"(If an operation has options for all modes, in OP_ and the operation, those for a single mode are never looked
+at. Keep one of them.)",
+    "PROPERTIES = OP_PROGRAM,1,VERIFY:OP_PROGRAM_BS,1,ERASE"};
 
-constexpr Rule FLAG_NOT_UPPER_CASE{"P107", Level::WARNING, "flag not in upper case",
-                                   "A flag is TRUE, exactly so: \"true\" counts as no. Only the properties "
-                                   "of flashes in spi.acd are compared without regard to case.",
-                                   "PROPERTY = FLASH,true"};
-
-constexpr Rule HIDDEN_OPTIONS{"P204", Level::WARNING, "options for one mode that are never looked at",
-                              "Where an operation has options for all modes, in OP_ and the operation, those "
-                              "for a single mode are never looked at. Keep one or the other.",
-                              "PROPERTIES = OP_PROGRAM,1,VERIFY:OP_PROGRAM_BS,1,ERASE"};
-
-bool holds(const std::vector<std::string>& all, std::string_view text) {
+bool contains(const std::vector<std::string>& all, std::string_view text) {
     return std::find(all.begin(), all.end(), text) != all.end();
 }
 
-/// A decimal number as it may stand for a count; nothing when it is none.
+/// The count of values; nothing when the text is no decimal number.
 std::optional<std::size_t> number(std::string_view text) {
     std::size_t value = 0;
-    const auto [end, fault] = std::from_chars(text.data(), text.data() + text.size(), value);
-    return fault == std::errc() && end == text.data() + text.size() ? std::optional(value) : std::nullopt;
+    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value);
+    return error == std::errc() && end == text.data() + text.size() ? std::optional(value) : std::nullopt;
 }
 
-void checkTwice(const Entry& entry, Findings& findings) {
+void checkTwice(const std::vector<Item>& items, Findings& findings) {
     std::map<std::string_view, const AcdLines*> files;
-    for (const Record& record : entry.records) {
-        const Token& name = record.fields.front();
+    for (const Item& item : items) {
+        const Token& name = item.fields.front();
         const AcdLines*& file = files[name.text];
-        // A layer on top may well append another value.
-        if (std::exchange(file, name.place.file) == name.place.file && !name.text.empty()) {
-            findings.add(NAME_TWICE, name,
-                         fmt::format("what {} was given before is lost", quoted(name.text)));
+        // A layer on top may append another value on purpose.
+        if (std::exchange(file, name.location.file) == name.location.file && !name.text.empty()) {
+            findings.add(NAME_TWICE, name, "what {} was given before is lost", quoted(name.text));
         }
     }
 }
 
-void checkSingle(const Entry& entry, Findings& findings) {
-    checkTwice(entry, findings);
-    for (const Record& record : entry.records) {
-        if (record.whole.text.empty()) {
-            continue; // found as an empty item
-        }
-        if (record.fields.size() < 2) {
-            findings.add(NO_VALUE, record.whole,
-                         fmt::format("no value behind {}", quoted(record.whole.text)));
-        } else if (record.fields.size() > 2) {
-            findings.add(SEVERAL_VALUES, record.fields[2],
-                         fmt::format("{} is never read: {} has one value", quoted(record.fields[2].text),
-                                     quoted(record.fields[0].text)));
-        }
+void checkSingle(const Item& item, Findings& findings) {
+    if (item.fields.size() < 2) {
+        findings.add(NO_VALUE, item.whole, "no value behind {}", quoted(item.whole.text));
+    } else if (item.fields.size() > 2) {
+        findings.add(SEVERAL_VALUES, item.fields[2], "{} is never read: {} has one value",
+                     quoted(item.fields[2].text), quoted(item.fields[0].text));
     }
 }
 
-void checkCounted(const Entry& entry, Findings& findings) {
-    checkTwice(entry, findings);
-    for (const Record& record : entry.records) {
-        const std::vector<Token>& fields = record.fields;
-        if (record.whole.text.empty()) {
-            continue; // found as an empty item
-        }
-        const std::optional<std::size_t> count = fields.size() < 2 ? std::nullopt : number(fields[1].text);
-        if (!count) {
-            findings.add(NO_COUNT, fields.size() < 2 ? record.whole : fields[1],
-                         fmt::format("no number of values behind {}", quoted(fields[0].text)));
-        } else if (*count != fields.size() - 2) {
-            findings.add(WRONG_COUNT, fields[1],
-                         fmt::format("{} says {} values and has {}", quoted(fields[0].text), *count,
-                                     fields.size() - 2));
-        }
+void checkCounted(const Item& item, Findings& findings) {
+    const std::vector<Token>& fields = item.fields;
+    const std::optional<std::size_t> count = fields.size() < 2 ? std::nullopt : number(fields[1].text);
+    if (!count) {
+        findings.add(NO_COUNT, fields.size() < 2 ? item.whole : fields[1], "no number of values behind {}",
+                     quoted(fields[0].text));
+    } else if (*count != fields.size() - 2) {
+        findings.add(WRONG_COUNT, fields[1], "{} says {} values and has {}", quoted(fields[0].text), *count,
+                     fields.size() - 2);
     }
 }
 
-/// The operation that the name behind `OP_` stands for, with or without a mode key; nothing when it is none.
+/// Does the name after `OP_` belong to an operation, with or without a mode key?
 bool namesOperation(std::string_view name) {
-    if (holds(vocabulary::operations(), name)) {
+    if (contains(vocabulary::operations(), name)) {
         return true;
     }
     const std::size_t cut = name.rfind('_');
-    return cut != name.npos && holds(vocabulary::operations(), name.substr(0, cut)) &&
-           holds(vocabulary::modes(), name.substr(cut + 1));
+    return cut != name.npos && contains(vocabulary::operations(), name.substr(0, cut)) &&
+           contains(vocabulary::modes(), name.substr(cut + 1));
 }
 
 std::vector<std::string> optionPropertyNames() {
@@ -154,129 +168,122 @@ std::vector<std::string> optionPropertyNames() {
     return all;
 }
 
-/// Properties whose name has a meaning to the manager.
-void checkMeaning(const Entry& entry, std::size_t firstValue, Findings& findings) {
-    for (const Record& record : entry.records) {
-        const Token& name = record.fields.front();
-        const bool isOption = name.text.starts_with("OP_");
-        if (isOption && !namesOperation(name.text.substr(3))) {
-            findings.add(UNKNOWN_OPERATION_NAME, name,
-                         fmt::format("{} belongs to no operation{}", quoted(name.text),
-                                     findings.didYouMean(name.text, optionPropertyNames())));
-        }
-        if (!isOption && !holds(vocabulary::operations(), name.text)) {
+/// Checks the properties whose name has a meaning for the manager.
+void checkMeaning(const Item& item, std::size_t firstValue, Findings& findings) {
+    const Token& name = item.fields.front();
+    const bool isOption = name.text.starts_with(schema::OPTIONS_PREFIX);
+    const std::string upper = plain(UT_STR::Upper(std::string(name.text).c_str()));
+    const bool isUpperOption = upper.starts_with(schema::OPTIONS_PREFIX) &&
+                               namesOperation(std::string_view(upper).substr(schema::OPTIONS_PREFIX.size()));
+    if (isOption ? name.text != upper || !isUpperOption : isUpperOption) {
+        findings.add(UNKNOWN_OPERATION_NAME, name, "{} belongs to no operation{}", quoted(name.text),
+                     findings.didYouMean(name.text, optionPropertyNames()));
+    }
+    if (!isOption && !contains(vocabulary::operations(), name.text)) {
+        return;
+    }
+    const std::vector<std::string>& known = isOption ? vocabulary::options() : vocabulary::modes();
+    for (std::size_t i = firstValue; i < item.fields.size(); ++i) {
+        const Token& value = item.fields[i];
+        if (value.text.empty() || contains(known, value.text)) {
             continue;
         }
-        const std::vector<std::string>& known = isOption ? vocabulary::options() : vocabulary::modes();
-        for (std::size_t i = firstValue; i < record.fields.size(); ++i) {
-            const Token& value = record.fields[i];
-            if (value.text.empty() || holds(known, value.text)) {
-                continue;
-            }
-            // A text that records use for a mode is the likeliest mistake.
-            const std::string hint = !isOption && sameWithoutCase(value.text, "Bscan")
-                                         ? "; did you mean \"BS\"?"
-                                         : findings.didYouMean(value.text, known);
-            findings.add(
-                isOption ? UNKNOWN_OPTION_VALUE : UNKNOWN_MODE_KEY, value,
-                fmt::format("unknown {} {}{}", isOption ? "option" : "mode key", quoted(value.text), hint));
-        }
+        // The word that records use for a mode is the likeliest mistake.
+        const std::string hint = !isOption && sameWithoutCase(value.text, "Bscan")
+                                     ? "; did you mean \"BS\"?"
+                                     : findings.didYouMean(value.text, known, item.fields);
+        findings.add(isOption ? UNKNOWN_OPTION_VALUE : UNKNOWN_MODE_KEY, value, "unknown {} {}{}",
+                     isOption ? "option" : "mode key", quoted(value.text), hint);
     }
 }
 
-void checkBoth(const Entry& single, const Entry& counted, Findings& findings) {
-    std::set<std::string_view> names;
-    for (const Record& record : counted.records) {
-        names.insert(record.fields.front().text);
-    }
-    for (const Record& record : single.records) {
-        const Token& name = record.fields.front();
-        if (!name.text.empty() && names.contains(name.text)) {
-            findings.add(IN_BOTH_KEYS, name,
-                         fmt::format("{} stands in PROPERTIES too, which counts", quoted(name.text)));
-        }
-    }
-}
-
-void checkFlags(const Entry& entry, std::size_t firstValue, Findings& findings) {
-    for (const Record& record : entry.records) {
-        for (std::size_t i = firstValue; i < record.fields.size(); ++i) {
-            const Token& value = record.fields[i];
-            for (const char* const flag : {"TRUE", "FALSE"}) {
-                if (sameWithoutCase(value.text, flag) && value.text != flag) {
-                    findings.add(
-                        FLAG_NOT_UPPER_CASE, value,
-                        fmt::format("{} is not {}: flags are compared with case", quoted(value.text), flag));
-                }
+void checkFlags(const Item& item, std::size_t firstValue, Findings& findings) {
+    for (std::size_t i = firstValue; i < item.fields.size(); ++i) {
+        const Token& value = item.fields[i];
+        for (const char* const flag : {"TRUE", "FALSE"}) {
+            if (sameWithoutCase(value.text, flag) && value.text != flag) {
+                findings.add(FLAG_NOT_UPPER_CASE, value, "{} is not {}: flags are compared with case",
+                             quoted(value.text), flag);
             }
         }
     }
 }
 
-/// Has a property of these keys a value?
+/// Does a property have a value? Nothing when the section does not give it.
 std::optional<bool> hasValue(const Section& section, std::string_view name) {
     std::optional<bool> found;
-    for (const auto& [key, firstValue] : {std::pair("PROPERTY", 1U), std::pair("PROPERTIES", 2U)}) {
-        const Entry* const entry = section.find(key);
-        for (std::size_t i = 0; entry != nullptr && i < entry->records.size(); ++i) {
-            const std::vector<Token>& fields = entry->records[i].fields;
-            if (fields.front().text == name) {
-                found = fields.size() > firstValue;
+    for (const schema::PropertyKey key : schema::PROPERTY_KEYS) {
+        for (const Item& item : section.items(key.key)) {
+            if (item.fields.front().text == name) {
+                found = item.fields.size() > key.firstValue;
             }
         }
     }
     return found;
 }
 
-void checkHiddenOptions(const Entry& entry, const Section& section, const Section& family,
-                        Findings& findings) {
-    for (const Record& record : entry.records) {
-        const Token& name = record.fields.front();
-        const std::size_t cut = name.text.rfind('_');
-        if (!name.text.starts_with("OP_") || cut < 3 || !namesOperation(name.text.substr(3)) ||
-            holds(vocabulary::operations(), name.text.substr(3))) {
-            continue;
-        }
-        const std::string_view forAllModes = name.text.substr(0, cut);
-        if (hasValue(section, forAllModes).value_or(hasValue(family, forAllModes).value_or(false))) {
-            findings.add(
-                HIDDEN_OPTIONS, name,
-                fmt::format("{} is never looked at: there is {}", quoted(name.text), quoted(forAllModes)));
+void checkHiddenOptions(const Item& item, const Section& section, const Section& family, Findings& findings) {
+    const Token& name = item.fields.front();
+    const std::size_t cut = name.text.rfind('_');
+    if (!name.text.starts_with(schema::OPTIONS_PREFIX) || cut < schema::OPTIONS_PREFIX.size() ||
+        !namesOperation(name.text.substr(schema::OPTIONS_PREFIX.size())) ||
+        contains(vocabulary::operations(), name.text.substr(schema::OPTIONS_PREFIX.size()))) {
+        return;
+    }
+    const std::string_view forAllModes = name.text.substr(0, cut);
+    if (hasValue(section, forAllModes).value_or(hasValue(family, forAllModes).value_or(false))) {
+        findings.add(HIDDEN_OPTIONS, name, "{} is never looked at: there is {}", quoted(name.text),
+                     quoted(forAllModes));
+    }
+}
+
+void checkBothKeys(const Section& section, Findings& findings) {
+    std::map<std::string_view, const AcdLines*> files;
+    for (const Item& item : section.items(schema::PROPERTIES)) {
+        files.insert_or_assign(item.fields.front().text, item.whole.location.file);
+    }
+    for (const Item& item : section.items(schema::PROPERTY)) {
+        const Token& name = item.fields.front();
+        // A layer on top may replace a single value by a list on purpose.
+        const auto known = files.find(name.text);
+        if (!name.text.empty() && known != files.end() && known->second == name.location.file) {
+            findings.add(IN_BOTH_KEYS, name, "{} stands in PROPERTIES too, which counts", quoted(name.text));
         }
     }
 }
 
 void checkSection(const Section& section, const Section& family, Findings& findings) {
-    const Entry* const single = section.find("PROPERTY");
-    const Entry* const counted = section.find("PROPERTIES");
-    if (single != nullptr) {
-        checkSingle(*single, findings);
-        checkMeaning(*single, 1, findings);
-        checkFlags(*single, 1, findings);
-        checkHiddenOptions(*single, section, family, findings);
+    for (const schema::PropertyKey key : schema::PROPERTY_KEYS) {
+        checkTwice(section.items(key.key), findings);
+        for (const Item& item : section.items(key.key)) {
+            if (item.whole.text.empty()) {
+                continue; // found as an empty item
+            }
+            if (key.key == schema::PROPERTY) {
+                checkSingle(item, findings);
+            } else {
+                checkCounted(item, findings);
+            }
+            checkMeaning(item, key.firstValue, findings);
+            checkFlags(item, key.firstValue, findings);
+            checkHiddenOptions(item, section, family, findings);
+        }
     }
-    if (counted != nullptr) {
-        checkCounted(*counted, findings);
-        checkMeaning(*counted, 2, findings);
-        checkFlags(*counted, 2, findings);
-        checkHiddenOptions(*counted, section, family, findings);
-    }
-    if (single != nullptr && counted != nullptr) {
-        checkBoth(*single, *counted, findings);
-    }
+    checkBothKeys(section, findings);
 }
 
 void check(const Model& model, Findings& findings) {
-    for (const Family& family : model.families()) {
-        checkSection(family.own, family.own, findings);
-        for (const Section& device : family.devices) {
-            checkSection(device, family.own, findings);
-        }
+    for (const FamilyData& family : model.families()) {
+        family.forEachSection([&](const Section& section) { checkSection(section, family.own, findings); });
     }
-    if (model.spi() != nullptr) {
-        for (const auto& [key, entry] : model.spi()->own.entries) {
-            if (key.ends_with(PROPERTY_ENDING) && entry.shape == Shape::RECORDS) {
-                checkSingle(entry, findings);
+    for (const auto& [key, value] : model.spiKeys().values) {
+        if (!key.ends_with(schema::PROPERTY_SUFFIX)) {
+            continue;
+        }
+        checkTwice(value.items, findings);
+        for (const Item& item : value.items) {
+            if (!item.whole.text.empty()) {
+                checkSingle(item, findings);
             }
         }
     }
@@ -284,8 +291,9 @@ void check(const Model& model, Findings& findings) {
 
 } // namespace
 
-Group propertyRules() {
-    return {{&WRONG_COUNT, &NO_COUNT, &NO_VALUE, &SEVERAL_VALUES, &IN_BOTH_KEYS, &NAME_TWICE,
+RuleSet propertyRules() {
+    return {"properties",
+            {&WRONG_COUNT, &NO_COUNT, &NO_VALUE, &SEVERAL_VALUES, &IN_BOTH_KEYS, &NAME_TWICE,
              &FLAG_NOT_UPPER_CASE, &UNKNOWN_MODE_KEY, &UNKNOWN_OPTION_VALUE, &UNKNOWN_OPERATION_NAME,
              &HIDDEN_OPTIONS},
             check};

@@ -4,20 +4,19 @@
 
 namespace lint {
 
-// One function for each group of rules.
-[[nodiscard]] Group idcodeRules();
-[[nodiscard]] Group flashRules();
-[[nodiscard]] Group keyRules();
-[[nodiscard]] Group lineRules();
-[[nodiscard]] Group listRules();
-[[nodiscard]] Group modeRules();
-[[nodiscard]] Group nameRules();
-[[nodiscard]] Group propertyRules();
-[[nodiscard]] Group supportRules();
-[[nodiscard]] Group tableRules();
-
-/// Comments to the linter itself. They are looked at apart, when everything else is found.
-extern const Rule UNUSED_IGNORE;
-extern const Rule UNREADABLE_COMMENT;
+[[nodiscard]] RuleSet agreementRules();
+[[nodiscard]] RuleSet commentRules(); ///< checked last, by `Suppressions`
+[[nodiscard]] RuleSet consistencyRules();
+[[nodiscard]] RuleSet flashRules();
+[[nodiscard]] RuleSet idcodeRules();
+[[nodiscard]] RuleSet keyRules();
+[[nodiscard]] RuleSet layerRules();
+[[nodiscard]] RuleSet lineRules();
+[[nodiscard]] RuleSet listRules();
+[[nodiscard]] RuleSet modeRules();
+[[nodiscard]] RuleSet nameRules();
+[[nodiscard]] RuleSet propertyRules();
+[[nodiscard]] RuleSet supportRules();
+[[nodiscard]] RuleSet tableRules();
 
 } // namespace lint

@@ -1,8 +1,8 @@
-// Rules about DEVICE_SUPPORTED and PROGRAM_OPTION_PACKAGE: what has no table raises when it is asked about.
+// Rules about DEVICE_SUPPORTED and PROGRAM_OPTION_PACKAGE: a name without a table raises when it is asked for.
 #include "lint/Findings.h"
 #include "lint/rules/RuleSets.h"
 
-#include <fmt/format.h>
+#include "model/Vocabulary.h"
 
 #include <algorithm>
 
@@ -10,38 +10,71 @@ namespace lint {
 
 namespace {
 
-constexpr Rule UNKNOWN_SUPPORTED{"B101", Level::ERROR, "supported name that is neither family nor device",
-                                 "DEVICE_SUPPORTED lists families and devices exactly as their file or "
-                                 "header spells them, case included. Any other "
-                                 "name gets a table that stays empty. Flashes are all of family \"spi\".",
-                                 "DEVICE_SUPPORTED = base,kestral"};
+constexpr Rule UNKNOWN_SUPPORTED{
+    "B101",
+    "unknown-supported",
+    Severity::ERROR,
+    "supported name that is neither family nor device",
+    R"(DEVICE_SUPPORTED lists families and devices exactly as their file or header spells them, case included. Any
+other name gets a table that stays empty. Flashes all belong to family "spi".)",
+    "DEVICE_SUPPORTED = base,kestral"};
 constexpr Rule UNKNOWN_OPTION_OWNER{
-    "B102", Level::ERROR, "option table for a name that is neither family, device nor device with package",
-    "PROGRAM_OPTION_PACKAGE lists families, devices, and devices with a package written right behind "
-    "(KS50PQ208, without "
-    "\"_\"), case included. Any other name gets a table that stays empty.",
+    "B102",
+    "unknown-option-owner",
+    Severity::ERROR,
+    "option table for a name that is neither family, device nor device with package",
+    R"(PROGRAM_OPTION_PACKAGE lists families, devices, and devices with a package directly after them (KS50PQ208,
+without "_"), case included. Any other name gets a table that stays empty.)",
     "PROGRAM_OPTION_PACKAGE = base,KS50_PQ208"};
 constexpr Rule UNKNOWN_PACKAGE{
-    "B103", Level::ERROR, "option table for a package that the device does not have",
-    "The package behind the device is none that its property PACKAGES lists, so nobody asks "
-    "for this table.",
+    "B103",
+    "unknown-package",
+    Severity::ERROR,
+    "option table for a package that the device does not have",
+    "The device's property PACKAGES does not list the package, so the table is never asked for.",
     "PROGRAM_OPTION_PACKAGE = base,KS50PQ280"};
-constexpr Rule FAMILY_NOT_LISTED{
-    "B104", Level::ERROR, "file whose family no list names",
-    "No list of base.acd names the family: asking about one of its devices raises OutOfRangeException, and "
-    "no mode takes "
-    "it. Name it in DEVICE_SUPPORTED, in PROGRAM_OPTION_PACKAGE and under its modes.",
+constexpr Rule UNLISTED_FAMILY{
+    "B104",
+    "unlisted-family",
+    Severity::ERROR,
+    "file whose family no list names",
+    R"(No list of base.acd names the family: asking about one of its devices raises OutOfRangeException, and no mode
+accepts it. Name it in DEVICE_SUPPORTED, in PROGRAM_OPTION_PACKAGE and under its modes.)",
     "# a file sparrow.acd, and no \"sparrow\" in base.acd"};
-constexpr Rule FAMILY_NOT_SUPPORTED{
-    "B105", Level::ERROR, "family missing from DEVICE_SUPPORTED",
-    "A family without a table of operations raises OutOfRangeException when it is loaded "
-    "and, with exceptions off, offers nothing. base and spi must be listed too.",
+constexpr Rule UNSUPPORTED_FAMILY{
+    "B105",
+    "unsupported-family",
+    Severity::ERROR,
+    "family missing from DEVICE_SUPPORTED",
+    R"(A family without a table of operations raises OutOfRangeException when it is loaded and, with exceptions off,
+offers nothing. List base and spi, too.)",
     "DEVICE_SUPPORTED = base,spi"};
 constexpr Rule NO_OPTION_TABLE{
-    "B106", Level::ERROR, "family or device missing from PROGRAM_OPTION_PACKAGE",
-    "Every family, and every device of DEVICE_SUPPORTED, needs a table of options; one without raises "
-    "OutOfRangeException when it is loaded. base and spi must be listed too.",
+    "B106",
+    "no-option-table",
+    Severity::ERROR,
+    "family or device missing from PROGRAM_OPTION_PACKAGE",
+    R"(Every family, and every device of DEVICE_SUPPORTED, needs a table of options; one without raises
+OutOfRangeException when it is loaded. List base and spi, too.)",
     "DEVICE_SUPPORTED       = base,kestrel\nPROGRAM_OPTION_PACKAGE = base"};
+
+constexpr Rule PACKAGE_OF_SUPPORTED{
+    "B107",
+    "package-of-supported",
+    Severity::ERROR,
+    "option table for a package of a device of DEVICE_SUPPORTED",
+    R"(The options of a device that DEVICE_SUPPORTED lists go to the table of the device alone. The table for the device
+in a package stays empty, and an application that asks for the package gets no options.)",
+    "DEVICE_SUPPORTED       = base,OS2000E,osprey\nPROGRAM_OPTION_PACKAGE = "
+    "base,OS2000E,OS2000EFB900,osprey"};
+constexpr Rule NO_TABLES{
+    "B108",
+    "no-tables",
+    Severity::WARNING,
+    "device of DEVICE_SUPPORTED without tables of its own",
+    R"(The section has neither OPERATION nor BSDL_OPERATION, so the device has the operations of its family anyway, but it is
+no longer found with its package behind "_". Remove the name, or add the tables.)",
+    "# while [KS50] has no OPERATION\nDEVICE_SUPPORTED = base,KS50,kestrel"};
 
 bool isKnown(const Model& model, std::string_view name) {
     return model.isFamily(name) || model.device(name) != nullptr;
@@ -54,26 +87,32 @@ std::vector<std::string> familiesAndDevices(const Model& model) {
 }
 
 void checkSupported(const Model& model, Findings& findings) {
-    const Entry* const entry = model.baseEntry("DEVICE_SUPPORTED");
     const std::vector<std::string> candidates = familiesAndDevices(model);
-    for (std::size_t i = 0; entry != nullptr && i < entry->list().size(); ++i) {
-        const Token& name = entry->list()[i];
+    const std::vector<Token>& listed = model.baseKeys().list(schema::DEVICE_SUPPORTED);
+    for (const Token& name : listed) {
         if (!name.text.empty() && !isKnown(model, name.text)) {
-            findings.add(UNKNOWN_SUPPORTED, name,
-                         fmt::format("{} is neither a family nor a device{}", quoted(name.text),
-                                     findings.didYouMean(name.text, candidates)));
+            findings.add(UNKNOWN_SUPPORTED, name, "{} is neither a family nor a device{}", quoted(name.text),
+                         findings.didYouMean(name.text, candidates, listed));
+        }
+        const Device* const device = model.device(name.text);
+        if (device != nullptr && device->section->find(schema::OPERATION) == nullptr &&
+            device->section->find(schema::BSDL_OPERATION) == nullptr) {
+            findings.add(NO_TABLES, name, "the section of {} has neither OPERATION nor BSDL_OPERATION",
+                         quoted(name.text));
         }
     }
 }
 
-/// What is known of a name that may be a device with a package.
+/// What a name is that may be a device with a package.
 enum class Part {
-    UNKNOWN,       ///< begins with no device's name
+    UNKNOWN,       ///< does not begin with the name of a device
     OTHER_PACKAGE, ///< the device is known and has other packages
     KNOWN,
 };
 
-Part partOf(const Model& model, std::string_view name, std::vector<std::string>& packages) {
+/// @param found set to the device of a known part
+Part partOf(const Model& model, std::string_view name, std::vector<std::string>& packages,
+            std::string& found) {
     Part part = Part::UNKNOWN;
     for (std::size_t length = 1; length < name.size(); ++length) {
         const Device* const device = model.device(name.substr(0, length));
@@ -82,9 +121,10 @@ Part partOf(const Model& model, std::string_view name, std::vector<std::string>&
         }
         const std::vector<Token> known = model.packages(*device);
         const std::string_view package = name.substr(length);
-        // Of a device that lists no packages nothing can be said.
+        // The packages of a device that lists none are unknown.
         if (known.empty() || std::any_of(known.begin(), known.end(),
                                          [package](const Token& token) { return token.text == package; })) {
+            found = name.substr(0, length);
             return Part::KNOWN;
         }
         part = Part::OTHER_PACKAGE;
@@ -96,76 +136,80 @@ Part partOf(const Model& model, std::string_view name, std::vector<std::string>&
 }
 
 void checkOptionOwners(const Model& model, Findings& findings) {
-    const Entry* const entry = model.baseEntry("PROGRAM_OPTION_PACKAGE");
     const std::vector<std::string> candidates = familiesAndDevices(model);
-    for (std::size_t i = 0; entry != nullptr && i < entry->list().size(); ++i) {
-        const Token& name = entry->list()[i];
+    const std::vector<Token>& listed = model.baseKeys().list(schema::PROGRAM_OPTION_PACKAGE);
+    for (const Token& name : listed) {
         if (name.text.empty() || isKnown(model, name.text)) {
             continue;
         }
         std::vector<std::string> packages;
-        switch (partOf(model, name.text, packages)) {
+        std::string device;
+        switch (partOf(model, name.text, packages, device)) {
         case Part::UNKNOWN:
             findings.add(UNKNOWN_OPTION_OWNER, name,
-                         fmt::format("{} is neither a family nor a device, nor a device with a package{}",
-                                     quoted(name.text), findings.didYouMean(name.text, candidates)));
+                         "{} is neither a family nor a device, nor a device with a package{}",
+                         quoted(name.text), findings.didYouMean(name.text, candidates, listed));
             break;
-        case Part::OTHER_PACKAGE: {
+        case Part::OTHER_PACKAGE:
             packages.insert(packages.end(), candidates.begin(), candidates.end());
-            findings.add(UNKNOWN_PACKAGE, name,
-                         fmt::format("no device has the package of {}{}", quoted(name.text),
-                                     findings.didYouMean(name.text, packages)));
+            findings.add(UNKNOWN_PACKAGE, name, "no device has the package of {}{}", quoted(name.text),
+                         findings.didYouMean(name.text, packages, listed));
             break;
-        }
         case Part::KNOWN:
+            if (model.supported().contains(device)) {
+                findings.add(PACKAGE_OF_SUPPORTED, name,
+                             "the table of {} stays empty: DEVICE_SUPPORTED lists {}", quoted(name.text),
+                             quoted(device));
+            }
             break;
         }
     }
 }
 
 bool isUnderAMode(const Model& model, std::string_view family) {
-    for (const auto& [key, entry] : model.base()->own.entries) {
-        if (key == "IDCODE" || entry.shape != Shape::RECORDS || entry.records.size() < 2) {
-            continue;
-        }
-        const std::vector<Token>& families = entry.records[1].fields;
-        if (std::any_of(families.begin(), families.end(),
-                        [family](const Token& token) { return token.text == family; })) {
-            return true;
-        }
-    }
-    return false;
+    const std::vector<std::string>& modes = vocabulary::modes();
+    return std::any_of(modes.begin(), modes.end(), [&](const std::string& mode) {
+        const std::vector<Item>& items = model.baseKeys().items(mode);
+        return items.size() > 1 && std::any_of(items[1].fields.begin(), items[1].fields.end(),
+                                               [&](const Token& token) { return token.text == family; });
+    });
 }
 
-/// Where a missing name belongs: the list's key, or the start of base.acd where there is no list.
-Token listPlace(const Model& model, std::string_view key) {
-    const Entry* const entry = model.baseEntry(key);
-    return entry == nullptr ? model.base()->place() : entry->key;
+/// Where to report a missing name: the list's key, or the start of base.acd when there is no list.
+Token listKey(const Model& model, std::string_view key) {
+    const Value* const value = model.baseKeys().find(key);
+    return value == nullptr ? model.base()->start() : value->key;
+}
+
+void checkTables(const Model& model, const std::string& family, Findings& findings) {
+    if (!model.supported().contains(family)) {
+        findings.add(UNSUPPORTED_FAMILY, listKey(model, schema::DEVICE_SUPPORTED),
+                     "DEVICE_SUPPORTED lacks the family {}", quoted(family));
+    }
+    if (!model.optionPackages().contains(family)) {
+        findings.add(NO_OPTION_TABLE, listKey(model, schema::PROGRAM_OPTION_PACKAGE),
+                     "PROGRAM_OPTION_PACKAGE lacks the family {}", quoted(family));
+    }
 }
 
 void checkFamilies(const Model& model, Findings& findings) {
-    for (const Family& family : model.families()) {
-        const bool isSupported = model.supported().contains(family.name);
-        const bool hasOptions = model.optionPackages().contains(family.name);
-        if (!isSupported && !hasOptions && !isUnderAMode(model, family.name)) {
-            findings.add(FAMILY_NOT_LISTED, family.place(),
-                         fmt::format("no list of base.acd names the family {}", quoted(family.name)));
-            continue;
+    for (const FamilyData& family : model.families()) {
+        if (!model.supported().contains(family.name) && !model.optionPackages().contains(family.name) &&
+            !isUnderAMode(model, family.name)) {
+            findings.add(UNLISTED_FAMILY, family.start(), "no list of base.acd names the family {}",
+                         quoted(family.name));
+        } else {
+            checkTables(model, family.name, findings);
         }
-        if (!isSupported) {
-            findings.add(FAMILY_NOT_SUPPORTED, listPlace(model, "DEVICE_SUPPORTED"),
-                         fmt::format("DEVICE_SUPPORTED lacks the family {}", quoted(family.name)));
-        }
-        if (!hasOptions) {
-            findings.add(NO_OPTION_TABLE, listPlace(model, "PROGRAM_OPTION_PACKAGE"),
-                         fmt::format("PROGRAM_OPTION_PACKAGE lacks the family {}", quoted(family.name)));
-        }
+    }
+    // In SPI mode every device is looked up as spi, with or without flashes.
+    if (model.spi() == nullptr && model.baseKeys().find("SPI") != nullptr) {
+        checkTables(model, "spi", findings);
     }
     for (const std::string_view name : model.supported()) {
         if (model.device(name) != nullptr && !model.optionPackages().contains(name)) {
-            findings.add(
-                NO_OPTION_TABLE, listPlace(model, "PROGRAM_OPTION_PACKAGE"),
-                fmt::format("PROGRAM_OPTION_PACKAGE lacks {}, a device of DEVICE_SUPPORTED", quoted(name)));
+            findings.add(NO_OPTION_TABLE, listKey(model, schema::PROGRAM_OPTION_PACKAGE),
+                         "PROGRAM_OPTION_PACKAGE lacks {}, a device of DEVICE_SUPPORTED", quoted(name));
         }
     }
 }
@@ -181,9 +225,10 @@ void check(const Model& model, Findings& findings) {
 
 } // namespace
 
-Group supportRules() {
-    return {{&UNKNOWN_SUPPORTED, &UNKNOWN_OPTION_OWNER, &UNKNOWN_PACKAGE, &FAMILY_NOT_LISTED,
-             &FAMILY_NOT_SUPPORTED, &NO_OPTION_TABLE},
+RuleSet supportRules() {
+    return {"lists of names with tables",
+            {&UNKNOWN_SUPPORTED, &UNKNOWN_OPTION_OWNER, &UNKNOWN_PACKAGE, &UNLISTED_FAMILY,
+             &UNSUPPORTED_FAMILY, &NO_OPTION_TABLE, &PACKAGE_OF_SUPPORTED, &NO_TABLES},
             check};
 }
 

@@ -1,4 +1,4 @@
-// Rules about OPERATION, BSDL_OPERATION and PROGRAM_OPTION: which cells of the permission tables they turn on.
+// Rules about OPERATION, BSDL_OPERATION and PROGRAM_OPTION: which cells of the permission tables they set.
 #include "lint/Findings.h"
 #include "lint/rules/RuleSets.h"
 
@@ -6,8 +6,6 @@
 #include "text/Suggest.h"
 
 #include <tarvik/ConstraintsManager.h>
-
-#include <fmt/format.h>
 
 #include <algorithm>
 #include <optional>
@@ -19,105 +17,112 @@ namespace lint {
 namespace {
 
 using TARVIKNS::MODE_TYPE;
-using TARVIKNS::OUTPUT_TYPE;
-using TARVIKNS::PROGRAM_OPTION;
 
-constexpr Rule UNKNOWN_OPERATION{"T101", Level::ERROR, "unknown operation",
-                                 "Operations go by their key names, in any case. An unknown one raises "
-                                 "OutOfRangeException, and the rest of the key is "
-                                 "never read; with exceptions off the record says nothing.",
-                                 "OPERATION = PROGRM,Bscan,USB2"};
-constexpr Rule UNKNOWN_OPTION{"T102", Level::ERROR, "unknown option",
-                              "Options go by their key names, in upper case. An unknown one raises "
-                              "DataMismatchException even with exceptions off, "
-                              "and the rest of the key is never read; in spi.acd it ends the start-up.",
-                              "PROGRAM_OPTION = Verify,Bscan,USB2"};
+constexpr Rule UNKNOWN_OPERATION{
+    "T101",
+    "unknown-operation",
+    Severity::ERROR,
+    "unknown operation",
+    R"(Operations are written by their key names, in any case. An unknown one raises OutOfRangeException, and the rest
+of the key is not read; with exceptions off the record has no effect.)",
+    "OPERATION = PROGRM,Bscan,USB2"};
+constexpr Rule UNKNOWN_OPTION{
+    "T102",
+    "unknown-option",
+    Severity::ERROR,
+    "unknown option",
+    R"(Options are written by their key names, in upper case. An unknown one raises DataMismatchException even with
+exceptions off, and the rest of the key is not read; in spi.acd it ends the start-up.)",
+    "PROGRAM_OPTION = Verify,Bscan,USB2"};
 constexpr Rule UNREADABLE_OPTION{
-    "T103", Level::ERROR, "option that can be named but not read",
-    "The manager names the options from PROGRAM_ONLYFPGA to RS_PIN0, but a database can't "
-    "give them: reading one raises as an unknown option does.",
+    "T103",
+    "unreadable-option",
+    Severity::ERROR,
+    "option that a database cannot give",
+    R"(The manager has names for the options from PROGRAM_ONLYFPGA to RS_PIN0, but reading one from a database raises
+DataMismatchException, as an unknown option does.)",
     "PROGRAM_OPTION = OTP,Bscan,USB2"};
 constexpr Rule UNKNOWN_MODE{
-    "T104", Level::ERROR, "unknown mode",
-    "A text that names no mode counts as Boundary Scan, silently. Modes are Bscan, SSerial, Smap, "
-    "BSFILE, DP770 and SPI, in any case.",
+    "T104",
+    "unknown-mode",
+    Severity::ERROR,
+    "unknown mode",
+    R"(An unknown mode is silently read as Boundary Scan. Modes are Bscan, SSerial, Smap, BSFILE, DP770 and SPI, in any
+case.)",
     "OPERATION = PROGRAM,Slave,USB2"};
 constexpr Rule ACCIDENTAL_MODE{
-    "T105", Level::WARNING, "mode BS",
-    "BS is the key of Boundary Scan in base.acd and in properties, but no text that a record "
-    "knows. It counts as Boundary Scan by accident, as every unknown text does. Write Bscan.",
+    "T105",
+    "accidental-mode",
+    Severity::WARNING,
+    "mode BS",
+    R"(BS is the key of Boundary Scan in base.acd and in properties, but records do not know it. It is read as Boundary
+Scan only by accident, as every unknown text is. Write Bscan.)",
     "OPERATION = PROGRAM,BS,USB2"};
 constexpr Rule UNKNOWN_OUTPUT{
-    "T106", Level::ERROR, "unknown output",
-    "Outputs are PARALLEL, ZORVA, USB2, SVF and STAPL, in upper case. Any other text raises "
-    "DataMismatchException, and the rest of the key is never read; with exceptions off it says "
-    "nothing. QSVF and NULLCABLE can be named but not read.",
+    "T106",
+    "unknown-output",
+    Severity::ERROR,
+    "unknown output",
+    R"(Outputs are PARALLEL, ZORVA, USB2, SVF and STAPL, in upper case. Any other text raises DataMismatchException,
+and the rest of the key is not read; with exceptions off it has no effect. QSVF and NULLCABLE have names, but a database
+cannot give them.)",
     "OPERATION = PROGRAM,Bscan,USB"};
 constexpr Rule OUTPUT_WITHOUT_CELL{
-    "T107", Level::WARNING, "output without a cell",
-    "EXPRESSSVF and EXPRESSQSVF are outputs of modes, but the tables have no cell for "
-    "them: here they say nothing, silently.",
+    "T107",
+    "output-without-cell",
+    Severity::WARNING,
+    "output without a cell",
+    R"(EXPRESSSVF and EXPRESSQSVF are outputs of modes, but the tables have no cells for them: here they silently have
+no effect.)",
     "OPERATION = PROGRAM,BSFILE,EXPRESSSVF"};
 constexpr Rule MODE_WITHOUT_CELL{
-    "T108", Level::WARNING, "mode without a cell",
-    "The tables have no cells for the Kite modes and the PROM file formatter: the record "
-    "says nothing, silently. Such modes belong in the property named as the operation.",
+    "T108",
+    "mode-without-cell",
+    Severity::WARNING,
+    "mode without a cell",
+    R"(The tables have no cells for the Kite modes and the PROM file formatter: the record silently has no effect. List
+such a mode in the property with the name of the operation.)",
     "OPERATION = PROGRAM,KITECF,SVF"};
 constexpr Rule NO_OUTPUT{
-    "T109", Level::ERROR, "record without outputs",
-    "A record turns on one cell for each of its outputs. Without one, or without a mode, it raises "
-    "DataMismatchException, and the rest of the key is never read.",
+    "T109",
+    "no-output",
+    Severity::ERROR,
+    "record without outputs",
+    R"(A record sets one cell for each of its outputs. Without an output, or without a mode, it raises
+DataMismatchException, and the rest of the key is not read.)",
     "OPERATION = PROGRAM,Bscan"};
 constexpr Rule CELL_TWICE{
-    "T110", Level::WARNING, "cell given twice",
-    "The same operation or option, mode and output stand in the key already. Where another was "
-    "meant, that one is missing.",
+    "T110",
+    "cell-twice",
+    Severity::WARNING,
+    "cell given twice",
+    R"(The key already has the same operation or option with this mode and output. If another was meant, that one is
+missing.)",
     "OPERATION = PROGRAM,Bscan,USB2:PROGRAM,Bscan,USB2,SVF"};
 constexpr Rule SPI_MODE_ELSEWHERE{
-    "T111", Level::WARNING, "mode SPI outside spi.acd",
-    "In SPI mode the manager asks for family \"spi\" whatever the device, so a record with "
-    "that mode says something in spi.acd only.",
+    "T111",
+    "spi-mode-elsewhere",
+    Severity::WARNING,
+    "mode SPI outside spi.acd",
+    R"(In SPI mode the manager asks for family "spi" whatever the device, so a record with that mode has an effect only
+in spi.acd.)",
     "# in kestrel.acd\nOPERATION = PROGRAM,SPI,USB2"};
-
 constexpr Rule MODE_WITHOUT_FAMILY{
-    "T112", Level::WARNING, "mode that does not list the family",
-    "The tables allow something in a mode that base.acd does not list the family under: an application that "
-    "asks whether the device can be configured in the mode is told no, and one that asks for the operation, "
-    "yes.",
+    "T112",
+    "mode-without-family",
+    Severity::WARNING,
+    "mode that does not list the family",
+    R"(The tables allow something in a mode under which base.acd does not list the family: an application that asks
+whether the device can be configured in the mode gets no, and one that asks for the operation gets yes.)",
     "# in kestrel.acd, while base.acd has no kestrel under SM\nOPERATION = PROGRAM,Smap,USB2"};
-
 constexpr Rule MODE_WITHOUT_OUTPUT{
-    "T113", Level::WARNING, "output that the mode can't use",
-    "The tables allow something through an output that base.acd does not list under the mode: an application "
-    "that asks for the mode and the output is told no, and one that asks for the operation, yes.",
+    "T113",
+    "mode-without-output",
+    Severity::WARNING,
+    "output that the mode cannot use",
+    R"(The tables allow something through an output that base.acd does not list under the mode: an application that
+asks for the mode and the output gets no, and one that asks for the operation gets yes.)",
     "# while base.acd has no PARALLEL under SM\nOPERATION = PROGRAM,Smap,PARALLEL"};
-
-/// What stands before the outputs of a record, by key.
-struct Table {
-    const char* key;
-    bool hasOptions; ///< in place of operations
-    bool hasMode;
-};
-
-constexpr Table TABLES[] = {
-    {"OPERATION", false, true}, {"BSDL_OPERATION", false, false}, {"PROGRAM_OPTION", true, true}};
-
-const std::vector<std::string>& modeTexts() {
-    static const std::vector<std::string> texts{"Bscan", "SSerial", "Smap", "BSFILE", "DP770", "SPI"};
-    return texts;
-}
-
-std::vector<std::string> readableOptions() {
-    const std::vector<std::string>& all = vocabulary::options();
-    return {all.begin(), all.begin() + static_cast<int>(PROGRAM_OPTION::SECTOR_LOCKDOWN) + 1};
-}
-
-const std::vector<std::string>& cellOutputs() {
-    static const std::vector<std::string> texts{vocabulary::outputs().begin(),
-                                                vocabulary::outputs().begin() +
-                                                    static_cast<int>(OUTPUT_TYPE::STAPL) + 1};
-    return texts;
-}
 
 std::optional<std::size_t> position(const std::vector<std::string>& all, std::string_view text,
                                     bool anyCase) {
@@ -127,7 +132,7 @@ std::optional<std::size_t> position(const std::vector<std::string>& all, std::st
     return found == all.end() ? std::nullopt : std::optional(static_cast<std::size_t>(found - all.begin()));
 }
 
-/// What base.acd says of a mode. A list that is missing says nothing.
+/// The lists of a mode in base.acd. A list that is missing is unknown, not empty.
 struct ModeLists {
     std::optional<std::set<std::string_view>> outputs;
     std::optional<std::set<std::string_view>> families;
@@ -136,11 +141,11 @@ struct ModeLists {
 /// By mode.
 using AllModeLists = std::vector<ModeLists>;
 
-/// Behind the label.
-std::set<std::string_view> listed(const Record& record) {
+/// The names after the label.
+std::set<std::string_view> listed(const Item& item) {
     std::set<std::string_view> names;
-    for (std::size_t i = 1; i < record.fields.size(); ++i) {
-        names.insert(record.fields[i].text);
+    for (std::size_t i = 1; i < item.fields.size(); ++i) {
+        names.insert(item.fields[i].text);
     }
     return names;
 }
@@ -149,48 +154,45 @@ AllModeLists modeLists(const Model& model) {
     AllModeLists all;
     for (const std::string& mode : vocabulary::modes()) {
         ModeLists& lists = all.emplace_back();
-        const Entry* const entry = model.baseEntry(mode);
-        if (entry != nullptr && entry->records.size() > 1) {
-            lists.outputs = listed(entry->records[0]);
-            lists.families = listed(entry->records[1]);
+        const std::vector<Item>& items = model.baseKeys().items(mode);
+        if (items.size() > 1) {
+            lists.outputs = listed(items[0]);
+            lists.families = listed(items[1]);
         }
     }
     return all;
 }
 
-/// Looks at the records of one key.
+/// Checks the records of one key.
 class TableCheck {
 public:
-    TableCheck(const Table& table, const Family& family, const AllModeLists& modes, Findings& findings)
+    TableCheck(const schema::Table& table, const FamilyData& family, const AllModeLists& modes,
+               Findings& findings)
         : m_table(table), m_family(family), m_modes(modes), m_findings(findings) {}
 
-    void check(const Record& record) {
+    void check(const Item& record) {
         const std::vector<Token>& fields = record.fields;
         if (record.whole.text.empty()) {
-            return; // an empty item is found as such
+            return; // found as an empty item
         }
         const std::optional<std::size_t> row = m_table.hasOptions ? option(fields[0]) : operation(fields[0]);
-        std::size_t next = 1;
         std::optional<std::size_t> mode = 0;
         bool isInMode = false;
-        if (m_table.hasMode && fields.size() > 1) {
-            mode = readMode(fields[next]);
-            isInMode = mode && modeTakesFamily(*mode, fields[next]);
-            ++next;
+        if (m_table.firstOutput > 1 && fields.size() > 1) {
+            mode = readMode(fields[1]);
+            isInMode = mode && modeTakesFamily(*mode, fields[1]);
         }
-        if (fields.size() <= (m_table.hasMode ? 2U : 1U)) {
-            m_findings.add(NO_OUTPUT, record.whole,
-                           fmt::format("no output in {}", quoted(record.whole.text)));
+        if (fields.size() <= m_table.firstOutput) {
+            m_findings.add(NO_OUTPUT, record.whole, "no output in {}", quoted(record.whole.text));
         }
-        for (; next < fields.size(); ++next) {
-            const std::optional<std::size_t> output = readOutput(fields[next]);
+        for (std::size_t i = m_table.firstOutput; i < fields.size(); ++i) {
+            const std::optional<std::size_t> output = readOutput(fields[i]);
             if (isInMode && output) {
-                checkModeOutput(*mode, fields[next]);
+                checkModeOutput(*mode, fields[i]);
             }
             if (row && mode && output && !m_cells.insert({*row, *mode, *output}).second) {
-                m_findings.add(CELL_TWICE, fields[next],
-                               fmt::format("{} of {} is given already", quoted(fields[next].text),
-                                           quoted(record.whole.text)));
+                m_findings.add(CELL_TWICE, fields[i], "{} of {} is given already", quoted(fields[i].text),
+                               quoted(record.whole.text));
             }
         }
     }
@@ -199,23 +201,20 @@ private:
     std::optional<std::size_t> operation(const Token& token) {
         const std::optional<std::size_t> found = position(vocabulary::operations(), token.text, true);
         if (!found && !token.text.empty()) {
-            m_findings.add(UNKNOWN_OPERATION, token,
-                           fmt::format("unknown operation {}{}", quoted(token.text),
-                                       m_findings.didYouMean(token.text, vocabulary::operations())));
+            m_findings.add(UNKNOWN_OPERATION, token, "unknown operation {}{}", quoted(token.text),
+                           m_findings.didYouMean(token.text, vocabulary::operations()));
         }
         return found;
     }
 
     std::optional<std::size_t> option(const Token& token) {
-        const std::vector<std::string> readable = readableOptions();
         const std::optional<std::size_t> found = position(vocabulary::options(), token.text, false);
-        if (found && *found >= readable.size()) {
-            m_findings.add(UNREADABLE_OPTION, token,
-                           fmt::format("a database can't give the option {}", quoted(token.text)));
+        if (found && *found >= schema::tableOptions().size()) {
+            m_findings.add(UNREADABLE_OPTION, token, "a database can't give the option {}",
+                           quoted(token.text));
         } else if (!found && !token.text.empty()) {
-            m_findings.add(UNKNOWN_OPTION, token,
-                           fmt::format("unknown option {}{}", quoted(token.text),
-                                       m_findings.didYouMean(token.text, readable)));
+            m_findings.add(UNKNOWN_OPTION, token, "unknown option {}{}", quoted(token.text),
+                           m_findings.didYouMean(token.text, schema::tableOptions()));
         }
         return found;
     }
@@ -227,33 +226,30 @@ private:
         if (mode == MODE_TYPE::BS && !sameWithoutCase(text, "Bscan")) {
             if (sameWithoutCase(text, "BS")) {
                 m_findings.add(ACCIDENTAL_MODE, token,
-                               fmt::format("{} counts as Boundary Scan by accident; did you mean \"Bscan\"?",
-                                           quoted(text)));
+                               "{} counts as Boundary Scan by accident; did you mean \"Bscan\"?",
+                               quoted(text));
             } else if (!text.empty()) {
-                m_findings.add(UNKNOWN_MODE, token,
-                               fmt::format("unknown mode {}, which counts as Boundary Scan{}", quoted(text),
-                                           m_findings.didYouMean(text, modeTexts())));
+                m_findings.add(UNKNOWN_MODE, token, "unknown mode {}, which counts as Boundary Scan{}",
+                               quoted(text), m_findings.didYouMean(text, schema::tableModes()));
             }
         } else if (mode > MODE_TYPE::SPI) {
-            m_findings.add(MODE_WITHOUT_CELL, token,
-                           fmt::format("the table has no cells for mode {}", quoted(text)));
+            m_findings.add(MODE_WITHOUT_CELL, token, "the table has no cells for mode {}", quoted(text));
             return std::nullopt;
-        } else if (mode == MODE_TYPE::SPI && m_family.kind == Family::Kind::PARTS) {
-            m_findings.add(SPI_MODE_ELSEWHERE, token, "in SPI mode only the tables of spi.acd are asked");
+        } else if (mode == MODE_TYPE::SPI && m_family.kind == schema::File::FAMILY) {
+            m_findings.addText(SPI_MODE_ELSEWHERE, token, "in SPI mode only the tables of spi.acd are asked");
             return std::nullopt;
         }
         return static_cast<std::size_t>(mode);
     }
 
-    /// Can the family be configured in the mode? Unknown devices, which are of family "base", can't in any.
+    /// Can the family be configured in the mode? Unknown devices, which are of family "base", cannot in any.
     bool modeTakesFamily(std::size_t mode, const Token& token) {
         const auto& families = m_modes[mode].families;
         const bool isMissing =
-            families && m_family.kind != Family::Kind::BASE && !families->contains(m_family.name);
+            families && m_family.kind != schema::File::BASE && !families->contains(m_family.name);
         if (isMissing) {
-            m_findings.add(MODE_WITHOUT_FAMILY, token,
-                           fmt::format("{} of base.acd does not list the family {}",
-                                       vocabulary::modes()[mode], quoted(m_family.name)));
+            m_findings.add(MODE_WITHOUT_FAMILY, token, "{} of base.acd does not list the family {}",
+                           vocabulary::modes()[mode], quoted(m_family.name));
         }
         return !isMissing;
     }
@@ -261,65 +257,55 @@ private:
     void checkModeOutput(std::size_t mode, const Token& token) {
         const auto& outputs = m_modes[mode].outputs;
         if (outputs && !outputs->contains(token.text)) {
-            m_findings.add(MODE_WITHOUT_OUTPUT, token,
-                           fmt::format("{} of base.acd does not list the output {}",
-                                       vocabulary::modes()[mode], quoted(token.text)));
+            m_findings.add(MODE_WITHOUT_OUTPUT, token, "{} of base.acd does not list the output {}",
+                           vocabulary::modes()[mode], quoted(token.text));
         }
     }
 
     /// @return an output with a cell; nothing for any other
     std::optional<std::size_t> readOutput(const Token& token) {
-        const std::optional<std::size_t> found = position(cellOutputs(), token.text, false);
+        const std::optional<std::size_t> found = position(schema::tableOutputs(), token.text, false);
         if (found || token.text.empty()) {
             return found;
         }
-        if (token.text == "EXPRESSSVF" || token.text == "EXPRESSQSVF") {
-            m_findings.add(OUTPUT_WITHOUT_CELL, token,
-                           fmt::format("the table has no cells for output {}", quoted(token.text)));
+        if (position(schema::modeOutputs(), token.text, false)) {
+            m_findings.add(OUTPUT_WITHOUT_CELL, token, "the table has no cells for output {}",
+                           quoted(token.text));
         } else if (position(vocabulary::outputs(), token.text, false)) {
-            m_findings.add(UNKNOWN_OUTPUT, token,
-                           fmt::format("a database can't give the output {}", quoted(token.text)));
+            m_findings.add(UNKNOWN_OUTPUT, token, "a database can't give the output {}", quoted(token.text));
         } else {
-            m_findings.add(UNKNOWN_OUTPUT, token,
-                           fmt::format("unknown output {}{}", quoted(token.text),
-                                       m_findings.didYouMean(token.text, cellOutputs())));
+            m_findings.add(UNKNOWN_OUTPUT, token, "unknown output {}{}", quoted(token.text),
+                           m_findings.didYouMean(token.text, schema::tableOutputs()));
         }
         return std::nullopt;
     }
 
-    const Table& m_table;
-    const Family& m_family;
+    const schema::Table& m_table;
+    const FamilyData& m_family;
     const AllModeLists& m_modes;
     Findings& m_findings;
     std::set<std::tuple<std::size_t, std::size_t, std::size_t>> m_cells;
 };
 
-void checkSection(const Section& section, const Family& family, const AllModeLists& modes,
-                  Findings& findings) {
-    for (const Table& table : TABLES) {
-        if (const Entry* const entry = section.find(table.key)) {
-            TableCheck check(table, family, modes, findings);
-            for (const Record& record : entry->records) {
-                check.check(record);
-            }
-        }
-    }
-}
-
 void check(const Model& model, Findings& findings) {
     const AllModeLists modes = modeLists(model);
-    for (const Family& family : model.families()) {
-        checkSection(family.own, family, modes, findings);
-        for (const Section& device : family.devices) {
-            checkSection(device, family, modes, findings);
-        }
+    for (const FamilyData& family : model.families()) {
+        family.forEachSection([&](const Section& section) {
+            for (const schema::Table& table : schema::TABLES) {
+                TableCheck check(table, family, modes, findings);
+                for (const Item& record : section.items(table.key)) {
+                    check.check(record);
+                }
+            }
+        });
     }
 }
 
 } // namespace
 
-Group tableRules() {
-    return {{&UNKNOWN_OPERATION, &UNKNOWN_OPTION, &UNREADABLE_OPTION, &UNKNOWN_MODE, &ACCIDENTAL_MODE,
+RuleSet tableRules() {
+    return {"tables of operations and options",
+            {&UNKNOWN_OPERATION, &UNKNOWN_OPTION, &UNREADABLE_OPTION, &UNKNOWN_MODE, &ACCIDENTAL_MODE,
              &UNKNOWN_OUTPUT, &OUTPUT_WITHOUT_CELL, &MODE_WITHOUT_CELL, &NO_OUTPUT, &CELL_TWICE,
              &SPI_MODE_ELSEWHERE, &MODE_WITHOUT_FAMILY, &MODE_WITHOUT_OUTPUT},
             check};

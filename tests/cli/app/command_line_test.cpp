@@ -10,20 +10,67 @@ using testing::IsEmpty;
 using testing::StartsWith;
 
 TEST(CommandLine, VersionNamesTheTool) {
-    const Outcome outcome = runTool({"--version"});
+    const ProcessResult outcome = runTool({"--version"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.output, StartsWith("tarvik "));
 }
 
+TEST(CommandLine, VersionHasAShortName) { EXPECT_EQ(runTool({"-V"}).output, runTool({"--version"}).output); }
+
+TEST(CommandLine, WithoutArgumentsTheHelpIsShown) {
+    const ProcessResult outcome = runTool(std::vector<std::string>{});
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_EQ(outcome.output, runTool({"--help"}).output);
+    EXPECT_THAT(outcome.output, HasSubstr("\nCommands:\n"));
+}
+
 TEST(CommandLine, NoCommandIsAFault) {
-    const Outcome outcome = runTool(std::vector<std::string>{});
+    const ProcessResult outcome = runTool({"--verbose"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.output, IsEmpty());
     EXPECT_THAT(outcome.error, StartsWith("tarvik: a command is required\nsee: tarvik --help\n"));
 }
 
+TEST(CommandLine, HelpIsACommandToo) {
+    EXPECT_EQ(runTool({"help"}).output, runTool({"--help"}).output);
+    EXPECT_EQ(runTool({"help", "check"}).output, runTool({"check", "--help"}).output);
+    const ProcessResult outcome = runTool({"help", "chek"});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_EQ(outcome.error, "tarvik: unknown command \"chek\"; did you mean \"check\"?\nsee: tarvik help\n");
+}
+
+TEST(CommandLine, HelpNamesPossibleValues) {
+    EXPECT_THAT(runTool({"help", "check"}).output,
+                testing::AllOf(HasSubstr("BS, SS, SM, BSFILE"), HasSubstr("PARALLEL, ZORVA"),
+                               HasSubstr("PROGRAM, PROGRAMFLASH")));
+    EXPECT_THAT(runTool({"help", "why"}).output, HasSubstr("READPROTECT"));
+    EXPECT_THAT(runTool({"help", "lint"}).output, HasSubstr("text, json, sarif"));
+}
+
+TEST(CommandLine, HelpIsShownWithoutWhatIsRequired) {
+    EXPECT_EQ(runTool({"show", "--help"}).status, 0);
+    EXPECT_EQ(runTool({"show", "-h", "--version"}).output, runTool({"help", "show"}).output);
+}
+
+TEST(CommandLine, OptionsAfterTwoDashesAreReported) {
+    const ProcessResult outcome = runTool({"check", "--", "KS50", "--mode", "BS"});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_EQ(outcome.error, "tarvik: \"--mode\" comes after \"--\", so it is not read as an option\n"
+                             "see: tarvik check --help\n");
+}
+
+TEST(CommandLine, UnknownChoicesAreFaultsThatSayWhatIsAccepted) {
+    const ProcessResult outcome = runTool({"dump", "operation"});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_THAT(outcome.error,
+                StartsWith("tarvik: unknown table \"operation\"; did you mean \"operations\"?\n"
+                           "accepted: "));
+    EXPECT_THAT(runTool({"families", "--color", "red"}).error,
+                StartsWith("tarvik: unknown when \"red\"\naccepted: auto, always, never\n"));
+}
+
 TEST(CommandLine, UnknownCommandIsAFaultWithASuggestion) {
-    const Outcome outcome = runTool({"devises"});
+    const ProcessResult outcome = runTool({"devises"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error,
                 StartsWith("tarvik: unknown command \"devises\"; did you mean \"devices\"?\n"));
@@ -33,14 +80,14 @@ TEST(CommandLine, UnknownOptionIsAFaultWithASuggestion) {
     EXPECT_EQ(runTool({"--frob"}).error, "tarvik: unknown option \"--frob\"\nsee: tarvik --help\n");
     EXPECT_THAT(runTool({"--jsn", "devices"}).error,
                 StartsWith("tarvik: unknown option \"--jsn\"; did you mean \"--json\"?\n"));
-    const Outcome outcome = runTool({"devices", "--famly", "finch"});
+    const ProcessResult outcome = runTool({"devices", "--famly", "finch"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_EQ(outcome.error, "tarvik: unknown option \"--famly\"; did you mean \"--family\"?\n"
                              "see: tarvik devices --help\n");
 }
 
 TEST(CommandLine, TooManyArgumentsAreAFault) {
-    const Outcome outcome = runTool({"show", "FN10", "FN20"});
+    const ProcessResult outcome = runTool({"show", "FN10", "FN20"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_EQ(outcome.error, "tarvik: \"FN20\" is one argument too many\nsee: tarvik show --help\n");
 }
@@ -51,7 +98,7 @@ TEST(CommandLine, FaultsAreToldInJsonToo) {
 }
 
 TEST(CommandLine, MissingArgumentIsAFaultThatNamesTheHelp) {
-    const Outcome outcome = runTool({"show"});
+    const ProcessResult outcome = runTool({"show"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, HasSubstr("DEVICE"));
     EXPECT_THAT(outcome.error, HasSubstr("see: tarvik show --help"));
@@ -59,7 +106,7 @@ TEST(CommandLine, MissingArgumentIsAFaultThatNamesTheHelp) {
 
 TEST(CommandLine, OptionsOfTheToolMayStandBehindTheCommand) {
     const SmallDatabase database;
-    const Outcome outcome = runTool({"families", "--json", "--database", database.path()});
+    const ProcessResult outcome = runTool({"families", "--json", "--database", database.path()});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.output, StartsWith("{\"version\":1,"));
 }
@@ -70,7 +117,7 @@ TEST(CommandLine, ADeviceMayBeNamedAsACommand) {
 }
 
 TEST(CommandLine, VocabularyNeedsNoDatabase) {
-    const Outcome outcome = runTool({"--database", "/nowhere", "vocabulary"});
+    const ProcessResult outcome = runTool({"--database", "/nowhere", "vocabulary"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.error, IsEmpty());
 }

@@ -1,8 +1,8 @@
-"""Types command lines into real shells, presses the tabulator key, and looks at what the shell runs then.
+"""Types command lines into real shells, presses the tabulator key, and checks what the shell runs.
 
     completion_shells.py TARVIK FOLDER
 
-FOLDER holds the completions.
+FOLDER contains the completions.
 """
 
 import os
@@ -34,6 +34,9 @@ LINES = [
     ("tarvik devices --family kes@", ["devices", "--family", "kestrel"]),
     ("tarvik property KS50 VEND@", ["property", "KS50", "VENDOR"]),
     ("tarvik which --property VEND@Korvel", ["which", "--property", "VENDOR=Korvel"]),
+    ("tarvik which --property VENDOR=Kor@", ["which", "--property", "VENDOR=Korvel"]),
+    ("tarvik check --mode=dp@ KS50", ["check", "--mode=DP770", "KS50"]),
+    ("tarvik help voc@", ["help", "vocabulary"]),
     ("tarvik lint some-f@", ["lint", "some-folder"]),
 ]
 

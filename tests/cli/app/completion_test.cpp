@@ -18,14 +18,14 @@ using Words = std::vector<std::string>;
 
 class Completion : public testing::Test {
 protected:
-    [[nodiscard]] Outcome run(Words words) const {
+    [[nodiscard]] ProcessResult run(Words words) const {
         words.insert(words.begin(), "complete");
         return runTool({words, {}, {{"TARVIK_DATABASE", m_database.path()}}, {}});
     }
 
     /// The candidates without their descriptions.
     [[nodiscard]] Words offered(const Words& words) const {
-        const Outcome outcome = run(words);
+        const ProcessResult outcome = run(words);
         EXPECT_EQ(outcome.status, 0);
         EXPECT_THAT(outcome.error, IsEmpty());
         Words offered;
@@ -40,9 +40,10 @@ protected:
 };
 
 TEST_F(Completion, OffersCommandsWithTheirSummaries) {
-    EXPECT_THAT(offered({"d"}), ElementsAre("devices", "dump", "diff"));
-    EXPECT_EQ(run({"fam"}).output, "families\tList part families and their modes\n");
+    EXPECT_THAT(offered({"d"}), ElementsAre("devices", "diff", "dump"));
+    EXPECT_EQ(run({"fam"}).output, "families\tList the part families and their modes\n");
     EXPECT_THAT(offered({""}), Not(Contains("complete")));
+    EXPECT_THAT(offered({"help", "f"}), ElementsAre("families"));
     EXPECT_THAT(offered({"--json", "vo"}), ElementsAre("vocabulary"));
 }
 
@@ -77,6 +78,9 @@ TEST_F(Completion, OffersWhatTheDeviceHas) {
     EXPECT_THAT(offered({"property", "FLA", ""}), ElementsAre("DENSITY", "PAGE"));
     EXPECT_THAT(offered({"why", "FN10", "--property", "V"}), ElementsAre("VENDOR"));
     EXPECT_THAT(offered({"which", "--property", "V"}), ElementsAre("VENDOR="));
+    EXPECT_THAT(offered({"which", "--property", "VENDOR="}), ElementsAre("VENDOR=Korvel"));
+    EXPECT_THAT(offered({"which", "--property=VENDOR=k"}), ElementsAre("--property=VENDOR=Korvel"));
+    EXPECT_THAT(offered({"which", "--property", "NO="}), IsEmpty());
     const DatabaseDirectory packages({{"base.acd", "DEVICE_SUPPORTED = finch\n"},
                                       {"finch.acd", "PROPERTIES = PACKAGES,2,P48,TQ100\n[FN10]\n"},
                                       {"spi.acd", ""}});
@@ -92,7 +96,7 @@ TEST_F(Completion, GoesOnBehindAnEqualsSign) {
 
 TEST_F(Completion, LeavesFilesToTheShell) {
     for (const Words& words : {Words{"--database", ""}, {"lint", ""}, {"diff", "a", "b"}, {"--database=d"}}) {
-        const Outcome outcome = run(words);
+        const ProcessResult outcome = run(words);
         EXPECT_EQ(outcome.status, 1);
         EXPECT_THAT(outcome.output, IsEmpty());
     }
@@ -107,7 +111,7 @@ TEST_F(Completion, OffersNothingWhereNothingCanStand) {
 }
 
 TEST_F(Completion, IsQuietAboutADatabaseThatIsNotThere) {
-    const Outcome outcome = run({"--database", "/nowhere", "show", ""});
+    const ProcessResult outcome = run({"--database", "/nowhere", "show", ""});
     EXPECT_NE(outcome.status, 1);
     EXPECT_THAT(outcome.output, IsEmpty());
     EXPECT_THAT(outcome.error, IsEmpty());
@@ -115,7 +119,7 @@ TEST_F(Completion, IsQuietAboutADatabaseThatIsNotThere) {
 }
 
 TEST_F(Completion, KnowsTheDemonstration) {
-    const Outcome outcome = runTool({"complete", "show", "KS5"});
+    const ProcessResult outcome = runTool({"complete", "show", "KS5"});
     EXPECT_THAT(outcome.output, testing::HasSubstr("KS50\n"));
     EXPECT_THAT(outcome.error, IsEmpty());
 }

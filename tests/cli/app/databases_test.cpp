@@ -12,7 +12,7 @@ using testing::Not;
 constexpr const char* DEMONSTRATION_NOTE =
     "tarvik: no database given: answering from the built-in demonstration\n";
 
-Outcome runOn(const std::vector<std::string>& directories, const std::vector<std::string>& command) {
+ProcessResult runOn(const std::vector<std::string>& directories, const std::vector<std::string>& command) {
     std::vector<std::string> arguments;
     for (const std::string& directory : directories) {
         arguments.insert(arguments.end(), {"--database", directory});
@@ -23,7 +23,7 @@ Outcome runOn(const std::vector<std::string>& directories, const std::vector<std
 
 TEST(Databases, GivenDirectoryIsAnsweredFromWithoutANote) {
     const SmallDatabase database;
-    const Outcome outcome = runOn({database.path()}, {"devices"});
+    const ProcessResult outcome = runOn({database.path()}, {"devices"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.output, HasSubstr("FN10"));
     EXPECT_THAT(outcome.error, IsEmpty());
@@ -31,28 +31,30 @@ TEST(Databases, GivenDirectoryIsAnsweredFromWithoutANote) {
 
 TEST(Databases, EnvironmentNamesOne) {
     const SmallDatabase database;
-    const Outcome outcome = runTool(Start{{"devices"}, "", {{"TARVIK_DATABASE", database.path()}}, ""});
+    const ProcessResult outcome =
+        runTool(ProcessOptions{{"devices"}, "", {{"TARVIK_DATABASE", database.path()}}, ""});
     EXPECT_THAT(outcome.output, HasSubstr("FN10"));
     EXPECT_THAT(outcome.error, IsEmpty());
 }
 
 TEST(Databases, OptionOutranksTheEnvironment) {
     const SmallDatabase database;
-    const Outcome outcome =
-        runTool(Start{{"--database", database.path(), "devices"}, "", {{"TARVIK_DATABASE", "/nowhere"}}, ""});
+    const ProcessResult outcome = runTool(ProcessOptions{
+        {"--database", database.path(), "devices"}, "", {{"TARVIK_DATABASE", "/nowhere"}}, ""});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.output, HasSubstr("FN10"));
 }
 
 TEST(Databases, NoneGivenIsTheDemonstrationWithANote) {
-    const Outcome outcome = runTool({"families"});
+    const ProcessResult outcome = runTool({"families"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.output, HasSubstr("kestrel"));
     EXPECT_EQ(outcome.error, DEMONSTRATION_NOTE);
 }
 
 TEST(Databases, EmptyEnvironmentNamesNone) {
-    EXPECT_EQ(runTool(Start{{"families"}, "", {{"TARVIK_DATABASE", ""}}, ""}).error, DEMONSTRATION_NOTE);
+    EXPECT_EQ(runTool(ProcessOptions{{"families"}, "", {{"TARVIK_DATABASE", ""}}, ""}).error,
+              DEMONSTRATION_NOTE);
 }
 
 TEST(Databases, FirstLayerIsOnTop) {
@@ -63,7 +65,7 @@ TEST(Databases, FirstLayerIsOnTop) {
 }
 
 TEST(Databases, MissingDirectoryIsAFaultThatNamesThePath) {
-    const Outcome outcome = runOn({"/nowhere/at all"}, {"devices"});
+    const ProcessResult outcome = runOn({"/nowhere/at all"}, {"devices"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.output, IsEmpty());
     EXPECT_THAT(outcome.error, HasSubstr("\"/nowhere/at all\""));
@@ -72,13 +74,14 @@ TEST(Databases, MissingDirectoryIsAFaultThatNamesThePath) {
 
 TEST(Databases, MissingLayerIsAFaultThatNamesAllPaths) {
     const SmallDatabase database;
-    const Outcome outcome = runOn({database.path(), "/nowhere"}, {"devices"});
+    const ProcessResult outcome = runOn({database.path(), "/nowhere"}, {"devices"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, HasSubstr("tried: \"" + database.path() + "\", \"/nowhere\"\n"));
 }
 
 TEST(Databases, MissingDirectoryOfTheEnvironmentIsAFault) {
-    const Outcome outcome = runTool(Start{{"devices"}, "", {{"TARVIK_DATABASE", "/nowhere:/neither"}}, ""});
+    const ProcessResult outcome =
+        runTool(ProcessOptions{{"devices"}, "", {{"TARVIK_DATABASE", "/nowhere:/neither"}}, ""});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, HasSubstr("tried: \"/nowhere\", \"/neither\"\n"));
 }
@@ -92,7 +95,7 @@ TEST(Databases, EmptyNameIsNoDirectory) { EXPECT_EQ(runOn({""}, {"devices"}).sta
 
 TEST(Databases, DirectoryWithoutABaseIsAFault) {
     const DatabaseDirectory empty;
-    const Outcome outcome = runOn({empty.path()}, {"devices"});
+    const ProcessResult outcome = runOn({empty.path()}, {"devices"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, HasSubstr("base.acd"));
     EXPECT_THAT(outcome.error, HasSubstr(empty.path()));
@@ -107,7 +110,7 @@ TEST(Databases, BaseThatCannotBeReadIsAFault) {
 TEST(Databases, FamilyThatCannotBeReadIsAFault) {
     const SmallDatabase database;
     std::filesystem::create_directory(database.path("broken.acd"));
-    const Outcome outcome = database.run({"devices"});
+    const ProcessResult outcome = database.run({"devices"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, HasSubstr("broken.acd"));
 }
@@ -121,7 +124,7 @@ TEST(Databases, FaultIsToldInJsonToo) {
 TEST(Databases, MalformedLineIsReportedOnce) {
     const DatabaseDirectory directory(
         {{"base.acd", "DEVICE_SUPPORTED = finch\nnonsense\n"}, {"finch.acd", "[FN10]\n"}});
-    const Outcome outcome = runOn({directory.path()}, {"devices"});
+    const ProcessResult outcome = runOn({directory.path()}, {"devices"});
     EXPECT_EQ(outcome.status, 0);
     const std::string place = directory.path("base.acd") + ":2";
     EXPECT_THAT(outcome.error, HasSubstr(place));

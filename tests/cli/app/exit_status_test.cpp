@@ -107,6 +107,7 @@ std::vector<Endings> endings(const std::string& database) {
          {{database}, {database, "/nowhere"}, {"/nowhere", database}}},
         {"report", {{"-o", "/dev/null"}}, {}, {{}, {"-o", "/nowhere/page.html"}}},
         {"batch", {{}}, {}, {{"zz"}}},
+        {"help", {{}, {"check"}}, {}, {{"zz"}}},
     };
 }
 
@@ -124,7 +125,7 @@ TEST(ExitStatus, OfEveryCommand) {
         const auto expectAll = [&](const std::vector<Words>& lines, int status) {
             for (Words words : lines) {
                 words.insert(words.begin(), each.command);
-                const Outcome outcome = database.run(words);
+                const ProcessResult outcome = database.run(words);
                 EXPECT_EQ(outcome.status, status) << joined(words) << '\n' << outcome;
                 if (status == 2) {
                     EXPECT_THAT(outcome.error, StartsWith("tarvik: ")) << joined(words);
@@ -149,7 +150,7 @@ TEST(ExitStatus, OfEveryCommandWithoutItsDatabase) {
         Words words = each.command == "lint" ? Words{} : each.yes.front();
         words.insert(words.begin(), each.command);
         for (const std::string& path : {std::string("/nowhere"), empty.path()}) {
-            const Outcome outcome = runTool({words, {}, {{"TARVIK_DATABASE", path}}, {}});
+            const ProcessResult outcome = runTool({words, {}, {{"TARVIK_DATABASE", path}}, {}});
             EXPECT_EQ(outcome.status, 2) << joined(words);
             EXPECT_THAT(outcome.output, IsEmpty()) << joined(words);
             EXPECT_THAT(outcome.error, HasSubstr(path)) << joined(words);
@@ -163,7 +164,7 @@ TEST(ExitStatus, IsTheSameWithJson) {
         const auto expectAll = [&](const std::vector<Words>& lines, int status) {
             for (Words words : lines) {
                 words.insert(words.begin(), {"--json", each.command});
-                const Outcome outcome = database.run(words);
+                const ProcessResult outcome = database.run(words);
                 EXPECT_EQ(outcome.status, status) << joined(words) << '\n' << outcome;
                 if (each.command != "batch" || status == 2) {
                     EXPECT_THAT(outcome.output, StartsWith("{\"version\":1,")) << joined(words);

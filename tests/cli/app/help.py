@@ -1,8 +1,9 @@
-"""Holds the help against what the tool does, and the manual page against the help.
+"""Compares the help with what the tool does, and the manual page with the help.
 
-    help.py TARVIK DATABASE MANUAL
+    help.py TARVIK DATABASE MANUAL UPDATE_MANUAL
 
-Every example of the help runs, and everything that the help names is in the manual.
+Every example of the help runs, everything that the help names is in the manual, and the manual's sections of options
+and commands are what UPDATE_MANUAL makes.
 """
 
 import os
@@ -31,8 +32,8 @@ def commands_of(text):
 def options_of(text):
     names = set()
     for line in text.splitlines():
-        if re.match(r"  -", line):
-            names.update(re.findall(r"(?<![\w-])--?[a-z][a-z-]*", line[:28]))
+        if re.match(r" +-", line):
+            names.update(re.findall(r"(?<![\w-])--?[a-zA-Z][a-z-]*", line[:28]))
     return names
 
 
@@ -41,7 +42,7 @@ def examples_of(text):
 
 
 def prepare(folder, database):
-    """What the examples speak of."""
+    """Makes the files that the examples name."""
     for name in ("database", "company", "changed", "released"):
         shutil.copytree(database, Path(folder, name))
     Path(folder, "site").mkdir()
@@ -63,7 +64,7 @@ def check_manual(manual, names):
 
 
 def main():
-    tool, database, manual = map(os.path.abspath, sys.argv[1:])
+    tool, database, manual, update_manual = map(os.path.abspath, sys.argv[1:])
     environment = {
         name: value for name, value in os.environ.items() if name != "COLUMNS" and not name.startswith("TARVIK_")
     }
@@ -90,6 +91,7 @@ def main():
         for line in shown.splitlines():
             assert len(line) <= 80, line
     check_manual(manual, names)
+    subprocess.run([update_manual, "--check", tool], check=True)
     print(f"{count} examples of {len(commands)} commands; {len(names)} names in the manual")
     return 0
 

@@ -139,7 +139,7 @@ TEST(BatchCalls, MasksAreSigned) {
     const DatabaseDirectory directory(
         {{"base.acd", "DEVICE_SUPPORTED = finch\nPROGRAM_OPTION_PACKAGE = finch\n"},
          {"finch.acd", "OPERATION = EXPRESSQSVF,BS,USB2\n[FN10]\n"}});
-    Start start{{"--database", directory.path(), "batch"}, "", {}, ""};
+    ProcessOptions start{{"--database", directory.path(), "batch"}, "", {}, ""};
     start.input = request("getDeviceOperations", R"(["FN10", 0, 2])");
     EXPECT_EQ(json::parse(runTool(start).output)["result"], -2147483648LL);
 }
@@ -232,21 +232,48 @@ TEST(BatchCalls, NumbersAreThoseOfInt) {
               "cableType2String takes (output: integer)");
 }
 
-TEST(BatchCalls, KeyNamesAreExact) {
-    EXPECT_EQ(error("modeType2String", R"({"mode": "bs"})"),
-              "\"mode\" has no key name \"bs\"; did you mean \"BS\"?");
-    EXPECT_EQ(error("modeType2String", R"({"mode": "Bscan"})"), "\"mode\" has no key name \"Bscan\"");
+TEST(BatchCalls, NamedArgumentsTakeTheWordsOfTheCommands) {
+    EXPECT_EQ(result("modeType2String", R"({"mode": "ss"})"), "SS");
+    EXPECT_EQ(result("modeType2String", R"({"mode": "Smap"})"), "SM");
+    EXPECT_EQ(result("modeType2String", R"({"mode": "Slave Serial"})"), "SS");
+    EXPECT_EQ(error("modeType2String", R"({"mode": "SR"})"), "unknown mode \"SR\"; did you mean \"SS\"?");
     EXPECT_EQ(result("cableType2String", R"({"output": "NULLCABLE"})"), "NULLCABLE");
     EXPECT_EQ(result("optionType2String", R"({"option": "RS_PIN0"})"), "RS_PIN0");
     EXPECT_EQ(result("operationType2String", R"({"operation": "EXPRESSQSVF"})"), "EXPRESSQSVF");
-    EXPECT_EQ(error("operationType2String", R"({"operation": "Program"})"),
-              "\"operation\" has no key name \"Program\"; did you mean \"PROGRAM\"?");
+    EXPECT_EQ(result("operationType2String", R"({"operation": "Get Device ID"})"), "READIDCODE");
+    EXPECT_EQ(error("operationType2String", R"({"operation": "PROGRAMM"})"),
+              "unknown operation \"PROGRAMM\"; did you mean \"PROGRAM\"?");
 }
 
 TEST(BatchCalls, NulInATextIsAFaultWhereMethodsWouldNotSeeIt) {
     EXPECT_EQ(error("getPartFamily", R"(["FN10\u0000x"])"), "\"device\" holds a NUL");
     EXPECT_EQ(result("isSpiDevice", R"(["FLA\u0000"])"), false);
     EXPECT_EQ(result("removePackageName", R"(["a\u0000b_c"])"), std::string("a\0b", 3));
+}
+
+TEST(BatchCalls, HelpListsEveryCallWithItsArguments) {
+    const json calls = result("help", "[]");
+    std::size_t checks = 0;
+    for (const json& call : calls) {
+        checks += call["call"] == "checkConstraints" ? 1U : 0U;
+        if (call["call"] == "help") {
+            continue;
+        }
+        // With one argument too many a call names what it takes: exactly the arguments that the help lists.
+        json arguments = json::array();
+        for (int i = 0; i < 9; ++i) {
+            arguments.push_back(nullptr);
+        }
+        const std::string taken = error(call["call"], arguments.dump());
+        for (const json& argument : call["args"]) {
+            EXPECT_THAT(taken, HasSubstr(argument["name"].get<std::string>() + ": ")) << call;
+        }
+    }
+    EXPECT_EQ(checks, 5U);
+    EXPECT_EQ(calls.at(7),
+              json::parse(R"({"call": "cableString2Type", "args": [{"name": "text", "type": "text or null"}],
+                                            "result": "integer"})"));
+    EXPECT_EQ(error("help", R"(["getPartFamily"])"), "help takes ()");
 }
 
 TEST(BatchCalls, FaultyArgumentsCallNothing) {

@@ -12,9 +12,9 @@ std::string error(const std::string& line) { return answerTo(line + "\n")["error
 
 TEST(Batch, AnswerHasIdResultAndMessagesInThisOrder) {
     const SmallDatabase database;
-    Start start = database.start({"batch"});
+    ProcessOptions start = database.start({"batch"});
     start.input = "{\"id\": 7, \"call\": \"getDeviceOperations\", \"args\": [\"FN10\", 0, 2]}\n";
-    const Outcome outcome = runTool(start);
+    const ProcessResult outcome = runTool(start);
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.output, "{\"id\":7,\"result\":1,\"messages\":[]}\n");
     EXPECT_EQ(outcome.error, "");
@@ -69,11 +69,11 @@ TEST(Batch, OneManagerAnswersAll) {
 TEST(Batch, StartUpMessagesStandInTheFirstAnswer) {
     const DatabaseDirectory directory(DatabaseDirectory::Files{{"base.acd", "nonsense\n"}});
     std::filesystem::create_directory(directory.path("spi.acd"));
-    Start start{{"--database", directory.path(), "batch"}, "", {}, ""};
+    ProcessOptions start{{"--database", directory.path(), "batch"}, "", {}, ""};
     start.input = "not a request\n"
                   "{\"id\": 1, \"call\": \"modeType2String\", \"args\": [1]}\n"
                   "{\"id\": 2, \"call\": \"modeType2String\", \"args\": [1]}\n";
-    const Outcome outcome = runTool(start);
+    const ProcessResult outcome = runTool(start);
     EXPECT_EQ(outcome.error, "");
     std::istringstream lines(outcome.output);
     std::string line;
@@ -190,7 +190,7 @@ TEST(Batch, BytesThatAreNoTextShowAsReplaced) {
         {{"base.acd", "DEVICE_SUPPORTED = finch\nPROGRAM_OPTION_PACKAGE = finch\n"},
          {"finch.acd", "[FN10]\nPROPERTY = KEY,a\xFF"
                        "b\n"}});
-    Start start{{"--database", directory.path(), "batch"}, "", {}, ""};
+    ProcessOptions start{{"--database", directory.path(), "batch"}, "", {}, ""};
     start.input = "{\"call\": \"getDeviceStringProperty\", \"args\": [\"FN10\", \"KEY\"]}\n";
     EXPECT_EQ(json::parse(runTool(start).output)["result"], "a\xEF\xBF\xBD"
                                                             "b");
@@ -198,7 +198,7 @@ TEST(Batch, BytesThatAreNoTextShowAsReplaced) {
 
 TEST(Batch, AnswersComeBeforeTheNextRequestIsAsked) {
     const SmallDatabase database;
-    Conversation batch(database.start({"batch"}));
+    InteractiveProcess batch(database.start({"batch"}));
     for (int id = 0; id < 3; ++id) {
         batch.write("{\"id\": " + std::to_string(id) + ", \"call\": \"getOperationOrders\"}\n");
         EXPECT_EQ(json::parse(batch.readLine())["id"], id);
@@ -226,8 +226,8 @@ TEST(Batch, ManyRequestsAreAnsweredInOrder) {
 }
 
 TEST(Batch, DatabaseIsOpenedBeforeTheFirstRequest) {
-    Start start{{"--database", "/nowhere", "batch"}, "{\"call\": \"getOperationOrders\"}\n", {}, ""};
-    const Outcome outcome = runTool(start);
+    ProcessOptions start{{"--database", "/nowhere", "batch"}, "{\"call\": \"getOperationOrders\"}\n", {}, ""};
+    const ProcessResult outcome = runTool(start);
     EXPECT_EQ(outcome.status, 2);
     EXPECT_EQ(outcome.output, "");
 }

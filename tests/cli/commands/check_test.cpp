@@ -10,11 +10,11 @@ using testing::HasSubstr;
 
 TEST(Check, ModeAndOutput) {
     const SmallDatabase database;
-    const Outcome yes = database.run({"check", "--mode", "BS", "--output", "USB2"});
+    const ProcessResult yes = database.run({"check", "--mode", "BS", "--output", "USB2"});
     EXPECT_EQ(yes.status, 0);
     EXPECT_EQ(yes.output, "yes: mode BS through USB2\n");
     EXPECT_EQ(yes.error, "");
-    const Outcome no = database.run({"check", "--mode", "BS", "--output", "ZORVA"});
+    const ProcessResult no = database.run({"check", "--mode", "BS", "--output", "ZORVA"});
     EXPECT_EQ(no.status, 1);
     EXPECT_EQ(no.output, "no: mode BS through ZORVA\n");
     EXPECT_EQ(no.error, "ZORVA cable is not supported in Boundary Scan mode\n");
@@ -23,14 +23,14 @@ TEST(Check, ModeAndOutput) {
 TEST(Check, DeviceInMode) {
     const SmallDatabase database;
     EXPECT_EQ(database.run({"check", "FN10", "--mode", "SS"}).output, "yes: FN10 in mode SS\n");
-    const Outcome no = database.run({"check", "FN10", "--mode", "SM"});
+    const ProcessResult no = database.run({"check", "FN10", "--mode", "SM"});
     EXPECT_EQ(no.status, 1);
     EXPECT_EQ(no.error, "FN10 is not supported in Select Map mode\n");
 }
 
 TEST(Check, PackageInMode) {
     const SmallDatabase database;
-    const Outcome no = database.run({"check", "FN10", "--mode", "SS", "--package", "P48"});
+    const ProcessResult no = database.run({"check", "FN10", "--mode", "SS", "--package", "P48"});
     EXPECT_EQ(no.status, 1);
     EXPECT_EQ(no.output, "no: FN10 in package P48 in mode SS\n");
     EXPECT_EQ(no.error, "FN10_P48 is not supported in Slave Serial mode\n");
@@ -55,7 +55,7 @@ TEST(Check, PackageInModeThroughOutput) {
     const SmallDatabase database;
     const std::vector<std::string> question{"check",    "FN10",     "--mode",    "SS",
                                             "--output", "PARALLEL", "--package", "P48"};
-    const Outcome no = database.run(question);
+    const ProcessResult no = database.run(question);
     EXPECT_EQ(no.status, 1);
     EXPECT_EQ(no.error, "FN10_P48 is not supported in Slave Serial mode\n");
 }
@@ -90,11 +90,11 @@ TEST(Check, JsonHoldsTheQuestionAndTheRefusal) {
 
 TEST(Check, UnknownDeviceIsNoted) {
     const SmallDatabase database;
-    const Outcome no = database.run({"check", "FN11", "--mode", "BS"});
+    const ProcessResult no = database.run({"check", "FN11", "--mode", "BS"});
     EXPECT_EQ(no.status, 1);
     EXPECT_THAT(no.error, HasSubstr("tarvik: the database has no device \"FN11\""));
     // The manager takes every device in this mode, and the answer is the manager's.
-    const Outcome yes = database.run({"check", "FN11", "--mode", "PFF"});
+    const ProcessResult yes = database.run({"check", "FN11", "--mode", "PFF"});
     EXPECT_EQ(yes.status, 0);
     EXPECT_THAT(yes.error, HasSubstr("tarvik: the database has no device \"FN11\""));
 }
@@ -111,7 +111,7 @@ TEST(Check, OtherCombinationsAreFaultsThatSayWhatIsPossible) {
         {"check", "FN10", "--mode", "BS", "--output", "USB2", "--operation", "ERASE", "--package", "P48"},
     };
     for (const std::vector<std::string>& combination : combinations) {
-        const Outcome outcome = database.run(combination);
+        const ProcessResult outcome = database.run(combination);
         EXPECT_EQ(outcome.status, 2) << testing::PrintToString(combination);
         EXPECT_EQ(outcome.output, "");
         EXPECT_THAT(outcome.error, HasSubstr("DEVICE --mode M --output O [--package P]\n"));
@@ -128,14 +128,15 @@ TEST(Check, UnknownWordsAreFaults) {
 }
 
 TEST(Check, UsageFaultsNeedNoDatabase) {
-    const Outcome outcome = runTool({"--database", "/nowhere", "check", "--mode", "BS"});
+    const ProcessResult outcome = runTool({"--database", "/nowhere", "check", "--mode", "BS"});
     EXPECT_THAT(outcome.error, testing::StartsWith("tarvik: check takes one of these:\n"));
 }
 
 TEST(Multiboot, TypeIsReadWithAndWithoutItsPrefixInAnyCase) {
     const SmallDatabase database;
     for (const char* const type : {"MB_SPI", "mb_spi", "TYPE_MB_SPI", "type_mb_spi"}) {
-        const Outcome yes = database.run({"multiboot", "fla", "--type", type, "--width", "none", "--lead"});
+        const ProcessResult yes =
+            database.run({"multiboot", "fla", "--type", type, "--width", "none", "--lead"});
         EXPECT_EQ(yes.status, 0);
         EXPECT_EQ(yes.output, "yes: fla as lead device of TYPE_MB_SPI NONE\n");
     }
@@ -143,7 +144,8 @@ TEST(Multiboot, TypeIsReadWithAndWithoutItsPrefixInAnyCase) {
 
 TEST(Multiboot, PositionCounts) {
     const SmallDatabase database;
-    const Outcome no = database.run({"multiboot", "FLA", "--type", "MB_SPI", "--width", "NONE", "--chain"});
+    const ProcessResult no =
+        database.run({"multiboot", "FLA", "--type", "MB_SPI", "--width", "NONE", "--chain"});
     EXPECT_EQ(no.status, 1);
     EXPECT_EQ(no.output, "no: FLA as chain device of TYPE_MB_SPI NONE\n");
 }
@@ -163,11 +165,13 @@ TEST(Multiboot, CombinationThatNoTypeHasIsANo) {
 
 TEST(Multiboot, UnknownWordsAreFaults) {
     const SmallDatabase database;
-    const Outcome type = database.run({"multiboot", "FLA", "--type", "MB", "--width", "NONE", "--lead"});
+    const ProcessResult type =
+        database.run({"multiboot", "FLA", "--type", "MB", "--width", "NONE", "--lead"});
     EXPECT_EQ(type.status, 2);
     EXPECT_THAT(type.error, HasSubstr("unknown multiboot type \"MB\"; did you mean \"MB_SPI\"?\n"));
     EXPECT_THAT(type.error, HasSubstr("TYPE_BPI, TYPE_MB_SPI, TYPE_MB_BPI, TYPE_MB_QPRM"));
-    const Outcome width = database.run({"multiboot", "FLA", "--type", "BPI", "--width", "WIDE", "--lead"});
+    const ProcessResult width =
+        database.run({"multiboot", "FLA", "--type", "BPI", "--width", "WIDE", "--lead"});
     EXPECT_EQ(width.status, 2);
     EXPECT_THAT(width.error, HasSubstr("SERIAL, PARALLEL, NONE"));
 }
@@ -181,7 +185,8 @@ TEST(Multiboot, JsonHoldsTheQuestion) {
 
 TEST(Multiboot, UnknownDeviceIsNoted) {
     const SmallDatabase database;
-    const Outcome no = database.run({"multiboot", "FLX", "--type", "MB_SPI", "--width", "NONE", "--lead"});
+    const ProcessResult no =
+        database.run({"multiboot", "FLX", "--type", "MB_SPI", "--width", "NONE", "--lead"});
     EXPECT_EQ(no.status, 1);
     EXPECT_THAT(no.error, HasSubstr("the database has no device \"FLX\"; did you mean \"FLA\"?"));
 }

@@ -10,7 +10,7 @@ using testing::HasSubstr;
 
 /// What a request of a batch answers.
 json result(const SmallDatabase& database, const std::string& requests) {
-    Start start = database.start({"batch"});
+    ProcessOptions start = database.start({"batch"});
     start.input = requests;
     const std::string output = runTool(start).output;
     return json::parse(output.substr(output.rfind('\n', output.size() - 2) + 1))["result"];
@@ -23,7 +23,7 @@ TEST(Dump, RecordedTablesAreWhatTheManagerRecords) {
                                                      {"options", "dumpProgramOptionsTable"},
                                                      {"families", "dumpCachedDeviceFamilies"}};
     for (const auto& [table, method] : methods) {
-        const Outcome outcome = database.run({"dump", table});
+        const ProcessResult outcome = database.run({"dump", table});
         EXPECT_EQ(outcome.status, 0);
         EXPECT_EQ(outcome.error, "");
         EXPECT_EQ(
@@ -50,7 +50,7 @@ TEST(Dump, DevicesAreLoadedFirst) {
 
 TEST(Dump, MultibootComesFromTheStatusChannel) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"dump", "multiboot"});
+    const ProcessResult outcome = database.run({"dump", "multiboot"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.output, testing::StartsWith("TYPE_BPI_PARALLEL_CHAIN:\n"));
     EXPECT_THAT(outcome.output, HasSubstr("\nTYPE_MB_SPI_NONE_LEAD: FLA FN10\n"));
@@ -68,7 +68,7 @@ TEST(Dump, JsonHoldsTheText) {
 }
 
 TEST(Dump, UnknownTableIsAFault) {
-    const Outcome outcome = SmallDatabase().run({"dump", "operation"});
+    const ProcessResult outcome = SmallDatabase().run({"dump", "operation"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, HasSubstr("did you mean \"operations\"?"));
     EXPECT_THAT(outcome.error, HasSubstr("multiboot, bsdl, families, operations, options"));

@@ -10,7 +10,7 @@ using testing::HasSubstr;
 
 TEST(Devices, NameFamilyAndIdcodeStandInColumns) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"devices"});
+    const ProcessResult outcome = database.run({"devices"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.output, "DEVICE  FAMILY  IDCODE\n"
                               "FN10    finch   0x0010\n"
@@ -28,7 +28,7 @@ TEST(Devices, GlobMatchesWholeNamesWithoutCase) {
 
 TEST(Devices, NothingThatMatchesIsANo) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"devices", "zz*"});
+    const ProcessResult outcome = database.run({"devices", "zz*"});
     EXPECT_EQ(outcome.status, 1);
     EXPECT_EQ(outcome.output, "");
     EXPECT_EQ(outcome.error, "tarvik: no device matches \"zz*\"\n");
@@ -41,7 +41,7 @@ TEST(Devices, FamilyIsNamedInAnyCase) {
 
 TEST(Devices, UnknownFamilyIsANoWithASuggestion) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"devices", "--family", "finsh"});
+    const ProcessResult outcome = database.run({"devices", "--family", "finsh"});
     EXPECT_EQ(outcome.status, 1);
     EXPECT_THAT(outcome.error, HasSubstr("did you mean \"finch\"?"));
 }
@@ -49,9 +49,9 @@ TEST(Devices, UnknownFamilyIsANoWithASuggestion) {
 TEST(Devices, WithoutAnIdcodeThereIsNone) {
     const DatabaseDirectory directory(
         {{"base.acd", "DEVICE_SUPPORTED = finch\n"}, {"finch.acd", "[FN10]\n"}});
-    const Outcome text = runTool({"--database", directory.path(), "devices"});
+    const ProcessResult text = runTool({"--database", directory.path(), "devices"});
     EXPECT_THAT(text.output, HasSubstr("FN10    finch   -\n"));
-    const Outcome object = runTool({"--database", directory.path(), "devices", "--json"});
+    const ProcessResult object = runTool({"--database", directory.path(), "devices", "--json"});
     EXPECT_TRUE(json::parse(object.output)["devices"][0]["idcode"].is_null());
 }
 
@@ -59,7 +59,7 @@ TEST(Devices, DeviceOfSeveralFamiliesIsListedWhereItIsAnsweredFrom) {
     const DatabaseDirectory directory(
         {{"base.acd", "DEVICE_SUPPORTED = a,b\n"}, {"a.acd", "[TWICE]\n"}, {"b.acd", "[twice]\n[ONCE]\n"}});
     const auto names = [&](const std::string& family) {
-        const Outcome outcome =
+        const ProcessResult outcome =
             runTool({"--database", directory.path(), "devices", "--json", "--family", family});
         return json::parse(outcome.output)["devices"];
     };
@@ -71,13 +71,13 @@ TEST(Devices, DeviceOfSeveralFamiliesIsListedWhereItIsAnsweredFrom) {
 TEST(Devices, BytesThatAreNoTextShowAsReplacedInJson) {
     const DatabaseDirectory directory(
         {{"base.acd", "DEVICE_SUPPORTED = finch\n"}, {"finch.acd", "[FN\xFF]\n"}});
-    const Outcome outcome = runTool({"--database", directory.path(), "devices", "--json"});
+    const ProcessResult outcome = runTool({"--database", directory.path(), "devices", "--json"});
     EXPECT_EQ(json::parse(outcome.output)["devices"][0]["name"], "FN\xEF\xBF\xBD");
 }
 
 TEST(Families, DevicesAreCountedAndModesNamed) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"families"});
+    const ProcessResult outcome = database.run({"families"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.error, "");
     EXPECT_EQ(outcome.output, "FAMILY  DEVICES  MODES\n"
@@ -92,10 +92,10 @@ TEST(Families, SameInJson) {
 }
 
 TEST(Vocabulary, ModesComeWithTheirOtherTexts) {
-    const Outcome outcome = runTool({"vocabulary"});
+    const ProcessResult outcome = runTool({"vocabulary"});
     EXPECT_EQ(outcome.status, 0);
-    EXPECT_THAT(outcome.output, HasSubstr("0  BS       Bscan\n"));
-    EXPECT_THAT(outcome.output, HasSubstr("6  KITECF   CF CompactFlash\n"));
+    EXPECT_THAT(outcome.output, HasSubstr("0  BS       Bscan            Boundary Scan mode\n"));
+    EXPECT_THAT(outcome.output, HasSubstr("6  KITECF   CF CompactFlash  Kite Compact Flash  mode\n"));
 }
 
 TEST(Vocabulary, AllValuesStandInTheirOrder) {
@@ -105,14 +105,23 @@ TEST(Vocabulary, AllValuesStandInTheirOrder) {
     EXPECT_EQ(answer["outputs"].size(), 10U);
     EXPECT_EQ(answer["operations"].size(), 32U);
     EXPECT_EQ(answer["options"].size(), 24U);
-    EXPECT_EQ(answer["modes"][4], json::parse(R"({"value": 4, "key": "DP770", "also": ["DTCONFIG"]})"));
+    EXPECT_EQ(
+        answer["modes"][4],
+        json::parse(
+            R"({"value": 4, "key": "DP770", "also": ["DTCONFIG"], "name": "Destop Programming mode"})"));
     EXPECT_EQ(answer["operations"][2],
               json::parse(R"({"value": 2, "key": "PROGRAMFPGAONLY", "name": "Program FPGA Only "})"));
 }
 
+TEST(Devices, NamesOnlyAreWithoutHeader) {
+    const SmallDatabase database;
+    EXPECT_EQ(database.run({"devices", "--names"}).output, "FN10\nFN20\n");
+}
+
 TEST(Vocabulary, WordsThatDatabasesCannotUseAreMarked) {
     const json answer = json::parse(runTool({"vocabulary", "--json"}).output);
-    EXPECT_EQ(answer["outputs"][5], json::parse(R"({"value": 5, "key": "QSVF", "inDatabases": false})"));
+    EXPECT_EQ(answer["outputs"][5],
+              json::parse(R"({"value": 5, "key": "QSVF", "inDatabases": false, "name": "QSVF"})"));
     EXPECT_EQ(answer["outputs"][6]["inDatabases"], true);
     EXPECT_EQ(answer["options"][16]["inDatabases"], true);
     EXPECT_EQ(answer["options"][17]["inDatabases"], false);
@@ -120,7 +129,7 @@ TEST(Vocabulary, WordsThatDatabasesCannotUseAreMarked) {
 
 TEST(Spi, FlashesAreListedWithTheirFamilies) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"spi"});
+    const ProcessResult outcome = database.run({"spi"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.output, "FLASH  FAMILY\nFLA    ST1\nFLB    ST1\nFLC    NV\n");
     EXPECT_EQ(database.json({"spi"})["flashes"][2], json::parse(R"({"name": "FLC", "family": "NV"})"));

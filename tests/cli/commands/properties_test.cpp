@@ -17,7 +17,7 @@ TEST(Property, DeviceOutranksItsFamily) {
 
 TEST(Property, SeveralValuesStandOneALineInByteOrder) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"property", "FN10", "PROGRAM"});
+    const ProcessResult outcome = database.run({"property", "FN10", "PROGRAM"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.output, "BS\nSS\n");
     EXPECT_EQ(database.json({"property", "FN10", "PROGRAM"}),
@@ -27,7 +27,7 @@ TEST(Property, SeveralValuesStandOneALineInByteOrder) {
 
 TEST(Property, UnknownKeyIsANoWithTheManagersMessageAndASuggestion) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"property", "FN10", "vendor"});
+    const ProcessResult outcome = database.run({"property", "FN10", "vendor"});
     EXPECT_EQ(outcome.status, 1);
     EXPECT_EQ(outcome.output, "");
     EXPECT_EQ(outcome.error, "ACD entry  vendor not found for device family FN10.\n"
@@ -36,7 +36,7 @@ TEST(Property, UnknownKeyIsANoWithTheManagersMessageAndASuggestion) {
 
 TEST(Property, UnknownDeviceIsANo) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"property", "FN99", "VENDOR"});
+    const ProcessResult outcome = database.run({"property", "FN99", "VENDOR"});
     EXPECT_EQ(outcome.status, 1);
     EXPECT_THAT(outcome.error, HasSubstr("tarvik: the database has no device \"FN99\""));
 }
@@ -57,7 +57,7 @@ TEST(Spi, PropertyOfTheFlashOutranksItsClass) {
 TEST(Spi, AllPropertiesTellWhereTheyComeFrom) {
     const SmallDatabase database;
     const std::string file = database.path("spi.acd");
-    const Outcome outcome = database.run({"spi", "FLA"});
+    const ProcessResult outcome = database.run({"spi", "FLA"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.output, "PROPERTY  VALUE  FROM    WHERE\n"
                               "DENSITY   1024   device  " +
@@ -83,7 +83,7 @@ TEST(Spi, FamilyHasItsOwnProperties) {
 
 TEST(Spi, UnknownPropertyIsANoWithASuggestion) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"spi", "FLA", "DENSITIES"});
+    const ProcessResult outcome = database.run({"spi", "FLA", "DENSITIES"});
     EXPECT_EQ(outcome.status, 1);
     EXPECT_EQ(outcome.error, "tarvik: \"FLA\" has no property \"DENSITIES\"; did you mean \"DENSITY\"?\n");
 }
@@ -91,7 +91,7 @@ TEST(Spi, UnknownPropertyIsANoWithASuggestion) {
 TEST(Spi, DeviceThatIsNoFlashIsANo) {
     const SmallDatabase database;
     EXPECT_EQ(database.run({"spi", "FN10"}).status, 1);
-    const Outcome outcome = database.run({"spi", "FLD", "PAGE"});
+    const ProcessResult outcome = database.run({"spi", "FLD", "PAGE"});
     EXPECT_EQ(outcome.status, 1);
     EXPECT_EQ(outcome.error, "tarvik: the database has no flash \"FLD\"; did you mean \"FLA\"?\n");
 }

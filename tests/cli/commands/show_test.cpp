@@ -12,7 +12,7 @@ using testing::StartsWith;
 
 TEST(Show, WholeSheetOfADevice) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"show", "FN10"});
+    const ProcessResult outcome = database.run({"show", "FN10"});
     const std::string family = database.path("finch.acd");
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.error, "");
@@ -89,7 +89,7 @@ TEST(Show, WholeSheetInJson) {
 
 TEST(Show, NameInAnotherCaseIsShownInBoth) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"show", "Fn20"});
+    const ProcessResult outcome = database.run({"show", "Fn20"});
     EXPECT_THAT(outcome.output,
                 StartsWith("Device  Fn20 (in the database: FN20)\nFamily  finch\nIDCODE  0x0020"));
     EXPECT_EQ(database.json({"show", "Fn20"})["spelling"], "FN20");
@@ -107,7 +107,7 @@ TEST(Show, PackageDoesNotChangeTheIdcode) {
 
 TEST(Show, FlashHasFlashProperties) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"show", "FLB"});
+    const ProcessResult outcome = database.run({"show", "FLB"});
     EXPECT_THAT(outcome.output, StartsWith("Device  FLB\nFamily  spi (a flash)\nModes   SPI PFF\n"));
     EXPECT_THAT(outcome.output,
                 HasSubstr("\nFlash properties\n  PROPERTY  VALUE  FROM  WHERE\n  BUS       SPI    ST1 "));
@@ -145,7 +145,7 @@ TEST(Show, LaterEntryOfANameIsTheOneShown) {
 
 TEST(Show, UnknownDeviceIsANoWithASuggestion) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"show", "FN11"});
+    const ProcessResult outcome = database.run({"show", "FN11"});
     EXPECT_EQ(outcome.status, 1);
     EXPECT_EQ(outcome.output, "");
     EXPECT_EQ(outcome.error, "tarvik: the database has no device \"FN11\"; did you mean \"FN10\"?\n");
@@ -164,7 +164,7 @@ TEST(Show, FamilyThatCannotBeReadIsAFaultThatNamesIt) {
     const DatabaseDirectory directory(
         {{"base.acd", "DEVICE_SUPPORTED = finch\n"}, {"spi.acd", "DEVICE_FAMILY = NV\n"}});
     std::filesystem::create_directory(directory.path("finch.acd"));
-    const Outcome outcome = runTool({"--database", directory.path(), "show", "finch"});
+    const ProcessResult outcome = runTool({"--database", directory.path(), "show", "finch"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, HasSubstr("finch.acd"));
 }
@@ -173,7 +173,7 @@ TEST(Show, BadRecordsRaiseNothing) {
     const DatabaseDirectory directory(
         {{"base.acd", "DEVICE_SUPPORTED = finch\n"},
          {"finch.acd", "OPERATION = NOTHING,BS,USB2:PROGRAM,BS,XX,USB2\n[FN10]\n"}});
-    const Outcome outcome = runTool({"--database", directory.path(), "show", "FN10"});
+    const ProcessResult outcome = runTool({"--database", directory.path(), "show", "FN10"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.output, HasSubstr("PROGRAM  --U--"));
     EXPECT_EQ(outcome.error, "Operation NOTHING is not defined.\n");
@@ -183,7 +183,7 @@ TEST(Show, NamesWhatLayersShadow) {
     const SmallDatabase below;
     const DatabaseDirectory above(DatabaseDirectory::Files{{"base.acd", "IDCODE += :FN10,0x0030\n"},
                                                            {"finch.acd", "[FN10]\nPROPERTY = PINS,48\n"}});
-    const Outcome outcome =
+    const ProcessResult outcome =
         runTool({{"--database", above.path(), "--database", below.path(), "show", "FN10"}, {}, {}, {}});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.output,

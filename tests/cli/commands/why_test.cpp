@@ -14,7 +14,7 @@ using testing::StartsWith;
 
 TEST(Why, NamesTheRecordThatAllows) {
     const SmallDatabase database;
-    const Outcome outcome =
+    const ProcessResult outcome =
         database.run({"why", "FN10", "--mode", "BS", "--output", "USB2", "--operation", "PROGRAM"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.error, IsEmpty());
@@ -25,7 +25,7 @@ TEST(Why, NamesTheRecordThatAllows) {
 
 TEST(Why, TellsWhatWouldBeAllowedInstead) {
     const SmallDatabase database;
-    const Outcome outcome =
+    const ProcessResult outcome =
         database.run({"why", "FN10", "--mode", "SS", "--output", "PARALLEL", "--operation", "PROGRAM"});
     EXPECT_EQ(outcome.status, 1);
     EXPECT_THAT(outcome.output, StartsWith("no: PROGRAM of FN10 in mode SS through PARALLEL\n"));
@@ -62,7 +62,7 @@ TEST(Why, AnswersEachFormOfQuestion) {
     };
     for (std::vector<std::string> question : questions) {
         question.insert(question.begin(), "why");
-        const Outcome outcome = database.run(question);
+        const ProcessResult outcome = database.run(question);
         EXPECT_EQ(outcome.status, 0) << outcome;
         EXPECT_THAT(outcome.output, StartsWith("yes: "));
     }
@@ -76,14 +76,14 @@ TEST(Why, SuggestsNamesThatAreNear) {
 }
 
 TEST(Why, ListsTheFormsOfQuestionsWhenNoneFits) {
-    const Outcome outcome = SmallDatabase().run({"why", "FN10"});
+    const ProcessResult outcome = SmallDatabase().run({"why", "FN10"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, StartsWith("tarvik: why takes one of\n  --mode M --output O\n"));
 }
 
 TEST(Which, ListsTheDevicesThatAllowAnOperation) {
     const SmallDatabase database;
-    const Outcome outcome =
+    const ProcessResult outcome =
         database.run({"which", "--operation", "ERASE", "--mode", "SPI", "--output", "USB2"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.error, IsEmpty());
@@ -102,7 +102,7 @@ TEST(Which, ListsTheDevicesThatHaveAProperty) {
 }
 
 TEST(Which, SaysWhenThereIsNone) {
-    const Outcome outcome = SmallDatabase().run({"which", "--property", "CORE=9"});
+    const ProcessResult outcome = SmallDatabase().run({"which", "--property", "CORE=9"});
     EXPECT_EQ(outcome.status, 1);
     EXPECT_THAT(outcome.output, IsEmpty());
     EXPECT_EQ(outcome.error, "tarvik: there is no such device\n");
@@ -129,13 +129,14 @@ TEST(Which, NamesTheDevicesThatHaveNoAnswer) {
         {{"base.acd", "DEVICE_SUPPORTED = finch\nBS = outputs,USB2:families,finch\n"},
          {"finch.acd", "PROGRAM_OPTION = NONSENSE,Bscan,USB2\n[FN10]\n[FN20]\n"},
          {"spi.acd", "DEVICE_FAMILY = ST1\n"}});
-    const Outcome outcome = runTool({"--database", database.path(), "which", "--property", "VENDOR=Korvel"});
+    const ProcessResult outcome =
+        runTool({"--database", database.path(), "which", "--property", "VENDOR=Korvel"});
     EXPECT_EQ(outcome.status, 1);
     EXPECT_THAT(outcome.error, HasSubstr("no answer for 2 devices, the first \"FN10\": see tarvik why"));
     EXPECT_THAT(
         runTool({"--database", database.path(), "--json", "which", "--property", "VENDOR=Korvel"}).output,
         HasSubstr("\"faults\":[\"FN10\",\"FN20\"]"));
-    const Outcome why = runTool({"--database", database.path(), "why", "FN10", "--property", "VENDOR"});
+    const ProcessResult why = runTool({"--database", database.path(), "why", "FN10", "--property", "VENDOR"});
     EXPECT_EQ(why.status, 2);
     EXPECT_THAT(why.output, StartsWith("no answer: "));
 }

@@ -46,7 +46,7 @@ void configure() {
 
 Picker anyPicker() { return Picker(rc::Random(*rc::gen::noShrink(rc::gen::arbitrary<std::uint64_t>()))); }
 
-Outcome diff(const Layers& before, const Layers& after) {
+ProcessResult diff(const Layers& before, const Layers& after) {
     return runTool(std::vector<std::string>{"diff", before.path(), after.path()});
 }
 
@@ -154,7 +154,7 @@ TEST(DiffProperty, TellsNothingOfWhatIsWrittenInAnotherWay) {
         Picker pick = anyPicker();
         const Files files = makeDatabases(pick, reference::Health::SOUND);
         const std::vector<Files> layers = rewritten(pick, files);
-        const Outcome outcome = diff(Layers({files}), Layers(layers));
+        const ProcessResult outcome = diff(Layers({files}), Layers(layers));
         if (outcome.status != 0) {
             RC_FAIL(outcome.output + outcome.error + shown({files}) + shown(layers));
         }
@@ -171,7 +171,7 @@ TEST(DiffProperty, TellsOneChangeAndNothingElse) {
         Files after = before;
         apply(edit, after);
         const std::vector<Files> layers = rewritten(pick, after);
-        const Outcome outcome = diff(Layers({before}), Layers(layers));
+        const ProcessResult outcome = diff(Layers({before}), Layers(layers));
         if (outcome.output != edit.told) {
             RC_FAIL(outcome.output + outcome.error + shown({before}) + shown(layers));
         }

@@ -41,7 +41,7 @@ Files changed(const std::string& file, const std::string& from, const std::strin
     return files;
 }
 
-Outcome diff(const Files& before, const Files& after, std::vector<std::string> arguments = {}) {
+ProcessResult diff(const Files& before, const Files& after, std::vector<std::string> arguments = {}) {
     const DatabaseDirectory oldDatabase(before);
     const DatabaseDirectory newDatabase(after);
     arguments.insert(arguments.begin(), {"diff", oldDatabase.path(), newDatabase.path()});
@@ -50,7 +50,7 @@ Outcome diff(const Files& before, const Files& after, std::vector<std::string> a
 
 /// The text of the difference that a change makes.
 std::string difference(const std::string& file, const std::string& from, const std::string& to) {
-    const Outcome outcome = diff(database(), changed(file, from, to));
+    const ProcessResult outcome = diff(database(), changed(file, from, to));
     EXPECT_EQ(outcome.status, 1) << outcome;
     EXPECT_EQ(outcome.error, "");
     return outcome.output;
@@ -59,7 +59,7 @@ std::string difference(const std::string& file, const std::string& from, const s
 } // namespace
 
 TEST(Diff, IsSilentWhenAllAnswersAreTheSame) {
-    const Outcome outcome = diff(database(), database());
+    const ProcessResult outcome = diff(database(), database());
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.output, "");
     EXPECT_EQ(outcome.error, "");
@@ -242,7 +242,7 @@ TEST(Diff, WritesReleaseNotesInMarkdown) {
     replace(after.at("base.acd"), "KS100,0xX4108FB7", "KS100,0xX4148FB7");
     replace(after.at("base.acd"), "outputs,PARALLEL", "outputs,ZORVA");
     replace(after.at("spi.acd"), ",TMF2M", "");
-    const Outcome outcome = diff(database(), after, {"--format", "markdown"});
+    const ProcessResult outcome = diff(database(), after, {"--format", "markdown"});
     EXPECT_EQ(outcome.status, 1);
     EXPECT_EQ(outcome.output, "### New devices\n\n"
                               "- osprey: `` OS`250 ``\n\n"
@@ -264,13 +264,13 @@ TEST(Diff, WritesReleaseNotesInMarkdown) {
 TEST(Diff, TakesLayersWithColonsBetween) {
     const DatabaseDirectory below(database());
     const DatabaseDirectory above(Files{{"kestrel.acd", "PROPERTY += :KIND,FPGA\n"}});
-    const Outcome outcome =
+    const ProcessResult outcome =
         runTool(std::vector<std::string>{"diff", below.path(), above.path() + ':' + below.path()});
     EXPECT_EQ(outcome.output, "kestrel (all 3 devices)\n  property KIND: +FPGA\n");
 }
 
 TEST(Diff, TellsTheSameInJson) {
-    const Outcome outcome = diff(database(), changed("kestrel.acd", "BYPASS,USB2", "HIGHZ,USB2"), {"--json"});
+    const ProcessResult outcome = diff(database(), changed("kestrel.acd", "BYPASS,USB2", "HIGHZ,USB2"), {"--json"});
     EXPECT_EQ(outcome.status, 1);
     const nlohmann::json answer = nlohmann::json::parse(outcome.output);
     EXPECT_EQ(answer.at("version"), 1);
@@ -285,7 +285,7 @@ TEST(Diff, TellsTheSameInJson) {
 
 TEST(Diff, EndsWithTwoWhenADatabaseCantBeRead) {
     const DatabaseDirectory readable(database());
-    const Outcome outcome = runTool(std::vector<std::string>{"diff", readable.path(), "/nowhere/at/all"});
+    const ProcessResult outcome = runTool(std::vector<std::string>{"diff", readable.path(), "/nowhere/at/all"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, HasSubstr("/nowhere/at/all"));
     EXPECT_EQ(runTool(std::vector<std::string>{"diff", readable.path(), ":"}).status, 2);

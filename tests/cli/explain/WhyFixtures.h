@@ -51,7 +51,7 @@ private:
 
 /// The verdict that the records lead to, and the steps there.
 [[nodiscard]] inline why::Explanation explained(const why::Question& question) {
-    return why::explain(why::readStartUp(), question);
+    return why::explain(question);
 }
 
 /// The answer as a pipe would get it.

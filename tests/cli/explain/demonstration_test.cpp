@@ -15,7 +15,7 @@ using why::Verdict;
 using Kind = Question::Kind;
 
 /// The bytes of a file that start at a place.
-std::string textAt(const why::Origin& origin) {
+std::string textAt(const catalogue::Origin& origin) {
     std::ifstream file(origin.file);
     std::string line;
     for (unsigned number = 0; number < origin.line; ++number) {
@@ -27,7 +27,7 @@ std::string textAt(const why::Origin& origin) {
 class WhyDemonstration : public testing::Test {
 protected:
     void expectAgreement(const Question& question) {
-        const why::Explanation explanation = why::explain(m_facts, question);
+        const why::Explanation explanation = why::explain(question);
         ASSERT_EQ(explanation.verdict, why::ask(m_manager, question))
             << asPlainText({question, explanation.verdict, explanation});
         ++m_compared;
@@ -60,7 +60,6 @@ protected:
     Databases m_databases{demonstration()};
     // One manager for all questions: in a sound database none changes the answer to another.
     ConstraintsManager& m_manager = Databases::freshManager();
-    why::StartUp m_facts = why::readStartUp();
     int m_compared = 0;
 
     /// One device of each kind: with and without tables and options of its own, with a package, a family, a flash, a
@@ -174,7 +173,7 @@ TEST_F(WhyDemonstration, EveryPlaceHoldsItsFragment) {
         for (const Kind kind :
              {Kind::DEVICE, Kind::OPERATION, Kind::OPTION, Kind::BSDL, Kind::OPERATION_IN_MODE}) {
             question.kind = kind;
-            for (const why::Step& step : why::explain(m_facts, question).steps) {
+            for (const why::Step& step : why::explain(question).steps) {
                 if (step.place) {
                     // A record may go on in the next line.
                     const std::string written = textAt(step.place->origin);
@@ -193,8 +192,8 @@ TEST_F(WhyDemonstration, LinesAreAtMost80BytesButForPaths) {
     question.kind = Kind::OPERATION;
     question.device = "KS50";
     question.output = TARVIKNS::OUTPUT_TYPE::STAPL;
-    why::Explanation explanation = why::explain(m_facts, question);
-    for (why::Step& step : why::alternatives(m_facts, question)) {
+    why::Explanation explanation = why::explain(question);
+    for (why::Step& step : why::alternatives(question)) {
         if (step.place) {
             step.place->origin.file = "kestrel.acd";
         }

@@ -166,7 +166,7 @@ TEST(WhySteps, APropertyOfTheFamilyIsToldAsSuch) {
 TEST(WhyAlternatives, TheRecordsThatAllowItElsewhere) {
     const Databases databases(family("OPERATION = PROGRAM,Bscan,PARALLEL,USB2:PROGRAM,SS,SVF"));
     const std::vector<why::Step> steps =
-        why::alternatives(why::readStartUp(), programming("D1", MODE_TYPE::SM, OUTPUT_TYPE::USB2));
+        why::alternatives(programming("D1", MODE_TYPE::SM, OUTPUT_TYPE::USB2));
     ASSERT_EQ(steps.size(), 2U);
     EXPECT_EQ(steps[0].text, "yes in mode BS through PARALLEL, USB2");
     EXPECT_EQ(place(steps[0]), "fam.acd:1:13: PROGRAM,Bscan,PARALLEL,USB2");
@@ -176,7 +176,7 @@ TEST(WhyAlternatives, TheRecordsThatAllowItElsewhere) {
 TEST(WhyAlternatives, WhatElseIsAllowedThere) {
     const Databases databases(family("OPERATION = VERIFY,Bscan,USB2:ERASE,Bscan,USB2"));
     const std::vector<why::Step> steps =
-        why::alternatives(why::readStartUp(), programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
+        why::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
     ASSERT_EQ(steps.size(), 1U);
     EXPECT_EQ(steps[0].text, "allowed there: VERIFY, ERASE");
 }
@@ -187,8 +187,7 @@ TEST(WhyAlternatives, DevicesOfTheFamilyThatDiffer) {
     Question question = about(Kind::PROPERTY, "D1");
     question.property = "A";
     question.value = "2";
-    EXPECT_EQ(stepAbout(why::alternatives(why::readStartUp(), question), "differs").text,
-              "in family fam, yes for D2");
+    EXPECT_EQ(stepAbout(why::alternatives(question), "differs").text, "in family fam, yes for D2");
 }
 
 TEST(WhyAlternatives, ADeviceWithATableOfItsOwnDiffers) {
@@ -197,9 +196,7 @@ TEST(WhyAlternatives, ADeviceWithATableOfItsOwnDiffers) {
     files["fam.acd"] = "[D1]\n[D2]\nOPERATION = PROGRAM,Bscan,USB2\n";
     const Databases databases(std::move(files));
     EXPECT_EQ(
-        stepAbout(why::alternatives(why::readStartUp(), programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)),
-                  "differs")
-            .text,
+        stepAbout(why::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "differs").text,
         "in family fam, yes for D2");
 }
 
@@ -212,8 +209,7 @@ TEST(WhyAlternatives, ThePackageThatHasTheOption) {
     question.option = PROGRAM_OPTION::VERIFY;
     question.package = "VS20";
     EXPECT_EQ(explained(question).verdict, Verdict::NO);
-    EXPECT_EQ(stepAbout(why::alternatives(why::readStartUp(), question), "differs").text,
-              "yes in package PQ");
+    EXPECT_EQ(stepAbout(why::alternatives(question), "differs").text, "yes in package PQ");
 }
 
 TEST(WhyAlternatives, TheFamilyItselfMayDiffer) {
@@ -222,9 +218,7 @@ TEST(WhyAlternatives, TheFamilyItselfMayDiffer) {
     files["fam.acd"] = "OPERATION = PROGRAM,Bscan,USB2\n[D1]\nOPERATION = ERASE,Bscan,USB2\n";
     const Databases databases(std::move(files));
     EXPECT_EQ(
-        stepAbout(why::alternatives(why::readStartUp(), programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)),
-                  "differs")
-            .text,
+        stepAbout(why::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "differs").text,
         "in family fam, yes for the family itself");
 }
 
@@ -234,9 +228,7 @@ TEST(WhyAlternatives, SpiModeAnswersWhateverTheDevice) {
     files["spi.acd"] = "OPERATION = PROGRAM,SPI,USB2\n";
     const Databases databases(std::move(files));
     EXPECT_EQ(
-        stepAbout(why::alternatives(why::readStartUp(), programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)),
-                  "instead")
-            .text,
+        stepAbout(why::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "instead").text,
         "yes in mode SPI through USB2, whatever the device");
 }
 
@@ -244,8 +236,7 @@ TEST(WhyAlternatives, TheKeyThatWasMeant) {
     const Databases databases(family("PROPERTY = VENDOR,Korvel"));
     Question question = about(Kind::PROPERTY, "D1");
     question.property = "VENDER";
-    EXPECT_EQ(stepAbout(why::alternatives(why::readStartUp(), question), "instead").text,
-              "there is a property VENDOR");
+    EXPECT_EQ(stepAbout(why::alternatives(question), "instead").text, "there is a property VENDOR");
 }
 
 TEST(WhyPresentation, StepsReadAsATableWithPlaces) {
@@ -268,7 +259,7 @@ TEST(WhyPresentation, LongTextsAreBrokenAndLongFragmentsCut) {
     }
     const std::string fragment = std::string(66, 'x') + "\xC3\xBC" + std::string(9, 'y');
     why::Explanation explanation{
-        Verdict::NO, {{"absent", words + "end", why::Piece{fragment, {std::string(60, 'f'), 12, 3}}}}};
+        Verdict::NO, {{"absent", words + "end", why::SourceText{fragment, {std::string(60, 'f'), 12, 3}}}}};
     const std::string text = asPlainText({question, Verdict::NO, explanation});
     EXPECT_THAT(text, HasSubstr("\n            " + std::string(60, 'f') + ":12:3:\n            "));
     EXPECT_THAT(text, HasSubstr("xxx...\n"));

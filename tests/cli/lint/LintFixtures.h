@@ -27,13 +27,13 @@ inline Files withFamily(const std::string& text) {
 }
 
 /// Runs the linter with just these arguments.
-inline Outcome runLint(std::vector<std::string> arguments) {
+inline ProcessResult runLint(std::vector<std::string> arguments) {
     arguments.insert(arguments.begin(), "lint");
     return runTool({std::move(arguments), {}, {}, {}});
 }
 
 /// What the linter says of these files, with further arguments.
-inline Outcome lint(const Files& files, std::vector<std::string> arguments = {}) {
+inline ProcessResult lint(const Files& files, std::vector<std::string> arguments = {}) {
     const DatabaseDirectory directory(files);
     arguments.push_back(directory.path());
     return runLint(std::move(arguments));

@@ -8,21 +8,21 @@ using testing::HasSubstr;
 using testing::IsEmpty;
 
 TEST(Lint, IsSilentAboutACleanDatabase) {
-    const Outcome outcome = lint(cleanDatabase(), {"--strict"});
+    const ProcessResult outcome = lint(cleanDatabase(), {"--strict"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.output, "");
     EXPECT_EQ(outcome.error, "");
 }
 
 TEST(Lint, FindsNothingInTheDemonstration) {
-    const Outcome outcome = runLint({TARVIK_SOURCE_DIRECTORY "/database", "--strict"});
+    const ProcessResult outcome = runLint({TARVIK_SOURCE_DIRECTORY "/database", "--strict"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.output, "");
 }
 
 TEST(Lint, LooksAtTheDemonstrationWhenNoDirectoryIsGiven) {
-    Start start{{"lint", "--strict"}, {}, {}, {}};
-    const Outcome outcome = runTool(start);
+    ProcessOptions start{{"lint", "--strict"}, {}, {}, {}};
+    const ProcessResult outcome = runTool(start);
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.error, HasSubstr("built-in demonstration"));
 }
@@ -31,7 +31,7 @@ TEST(Lint, ShowsPlaceLevelTextCodeAndTheLineWithACaret) {
     const DatabaseDirectory directory(withFamily("OPERATION = PROGRAM,Bscan,USB2: \\\n"
                                                  "            VERFIY,Bscan,USB2\n"
                                                  "[KS50]\n"));
-    const Outcome outcome = runLint({directory.path()});
+    const ProcessResult outcome = runLint({directory.path()});
     EXPECT_EQ(outcome.output,
               directory.path("kestrel.acd") +
                   ":2:13: error: unknown operation \"VERFIY\"; did you mean \"VERIFY\"? [T101]\n"
@@ -43,19 +43,19 @@ TEST(Lint, ShowsPlaceLevelTextCodeAndTheLineWithACaret) {
 
 TEST(Lint, ShowsOfALongLineWhatIsAroundTheFinding) {
     const std::string many(500, 'A');
-    const Outcome outcome = lint(withFamily("PROPERTY = LONG," + many + ":LONG,1\n[KS50]\n"));
+    const ProcessResult outcome = lint(withFamily("PROPERTY = LONG," + many + ":LONG,1\n[KS50]\n"));
     EXPECT_THAT(outcome.output, HasSubstr("    ..." + std::string(34, 'A') + ":LONG,1\n"));
     EXPECT_THAT(outcome.output, HasSubstr("\n    " + std::string(38, ' ') + "^~~~\n"));
 }
 
 TEST(Lint, KeepsTheCaretBelowTheColumnBehindTabsAndWideBytes) {
-    const Outcome outcome = lint(withFamily("PROPERTY\t=\tT,K\xC3\xA9strel:T,2\n[KS50]\n"));
+    const ProcessResult outcome = lint(withFamily("PROPERTY\t=\tT,K\xC3\xA9strel:T,2\n[KS50]\n"));
     EXPECT_THAT(outcome.output, HasSubstr("\n    PROPERTY = T,K\xC3\xA9strel:T,2\n"
                                           "                         ^\n"));
 }
 
 TEST(Lint, SendsNoControlBytesToATerminal) {
-    const Outcome outcome = lint(withFamily("K\x1B[31m = 1\n[KS50]\n"));
+    const ProcessResult outcome = lint(withFamily("K\x1B[31m = 1\n[KS50]\n"));
     EXPECT_EQ(outcome.output.find('\x1B'), std::string::npos);
     EXPECT_THAT(outcome.output, HasSubstr("[K102]"));
 }
@@ -84,7 +84,7 @@ TEST(Lint, EndsWithOneForErrorsOnlyUnlessStrict) {
 }
 
 TEST(Lint, EndsWithTwoWhenADirectoryIsMissing) {
-    const Outcome outcome = runLint({"/nowhere/at/all"});
+    const ProcessResult outcome = runLint({"/nowhere/at/all"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, HasSubstr("/nowhere/at/all"));
 }
@@ -94,7 +94,7 @@ TEST(Lint, EndsWithTwoWhenThereIsNoBase) { EXPECT_EQ(lint(Files{{"kestrel.acd", 
 TEST(Lint, EndsWithTwoAndNamesAFileThatCantBeRead) {
     const DatabaseDirectory directory(cleanDatabase());
     std::filesystem::create_directory(directory.path("osprey.acd"));
-    const Outcome outcome = runLint({directory.path()});
+    const ProcessResult outcome = runLint({directory.path()});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, HasSubstr("osprey.acd: can't be read"));
 }
@@ -126,7 +126,7 @@ TEST(Lint, SelectsByPrefix) {
 }
 
 TEST(Lint, RefusesAPrefixThatNoCodeHas) {
-    const Outcome outcome = lint(cleanDatabase(), {"--ignore", "Q1"});
+    const ProcessResult outcome = lint(cleanDatabase(), {"--ignore", "Q1"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, HasSubstr("no code begins with \"Q1\""));
 }

@@ -39,7 +39,7 @@ TEST(LintOnHostileDatabases, EndsWithFindings) {
         for (auto& [name, text] : files) {
             spoil(text, random);
         }
-        const Outcome outcome = lint(files, {"--format", "sarif"});
+        const ProcessResult outcome = lint(files, {"--format", "sarif"});
         ASSERT_EQ(outcome.status, 1) << outcome.error;
         EXPECT_TRUE(nlohmann::json::accept(outcome.output));
     }
@@ -48,7 +48,7 @@ TEST(LintOnHostileDatabases, EndsWithFindings) {
 TEST(LintOnHostileDatabases, EndsOnNonsense) {
     HostileTexts random(2);
     for (int i = 0; i < 10; ++i) {
-        const Outcome outcome = lint(Files{{"base.acd", random.next(200)},
+        const ProcessResult outcome = lint(Files{{"base.acd", random.next(200)},
                                            {"spi.acd", random.next(200)},
                                            {"a.acd", random.next(200)},
                                            {"b.acd", random.noise(500)}});

@@ -43,7 +43,7 @@ json shown(const json& answer) {
 std::size_t expectAgreement(const std::vector<std::string>& database) {
     std::vector<std::string> arguments = database;
     arguments.insert(arguments.end(), {"report", "-o", "-"});
-    const Outcome outcome = runTool(arguments);
+    const ProcessResult outcome = runTool(arguments);
     EXPECT_EQ(outcome.status, 0) << outcome;
     const PageData page(outcome.output);
     for (std::size_t device = 0; device < page.size(); ++device) {

@@ -27,7 +27,7 @@ TEST(ReportFiles, WritesAWholePageAndSaysSo) {
     const SmallDatabase database;
     const DatabaseDirectory place;
     const std::string file = place.path("report.html");
-    const Outcome outcome = database.run({"report", "-o", file});
+    const ProcessResult outcome = database.run({"report", "-o", file});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.error, "");
     EXPECT_EQ(outcome.output, file + ": 5 devices in 2 families\n");
@@ -43,7 +43,7 @@ TEST(ReportFiles, SameDatabaseGivesSamePage) {
 
 TEST(ReportFiles, StandardOutputGetsThePageAlone) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"report", "-o", "-"});
+    const ProcessResult outcome = database.run({"report", "-o", "-"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.output, StartsWith("<!DOCTYPE html>"));
     EXPECT_THAT(outcome.output, EndsWith("</html>\n"));
@@ -62,7 +62,7 @@ TEST(ReportFiles, JsonTellsWhatWasWritten) {
 
 TEST(ReportFiles, JsonAndThePageCantShareStandardOutput) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"--json", "report", "-o", "-"});
+    const ProcessResult outcome = database.run({"--json", "report", "-o", "-"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_TRUE(nlohmann::json::parse(outcome.output).contains("error"));
 }
@@ -70,7 +70,7 @@ TEST(ReportFiles, JsonAndThePageCantShareStandardOutput) {
 TEST(ReportFiles, AnUnwritableFileIsAFault) {
     const SmallDatabase database;
     const DatabaseDirectory place;
-    const Outcome outcome = database.run({"report", "-o", place.path("no/such/report.html")});
+    const ProcessResult outcome = database.run({"report", "-o", place.path("no/such/report.html")});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_EQ(outcome.output, "");
     EXPECT_THAT(outcome.error, HasSubstr("can't write \"" + place.path("no/such/report.html") +
@@ -86,7 +86,7 @@ TEST(ReportFiles, ADirectoryIsAFault) {
 
 TEST(ReportFiles, AFullDeviceIsAFault) {
     const SmallDatabase database;
-    const Outcome outcome = database.run({"report", "-o", "/dev/full"});
+    const ProcessResult outcome = database.run({"report", "-o", "/dev/full"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, HasSubstr("No space left on device"));
     EXPECT_TRUE(std::filesystem::is_character_file("/dev/full"));
@@ -94,7 +94,7 @@ TEST(ReportFiles, AFullDeviceIsAFault) {
 
 TEST(ReportFiles, AFailedRunKeepsTheFormerPage) {
     const DatabaseDirectory place(DatabaseDirectory::Files{{"report.html", "former"}});
-    const Outcome outcome =
+    const ProcessResult outcome =
         runTool({"--database", place.path("missing"), "report", "-o", place.path("report.html")});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_EQ(textOf(place.path("report.html")), "former");

@@ -5,9 +5,9 @@
 /// The answers of one batch on the small database, line by line.
 inline std::vector<nlohmann::json> batch(const std::string& input) {
     const SmallDatabase database;
-    Start start = database.start({"batch"});
+    ProcessOptions start = database.start({"batch"});
     start.input = input;
-    const Outcome outcome = runTool(start);
+    const ProcessResult outcome = runTool(start);
     if (outcome.status != 0 || !outcome.error.empty()) {
         throw std::runtime_error("status " + std::to_string(outcome.status) + ": " + outcome.error);
     }

@@ -37,12 +37,12 @@ public:
     [[nodiscard]] std::string path() const { return m_directory.path(); }
     [[nodiscard]] std::string path(const std::string& name) const { return m_directory.path(name); }
 
-    [[nodiscard]] Start start(std::vector<std::string> arguments) const {
+    [[nodiscard]] ProcessOptions start(std::vector<std::string> arguments) const {
         arguments.insert(arguments.begin(), {"--database", path()});
         return {std::move(arguments), {}, {}, {}};
     }
 
-    [[nodiscard]] Outcome run(std::vector<std::string> arguments) const {
+    [[nodiscard]] ProcessResult run(std::vector<std::string> arguments) const {
         return runTool(start(std::move(arguments)));
     }
 

@@ -65,7 +65,7 @@ Pipe terminal(unsigned short columns) {
     return ends;
 }
 
-std::vector<std::string> environmentOf(const Start& start) {
+std::vector<std::string> environmentOf(const ProcessOptions& start) {
     std::vector<std::string> variables;
     for (char** variable = environ; *variable != nullptr; ++variable) {
         const std::string_view text(*variable);
@@ -90,7 +90,7 @@ std::vector<char*> pointers(std::vector<std::string>& texts) {
 }
 
 /// Starts the tool on the given descriptors.
-pid_t spawn(const Start& start, int input, int output, int error) {
+pid_t spawn(const ProcessOptions& start, int input, int output, int error) {
     std::vector<std::string> arguments{TARVIK_TOOL};
     arguments.insert(arguments.end(), start.arguments.begin(), start.arguments.end());
     std::vector<std::string> environment = environmentOf(start);
@@ -136,13 +136,13 @@ void feed(int& descriptor, std::string_view& text) {
 
 } // namespace
 
-std::ostream& operator<<(std::ostream& out, const Outcome& outcome) {
+std::ostream& operator<<(std::ostream& out, const ProcessResult& outcome) {
     return out << "status " << outcome.status << "\noutput:\n"
                << outcome.output << "error:\n"
                << outcome.error;
 }
 
-Outcome runTool(const Start& start) {
+ProcessResult runTool(const ProcessOptions& start) {
     ::signal(SIGPIPE, SIG_IGN);
     Pipe input;
     Pipe output;
@@ -161,7 +161,7 @@ Outcome runTool(const Start& start) {
     closeOnce(input.reading);
     closeOnce(output.writing);
     closeOnce(error.writing);
-    Outcome outcome{};
+    ProcessResult outcome{};
     std::string_view unwritten = start.input;
     if (unwritten.empty()) {
         closeOnce(input.writing);
@@ -185,11 +185,11 @@ Outcome runTool(const Start& start) {
     return outcome;
 }
 
-Outcome runTool(const std::vector<std::string>& arguments) {
-    return runTool(Start{arguments, {}, {}, {}, 0});
+ProcessResult runTool(const std::vector<std::string>& arguments) {
+    return runTool(ProcessOptions{arguments, {}, {}, {}, 0});
 }
 
-Conversation::Conversation(const Start& start) {
+InteractiveProcess::InteractiveProcess(const ProcessOptions& start) {
     ::signal(SIGPIPE, SIG_IGN);
     Pipe input;
     Pipe output;
@@ -200,7 +200,7 @@ Conversation::Conversation(const Start& start) {
     m_output = output.reading;
 }
 
-Conversation::~Conversation() {
+InteractiveProcess::~InteractiveProcess() {
     closeInput();
     closeOutput();
     if (m_process > 0) {
@@ -208,7 +208,7 @@ Conversation::~Conversation() {
     }
 }
 
-void Conversation::write(const std::string& text) {
+void InteractiveProcess::write(const std::string& text) {
     for (std::string_view rest = text; !rest.empty();) {
         const ssize_t count = ::write(m_input, rest.data(), rest.size());
         if (count < 0) {
@@ -218,7 +218,7 @@ void Conversation::write(const std::string& text) {
     }
 }
 
-std::string Conversation::readLine() {
+std::string InteractiveProcess::readLine() {
     while (m_read.find('\n') == std::string::npos) {
         if (m_output < 0) {
             throw std::runtime_error("the tool's output ended");
@@ -231,7 +231,7 @@ std::string Conversation::readLine() {
     return line;
 }
 
-void Conversation::closeInput() { closeOnce(m_input); }
-void Conversation::closeOutput() { closeOnce(m_output); }
+void InteractiveProcess::closeInput() { closeOnce(m_input); }
+void InteractiveProcess::closeOutput() { closeOnce(m_output); }
 
-int Conversation::wait() { return waitFor(std::exchange(m_process, 0)); }
+int InteractiveProcess::wait() { return waitFor(std::exchange(m_process, 0)); }

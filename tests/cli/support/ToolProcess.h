@@ -7,7 +7,7 @@
 #include <vector>
 
 /// How the tool is started.
-struct Start {
+struct ProcessOptions {
     std::vector<std::string> arguments;
     std::string input;
     /// Variables of the tests' own that the tool heeds are not handed on.
@@ -19,27 +19,27 @@ struct Start {
 };
 
 /// What a run of the tool left behind.
-struct Outcome {
+struct ProcessResult {
     int status; ///< the exit status; 128 and more: ended by a signal
     std::string output;
     std::string error;
 };
 
-std::ostream& operator<<(std::ostream& out, const Outcome& outcome);
+std::ostream& operator<<(std::ostream& out, const ProcessResult& outcome);
 
 /// Runs the tool to its end.
-[[nodiscard]] Outcome runTool(const Start& start);
+[[nodiscard]] ProcessResult runTool(const ProcessOptions& start);
 
 /// Runs the tool with just these arguments.
-[[nodiscard]] Outcome runTool(const std::vector<std::string>& arguments);
+[[nodiscard]] ProcessResult runTool(const std::vector<std::string>& arguments);
 
 /// A running tool that is talked to line by line. Waits for it at the end.
-class Conversation {
+class InteractiveProcess {
 public:
-    explicit Conversation(const Start& start);
-    ~Conversation();
-    Conversation(const Conversation&) = delete;
-    Conversation& operator=(const Conversation&) = delete;
+    explicit InteractiveProcess(const ProcessOptions& start);
+    ~InteractiveProcess();
+    InteractiveProcess(const InteractiveProcess&) = delete;
+    InteractiveProcess& operator=(const InteractiveProcess&) = delete;
 
     void write(const std::string& text);
 

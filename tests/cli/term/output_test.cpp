@@ -11,10 +11,10 @@ TEST(Output, FullDiskIsAFault) {
     const SmallDatabase database;
     for (const std::vector<std::string>& arguments :
          {std::vector<std::string>{"devices"}, {"devices", "--json"}, {"batch"}, {"--help"}}) {
-        Start start = database.start(arguments);
+        ProcessOptions start = database.start(arguments);
         start.input = "{\"call\": \"getOperationOrders\"}\n";
         start.outputPath = "/dev/full";
-        const Outcome outcome = runTool(start);
+        const ProcessResult outcome = runTool(start);
         EXPECT_EQ(outcome.status, 2);
         EXPECT_EQ(outcome.error, "tarvik: can't write to standard output: No space left on device\n");
     }
@@ -22,7 +22,7 @@ TEST(Output, FullDiskIsAFault) {
 
 TEST(Output, ReaderThatLeavesEndsABatchQuietly) {
     const SmallDatabase database;
-    Conversation batch(database.start({"batch"}));
+    InteractiveProcess batch(database.start({"batch"}));
     batch.write("{\"id\": 1, \"call\": \"getOperationOrders\"}\n");
     EXPECT_THAT(batch.readLine(), HasSubstr("\"id\":1"));
     batch.closeOutput();
@@ -33,7 +33,7 @@ TEST(Output, ReaderThatLeavesEndsABatchQuietly) {
 
 TEST(Output, ReaderThatLeavesAtOnceIsNoFault) {
     const SmallDatabase database;
-    Conversation devices(database.start({"dump", "operations"}));
+    InteractiveProcess devices(database.start({"dump", "operations"}));
     devices.closeOutput();
     EXPECT_EQ(devices.wait(), 0);
 }

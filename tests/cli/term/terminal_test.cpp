@@ -101,6 +101,22 @@ TEST(Terminals, TextsOfADatabaseDoNotControlThem) {
     }
 }
 
+TEST(Terminals, ArgumentsDoNotControlThem) {
+    const SmallDatabase database;
+    for (const std::vector<std::string>& question :
+         {std::vector<std::string>{"show", "\x1b[2J"},
+          {"check", "\x1b[2J", "--mode", "BS"},
+          {"\x1b[2J"},
+          {"operations", "FN10", "--mode", "\x1b[2J", "--output", "USB2"},
+          {"--database", "\x1b[2J", "devices"}}) {
+        std::vector<std::string> arguments{"--database", database.path(), "--color", "never"};
+        arguments.insert(arguments.end(), question.begin(), question.end());
+        EXPECT_THAT(runTool({arguments, {}, {}, {}, 80}).output,
+                    AllOf(HasSubstr("?[2J"), Not(HasSubstr("\x1b"))))
+            << question.front();
+    }
+}
+
 TEST(Terminals, NoColoursWhereTheyAreNotWanted) {
     using Environment = std::map<std::string, std::string>;
     for (const Environment& environment :
@@ -115,7 +131,7 @@ TEST(Terminals, NoColoursWhereTheyAreNotWanted) {
 
 TEST(Terminals, NoColoursInAPipeUnlessAskedFor) {
     const SmallDatabase database;
-    Start start = database.start({"devices"});
+    ProcessOptions start = database.start({"devices"});
     start.environment = {{"TERM", "xterm"}};
     EXPECT_THAT(runTool(start).output, Not(HasSubstr(ESCAPE)));
     start.arguments.insert(start.arguments.end(), {"--color", "always"});
@@ -144,6 +160,13 @@ TEST(Terminals, RowsThatDoNotFitGoOnBelow) {
     EXPECT_THAT(families, testing::ContainsRegex("\n                  [A-Z0-9]+"));
     // In a pipe a row is a line.
     EXPECT_GT(longestLine(runTool({{"families"}, {}, {{"COLUMNS", "30"}}, {}, 0}).output), 30U);
+}
+
+TEST(Terminals, NothingIsWrappedInAPipe) {
+    EXPECT_GT(longestLine(runTool({{"lint", "--explain", "T105"}, {}, {}, {}, 0}).output), 120U);
+    EXPECT_LE(longestLine(runTool({{"lint", "--explain", "T105"}, {}, {{"COLUMNS", "80"}}, {}, 0}).output),
+              80U);
+    EXPECT_LE(longestLine(runTool({{"help", "lint"}, {}, {}, {}, 0}).output), 80U);
 }
 
 TEST(Terminals, TheEnvironmentMayNameTheWidth) {

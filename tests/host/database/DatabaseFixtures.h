@@ -21,6 +21,7 @@
 #include <stdexcept>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 /// A directory of its own for one test, gone with all that is in it at the end.
@@ -63,6 +64,18 @@ protected:
     MessageRecorder messages;
 };
 
+/// Starts again with these files.
+inline void useFiles(std::map<std::string, std::string> files) {
+    acd::Store::resetForTesting();
+    AcdStore::setMemoryFiles(std::move(files));
+}
+
+/// Starts again with these directories.
+inline void useDirectories(std::vector<std::string> directories) {
+    acd::Store::resetForTesting();
+    AcdStore::setSearchPath(std::move(directories));
+}
+
 /// The whole value of a key as an accessor opened by `name` gives it.
 [[nodiscard]] inline std::optional<std::string> valueOf(const char* name, const char* key) {
     const char* const text = AcdReader(name).getDevkey()->getstringbykey(key, nullptr, 0, nullptr, 0);
@@ -72,13 +85,13 @@ protected:
 /// The whole value of a key of the family "kestrel" whose file holds `text`, and nothing else there is.
 [[nodiscard]] inline std::optional<std::string> valueIn(std::string_view text, const char* key,
                                                         const char* name = "kestrel") {
-    AcdStore::setMemoryFiles({{"kestrel.acd", std::string(text)}});
+    useFiles({{"kestrel.acd", std::string(text)}});
     return valueOf(name, key);
 }
 
 /// The devices of the family "kestrel" whose file holds `text`.
 [[nodiscard]] inline std::vector<std::string> devicesIn(std::string_view text) {
-    AcdStore::setMemoryFiles({{"kestrel.acd", std::string(text)}});
+    useFiles({{"kestrel.acd", std::string(text)}});
     return AcdStore::devices("kestrel");
 }
 

@@ -3,8 +3,8 @@
 #include "ReferenceParser.h"
 
 #include "database/Database.h"
-#include "database/SectionScanner.h"
 #include "database/LineReader.h"
+#include "database/SectionScanner.h"
 
 #include <algorithm>
 #include <cstring>
@@ -28,9 +28,9 @@ constexpr int ROUNDS = 8000;
 }
 
 /// Hands its text out in portions of random size.
-class Dripping final : public acd::ByteSource {
+class ChunkedSource final : public acd::ByteSource {
 public:
-    Dripping(std::string_view text, unsigned seed) : m_rest(text), m_random(seed) {}
+    ChunkedSource(std::string_view text, unsigned seed) : m_rest(text), m_random(seed) {}
 
     [[nodiscard]] std::size_t expectedSize() const noexcept override { return 0; }
     [[nodiscard]] std::size_t read(char* buffer, std::size_t size) override {
@@ -69,7 +69,7 @@ private:
 }
 
 void expectScanAgrees(acd::SectionScanner& scan, std::string_view text, unsigned seed) {
-    const auto open = [&] { return std::make_unique<Dripping>(text, seed); };
+    const auto open = [&] { return std::make_unique<ChunkedSource>(text, seed); };
     ASSERT_EQ(namesOf(scan.names(open)), parsedNames(text)) << testing::PrintToString(std::string(text));
 }
 

@@ -121,7 +121,7 @@ TEST(AcdFamily, AgreesWithTheReaders) {
     directory.write("top/k.acd", top);
     acd::Store::resetForTesting();
     MessageRecorder messages;
-    AcdStore::setSearchPath({directory.path("top"), directory.path("low")});
+    useDirectories({directory.path("top"), directory.path("low")});
     const std::vector<AcdLines> files = AcdLines::ofDatabase();
     ASSERT_EQ(files.size(), 2U);
     const AcdFamily family({&files[0], &files[1]});

@@ -26,7 +26,7 @@ constexpr int DIRECTORY_UNREADABLE = 103;
 
 class Files : public DatabaseTest {
 protected:
-    Files() { AcdStore::setSearchPath({directory.path()}); }
+    Files() { useDirectories({directory.path()}); }
 
     void write(const std::string& name, std::string_view text) { directory.write(name, text); }
 
@@ -52,7 +52,7 @@ protected:
         EXPECT_THAT(messages.take(), IsEmpty());
 
         acd::Store::resetForTesting();
-        AcdStore::setSearchPath({directory.path()});
+        useDirectories({directory.path()});
         EXPECT_THAT(valueOf("Z", "KEY"), Optional("z"sv));
         EXPECT_THAT(messages.take(), ElementsAre(unreadable(file, reason)));
         EXPECT_THROW(AcdReader("bad"), DataNotFoundException);
@@ -61,6 +61,17 @@ protected:
 
     TemporaryDirectory directory;
 };
+
+TEST_F(Files, WhoseNamesBeginWithADotAreIgnored) {
+    directory.write("kestrel.acd", "KEY = a\n");
+    directory.write(".kestrel.acd", "KEY = hidden\n[KS50]\n");
+    directory.write(".#merlin.acd", "");
+    std::filesystem::create_symlink("nowhere", directory.path(".osprey.acd"));
+    EXPECT_THAT(AcdStore::families(), ElementsAre("kestrel"));
+    EXPECT_EQ(familyOf("KS50"), nullopt);
+    EXPECT_EQ(familyOf(".kestrel.acd"), nullopt);
+    EXPECT_THAT(messages.take(), IsEmpty());
+}
 
 TEST_F(Files, AreRead) {
     write("base.acd", "KEY = a\n");
@@ -78,7 +89,7 @@ TEST_F(Files, CountByTheirEndingInAnyCase) {
     write(".acd", "");
     write(".f.acd", "");
     write("gacd", "");
-    EXPECT_THAT(AcdStore::families(), ElementsAre(".f", "B", "a", "c"));
+    EXPECT_THAT(AcdStore::families(), ElementsAre("B", "a", "c"));
 }
 
 TEST_F(Files, OfTwoThatDifferInCaseTheFirstInByteOrderCounts) {
@@ -105,7 +116,7 @@ TEST_F(Files, InDirectoriesBelowDoNotCount) {
 TEST_F(Files, AreFoundByNameNotByPath) {
     write("database/kestrel.acd", "KEY = a\n");
     write("x.acd", "KEY = b\n");
-    AcdStore::setSearchPath({directory.path("database")});
+    useDirectories({directory.path("database")});
     for (const std::string& name : {std::string("../x"), std::string("../x.acd"), directory.path("x"),
                                     directory.path("x.acd"), std::string("./kestrel")}) {
         EXPECT_EQ(familyOf(name.c_str()), nullopt) << name;
@@ -230,7 +241,7 @@ TEST_F(Files, OneForWhichNoDescriptorIsLeftIsUnreadable) {
 TEST_F(Files, AnUnreadableOverlayMakesTheFamilyUnreadable) {
     write("low/bad.acd", "KEY = a\n[A]\n");
     std::filesystem::create_directories(directory.path("top/bad.acd"));
-    AcdStore::setSearchPath({directory.path("top"), directory.path("low")});
+    useDirectories({directory.path("top"), directory.path("low")});
     EXPECT_THAT(familyOf("A"), Optional("bad"sv));
     EXPECT_THROW(AcdReader("A"), DataNotFoundException);
     EXPECT_THAT(messages.take(), ElementsAre(unreadable("top/bad.acd", "not a regular file")));
@@ -239,7 +250,7 @@ TEST_F(Files, AnUnreadableOverlayMakesTheFamilyUnreadable) {
 TEST_F(Files, AllUnreadableLayersAreReported) {
     std::filesystem::create_directories(directory.path("low/bad.acd"));
     std::filesystem::create_directories(directory.path("top/bad.acd"));
-    AcdStore::setSearchPath({directory.path("top"), directory.path("low")});
+    useDirectories({directory.path("top"), directory.path("low")});
     EXPECT_THROW(AcdReader("bad"), DataNotFoundException);
     EXPECT_THAT(messages.take(), ElementsAre(unreadable("low/bad.acd", "not a regular file"),
                                              unreadable("top/bad.acd", "not a regular file")));
@@ -268,7 +279,7 @@ TEST_F(Files, NamesInMessagesAreHarmless) {
 // The base database
 
 TEST_F(Files, AMissingBaseNamesTheDirectoriesTried) {
-    AcdStore::setSearchPath({directory.path(), directory.path() + "/"});
+    useDirectories({directory.path(), directory.path() + "/"});
     try {
         const AcdReader reader;
         FAIL() << "nothing raised";
@@ -281,13 +292,13 @@ TEST_F(Files, AMissingBaseNamesTheDirectoriesTried) {
 }
 
 TEST_F(Files, AMissingBaseInMemorySaysSo) {
-    AcdStore::setMemoryFiles({{"kestrel.acd", ""}});
+    useFiles({{"kestrel.acd", ""}});
     EXPECT_THROW(AcdReader(), DataNotFoundException);
     EXPECT_THAT(messages.take(), ElementsAre(info(BASE_MISSING, "no base.acd among the files in memory\n")));
 }
 
 TEST_F(Files, AMissingBaseWithoutADirectorySaysSo) {
-    AcdStore::setSearchPath({});
+    useDirectories({});
     EXPECT_THROW(AcdReader(), DataNotFoundException);
     EXPECT_THAT(messages.take(),
                 ElementsAre(info(BASE_MISSING, "no base.acd since there is no directory to search\n")));
@@ -310,7 +321,7 @@ TEST_F(Files, TheBaseIsFoundInAnyCase) {
 
 TEST_F(Files, AMissingDirectoryIsReportedOnceAndTheOthersServe) {
     write("kestrel.acd", "KEY = a\n");
-    AcdStore::setSearchPath({directory.path("none"), directory.path()});
+    useDirectories({directory.path("none"), directory.path()});
     EXPECT_THAT(valueOf("kestrel", "KEY"), Optional("a"sv));
     EXPECT_THAT(familyOf("nothing"), nullopt);
     EXPECT_THAT(messages.take(),
@@ -320,7 +331,7 @@ TEST_F(Files, AMissingDirectoryIsReportedOnceAndTheOthersServe) {
 
 TEST_F(Files, AFileIsNoDirectory) {
     write("kestrel.acd", "KEY = a\n");
-    AcdStore::setSearchPath({directory.path("kestrel.acd")});
+    useDirectories({directory.path("kestrel.acd")});
     EXPECT_THAT(AcdStore::families(), IsEmpty());
     EXPECT_THAT(messages.take(),
                 ElementsAre(info(DIRECTORY_UNREADABLE,
@@ -336,7 +347,7 @@ TEST_F(Files, AreListedOnce) {
 TEST_F(Files, OfARelativeDirectoryAreFoundFromElsewhereToo) {
     write("database/kestrel.acd", "KEY = a\n[A]\nbroken\n");
     std::filesystem::current_path(directory.path());
-    AcdStore::setSearchPath({"database"});
+    useDirectories({"database"});
     EXPECT_THAT(AcdStore::families(), ElementsAre("kestrel"));
     std::filesystem::current_path("/");
     EXPECT_THAT(valueOf("A", "KEY"), Optional("a"sv));

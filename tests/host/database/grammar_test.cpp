@@ -192,7 +192,7 @@ TEST_F(Continuation, OfValuesLeavesTheirNeighboursAlone) {
 TEST_F(Continuation, ReachesUpToSixteenMebibytes) {
     const std::string half(std::size_t{8} << 20, 'a');
     const std::string value = half + half.substr(6); // with "KEY = " exactly 16 MiB
-    AcdStore::setMemoryFiles({{"kestrel.acd", "KEY = " + half + " \\\n " + half.substr(6) + "\n"}});
+    useFiles({{"kestrel.acd", "KEY = " + half + " \\\n " + half.substr(6) + "\n"}});
     EXPECT_TRUE(valueOf("kestrel", "KEY") == value);
     EXPECT_THAT(messages.take(), IsEmpty());
 }
@@ -251,7 +251,7 @@ TEST_F(Sections, HoldManyKeys) {
     for (int key = 0; key < 5000; ++key) {
         text += "K" + std::to_string(key * 7919 % 5000) + " = " + std::to_string(key) + "\n";
     }
-    AcdStore::setMemoryFiles({{"kestrel.acd", text}});
+    useFiles({{"kestrel.acd", text}});
     for (int key = 0; key < 5000; ++key) {
         const std::string name = "K" + std::to_string(key * 7919 % 5000);
         EXPECT_EQ(valueOf("kestrel", name.c_str()), std::to_string(key));

@@ -20,7 +20,7 @@ protected:
             std::filesystem::create_directories(directory.path(layer));
             layer = directory.path(layer);
         }
-        AcdStore::setSearchPath(std::move(layers));
+        useDirectories(std::move(layers));
     }
 
     TemporaryDirectory directory;
@@ -231,11 +231,11 @@ TEST_F(Layers, AreNamedByTheirDirectories) {
     EXPECT_EQ(AcdStore::value("kestrel", "A")->spans.front().layer, directory.path("top"));
     write("t/kestrel.acd", "A = a\n");
     std::filesystem::current_path(directory.path());
-    AcdStore::setSearchPath({"t"});
+    useDirectories({"t"});
     EXPECT_EQ(AcdStore::value("kestrel", "A")->spans.front().layer, "t");
     std::filesystem::current_path("/");
-    AcdStore::setMemoryFiles({{"kestrel.acd", "A = a\n"}});
+    useFiles({{"kestrel.acd", "A = a\n"}});
     EXPECT_EQ(AcdStore::value("kestrel", "A")->spans.front().layer, "");
-    AcdStore::setMemoryFiles({{"/kestrel.acd", "A = a\n"}});
+    useFiles({{"/kestrel.acd", "A = a\n"}});
     EXPECT_EQ(AcdStore::value("/kestrel", "A")->spans.front().layer, "/");
 }

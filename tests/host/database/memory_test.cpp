@@ -33,13 +33,12 @@ protected:
     ~MemoryUse() override { Port_MsgManData::setSink({}); }
 
     void useDirectories() const {
-        AcdStore::setSearchPath({directory.path("top"), directory.path("low"), "/nowhere"});
+        ::useDirectories({directory.path("top"), directory.path("low"), "/nowhere"});
     }
     static void useMemory() {
-        AcdStore::setMemoryFiles(
-            {{"base.acd", "LIST = a,b\nLIST += ,c\n"},
-             {"kestrel.acd", "broken\n[KS50]\nKEY = a\\\n  b\nKEY += c\n[broken\n[KS200]\n"},
-             {"merlin.acd", "[ML1]\\\n\n[ML2\n"}});
+        useFiles({{"base.acd", "LIST = a,b\nLIST += ,c\n"},
+                  {"kestrel.acd", "broken\n[KS50]\nKEY = a\\\n  b\nKEY += c\n[broken\n[KS200]\n"},
+                  {"merlin.acd", "[ML1]\\\n\n[ML2\n"}});
     }
 
     /// Asks all that can be asked.
@@ -119,6 +118,7 @@ TEST_F(MemoryUse, RunningOutWhileFilesAreSetKeepsTheFormerOnes) {
     const std::string expected = answers();
     std::map<std::string, std::string> files = {{"osprey.acd", "KEY = a\n"}};
     for (std::size_t failing = 1;; ++failing) {
+        useMemory();
         auto copy = files;
         if (runFailing(failing, [&] { AcdStore::setMemoryFiles(std::move(copy)); })) {
             break;
@@ -153,4 +153,20 @@ TEST_F(MemoryUse, ValuesReadAgainAskForNone) {
     };
     ask();
     EXPECT_EQ(countAllocations(ask), 0U);
+}
+
+TEST_F(MemoryUse, RunningOutWhileAnExceptionIsMadeLeavesItItsType) {
+    useDirectories();
+    (void)AcdReader("KS50").getDevkey()->getstringbykey("KEY", ":", 0, ",", 0);
+    int typesAlone = 0;
+    for (std::size_t failing = 1; failing != 20; ++failing) {
+        EXPECT_TRUE(runFailing(failing, [&typesAlone] {
+            const OutOfRangeException raised("Tarvik", "s/Example", "1.0", 1631);
+            const std::string_view text = raised.what();
+            EXPECT_EQ(text.substr(0, 19), "OutOfRangeException");
+            typesAlone += text.size() == 19 ? 1 : 0;
+        }));
+    }
+    EXPECT_GT(typesAlone, 1);
+    EXPECT_LT(typesAlone, 19);
 }

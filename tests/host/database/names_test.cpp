@@ -13,10 +13,10 @@ using namespace std::string_view_literals;
 class Names : public DatabaseTest {
 protected:
     Names() {
-        AcdStore::setMemoryFiles({{"base.acd", "KEY = base\n[BaseDevice]\nKEY = in base\n"},
-                                  {"spi.acd", "KEY = spi\n[SpiDevice]\nKEY = in spi\n"},
-                                  {"Kestrel.ACD", "KEY = kestrel\n[KS50]\nKEY = ks50\n[under_score]\n"},
-                                  {"merlin_x.acd", "KEY = merlin_x\n"}});
+        useFiles({{"base.acd", "KEY = base\n[BaseDevice]\nKEY = in base\n"},
+                  {"spi.acd", "KEY = spi\n[SpiDevice]\nKEY = in spi\n"},
+                  {"Kestrel.ACD", "KEY = kestrel\n[KS50]\nKEY = ks50\n[under_score]\n"},
+                  {"merlin_x.acd", "KEY = merlin_x\n"}});
     }
 };
 
@@ -85,7 +85,7 @@ TEST_F(Names, ANullNameIsNoneOfThoseThereAre) {
     for (char name = '!'; name <= '~'; ++name) {
         files[std::string{name} + ".acd"] = std::string{name} + " = x\n";
     }
-    AcdStore::setMemoryFiles(std::move(files));
+    useFiles(std::move(files));
     EXPECT_EQ(familyOf("~"), "~");
     EXPECT_EQ(familyOf(nullptr), nullopt);
     EXPECT_STREQ(AcdReader(nullptr).getPM(), "base");
@@ -105,35 +105,35 @@ TEST_F(Names, OddOnesFindNothing) {
 TEST_F(Names, VeryLongOnesFindNothing) { EXPECT_EQ(familyOf(std::string(1 << 20, 'x').c_str()), nullopt); }
 
 TEST_F(Names, AFileGoesBeforeAFamilyOfThatName) {
-    AcdStore::setMemoryFiles({{"a.acd", "KEY = a\n"}, {"a.acd.acd", "KEY = a.acd\n"}});
+    useFiles({{"a.acd", "KEY = a\n"}, {"a.acd.acd", "KEY = a.acd\n"}});
     EXPECT_THAT(familyOf("a.acd"), Optional("a"sv));
     EXPECT_THAT(familyOf("a.acd.acd"), Optional("a.acd"sv));
 }
 
 TEST_F(Names, AFamilyGoesBeforeADeviceOfThatName) {
-    AcdStore::setMemoryFiles({{"a.acd", "[b]\n[c]\n"}, {"b.acd", "KEY = b\n"}});
+    useFiles({{"a.acd", "[b]\n[c]\n"}, {"b.acd", "KEY = b\n"}});
     EXPECT_THAT(familyOf("b"), Optional("b"sv));
 }
 
 TEST_F(Names, AWholeDeviceGoesBeforeTheFamilyItBeginsWith) {
-    AcdStore::setMemoryFiles({{"a.acd", "[b_c]\n"}, {"b.acd", "KEY = b\n"}});
+    useFiles({{"a.acd", "[b_c]\n"}, {"b.acd", "KEY = b\n"}});
     EXPECT_THAT(familyOf("b_c"), Optional("a"sv));
     EXPECT_THAT(familyOf("b_d"), Optional("b"sv));
 }
 
 TEST_F(Names, OfSeveralFamiliesTheFirstFileNameInByteOrderHasADevice) {
-    AcdStore::setMemoryFiles({{"b.acd", "[D]\nKEY = b\n"},
-                              {"a.acd", "[d]\nKEY = a\n"},
-                              {"a-.acd", "[D]\nKEY = a-\n"},
-                              {"C.acd", "[E]\nKEY = C\n"},
-                              {"b2.acd", "[e]\nKEY = b2\n"}});
+    useFiles({{"b.acd", "[D]\nKEY = b\n"},
+              {"a.acd", "[d]\nKEY = a\n"},
+              {"a-.acd", "[D]\nKEY = a-\n"},
+              {"C.acd", "[E]\nKEY = C\n"},
+              {"b2.acd", "[e]\nKEY = b2\n"}});
     EXPECT_THAT(AcdStore::families(), ElementsAre("C", "a-", "a", "b", "b2"));
     EXPECT_THAT(valueOf("D", "KEY"), Optional("a-"sv));
     EXPECT_THAT(valueOf("E", "KEY"), Optional("C"sv));
 }
 
 TEST_F(Names, ADeviceMayBeCalledLikeAPath) {
-    AcdStore::setMemoryFiles({{"a.acd", "[../x/y]\n"}});
+    useFiles({{"a.acd", "[../x/y]\n"}});
     EXPECT_THAT(familyOf("../x/y"), Optional("a"sv));
     EXPECT_EQ(familyOf("../x"), nullopt);
 }

@@ -29,7 +29,7 @@ namespace {
 
 class Origins : public DatabaseTest {
 protected:
-    void read(std::string_view text) { AcdStore::setMemoryFiles({{"k.acd", std::string(text)}}); }
+    void read(std::string_view text) { useFiles({{"k.acd", std::string(text)}}); }
 };
 
 TEST_F(Origins, AreTheFirstByteOfTheValue) {
@@ -98,7 +98,7 @@ TEST_F(Origins, NameTheLayer) {
     const TemporaryDirectory directory;
     directory.write("low/k.acd", "A = a\nKEY = b\n");
     directory.write("top/k.acd", "KEY += c\n");
-    AcdStore::setSearchPath({directory.path("top"), directory.path("low") + "/"});
+    useDirectories({directory.path("top"), directory.path("low") + "/"});
     const std::string low = directory.path("low/k.acd");
     const std::string top = directory.path("top/k.acd");
     EXPECT_THAT(originsOf("k", "A"), ElementsAre("0 " + low + ":1:5"));

@@ -48,7 +48,7 @@ protected:
     /// Reads from the family "k" whose file holds `text`, by the name of the family or one of its devices.
     const RecordedRead& read(std::string_view text, const char* name, const char* key, const char* separator,
                              short item, const char* subSeparator = nullptr, short field = 0) {
-        AcdStore::setMemoryFiles({{"K.acd", std::string(text)}});
+        useFiles({{"K.acd", std::string(text)}});
         result = AcdReader(name).getDevkey()->getstringbykey(key, separator, item, subSeparator, field);
         EXPECT_EQ(reads.size(), 1U);
         return reads.back();
@@ -94,7 +94,7 @@ TEST_F(ReadObserver, IsGivenAWholeValueWithoutSeparator) {
 }
 
 TEST_F(ReadObserver, SeesTheFieldOfAnEarlierReadForgottenInAWholeItem) {
-    AcdStore::setMemoryFiles({{"K.acd", "LIST = a,b:c,d\n"}});
+    useFiles({{"K.acd", "LIST = a,b:c,d\n"}});
     PM_DEVKEY& accessor = *AcdReader("k").getDevkey();
     ASSERT_STREQ(accessor.getstringbykey("LIST", ":", 1, ",", 1), "d");
     ASSERT_STREQ(accessor.getstringbykey("LIST", ":", 1, nullptr, 0), "c,d");
@@ -172,7 +172,7 @@ TEST_F(ReadObserver, IsGivenTheLayer) {
     const TemporaryDirectory directory;
     directory.write("low/k.acd", "KEY = b\n");
     directory.write("top/k.acd", "KEY += ,c\n");
-    AcdStore::setSearchPath({directory.path("top"), directory.path("low")});
+    useDirectories({directory.path("top"), directory.path("low")});
     static_cast<void>(AcdReader("k").getDevkey()->getstringbykey("KEY", ",", 1, nullptr, 0));
     EXPECT_EQ(reads.back().text, "c");
     EXPECT_EQ(reads.back().layer, directory.path("top"));
@@ -181,7 +181,7 @@ TEST_F(ReadObserver, IsGivenTheLayer) {
 }
 
 TEST_F(ReadObserver, SeesEveryReadInOrder) {
-    AcdStore::setMemoryFiles({{"k.acd", "LIST = a,b\n"}});
+    useFiles({{"k.acd", "LIST = a,b\n"}});
     static_cast<void>(itemsOf(*AcdReader("k").getDevkey(), "LIST", ","));
     std::vector<std::string> texts;
     for (const RecordedRead& read : reads) {
@@ -194,7 +194,7 @@ TEST_F(ReadObserver, IsReturnedWhenItIsReplaced) {
     int calls = 0;
     const AcdStore::ReadObserver former = AcdStore::setReadObserver([&](const AcdStore::Read&) { ++calls; });
     ASSERT_TRUE(former);
-    AcdStore::setMemoryFiles({{"k.acd", "A = a\n"}});
+    useFiles({{"k.acd", "A = a\n"}});
     static_cast<void>(valueOf("k", "A"));
     EXPECT_EQ(calls, 1);
     EXPECT_THAT(reads, IsEmpty());
@@ -206,7 +206,7 @@ TEST_F(ReadObserver, IsReturnedWhenItIsReplaced) {
 
 TEST_F(ReadObserver, IsEndedByAnEmptyOne) {
     AcdStore::setReadObserver({});
-    AcdStore::setMemoryFiles({{"k.acd", "A = a\n"}});
+    useFiles({{"k.acd", "A = a\n"}});
     static_cast<void>(valueOf("k", "A"));
     EXPECT_THAT(reads, IsEmpty());
     EXPECT_FALSE(AcdStore::setReadObserver({}));
@@ -218,7 +218,7 @@ TEST_F(ReadObserver, MayReplaceItself) {
         EXPECT_EQ(text, std::string(64, 'x'));
         reads.emplace_back(read);
     });
-    AcdStore::setMemoryFiles({{"k.acd", "A = a\n"}});
+    useFiles({{"k.acd", "A = a\n"}});
     static_cast<void>(valueOf("k", "A"));
     static_cast<void>(valueOf("k", "A"));
     EXPECT_EQ(reads.size(), 1U);
@@ -229,7 +229,7 @@ TEST_F(ReadObserver, DoesNotSeeItsOwnReads) {
         reads.emplace_back(read);
         EXPECT_EQ(valueOf("other", "B"), "b");
     });
-    AcdStore::setMemoryFiles({{"k.acd", "A = a\n"}, {"other.acd", "B = b\n"}});
+    useFiles({{"k.acd", "A = a\n"}, {"other.acd", "B = b\n"}});
     EXPECT_EQ(valueOf("k", "A"), "a");
     EXPECT_EQ(valueOf("k", "A"), "a");
     EXPECT_EQ(reads.size(), 2U);
@@ -237,13 +237,13 @@ TEST_F(ReadObserver, DoesNotSeeItsOwnReads) {
 
 TEST_F(ReadObserver, ThrowsToTheReader) {
     AcdStore::setReadObserver([](const AcdStore::Read&) { throw std::runtime_error("enough"); });
-    AcdStore::setMemoryFiles({{"k.acd", "A = a\n"}});
+    useFiles({{"k.acd", "A = a\n"}});
     EXPECT_THROW(static_cast<void>(valueOf("k", "A")), std::runtime_error);
     EXPECT_THROW(static_cast<void>(valueOf("k", "A")), std::runtime_error);
 }
 
 TEST_F(ReadObserver, SeesAccessorsOfFiles) {
-    AcdStore::setMemoryFiles({{"spi.acd", "A = a\n"}});
+    useFiles({{"spi.acd", "A = a\n"}});
     const PicConfig configuration("spi", 1, PM_PARTNAME_BINDING::BY_NAME);
     PM_DEVKEY accessor("spi.acd", configuration, 0, 0, 0);
     ASSERT_STREQ(accessor.getstringbykey("A", ",", 0, nullptr, 0), "a");

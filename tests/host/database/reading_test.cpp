@@ -14,7 +14,7 @@ class Reading : public DatabaseTest {
 protected:
     /// An accessor of a database where KEY has this value.
     PM_DEVKEY& accessorOf(const std::string& value) {
-        AcdStore::setMemoryFiles({{"kestrel.acd", "KEY = " + value + "\nOTHER = o1,o2:o3\n"}});
+        useFiles({{"kestrel.acd", "KEY = " + value + "\nOTHER = o1,o2:o3\n"}});
         return *AcdReader("kestrel").getDevkey();
     }
 };
@@ -193,7 +193,7 @@ TEST_F(Reading, TheLongestListCostsTimeLinearInItsLength) {
         items.push_back(std::string(1000, 'a') + std::to_string(item));
         half += (item == 0 ? "" : "ab") + items.back();
     }
-    AcdStore::setMemoryFiles({{"kestrel.acd", "KEY = " + half + "\nKEY += ab" + half + "\n"}});
+    useFiles({{"kestrel.acd", "KEY = " + half + "\nKEY += ab" + half + "\n"}});
     PM_DEVKEY& accessor = *AcdReader("kestrel").getDevkey();
     for (int item = 0; item < 32768; ++item) {
         ASSERT_EQ(accessor.getstringbykey("KEY", "ab", static_cast<short>(item), nullptr, 0),
@@ -206,7 +206,7 @@ TEST_F(Reading, TheLongestRecordCostsTimeLinearInItsLength) {
     for (int field = 0; field < 16384; ++field) {
         half += std::string(1000, 'a') + std::to_string(field) + (field == 16383 ? "" : "ab");
     }
-    AcdStore::setMemoryFiles({{"kestrel.acd", "KEY = x:" + half + "\nKEY += ab" + half + "\n"}});
+    useFiles({{"kestrel.acd", "KEY = x:" + half + "\nKEY += ab" + half + "\n"}});
     PM_DEVKEY& accessor = *AcdReader("kestrel").getDevkey();
     for (int field = 0; field < 32768; ++field) {
         ASSERT_EQ(accessor.getstringbykey("KEY", ":", 1, "ab", static_cast<short>(field)),
@@ -234,7 +234,7 @@ TEST_F(Reading, ManyRecordsOfFieldsCostTimeLinearInTheirLength) {
 class Accessors : public DatabaseTest {};
 
 TEST_F(Accessors, OutliveTheirReader) {
-    AcdStore::setMemoryFiles({{"base.acd", "KEY = a\n"}});
+    useFiles({{"base.acd", "KEY = a\n"}});
     auto reader = std::make_unique<AcdReader>();
     PM_DEVKEY* const accessor = reader->getDevkey();
     reader.reset();
@@ -242,7 +242,7 @@ TEST_F(Accessors, OutliveTheirReader) {
 }
 
 TEST_F(Accessors, OfOneDatabaseAreOne) {
-    AcdStore::setMemoryFiles({{"kestrel.acd", "[A]\n[B]\n"}});
+    useFiles({{"kestrel.acd", "[A]\n[B]\n"}});
     EXPECT_EQ(AcdReader("A").getDevkey(), AcdReader("a_PKG").getDevkey());
     EXPECT_EQ(AcdReader("kestrel").getDevkey(), AcdReader("KESTREL.ACD").getDevkey());
     EXPECT_NE(AcdReader("A").getDevkey(), AcdReader("B").getDevkey());
@@ -250,7 +250,7 @@ TEST_F(Accessors, OfOneDatabaseAreOne) {
 }
 
 TEST_F(Accessors, OfSeveralSectionsDoNotDisturbEachOther) {
-    AcdStore::setMemoryFiles({{"kestrel.acd", "[A]\nKEY = a\n[B]\nKEY = b\n"}});
+    useFiles({{"kestrel.acd", "[A]\nKEY = a\n[B]\nKEY = b\n"}});
     const char* const a = AcdReader("A").getDevkey()->getstringbykey("KEY", ",", 0, nullptr, 0);
     const char* const b = AcdReader("B").getDevkey()->getstringbykey("KEY", ",", 0, nullptr, 0);
     EXPECT_STREQ(a, "a");
@@ -258,14 +258,14 @@ TEST_F(Accessors, OfSeveralSectionsDoNotDisturbEachOther) {
 }
 
 TEST_F(Accessors, OfAFileReadTheFamilysKeys) {
-    AcdStore::setMemoryFiles({{"SPI.acd", "KEY = a\n[A]\nKEY = b\n"}});
+    useFiles({{"SPI.acd", "KEY = a\n[A]\nKEY = b\n"}});
     const PicConfig configuration("base", 1, PM_PARTNAME_BINDING::BY_NAME);
     PM_DEVKEY accessor("spi.ACD", configuration, 1, 1, 1);
     EXPECT_STREQ(accessor.getstringbykey("KEY", ",", 0, nullptr, 0), "a");
 }
 
 TEST_F(Accessors, OfAMissingFileReadNothing) {
-    AcdStore::setMemoryFiles({{"kestrel.acd", "KEY = a\n"}});
+    useFiles({{"kestrel.acd", "KEY = a\n"}});
     const PicConfig configuration("base", 1, PM_PARTNAME_BINDING::BY_NAME);
     for (const char* const file : {"spi.acd", "kestrel", "", static_cast<const char*>(nullptr)}) {
         PM_DEVKEY accessor(file, configuration, 1, 1, 1);

@@ -8,7 +8,7 @@
 #include <unistd.h>
 
 // Prints the search path of a process that sets none; "open" opens the base database, "user" prints whose rights
-// the process has.
+// the process has, "elsewhere" changes the directory first.
 
 int main(int count, char** arguments) {
     const std::string_view wish = count > 1 ? arguments[1] : "";
@@ -21,6 +21,9 @@ int main(int count, char** arguments) {
             return 1;
         }
     } else {
+        if (wish == "elsewhere" && chdir("/") != 0) {
+            return 1;
+        }
         for (const std::string& directory : AcdStore::searchPath()) {
             std::cout << directory << '\n';
         }

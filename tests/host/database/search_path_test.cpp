@@ -2,8 +2,11 @@
 
 #include "database/SearchPath.h"
 
+#include <AcdLines.h>
+
 #include <array>
 #include <cstdio>
+#include <utility>
 
 #include <dlfcn.h>
 #include <sys/stat.h>
@@ -112,14 +115,50 @@ TEST_F(SearchPaths, AreReplacedByMemoryFiles) {
     EXPECT_THAT(AcdStore::families(), ElementsAre("merlin"));
 }
 
-TEST_F(SearchPaths, SetLaterLeaveFormerReadersAsTheyAre) {
+TEST_F(SearchPaths, SetAfterTheFirstReaderAreIgnoredWithAMessage) {
     AcdStore::setSearchPath({a});
     PM_DEVKEY& accessor = *AcdReader("kestrel").getDevkey();
     AcdStore::setSearchPath({b});
-    EXPECT_THAT(valueOf("kestrel", "KEY"), Optional("b"sv));
+    EXPECT_THAT(messages.take(),
+                ElementsAre(info(acd::location::SET_TOO_LATE,
+                                 "the search path can't be set after databases were looked for: ignored\n")));
     AcdStore::setMemoryFiles({});
+    EXPECT_THAT(
+        messages.take(),
+        ElementsAre(info(acd::location::SET_TOO_LATE,
+                         "the files in memory can't be set after databases were looked for: ignored\n")));
+    EXPECT_THAT(AcdStore::searchPath(), ElementsAre(a));
+    EXPECT_THAT(valueOf("kestrel", "KEY"), Optional("a"sv));
     EXPECT_STREQ(accessor.getstringbykey("KEY", ",", 0, nullptr, 0), "a");
-    EXPECT_EQ(familyOf("kestrel"), nullopt);
+}
+
+TEST_F(SearchPaths, AreSettledByEveryWayToLookForADatabase) {
+    const std::vector<std::pair<const char*, void (*)()>> ways = {
+        {"AcdReader()", [] { EXPECT_THROW(AcdReader(), DataNotFoundException); }},
+        {"AcdReader(name)", [] { AcdReader("nothing"); }},
+        {"PicConfig", [] { PicConfig("nothing", 1, PM_PARTNAME_BINDING::BY_NAME); }},
+        {"families", [] { static_cast<void>(AcdStore::families()); }},
+        {"devices", [] { static_cast<void>(AcdStore::devices("nothing")); }},
+        {"value", [] { static_cast<void>(AcdStore::value("nothing", "KEY")); }},
+        {"lines", [] { static_cast<void>(AcdLines::ofDatabase()); }},
+    };
+    for (const auto& [name, look] : ways) {
+        acd::Store::resetForTesting();
+        AcdStore::setSearchPath({directory.path()});
+        look();
+        static_cast<void>(messages.take());
+        AcdStore::setSearchPath({b});
+        EXPECT_THAT(AcdStore::searchPath(), ElementsAre(directory.path())) << name;
+        EXPECT_THAT(messages.take(), SizeIs(1)) << name;
+    }
+}
+
+TEST_F(SearchPaths, CanBeSetAgainBeforeTheFirstReader) {
+    AcdStore::setSearchPath({a});
+    EXPECT_THAT(AcdStore::searchPath(), ElementsAre(a));
+    AcdStore::setSearchPath({b});
+    EXPECT_THAT(AcdStore::searchPath(), ElementsAre(b));
+    EXPECT_THAT(messages.take(), IsEmpty());
 }
 
 TEST_F(SearchPaths, AreForgottenWithAllThatWasRead) {
@@ -199,7 +238,7 @@ TEST_F(InstalledDatabases, AreNotLookedForBesideABareName) {
 
 namespace {
 
-enum class Loader { AS_IT_IS, UNKNOWING, NAMELESS };
+enum class Loader { AS_IT_IS, UNKNOWING, NAMELESS, BARE_NAME };
 
 /// What the loader makes of the question which file this code is from.
 Loader& loader() {
@@ -223,6 +262,8 @@ int __wrap_dladdr(const void* address, Dl_info* information) {
     const int result = __real_dladdr(address, information);
     if (loader() == Loader::NAMELESS) {
         information->dli_fname = nullptr;
+    } else if (loader() == Loader::BARE_NAME) {
+        information->dli_fname = "program";
     }
     return result;
 }
@@ -234,11 +275,18 @@ int __wrap_dladdr(const void* address, Dl_info* information) {
 TEST_F(SearchPaths, AreEmptyWhereTheLoaderCannotTellTheLibrarysPlace) {
     for (const Loader answer : {Loader::UNKNOWING, Loader::NAMELESS}) {
         loader() = answer;
-        EXPECT_THAT(acd::defaultSearchPath().directories, IsEmpty());
-        EXPECT_THAT(acd::defaultSearchPath().tried, IsEmpty());
+        EXPECT_EQ(acd::findOwnFile(), "");
     }
     loader() = Loader::AS_IT_IS;
-    EXPECT_NE(acd::defaultSearchPath().directories.size() + acd::defaultSearchPath().tried.size(), 0U);
+    EXPECT_NE(acd::findOwnFile(), "");
+    EXPECT_THAT(acd::installedSearchPath("").directories, IsEmpty());
+    EXPECT_THAT(acd::installedSearchPath("").tried, IsEmpty());
+}
+
+TEST_F(SearchPaths, ComeFromTheProgramWhereTheLoaderNamesItAsItWasTyped) {
+    loader() = Loader::BARE_NAME;
+    EXPECT_EQ(acd::findOwnFile(), std::filesystem::read_symlink("/proc/self/exe").string());
+    loader() = Loader::AS_IT_IS;
 }
 
 class Processes : public InstalledDatabases {
@@ -269,6 +317,26 @@ TEST_F(Processes, FindTheDatabaseInstalledWithTheLibrary) {
     placeLibrary("usr/lib");
     EXPECT_EQ(run("env -u TARVIK_DATABASE LD_LIBRARY_PATH=" + directory.path("usr/lib") + " " + program),
               directory.path("usr/share/tarvik/database") + "\n");
+}
+
+TEST_F(Processes, FindItFromARelativeLibraryPathAfterTheyChangedTheirDirectory) {
+    install("usr");
+    placeLibrary("usr/lib");
+    EXPECT_EQ(run("cd " + directory.path("usr") + " && env -u TARVIK_DATABASE LD_LIBRARY_PATH=lib " +
+                  program + " elsewhere"),
+              directory.path("usr/share/tarvik/database") + "\n");
+}
+
+TEST_F(Processes, LinkedStaticallyFindItWhenTheyAreStartedThroughThePath) {
+    install("usr");
+    std::filesystem::create_directories(directory.path("usr/bin"));
+    std::filesystem::copy_file(TARVIK_STATIC_SEARCH_PATH_PROGRAM, directory.path("usr/bin/search-path"));
+    for (const char* const wish : {"", " elsewhere"}) {
+        EXPECT_EQ(run("env -u TARVIK_DATABASE PATH=" + directory.path("usr/bin") + " search-path" + wish),
+                  directory.path("usr/share/tarvik/database") + "\n");
+        EXPECT_EQ(run("cd " + directory.path("usr") + " && env -u TARVIK_DATABASE bin/search-path" + wish),
+                  directory.path("usr/share/tarvik/database") + "\n");
+    }
 }
 
 TEST_F(Processes, PreferTheEnvironment) {

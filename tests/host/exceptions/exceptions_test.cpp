@@ -58,11 +58,11 @@ TEST(Exceptions, AreNotCaughtAsTheirSiblings) {
 }
 
 TEST(Exceptions, NameTheirTypes) {
-    EXPECT_STREQ(TarvikException("", "", "", 0).what(), "TarvikException");
-    EXPECT_STREQ(LogicException("", "", "", 0).what(), "LogicException");
-    EXPECT_STREQ(DataMismatchException("", "", "", 0).what(), "DataMismatchException");
-    EXPECT_STREQ(OutOfRangeException("", "", "", 0).what(), "OutOfRangeException");
-    EXPECT_STREQ(DataNotFoundException("", "", "", 0).what(), "DataNotFoundException");
+    EXPECT_STREQ(TarvikException("", "", "", 0).typeName(), "TarvikException");
+    EXPECT_STREQ(LogicException("", "", "", 0).typeName(), "LogicException");
+    EXPECT_STREQ(DataMismatchException("", "", "", 0).typeName(), "DataMismatchException");
+    EXPECT_STREQ(OutOfRangeException("", "", "", 0).typeName(), "OutOfRangeException");
+    EXPECT_STREQ(DataNotFoundException("", "", "", 0).typeName(), "DataNotFoundException");
 }
 
 TEST(Exceptions, CarryTheirPlaceOfOrigin) {

@@ -73,7 +73,8 @@ TEST(FormattedText, ThatCannotBePrintedIsTheFormat) {
 
 TEST(FinishedText, WithoutPercentSignsStays) {
     EXPECT_EQ(formatting::unescapePercent(""), "");
-    EXPECT_EQ(formatting::unescapePercent("Device KS50 belongs to kestrel\n"), "Device KS50 belongs to kestrel\n");
+    EXPECT_EQ(formatting::unescapePercent("Device KS50 belongs to kestrel\n"),
+              "Device KS50 belongs to kestrel\n");
     EXPECT_EQ(formatting::unescapePercent("\xFF\x80\n"), "\xFF\x80\n");
 }
 

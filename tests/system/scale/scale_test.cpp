@@ -2,6 +2,8 @@
 #include "support/Fixtures.h"
 #include "support/TarvikTestPeer.h"
 
+#include <Implementation.h>
+
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
@@ -87,7 +89,7 @@ protected:
 
 TEST_P(ScaleOfLists, OfItems) {
     ConstraintsManager& manager = start({{"base.acd", "DEVICE_SUPPORTED = " + list("fam", m_count) + '\n'}});
-    EXPECT_EQ(TarvikTestPeer(manager).supportedDevices().size(), m_reached);
+    EXPECT_EQ(TarvikTestPeer::members(manager).m_supportedDevices.size(), m_reached);
 }
 
 TEST_P(ScaleOfLists, OfRecords) {

@@ -39,7 +39,7 @@ std::string answer(const Question& question) {
         try {
             return question();
         } catch (const TarvikException& raised) {
-            return std::string("raised ") + raised.what();
+            return std::string("raised ") + raised.typeName();
         } catch (const std::bad_alloc&) {
             continue;
         }

@@ -15,6 +15,7 @@ struct State {
     failing_host::Extent extent = failing_host::Extent::ONE_CALL;
     int reports = 0;
     std::vector<std::string> reads;
+    std::vector<std::string> events;
 };
 
 State& state() {
@@ -43,19 +44,28 @@ void hostCall(const char* service, const char* database, const char* key) {
     }
 }
 
+void hostClosed(const char* database) noexcept { state().events.push_back(std::string("close ") + database); }
+
 namespace failing_host {
 
 InjectedException::~InjectedException() = default;
 
-void InjectedException::report() const { ++state().reports; }
+void InjectedException::report() const {
+    ++state().reports;
+    state().events.emplace_back("report");
+}
 
-void failAt(std::size_t call, Failure failure, Extent extent) { state() = {0, call, failure, extent, 0, {}}; }
+void failAt(std::size_t call, Failure failure, Extent extent) {
+    state() = {0, call, failure, extent, 0, {}, {}};
+}
 
 void serve() { state() = {}; }
 
 bool hasFailed() { return state().failing != 0 && state().calls >= state().failing; }
 
 int reports() { return state().reports; }
+
+const std::vector<std::string>& events() { return state().events; }
 
 const std::vector<std::string>& reads() { return state().reads; }
 

@@ -2,6 +2,8 @@
 
 #include <HostTestPeer.h>
 
+#include <Implementation.h>
+
 #include <TarvikSmokeMgr.h>
 
 #include <string>
@@ -14,58 +16,58 @@ struct Snapshot {
     std::vector<std::pair<std::string, std::string>> steps;
 
     static Snapshot of(ConstraintsManager& manager) {
-        const TarvikTestPeer peer(manager);
-        return {{{"supported devices", text(peer.supportedDevices())},
-                 {"packages", text(peer.programOptionPackages())},
-                 {"BS outputs", text(peer.bsCables())},
-                 {"SS outputs", text(peer.ssCables())},
-                 {"SM outputs", text(peer.smCables())},
-                 {"BSFILE outputs", text(peer.bsFileCables())},
-                 {"DP770 outputs", text(peer.dp770Cables())},
-                 {"SPI outputs", text(peer.spiCables())},
-                 {"KITECF outputs", text(peer.kiteCfCables())},
-                 {"KITEMPM outputs", text(peer.kiteMpmCables())},
-                 {"PFF outputs", text(peer.pffCables())},
-                 {"BS families", text(peer.bsDevices())},
-                 {"SS families", text(peer.ssDevices())},
-                 {"SM families", text(peer.smDevices())},
-                 {"BSFILE families", text(peer.bsFileDevices())},
-                 {"DP770 families", text(peer.dp770Devices())},
-                 {"SPI families", text(peer.spiDevices())},
-                 {"KITECF families", text(peer.kiteCfDevices())},
-                 {"KITEMPM families", text(peer.kiteMpmDevices())},
-                 {"PFF families", text(peer.pffDevices())},
-                 {"idcodes", text(peer.deviceIdcodes())},
-                 {"excluded parts", text(peer.notSupportedPartInMode())},
+        auto& members = TarvikTestPeer::members(manager);
+        return {{{"supported devices", text(members.m_supportedDevices)},
+                 {"packages", text(members.m_programOptionPackages)},
+                 {"BS outputs", text(members.m_bsCables)},
+                 {"SS outputs", text(members.m_ssCables)},
+                 {"SM outputs", text(members.m_smCables)},
+                 {"BSFILE outputs", text(members.m_bsFileCables)},
+                 {"DP770 outputs", text(members.m_dp770Cables)},
+                 {"SPI outputs", text(members.m_spiCables)},
+                 {"KITECF outputs", text(members.m_kiteCfCables)},
+                 {"KITEMPM outputs", text(members.m_kiteMpmCables)},
+                 {"PFF outputs", text(members.m_pffCables)},
+                 {"BS families", text(members.m_bsDevices)},
+                 {"SS families", text(members.m_ssDevices)},
+                 {"SM families", text(members.m_smDevices)},
+                 {"BSFILE families", text(members.m_bsFileDevices)},
+                 {"DP770 families", text(members.m_dp770Devices)},
+                 {"SPI families", text(members.m_spiDevices)},
+                 {"KITECF families", text(members.m_kiteCfDevices)},
+                 {"KITEMPM families", text(members.m_kiteMpmDevices)},
+                 {"PFF families", text(members.m_pffDevices)},
+                 {"idcodes", text(members.m_deviceIdcodes)},
+                 {"excluded parts", text(members.m_notSupportedPartInMode)},
                  {"orders", text(manager.getOperationOrders()) + text(manager.getProgramOptionOrders())},
-                 {"SPI names", text(peer.spiNames()) + text(peer.spiFamilies())},
-                 {"AT1", text(peer.at1Devices())},
-                 {"ST1", text(peer.st1Devices())},
-                 {"ST2", text(peer.st2Devices())},
-                 {"BPI1", text(peer.bpi1Devices())},
-                 {"BPI2", text(peer.bpi2Devices())},
-                 {"BPI3", text(peer.bpi3Devices())},
-                 {"SPI properties", text(peer.spiProperties())},
+                 {"SPI names", text(members.m_spiNames) + text(members.m_spiFamilies)},
+                 {"AT1", text(members.m_at1Devices)},
+                 {"ST1", text(members.m_st1Devices)},
+                 {"ST2", text(members.m_st2Devices)},
+                 {"BPI1", text(members.m_bpi1Devices)},
+                 {"BPI2", text(members.m_bpi2Devices)},
+                 {"BPI3", text(members.m_bpi3Devices)},
+                 {"SPI properties", text(members.m_spiProperties)},
                  {"SPI operations", masks(manager,
                                           [&](auto output) {
                                               return manager.getDeviceOperations("", TARVIKNS::MODE_TYPE::SPI,
                                                                                  output);
                                           })},
-                 {"SPI operations noted", text(peer.operationsLoaded())},
+                 {"SPI operations noted", text(members.m_operationsLoaded)},
                  {"SPI boundary scan", boundaryScanFlags(manager)},
                  {"SPI options", masks(manager,
                                        [&](auto output) {
                                            return manager.getProgramOptions("", TARVIKNS::MODE_TYPE::SPI,
                                                                             output, nullptr);
                                        })},
-                 {"SPI options noted", text(peer.programOptionsLoaded())},
-                 {"multiboot types", text(peer.multibootTypes())}}};
+                 {"SPI options noted", text(members.m_programOptionsLoaded)},
+                 {"multiboot types", text(members.m_multibootTypes)}}};
     }
 
     /// The masks that SPI mode gives for each output, where there is one. That loads nothing.
     template <typename MaskOf>
     static std::string masks(ConstraintsManager& manager, MaskOf maskOf) {
-        const bool exceptions = TarvikTestPeer(manager).exceptions();
+        const bool exceptions = TarvikTestPeer::members(manager).m_exceptions;
         manager.setExceptions(false);
         std::string text;
         for (int output = 0; output < 5; ++output) {

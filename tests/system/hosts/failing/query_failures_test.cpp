@@ -117,9 +117,9 @@ struct Loaded {
     std::vector<std::string> options;
 
     static Loaded of(ConstraintsManager& manager) {
-        const TarvikTestPeer peer(manager);
-        return {list(peer.loadedFamilies()), list(peer.operationsLoaded()),
-                list(peer.programOptionsLoaded())};
+        auto& members = TarvikTestPeer::members(manager);
+        return {list(members.m_loadedFamilies), list(members.m_operationsLoaded),
+                list(members.m_programOptionsLoaded)};
     }
     template <typename Container>
     static std::vector<std::string> list(const Container& container) {

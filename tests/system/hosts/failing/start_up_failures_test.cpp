@@ -140,7 +140,7 @@ TEST_F(StartUpFailures, ATarvikExceptionEndsThePassAndIsReported) {
             break;
         }
         EXPECT_EQ(reports, 1) << call;
-        EXPECT_TRUE(TarvikTestPeer(*manager).exceptions()) << call;
+        EXPECT_TRUE(TarvikTestPeer::members(*manager).m_exceptions) << call;
         EXPECT_EQ(ConstraintsManager::getConstraintsManager(), manager) << "made once, failed or not";
 
         const std::size_t completed = completedSteps(Snapshot::of(*manager), expected);
@@ -152,6 +152,25 @@ TEST_F(StartUpFailures, ATarvikExceptionEndsThePassAndIsReported) {
     // Each step was the first unfinished one at some call, but for the orders: they ask nothing of the host.
     EXPECT_EQ(ends.size(), expected.steps.size() - 1);
     EXPECT_EQ(*ends.begin(), 0U);
+}
+
+TEST_F(StartUpFailures, ATarvikExceptionReportsItselfBeforeTheBaseReaderIsClosed) {
+    constexpr std::size_t OPENS_THE_READER = 1;
+    int reported = 0;
+    for (std::size_t call = OPENS_THE_READER + 1;; ++call) {
+        failing_host::failAt(call, Failure::TARVIK_EXCEPTION);
+        ASSERT_NE(ConstraintsManager::getConstraintsManager(), nullptr);
+        const bool failed = failing_host::hasFailed();
+        const std::vector<std::string> events = failing_host::events();
+        failing_host::serve();
+        TarvikTestPeer::removeManager();
+        if (!failed) {
+            break;
+        }
+        EXPECT_EQ(events, (std::vector<std::string>{"report", "close base"})) << call;
+        ++reported;
+    }
+    EXPECT_GT(reported, 10);
 }
 
 TEST_F(StartUpFailures, TheManagerIsUsableBehindATarvikException) {
@@ -185,7 +204,7 @@ TEST_F(StartUpFailures, AnyOtherExceptionLeavesNoManagerAndTheNextCallTriesAgain
         ConstraintsManager* const manager = ConstraintsManager::getConstraintsManager();
         ASSERT_NE(manager, nullptr);
         EXPECT_EQ(Snapshot::of(*manager).steps, expected.steps) << call;
-        EXPECT_TRUE(TarvikTestPeer(*manager).exceptions());
+        EXPECT_TRUE(TarvikTestPeer::members(*manager).m_exceptions);
         TarvikTestPeer::removeManager();
     }
 }

@@ -97,6 +97,8 @@ AcdReader::AcdReader(const char* name) : m_accessor(std::make_shared<PM_DEVKEY>(
     m_module = database == nullptr ? "base" : database->family;
 }
 
+AcdReader::~AcdReader() { hostClosed(m_module.c_str()); }
+
 PM_DEVKEY* AcdReader::getDevkey() const {
     hostCall("getDevkey");
     return m_accessor.get();

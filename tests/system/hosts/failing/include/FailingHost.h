@@ -41,6 +41,9 @@ bool hasFailed();
 /// How often an `InjectedException` was asked to report itself since `failAt`.
 int reports();
 
+/// The closed readers and the reports since `failAt` or `serve`, in order: "close DATABASE", "report".
+const std::vector<std::string>& events();
+
 /// The reads of keys since `failAt` or `serve`, as "database key".
 const std::vector<std::string>& reads();
 

@@ -11,6 +11,9 @@ public:
     /// @throw DataNotFoundException when there is no base database
     AcdReader();
     explicit AcdReader(const char* name);
+    ~AcdReader();
+    AcdReader(const AcdReader&) = delete;
+    AcdReader& operator=(const AcdReader&) = delete;
 
     [[nodiscard]] PM_DEVKEY* getDevkey() const;
     [[nodiscard]] const char* getPM() const;

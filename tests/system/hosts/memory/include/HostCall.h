@@ -6,3 +6,6 @@
 /// @param database the name of the database that is read; empty for other services
 /// @param key the key that is read, likewise
 inline void hostCall(const char* /*service*/, const char* /*database*/ = "", const char* /*key*/ = "") {}
+
+/// The same for a reader that is closed, which cannot fail.
+inline void hostClosed(const char* /*database*/) noexcept {}
