@@ -256,7 +256,7 @@ class Answers(InProcess):
         error = caught.exception
         self.assertEqual((error.line, error.product, error.source), (437, "Tarvik", "../s/ConstraintsManager"))
         self.assertTrue(error.cause.startswith("DataNotFoundException"))
-        self.assertEqual(str(error), f"{error.cause} (location 437)")
+        self.assertEqual(str(error), error.cause)
         self.assertIsInstance(error, tarvik.LogicException)
         self.assertIsInstance(error, tarvik.TarvikException)
         copy = pickle.loads(pickle.dumps(error))
