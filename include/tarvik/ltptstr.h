@@ -29,12 +29,6 @@ struct ltptstr {
     /// @return the same
     [[nodiscard]] static std::string_view view(std::string_view text) noexcept { return text; }
 
-    /// @param text NUL-terminated, must outlive the result; null is the empty text
-    /// @return its bytes
-    [[nodiscard]] static std::string_view view(const char* text) noexcept {
-        return text == nullptr ? std::string_view() : std::string_view(text);
-    }
-
     /// Is one text before another?
     /// @param left any text
     /// @param right any text
