@@ -27,8 +27,7 @@ static void keep(const tarvik_message* message, void* context) {
 
 /** Prints why a call failed. Returns the exit status for that. */
 static int fail(const char* what) {
-    const tarvik_error* error = tarvik_last_error();
-    fprintf(stderr, "%s: %s (location %d)\n", what, error->text, error->line);
+    fprintf(stderr, "%s: %s\n", what, tarvik_last_error()->text);
     return 2;
 }
 

@@ -243,7 +243,8 @@ TARVIK_API const char* tarvik_enumerator_name(int enumeration, int value);
 /* ---- Before the manager is made ------------------------------------------------------------------------- */
 
 /**
- * Sets the directories in which databases are looked for. The default is the environment variable
+ * Sets the directories in which databases are looked for. If the C++ library has made the manager already, that has no
+ * effect, and a message says so. The default is the environment variable
  * TARVIK_DATABASE, otherwise the installed share/tarvik/database.
  * @param directories the first one is on top: it can replace or extend what the others hold
  * @param count how many

@@ -5,7 +5,8 @@ class TarvikException(Exception):
     """A failure of the library, with its location.
 
     Attributes:
-        cause: what went wrong, in the library's words
+        cause: what went wrong: the exception, its location, and the value that was read last from the database, with
+            its file, line and column
         line: the location number of the exception, as the C++ library and its documentation give it
         product, source, revision: of the code that raised it
     """
@@ -20,7 +21,7 @@ class TarvikException(Exception):
         self.revision = revision
 
     def __str__(self) -> str:
-        return f"{self.cause} (location {self.line})"
+        return self.cause
 
 
 class LogicException(TarvikException):

@@ -4,118 +4,53 @@ import contextlib
 import ctypes
 import functools
 import os
-from typing import Any, Dict, FrozenSet, Iterable, Iterator, List, Mapping, Optional, Tuple, Union, overload
+from typing import Any, Dict, FrozenSet, Iterable, Iterator, Mapping, Optional, Tuple, Union, overload
 
+from ._calls import ask_flag, ask_integer, ask_map, ask_mask, ask_number, ask_orders, ask_text, ask_texts, call
 from ._enumerations import Mode, Operation, Option, Output
 from ._errors import StateError
-from ._library import Position, MemoryFile, bytes_of, library, lock, number_of, text_of
-from ._messages import fail, raised
+from ._library import MemoryFile, bytes_of, library, lock, number_of, text_of
 
 Directory = Union[str, "os.PathLike[str]"]
-
-# Where the library writes its results; used under the lock.
-_text = ctypes.c_char_p()
-_number = ctypes.c_int32()
-_mask = ctypes.c_uint32()
-_collection = ctypes.c_void_p()
-_integer = ctypes.c_int()
-_TEXT = ctypes.byref(_text)
-_NUMBER = ctypes.byref(_number)
-_MASK = ctypes.byref(_mask)
-_COLLECTION = ctypes.byref(_collection)
-_INTEGER = ctypes.byref(_integer)
 
 # What the first manager was given: there is no other in this process.
 _database: Optional[Tuple[Any, ...]] = None
 _exceptions_are_on = True
 
 
-def _check(status: int) -> None:
-    if status or raised:
-        fail(status)
-
-
-def _call(function: Any, *arguments: Any) -> None:
-    with lock:
-        _check(function(*arguments))
-
-
-def _flag_of(function: Any, *arguments: Any) -> bool:
-    with lock:
-        status = function(*arguments, _INTEGER)
-        if status or raised:
-            fail(status)
-        return _integer.value != 0
-
-
-def _integer_of(function: Any, *arguments: Any) -> int:
-    with lock:
-        status = function(*arguments, _INTEGER)
-        if status or raised:
-            fail(status)
-        return _integer.value
-
-
-def _number_of(function: Any, *arguments: Any) -> int:
-    with lock:
-        status = function(*arguments, _NUMBER)
-        if status or raised:
-            fail(status)
-        return _number.value
-
-
-def _mask_of(function: Any, *arguments: Any) -> int:
-    with lock:
-        status = function(*arguments, _MASK)
-        if status or raised:
-            fail(status)
-        return _mask.value
-
-
-def _text_of(function: Any, *arguments: Any) -> Optional[str]:
-    with lock:
-        status = function(*arguments, _TEXT)
-        if status or raised:
-            fail(status)
-        value = _text.value
-    return None if value is None else text_of(value)
-
-
-def _texts_of(function: Any, *arguments: Any) -> Tuple[str, ...]:
-    with lock:
-        _check(function(*arguments, _COLLECTION))
-        at = Position()
-        reference = ctypes.byref(at)
-        texts: List[str] = []
-        while (text := library.tarvik_text_set_next(_collection, reference)) is not None:
-            texts.append(text_of(text))
-    return tuple(texts)
-
-
-@functools.lru_cache(maxsize=4096)
-def _operations(mask: int) -> FrozenSet[Operation]:
+@functools.lru_cache(maxsize=None)
+def _operations_of_byte(mask: int) -> FrozenSet[Operation]:
     return frozenset(operation for operation in Operation if mask >> operation & 1)
 
 
-@functools.lru_cache(maxsize=4096)
-def _options(mask: int) -> FrozenSet[Option]:
+@functools.lru_cache(maxsize=None)
+def _options_of_byte(mask: int) -> FrozenSet[Option]:
     return frozenset(option for option in Option if mask >> option & 1)
 
 
-def _orders_of(function: Any) -> List[int]:
-    values = (ctypes.c_int * 32)()
-    count = ctypes.c_size_t()
-    _call(function, values, len(values), ctypes.byref(count))
-    return values[: count.value]
+# A large database may have more masks than are kept. To make one of its bytes' sets is several times as fast as to go
+# through the enumeration.
+
+
+@functools.lru_cache(maxsize=16384)
+def _operations(mask: int) -> FrozenSet[Operation]:
+    part = _operations_of_byte
+    return part(mask & 0xFF).union(part(mask & 0xFF00), part(mask & 0xFF0000), part(mask & 0xFF000000))
+
+
+@functools.lru_cache(maxsize=16384)
+def _options(mask: int) -> FrozenSet[Option]:
+    part = _options_of_byte
+    return part(mask & 0xFF).union(part(mask & 0xFF00), part(mask & 0xFF0000))
 
 
 def _set_database(directories: Optional[Tuple[bytes, ...]], files: Optional[Tuple[Tuple[bytes, bytes], ...]]) -> None:
     if directories is not None:
         path = (ctypes.c_char_p * len(directories))(*directories)
-        _call(library.tarvik_set_search_path, path, len(directories))
+        call(library.tarvik_set_search_path, path, len(directories))
     if files is not None:
         array = (MemoryFile * len(files))(*[MemoryFile(name, text, len(text)) for name, text in files])
-        _call(library.tarvik_set_memory_files, array, len(files))
+        call(library.tarvik_set_memory_files, array, len(files))
 
 
 def _directory_bytes(directory: Directory) -> bytes:
@@ -172,7 +107,7 @@ class Manager:
                 _database = (path, files)
             elif (path, files) not in (_database, (None, None)):
                 raise StateError("this process has a manager over another database: use a process for each")
-            _call(library.tarvik_get_constraints_manager)
+            call(library.tarvik_get_constraints_manager)
 
     # ---- The manager itself
 
@@ -180,14 +115,14 @@ class Manager:
     def remove_constraints_manager() -> None:
         """Removes the manager and frees its memory. It cannot be made again: every later question raises
         `StateError`. A script that ends anyway need not call this."""
-        _call(library.tarvik_remove_constraints_manager)
+        call(library.tarvik_remove_constraints_manager)
 
     def set_exceptions(self, exceptions: bool) -> None:
         """Turns exceptions on, as they are at first, or off: a fault of the database then gives False, 0, None or an
         empty set. See `exceptions` for a block of code."""
         global _exceptions_are_on  # pylint: disable=global-statement
         with lock:
-            _call(library.tarvik_set_exceptions, bool(exceptions))
+            call(library.tarvik_set_exceptions, bool(exceptions))
             _exceptions_are_on = bool(exceptions)
 
     @contextlib.contextmanager
@@ -208,12 +143,12 @@ class Manager:
     @staticmethod
     def get_operation_orders() -> Tuple[Operation, ...]:
         """The operations in the order in which they are presented to users."""
-        return tuple(map(Operation, _orders_of(library.tarvik_get_operation_orders)))
+        return tuple(map(Operation, ask_orders(library.tarvik_get_operation_orders)))
 
     @staticmethod
     def get_program_option_orders() -> Tuple[Option, ...]:
         """The programming options in the order in which they are presented to users."""
-        return tuple(map(Option, _orders_of(library.tarvik_get_program_option_orders)))
+        return tuple(map(Option, ask_orders(library.tarvik_get_program_option_orders)))
 
     # ---- The vocabulary: conversions that need no manager
 
@@ -224,38 +159,38 @@ class Manager:
         >>> tarvik.Manager.mode_string_to_type("sserial")
         <Mode.SS: 1>
         """
-        return Mode(_integer_of(library.tarvik_mode_string_to_type, bytes_of(text)))
+        return Mode(ask_integer(library.tarvik_mode_string_to_type, bytes_of(text)))
 
     @staticmethod
     def mode_type_to_string(mode: int) -> str:
         """The key name of a mode; "BS" for an unknown value."""
-        return _text_of(library.tarvik_mode_type_to_string, number_of(mode)) or ""
+        return ask_text(library.tarvik_mode_type_to_string, number_of(mode)) or ""
 
     @staticmethod
     def cable_string_to_type(text: str) -> Output:
         """The output with a key name, case-sensitive; `Output.NONE` for every other text, also for "QSVF" and
         "NULLCABLE"."""
-        return Output(_integer_of(library.tarvik_cable_string_to_type, bytes_of(text)))
+        return Output(ask_integer(library.tarvik_cable_string_to_type, bytes_of(text)))
 
     @staticmethod
     def cable_type_to_string(output: int) -> str:
         """The key name of an output; empty for an unknown value."""
-        return _text_of(library.tarvik_cable_type_to_string, number_of(output)) or ""
+        return ask_text(library.tarvik_cable_type_to_string, number_of(output)) or ""
 
     @staticmethod
     def operation_string_to_type(text: str) -> Optional[Operation]:
         """The operation with a key name, in any case; None, after a message, for every other text."""
-        return _operation(_integer_of(library.tarvik_operation_string_to_type, bytes_of(text)))
+        return _operation(ask_integer(library.tarvik_operation_string_to_type, bytes_of(text)))
 
     @staticmethod
     def operation_display_string_to_type(text: str) -> Optional[Operation]:
         """The operation with a display name, in any case; None, after a message, for every other text."""
-        return _operation(_integer_of(library.tarvik_operation_display_string_to_type, bytes_of(text)))
+        return _operation(ask_integer(library.tarvik_operation_display_string_to_type, bytes_of(text)))
 
     @staticmethod
     def operation_type_to_string(operation: int) -> str:
         """The key name of an operation; empty, after a message, for an unknown value."""
-        return _text_of(library.tarvik_operation_type_to_string, number_of(operation)) or ""
+        return ask_text(library.tarvik_operation_type_to_string, number_of(operation)) or ""
 
     @staticmethod
     def operation_type_to_display_string(operation: int) -> str:
@@ -264,18 +199,18 @@ class Manager:
         >>> tarvik.Manager.operation_type_to_display_string(tarvik.Operation.READIDCODE)
         'Get Device ID'
         """
-        return _text_of(library.tarvik_operation_type_to_display_string, number_of(operation)) or ""
+        return ask_text(library.tarvik_operation_type_to_display_string, number_of(operation)) or ""
 
     @staticmethod
     def option_string_to_type(text: str) -> Option:
         """The programming option with a key name, case-sensitive, up to `Option.SECTOR_LOCKDOWN`. Every other text
         raises `DataMismatchException`."""
-        return Option(_integer_of(library.tarvik_option_string_to_type, bytes_of(text)))
+        return Option(ask_integer(library.tarvik_option_string_to_type, bytes_of(text)))
 
     @staticmethod
     def option_type_to_string(option: int) -> str:
         """The key name of a programming option. An unknown value raises `DataMismatchException`."""
-        return _text_of(library.tarvik_option_type_to_string, number_of(option)) or ""
+        return ask_text(library.tarvik_option_type_to_string, number_of(option)) or ""
 
     @staticmethod
     def remove_package_name(device: str) -> str:
@@ -285,7 +220,7 @@ class Manager:
         'KS50'
         """
         buffer = ctypes.create_string_buffer(bytes_of(device) or b"")
-        _call(library.tarvik_remove_package_name, buffer)
+        call(library.tarvik_remove_package_name, buffer)
         return text_of(buffer.value)
 
     # ---- Checks
@@ -326,16 +261,16 @@ class Manager:
         if operation is not None and device is not None and package is None:
             operation = number_of(operation)
             if output is None:
-                return _flag_of(library.tarvik_check_operation_property, name, mode, operation, None)
-            return _flag_of(library.tarvik_check_operation, mode, number_of(output), name, operation, None)
+                return ask_flag(library.tarvik_check_operation_property, name, mode, operation, None)
+            return ask_flag(library.tarvik_check_operation, mode, number_of(output), name, operation, None)
         if operation is None and device is not None:
             if output is None:
-                return _flag_of(library.tarvik_check_device, mode, name, bytes_of(package))
-            return _flag_of(
+                return ask_flag(library.tarvik_check_device, mode, name, bytes_of(package))
+            return ask_flag(
                 library.tarvik_check_output_and_device, mode, number_of(output), name, bytes_of(package)
             )
         if operation is None and package is None and output is not None:
-            return _flag_of(library.tarvik_check_output, mode, number_of(output))
+            return ask_flag(library.tarvik_check_output, mode, number_of(output))
         raise TypeError("check_constraints takes no such combination of arguments")
 
     # ---- What a device offers
@@ -348,7 +283,7 @@ class Manager:
         True
         """
         return _operations(
-            _mask_of(library.tarvik_get_device_operations, bytes_of(device), number_of(mode), number_of(output))
+            ask_mask(library.tarvik_get_device_operations, bytes_of(device), number_of(mode), number_of(output))
         )
 
     def get_program_options(
@@ -357,7 +292,7 @@ class Manager:
         """The programming options that the device, or the device in that package, has in the mode through the
         output."""
         return _options(
-            _mask_of(
+            ask_mask(
                 library.tarvik_get_program_options,
                 bytes_of(device),
                 number_of(mode),
@@ -368,12 +303,12 @@ class Manager:
 
     def get_bsdl_operations(self, device: str, output: int) -> FrozenSet[Operation]:
         """The operations that the device offers by boundary scan alone."""
-        return _operations(_mask_of(library.tarvik_get_bsdl_operations, bytes_of(device), number_of(output)))
+        return _operations(ask_mask(library.tarvik_get_bsdl_operations, bytes_of(device), number_of(output)))
 
     def get_device_operation_options(self, device: str, operation: str, mode: int) -> Tuple[str, ...]:
         """The names of the options that an operation of the device has in the mode, in byte order. The operation is
         a key name, as properties spell it."""
-        return _texts_of(
+        return ask_texts(
             library.tarvik_get_device_operation_options, bytes_of(device), bytes_of(operation), number_of(mode)
         )
 
@@ -381,21 +316,21 @@ class Manager:
 
     def get_device_string_properties(self, device: str, key: str) -> Tuple[str, ...]:
         """All values of a property of the device, or of its family, in byte order; empty if there are none."""
-        return _texts_of(library.tarvik_get_device_string_properties, bytes_of(device), bytes_of(key))
+        return ask_texts(library.tarvik_get_device_string_properties, bytes_of(device), bytes_of(key))
 
     def get_device_string_property(self, device: str, key: str) -> Optional[str]:
         """The value of a property; if there are several, the smallest in byte order. If there is none, raises
         `DataNotFoundException`, or returns None while exceptions are off."""
-        return _text_of(library.tarvik_get_device_string_property, bytes_of(device), bytes_of(key))
+        return ask_text(library.tarvik_get_device_string_property, bytes_of(device), bytes_of(key))
 
     def get_device_bool_property(self, device: str, key: str) -> bool:
         """Is "TRUE" among the values of a property? False if there is no such property."""
-        return _flag_of(library.tarvik_get_device_bool_property, bytes_of(device), bytes_of(key))
+        return ask_flag(library.tarvik_get_device_bool_property, bytes_of(device), bytes_of(key))
 
     def get_device_long_property(self, device: str, key: str) -> int:
         """The value of a property as a decimal number; 0 for a text that is no number. If there is none, raises
         `DataNotFoundException`, or returns -1 while exceptions are off."""
-        return _number_of(library.tarvik_get_device_long_property, bytes_of(device), bytes_of(key))
+        return ask_number(library.tarvik_get_device_long_property, bytes_of(device), bytes_of(key))
 
     # ---- Families
 
@@ -405,15 +340,15 @@ class Manager:
         >>> manager.get_part_family("KS50")
         'kestrel'
         """
-        return _text_of(library.tarvik_get_part_family, bytes_of(device)) or ""
+        return ask_text(library.tarvik_get_part_family, bytes_of(device)) or ""
 
     def add_cached_device_family(self, device: str, family: str) -> None:
         """Sets the family of a device, unless the family that was resolved last is itself cached as a device."""
-        _call(library.tarvik_add_cached_device_family, bytes_of(device), bytes_of(family))
+        call(library.tarvik_add_cached_device_family, bytes_of(device), bytes_of(family))
 
     def is_korvel_device(self, device: str) -> bool:
         """Is the device known?"""
-        return _flag_of(library.tarvik_is_korvel_device, bytes_of(device))
+        return ask_flag(library.tarvik_is_korvel_device, bytes_of(device))
 
     def get_all_device_idcodes(self) -> Dict[str, str]:
         """The IDCODE of each device, both as the database spells them, in byte order of the devices.
@@ -421,33 +356,26 @@ class Manager:
         >>> manager.get_all_device_idcodes()["KS50"]
         '0xX4104FB7'
         """
-        idcodes: Dict[str, str] = {}
-        with lock:
-            _check(library.tarvik_get_all_device_idcodes(_COLLECTION))
-            at = Position()
-            reference = ctypes.byref(at)
-            while (device := library.tarvik_text_map_next(_collection, reference, _TEXT)) is not None:
-                idcodes[text_of(device)] = text_of(_text.value)
-        return idcodes
+        return ask_map(library.tarvik_get_all_device_idcodes)
 
     # ---- SPI flash
 
     def is_spi_device(self, device: str) -> bool:
         """Is the name an SPI flash or an SPI flash family, in any case?"""
-        return _flag_of(library.tarvik_is_spi_device, bytes_of(device))
+        return ask_flag(library.tarvik_is_spi_device, bytes_of(device))
 
     # `property` is the builtin: the argument has another name than in C.
     def get_spi_device_string_property(self, device: str, key: str) -> str:
         """A property of an SPI flash, or of its class; empty if there is none. Case does not matter."""
-        return _text_of(library.tarvik_get_spi_device_string_property, bytes_of(device), bytes_of(key)) or ""
+        return ask_text(library.tarvik_get_spi_device_string_property, bytes_of(device), bytes_of(key)) or ""
 
     def get_spi_device_bool_property(self, device: str, key: str) -> bool:
         """Is a property of an SPI flash "true", in any case? False if there is none."""
-        return _flag_of(library.tarvik_get_spi_device_bool_property, bytes_of(device), bytes_of(key))
+        return ask_flag(library.tarvik_get_spi_device_bool_property, bytes_of(device), bytes_of(key))
 
     def get_spi_device_long_property(self, device: str, key: str) -> int:
         """A property of an SPI flash as a decimal number; 0 if there is none."""
-        return _number_of(library.tarvik_get_spi_device_long_property, bytes_of(device), bytes_of(key))
+        return ask_number(library.tarvik_get_spi_device_long_property, bytes_of(device), bytes_of(key))
 
     # ---- Multiboot
 
@@ -460,7 +388,7 @@ class Manager:
             width: "SERIAL", "PARALLEL" or "NONE"
             lead: True for the lead device of the chain, False for a device further down
         """
-        return _flag_of(
+        return ask_flag(
             library.tarvik_is_mb_bpi_spi_support, bytes_of(device), bytes_of(type_prefix), bytes_of(width), bool(lead)
         )
 
@@ -484,7 +412,7 @@ class Manager:
 
     def dump_mb_bpi_spi(self) -> None:
         """Issues messages with the devices of each multiboot type."""
-        _call(library.tarvik_dump_mb_bpi_spi)
+        call(library.tarvik_dump_mb_bpi_spi)
 
 
 def _operation(value: int) -> Optional[Operation]:
@@ -493,6 +421,6 @@ def _operation(value: int) -> Optional[Operation]:
 
 def _dump(function: Any, as_messages: bool) -> str:
     if as_messages:
-        _call(function, None)
+        call(function, None)
         return ""
-    return _text_of(function) or ""
+    return ask_text(function) or ""

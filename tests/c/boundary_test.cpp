@@ -18,6 +18,7 @@
 namespace {
 
 using testing::ElementsAre;
+using testing::HasSubstr;
 using testing::StartsWith;
 using testing::StrEq;
 
@@ -184,6 +185,16 @@ TEST_F(Boundary, AFailureShowsItsException) {
     // A success leaves it.
     ASSERT_EQ(tarvik_get_device_string_property("FN10", "PINS", &value), TARVIK_OK);
     EXPECT_EQ(tarvik_last_error()->line, 437);
+}
+
+TEST_F(Boundary, AFailureNamesTheRecordThatItIsAbout) {
+    const tarvik_memory_file files[] = {{"base.acd", "DEVICE_SUPPORTED = swift\n", 25},
+                                        {"swift.acd", "OPERATION = PROGRAM\n[SW10]\n", 27}};
+    ASSERT_EQ(tarvik_set_memory_files(files, 2), TARVIK_OK);
+    std::uint32_t operations = 5;
+    EXPECT_EQ(tarvik_get_device_operations("SW10", 0, 2, &operations), TARVIK_DATA_MISMATCH);
+    EXPECT_EQ(operations, 5U);
+    EXPECT_THAT(tarvik_last_error()->text, HasSubstr("swift.acd:1:"));
 }
 
 TEST_F(Boundary, WithExceptionsOffAFaultGivesANeutralValue) {

@@ -1,4 +1,4 @@
-// Loads and unloads the library over and over, as an application with plug-ins does.
+// Loads and unloads the libraries over and over, as an application with plug-ins does.
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -13,8 +13,8 @@
 
 namespace {
 
-bool loadAndUnload() {
-    void* const library = dlopen(TARVIK_MANAGER_LIBRARY, RTLD_NOW | RTLD_LOCAL);
+bool loadAndUnload(const char* file) {
+    void* const library = dlopen(file, RTLD_NOW | RTLD_LOCAL);
     return library != nullptr && dlclose(library) == 0;
 }
 
@@ -24,25 +24,30 @@ std::ptrdiff_t mappings() {
     return std::count(std::istreambuf_iterator<char>(maps), std::istreambuf_iterator<char>(), '\n');
 }
 
-TEST(Unloading, AThousandTimesLeavesNothingBehind) {
+class LibraryUnloading : public testing::TestWithParam<const char*> {};
+
+TEST_P(LibraryUnloading, AThousandTimesLeavesNothingBehind) {
     // The first rounds fill what the loader and the allocator keep for good.
     for (int round = 0; round < 10; ++round) {
-        ASSERT_TRUE(loadAndUnload()) << dlerror();
+        ASSERT_TRUE(loadAndUnload(GetParam())) << dlerror();
     }
     const std::ptrdiff_t mappingsBefore = mappings();
     const std::size_t allocatedBefore = mallinfo2().uordblks;
     for (int round = 0; round < 1000; ++round) {
-        ASSERT_TRUE(loadAndUnload()) << dlerror();
+        ASSERT_TRUE(loadAndUnload(GetParam())) << dlerror();
     }
     // Sanitizers map something for themselves now and then, far less often than once a round.
     EXPECT_LT(mappings(), mappingsBefore + 100);
     EXPECT_LE(mallinfo2().uordblks, allocatedBefore + 4096);
 }
 
-TEST(Unloading, TakesTheLibraryOutOfTheProcess) {
-    ASSERT_TRUE(loadAndUnload()) << dlerror();
-    EXPECT_EQ(dlopen(TARVIK_MANAGER_LIBRARY, RTLD_NOW | RTLD_NOLOAD), nullptr);
+TEST_P(LibraryUnloading, TakesTheLibraryOutOfTheProcess) {
+    ASSERT_TRUE(loadAndUnload(GetParam())) << dlerror();
+    EXPECT_EQ(dlopen(GetParam(), RTLD_NOW | RTLD_NOLOAD), nullptr);
 }
+
+INSTANTIATE_TEST_SUITE_P(Manager, LibraryUnloading, testing::Values(TARVIK_MANAGER_LIBRARY));
+INSTANTIATE_TEST_SUITE_P(CInterface, LibraryUnloading, testing::Values(TARVIK_C_LIBRARY));
 
 /// Loads a plug-in, asks it for the vendor of KS50 in a database that says so, and unloads it.
 std::string vendorInPlugin(const std::string& vendor) {
