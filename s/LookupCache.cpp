@@ -18,11 +18,12 @@ const CachedLookup* LookupCache::find(std::string_view device) const noexcept {
     }
     const std::size_t hash = hashOf(device);
     const std::size_t last = m_slots.size() - 1;
-    for (std::size_t place = hash & last; m_slots[place].hash != FREE; place = (place + 1) & last) {
-        const Slot& slot = m_slots[place];
-        if (slot.hash == hash && view(slot.device) == device) {
-            return &slot.lookup;
+    const Slot* const slots = m_slots.data();
+    for (const Slot* slot = slots + (hash & last); slot->hash != FREE;) {
+        if (slot->hash == hash && view(slot->device) == device) {
+            return &slot->lookup;
         }
+        slot = slot == slots + last ? slots : slot + 1;
     }
     return nullptr;
 }
@@ -31,7 +32,7 @@ void LookupCache::add(const StringBase& device, CachedLookup lookup, std::size_t
     if (m_size >= limit) {
         clear();
     }
-    if (4 * (m_size + 1) > 3 * m_slots.size()) {
+    if (2 * (m_size + 1) > m_slots.size()) {
         grow();
     }
     const std::size_t hash = hashOf(view(device));
