@@ -2,31 +2,9 @@
 
 #include "StringViews.h"
 
-#include <functional>
 #include <utility>
 
 // The table of look-ups that were made before.
-
-std::size_t LookupCache::hashOf(std::string_view device) noexcept {
-    const std::size_t hash = std::hash<std::string_view>()(device);
-    return hash == FREE ? 1 : hash;
-}
-
-const CachedLookup* LookupCache::find(std::string_view device) const noexcept {
-    if (m_size == 0) {
-        return nullptr;
-    }
-    const std::size_t hash = hashOf(device);
-    const std::size_t last = m_slots.size() - 1;
-    const Slot* const slots = m_slots.data();
-    for (const Slot* slot = slots + (hash & last); slot->hash != FREE;) {
-        if (slot->hash == hash && view(slot->device) == device) {
-            return &slot->lookup;
-        }
-        slot = slot == slots + last ? slots : slot + 1;
-    }
-    return nullptr;
-}
 
 void LookupCache::add(const StringBase& device, CachedLookup lookup, std::size_t limit) {
     if (m_size >= limit) {
