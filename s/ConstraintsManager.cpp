@@ -48,16 +48,16 @@ bool ConstraintsManager::checkConstraints(const char* device, MODE_TYPE mode, OP
 }
 
 int ConstraintsManager::getDeviceOperations(const char* device, MODE_TYPE mode, OUTPUT_TYPE output) {
-    return m_implementation->getDeviceOperations(view(device), mode, output);
+    return m_implementation->getDeviceOperations(device, mode, output);
 }
 
 int ConstraintsManager::getProgramOptions(const char* device, MODE_TYPE mode, OUTPUT_TYPE output,
                                           const char* package) {
-    return m_implementation->getProgramOptions(view(device), mode, output, view(package));
+    return m_implementation->getProgramOptions(device, mode, output, view(package));
 }
 
 int ConstraintsManager::getBsdlOperations(const char* device, OUTPUT_TYPE output) {
-    return m_implementation->getBsdlOperations(view(device), output);
+    return m_implementation->getBsdlOperations(device, output);
 }
 
 const ConstraintsManager::TextSet&

@@ -38,10 +38,10 @@ public:
     bool checkConstraints(std::string_view device, MODE_TYPE mode, OP_TYPE operation);
 
     // What a device offers.
-    int getDeviceOperations(std::string_view device, MODE_TYPE mode, OUTPUT_TYPE output);
-    int getProgramOptions(std::string_view device, MODE_TYPE mode, OUTPUT_TYPE output,
+    int getDeviceOperations(const char* deviceName, MODE_TYPE mode, OUTPUT_TYPE output);
+    int getProgramOptions(const char* deviceName, MODE_TYPE mode, OUTPUT_TYPE output,
                           std::string_view package);
-    int getBsdlOperations(std::string_view device, OUTPUT_TYPE output);
+    int getBsdlOperations(const char* deviceName, OUTPUT_TYPE output);
     const TextSet& getDeviceOperationOptions(std::string_view device, std::string_view operation,
                                              MODE_TYPE mode);
 

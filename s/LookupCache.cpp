@@ -2,36 +2,15 @@
 
 #include "StringViews.h"
 
-#include <functional>
 #include <utility>
 
 // The table of look-ups that were made before.
-
-std::size_t LookupCache::hashOf(std::string_view device) noexcept {
-    const std::size_t hash = std::hash<std::string_view>()(device);
-    return hash == FREE ? 1 : hash;
-}
-
-const CachedLookup* LookupCache::find(std::string_view device) const noexcept {
-    if (m_size == 0) {
-        return nullptr;
-    }
-    const std::size_t hash = hashOf(device);
-    const std::size_t last = m_slots.size() - 1;
-    for (std::size_t place = hash & last; m_slots[place].hash != FREE; place = (place + 1) & last) {
-        const Slot& slot = m_slots[place];
-        if (slot.hash == hash && view(slot.device) == device) {
-            return &slot.lookup;
-        }
-    }
-    return nullptr;
-}
 
 void LookupCache::add(const StringBase& device, CachedLookup lookup, std::size_t limit) {
     if (m_size >= limit) {
         clear();
     }
-    if (4 * (m_size + 1) > 3 * m_slots.size()) {
+    if (2 * (m_size + 1) > m_slots.size()) {
         grow();
     }
     const std::size_t hash = hashOf(view(device));

@@ -1,8 +1,9 @@
 #pragma once
 
-#include <StringBase.h>
+#include "StringViews.h"
 
 #include <cstddef>
+#include <functional>
 #include <string_view>
 #include <vector>
 
@@ -17,7 +18,21 @@ struct CachedLookup {
 class LookupCache {
 public:
     /// @return the look-up of a device, valid until the next change; null when there is none
-    [[nodiscard]] const CachedLookup* find(std::string_view device) const noexcept;
+    [[nodiscard]] const CachedLookup* find(std::string_view device) const noexcept {
+        if (m_size == 0) {
+            return nullptr;
+        }
+        const std::size_t hash = hashOf(device);
+        const Slot* const slots = m_slots.data();
+        const std::size_t last = m_slots.size() - 1;
+        for (const Slot* slot = slots + (hash & last); slot->hash != FREE;) {
+            if (slot->hash == hash && view(slot->device) == device) {
+                return &slot->lookup;
+            }
+            slot = slot == slots + last ? slots : slot + 1;
+        }
+        return nullptr;
+    }
 
     /// Adds the look-up of a device that has none yet.
     /// @param limit how many look-ups there may be; when there are as many, all of them are dropped first
@@ -36,10 +51,13 @@ private:
     };
     static constexpr std::size_t FREE = 0;
 
-    [[nodiscard]] static std::size_t hashOf(std::string_view device) noexcept;
+    [[nodiscard]] static std::size_t hashOf(std::string_view device) noexcept {
+        const std::size_t hash = std::hash<std::string_view>()(device);
+        return hash == FREE ? 1 : hash;
+    }
     static Slot& slotFor(std::vector<Slot>& slots, std::size_t hash) noexcept;
     void grow();
 
-    std::vector<Slot> m_slots; ///< a power of two of them, of which a quarter is free at least; or none
+    std::vector<Slot> m_slots; ///< a power of two of them, of which at least half are free; or none
     std::size_t m_size = 0;
 };

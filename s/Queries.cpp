@@ -70,8 +70,9 @@ void ConstraintsManager::Implementation::cacheOptionLookup(const StringBase& dev
     }
 }
 
-int ConstraintsManager::Implementation::getDeviceOperations(std::string_view device, MODE_TYPE mode,
+int ConstraintsManager::Implementation::getDeviceOperations(const char* deviceName, MODE_TYPE mode,
                                                             OUTPUT_TYPE output) {
+    const std::string_view device = view(deviceName);
     // Modes and outputs without a cell give 0 silently, after the look-up, which may raise.
     const auto answer = [&](std::size_t block) {
         return static_cast<int>(
@@ -94,8 +95,9 @@ int ConstraintsManager::Implementation::getDeviceOperations(std::string_view dev
     return answer(block);
 }
 
-int ConstraintsManager::Implementation::getProgramOptions(std::string_view device, MODE_TYPE mode,
+int ConstraintsManager::Implementation::getProgramOptions(const char* deviceName, MODE_TYPE mode,
                                                           OUTPUT_TYPE output, std::string_view package) {
+    const std::string_view device = view(deviceName);
     const auto isOutOfRange = [&] {
         return diagnostics::rejectOutOfRange(mode, tableDimensions::MODES, diagnostics::MODE_OUT_OF_RANGE) ||
                diagnostics::rejectOutOfRange(output, tableDimensions::OUTPUTS, OUTPUT_OUT_OF_RANGE);
@@ -159,7 +161,8 @@ std::string_view ConstraintsManager::Implementation::loadedOptionOwner(StringBas
     return view(name);
 }
 
-int ConstraintsManager::Implementation::getBsdlOperations(std::string_view device, OUTPUT_TYPE output) {
+int ConstraintsManager::Implementation::getBsdlOperations(const char* deviceName, OUTPUT_TYPE output) {
+    const std::string_view device = view(deviceName);
     const auto answer = [&](std::size_t block) {
         // Negative outputs pass this test, have no cell and give 0 silently.
         if (static_cast<int>(output) >= tableDimensions::OUTPUTS) {
