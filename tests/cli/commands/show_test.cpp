@@ -125,9 +125,10 @@ TEST(Show, LongListsOfValuesAreBroken) {
     const DatabaseDirectory directory(
         {{"base.acd", "DEVICE_SUPPORTED = finch\n"},
          {"finch.acd", "[FN10]\nPROPERTIES = LONG,4,AAAAAAAAAA,BBBBBBBBBB,CCCCCCCCCC,DDDDDDDDDD\n"}});
-    EXPECT_THAT(runTool({"--database", directory.path(), "show", "FN10"}).output,
-                testing::ContainsRegex("LONG      AAAAAAAAAA, BBBBBBBBBB,  device  .*:2:14\n"
-                                       "            CCCCCCCCCC, DDDDDDDDDD\n"));
+    EXPECT_THAT(
+        runTool({{"--database", directory.path(), "show", "FN10"}, {}, {{"COLUMNS", "80"}}, {}, 0}).output,
+        testing::ContainsRegex("LONG      AAAAAAAAAA, BBBBBBBBBB,  device  .*:2:14\n"
+                               "            CCCCCCCCCC, DDDDDDDDDD\n"));
 }
 
 TEST(Show, LaterEntryOfANameIsTheOneShown) {

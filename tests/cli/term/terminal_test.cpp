@@ -163,10 +163,10 @@ TEST(Terminals, RowsThatDoNotFitGoOnBelow) {
 }
 
 TEST(Terminals, NothingIsWrappedInAPipe) {
-    EXPECT_GT(longestLine(runTool({{"lint", "--explain", "T105"}, {}, {}, {}, 0}).output), 120U);
+    EXPECT_GT(longestLine(runTool({"lint", "--explain", "T105"}).output), 120U);
     EXPECT_LE(longestLine(runTool({{"lint", "--explain", "T105"}, {}, {{"COLUMNS", "80"}}, {}, 0}).output),
               80U);
-    EXPECT_LE(longestLine(runTool({{"help", "lint"}, {}, {}, {}, 0}).output), 80U);
+    EXPECT_LE(longestLine(runTool(std::vector<std::string>{"help", "lint"}).output), 80U);
 }
 
 TEST(Terminals, TheEnvironmentMayNameTheWidth) {
