@@ -14,6 +14,11 @@
 /// It may contain any byte, NUL included; nothing is ever interpreted as a character encoding. Case is that
 /// of ASCII alone: bytes over 127 have none. A null text is treated as the empty text everywhere.
 class __attribute__((visibility("default"))) StringBase {
+    /// Takes part if `Text` is a text, but not a `StringBase`.
+    template <typename Text>
+    using IfOther = std::enable_if_t<std::is_convertible_v<const Text&, std::string_view> &&
+                                     !std::is_base_of_v<StringBase, Text>>;
+
 public:
     /// What `GetIndexOfFirstChar` answers for an absent character: all bits set.
     static constexpr std::size_t NOT_FOUND = static_cast<std::size_t>(-1);
@@ -122,61 +127,50 @@ public:
     [[nodiscard]] static std::uint32_t CRC32(const char* bytes, std::size_t length,
                                              std::uint32_t former = 0) noexcept;
 
+    // Comparisons with every kind of text: byte order as unsigned bytes, the shorter first on a tie; a null text is the
+    // empty text. Friends, so that comparisons without a StringBase never consider them.
+    friend bool operator==(const StringBase& left, const StringBase& right) noexcept {
+        return left.m_text == right.m_text;
+    }
+    friend bool operator!=(const StringBase& left, const StringBase& right) noexcept {
+        return !(left == right);
+    }
+    friend bool operator<(const StringBase& left, const StringBase& right) noexcept {
+        return left.m_text < right.m_text;
+    }
+    template <typename Text, typename = IfOther<Text>>
+    friend bool operator==(const StringBase& left, const Text& right) noexcept {
+        return left.m_text == view(right);
+    }
+    template <typename Text, typename = IfOther<Text>>
+    friend bool operator==(const Text& left, const StringBase& right) noexcept {
+        return view(left) == right.m_text;
+    }
+    template <typename Text, typename = IfOther<Text>>
+    friend bool operator!=(const StringBase& left, const Text& right) noexcept {
+        return left.m_text != view(right);
+    }
+    template <typename Text, typename = IfOther<Text>>
+    friend bool operator!=(const Text& left, const StringBase& right) noexcept {
+        return view(left) != right.m_text;
+    }
+    template <typename Text, typename = IfOther<Text>>
+    friend bool operator<(const StringBase& left, const Text& right) noexcept {
+        return left.m_text < view(right);
+    }
+    template <typename Text, typename = IfOther<Text>>
+    friend bool operator<(const Text& left, const StringBase& right) noexcept {
+        return view(left) < right.m_text;
+    }
+
 private:
+    static std::string_view view(const char* text) noexcept {
+        return text == nullptr ? std::string_view() : std::string_view(text);
+    }
+    static std::string_view view(std::string_view text) noexcept { return text; }
+
     std::string m_text;
 };
-
-/// Comparisons of a text with any kind of text, in byte order as unsigned bytes, the shorter first on a tie. A
-/// null text is the empty text.
-namespace StringBaseComparison {
-
-[[nodiscard]] inline std::string_view view(const char* text) noexcept {
-    return text == nullptr ? std::string_view() : std::string_view(text);
-}
-[[nodiscard]] inline std::string_view view(std::string_view text) noexcept { return text; }
-
-/// Takes part if `Text` is a text, but not a `StringBase`.
-template <typename Text>
-using IfOther = std::enable_if_t<std::is_convertible_v<const Text&, std::string_view> &&
-                                 !std::is_base_of_v<StringBase, Text>>;
-
-} // namespace StringBaseComparison
-
-// clang-format off
-[[nodiscard]] inline bool operator==(const StringBase& left, const StringBase& right) noexcept {
-    return std::string_view(left) == std::string_view(right);
-}
-[[nodiscard]] inline bool operator!=(const StringBase& left, const StringBase& right) noexcept {
-    return !(left == right);
-}
-[[nodiscard]] inline bool operator<(const StringBase& left, const StringBase& right) noexcept {
-    return std::string_view(left) < std::string_view(right);
-}
-template <typename Text, typename = StringBaseComparison::IfOther<Text>>
-[[nodiscard]] bool operator==(const StringBase& left, const Text& right) noexcept {
-    return std::string_view(left) == StringBaseComparison::view(right);
-}
-template <typename Text, typename = StringBaseComparison::IfOther<Text>>
-[[nodiscard]] bool operator==(const Text& left, const StringBase& right) noexcept {
-    return right == left;
-}
-template <typename Text, typename = StringBaseComparison::IfOther<Text>>
-[[nodiscard]] bool operator!=(const StringBase& left, const Text& right) noexcept {
-    return !(left == right);
-}
-template <typename Text, typename = StringBaseComparison::IfOther<Text>>
-[[nodiscard]] bool operator!=(const Text& left, const StringBase& right) noexcept {
-    return !(right == left);
-}
-template <typename Text, typename = StringBaseComparison::IfOther<Text>>
-[[nodiscard]] bool operator<(const StringBase& left, const Text& right) noexcept {
-    return std::string_view(left) < StringBaseComparison::view(right);
-}
-template <typename Text, typename = StringBaseComparison::IfOther<Text>>
-[[nodiscard]] bool operator<(const Text& left, const StringBase& right) noexcept {
-    return StringBaseComparison::view(left) < std::string_view(right);
-}
-// clang-format on
 
 /// Writes the bytes of a text. Include <ostream> to use it.
 /// @param stream of bytes

@@ -100,6 +100,15 @@ struct ArgumentWriter {
 
 } // namespace
 
+Call withoutHeldTexts(Call call) {
+    for (Argument& argument : call.arguments) {
+        if (std::holds_alternative<HeldText>(argument)) {
+            argument = std::string();
+        }
+    }
+    return call;
+}
+
 std::ostream& operator<<(std::ostream& out, const Call& call) {
     out << "{Method::" << signatures().at(static_cast<std::size_t>(call.method)).name << ", {";
     for (std::size_t number = 0; number < call.arguments.size(); ++number) {

@@ -104,6 +104,9 @@ struct Call {
     std::vector<Argument> arguments;
 };
 
+/// The call with the empty text in place of each text that the manager returned: for callers that hold no results.
+[[nodiscard]] Call withoutHeldTexts(Call call);
+
 using Files = std::map<std::string, std::string>;
 
 /// Databases, and what is asked about them. Prints as a test that can be pasted into a file of tests.

@@ -32,7 +32,7 @@ const char* nameOf(AcdLines::Kind kind) {
     return "fault";
 }
 
-const char* nameOf(AcdLines::Fault fault) {
+const char* nameOf(AcdLines::ParseError fault) {
     const char* const names[] = {"none",       "no equals sign", "empty key",         "blank in key",
                                  "NUL byte",   "line too long",  "continued at end",  "unclosed header",
                                  "empty name", "blank in name",  "text behind header"};

@@ -24,7 +24,7 @@ TEST(AcdLines, GiveHeadersAssignmentsAppendsAndFaultsInOrder) {
     EXPECT_EQ(lines.lines()[1].name, "KS50");
     EXPECT_EQ(lines.lines()[2].kind, Kind::APPEND);
     EXPECT_EQ(lines.lines()[2].value, "2");
-    EXPECT_EQ(lines.lines()[3].error, AcdLines::Fault::NO_EQUALS_SIGN);
+    EXPECT_EQ(lines.lines()[3].error, AcdLines::ParseError::NO_EQUALS_SIGN);
     EXPECT_EQ(lines.lines()[3].line, 4U);
     EXPECT_EQ(lines.lines()[3].text, "no '=' in 'no sense'");
 }
@@ -121,7 +121,7 @@ TEST(AcdLines, OfTheDatabaseComeByFamily) {
 }
 
 TEST(AcdLines, TellWhatIsWrongWithALine) {
-    using Fault = AcdLines::Fault;
+    using Fault = AcdLines::ParseError;
     using namespace std::string_literals;
     const std::pair<std::string, Fault> faults[] = {{"no sense"s, Fault::NO_EQUALS_SIGN},
                                                     {" = 1"s, Fault::EMPTY_KEY},
@@ -144,7 +144,7 @@ TEST(AcdLines, TellWhatIsWrongWithALine) {
 TEST(AcdLines, TellOfALineThatIsTooLong) {
     const AcdLines lines("A = " + std::string(std::size_t{16} << 20, 'x') + "\nB = 1\n");
     ASSERT_EQ(lines.lines().size(), 2U);
-    EXPECT_EQ(lines.lines()[0].error, AcdLines::Fault::LINE_TOO_LONG);
+    EXPECT_EQ(lines.lines()[0].error, AcdLines::ParseError::LINE_TOO_LONG);
     EXPECT_EQ(lines.lines()[1].name, "B");
 }
 

@@ -146,9 +146,9 @@ def same(meant, engine):
         return f"expected {expected}\nfound    {found}"
     if "place" in meant and meant["place"] != (engine["line"], engine["column"]):
         return f"expected at {meant['place']}, found at {engine['line']}:{engine['column']}"
-    fragments = engine["fragments"]
+    spans = engine["spans"]
     for offset, place in enumerate(meant.get("value_places", [])):
-        fragment = [candidate for candidate in fragments if candidate[0] <= offset][-1]
+        fragment = [candidate for candidate in spans if candidate[0] <= offset][-1]
         if place != (fragment[1], fragment[2] + offset - fragment[0]):
             return f"byte {offset} of the value expected at {place}, found in {fragment}"
     return None
