@@ -269,7 +269,8 @@ TEST(Diff, TakesLayersWithColonsBetween) {
 }
 
 TEST(Diff, TellsTheSameInJson) {
-    const ProcessResult outcome = diff(database(), changed("kestrel.acd", "BYPASS,USB2", "HIGHZ,USB2"), {"--json"});
+    const ProcessResult outcome =
+        diff(database(), changed("kestrel.acd", "BYPASS,USB2", "HIGHZ,USB2"), {"--json"});
     EXPECT_EQ(outcome.status, 1);
     const nlohmann::json answer = nlohmann::json::parse(outcome.output);
     EXPECT_EQ(answer.at("version"), 1);
@@ -370,7 +371,8 @@ TEST(Diff, RefusesAnUnknownFormat) { EXPECT_EQ(diff(database(), database(), {"--
 
 TEST(Diff, EndsWithTwoWhenADatabaseCantBeRead) {
     const DatabaseDirectory readable(database());
-    const ProcessResult outcome = runTool(std::vector<std::string>{"diff", readable.path(), "/nowhere/at/all"});
+    const ProcessResult outcome =
+        runTool(std::vector<std::string>{"diff", readable.path(), "/nowhere/at/all"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error, HasSubstr("/nowhere/at/all"));
     EXPECT_EQ(runTool(std::vector<std::string>{"diff", readable.path(), ":"}).status, 2);

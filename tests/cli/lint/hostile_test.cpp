@@ -49,9 +49,9 @@ TEST(LintOnHostileDatabases, EndsOnNonsense) {
     HostileTexts random(2);
     for (int i = 0; i < 10; ++i) {
         const ProcessResult outcome = lint(Files{{"base.acd", random.next(200)},
-                                           {"spi.acd", random.next(200)},
-                                           {"a.acd", random.next(200)},
-                                           {"b.acd", random.noise(500)}});
+                                                 {"spi.acd", random.next(200)},
+                                                 {"a.acd", random.next(200)},
+                                                 {"b.acd", random.noise(500)}});
         EXPECT_LE(outcome.status, 1) << outcome.error;
     }
 }
