@@ -70,7 +70,7 @@ std::string unexpected(const CommandLine& line, const DeclaredCommand* command, 
     }
     return command == nullptr
                ? fmt::format("unknown command \"{}\"{}", word, didYouMean(word, line.commandNames()))
-               : fmt::format("\"{}\" is one argument too many", word);
+               : fmt::format("unexpected argument \"{}\"", word);
 }
 
 /// What is wrong with the command line, and which help to read.

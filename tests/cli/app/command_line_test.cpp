@@ -89,7 +89,7 @@ TEST(CommandLine, UnknownOptionIsAFaultWithASuggestion) {
 TEST(CommandLine, TooManyArgumentsAreAFault) {
     const ProcessResult outcome = runTool({"show", "FN10", "FN20"});
     EXPECT_EQ(outcome.status, 2);
-    EXPECT_EQ(outcome.error, "tarvik: \"FN20\" is one argument too many\nsee: tarvik show --help\n");
+    EXPECT_EQ(outcome.error, "tarvik: unexpected argument \"FN20\"\nsee: tarvik show --help\n");
 }
 
 TEST(CommandLine, FaultsAreToldInJsonToo) {
