@@ -46,8 +46,8 @@ void requireChoice(const Argument& argument, const std::string& text) {
     if (argument.kind == ValueKind::CHOICE &&
         std::find(choices.begin(), choices.end(), text) == choices.end()) {
         throw CommandError(ExitCode::FAULT,
-                           fmt::format("unknown {} \"{}\"{}\naccepted: {}", lowerCase(argument.valueName()),
-                                       text, didYouMean(text, choices), fmt::join(choices, ", ")));
+                           fmt::format("{} cannot be \"{}\"{}\naccepted: {}", argument.name, text,
+                                       didYouMean(text, choices), fmt::join(choices, ", ")));
     }
 }
 
