@@ -65,7 +65,7 @@ std::string section(const char* title, const ArgumentList& arguments, bool optio
     return text.empty() ? text : fmt::format("\n{}:\n{}", title, text);
 }
 
-/// The words that stand for a kind of value in every database; none for the other kinds.
+/// The words of a kind of value, the same in every database; none for the other kinds.
 const std::vector<std::string>& wordsOf(ValueKind kind) {
     static const std::vector<std::string> none;
     switch (kind) {

@@ -40,7 +40,7 @@ void declare(CLI::App& parser, const Argument& argument) {
     }
 }
 
-/// Refuses a text that is none of an argument's choices.
+/// Refuses a text that is not among an argument's choices.
 void requireChoice(const Argument& argument, const std::string& text) {
     const std::vector<std::string>& choices = argument.choices;
     if (argument.kind == ValueKind::CHOICE &&

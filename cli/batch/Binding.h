@@ -181,7 +181,7 @@ constexpr Call call(std::string_view name, Signature<Result, Types...>, Names...
             }};
 }
 
-/// The row of a method, or of a function on the manager that stands for one: its name and the names of its parameters.
+/// The row of a method, or of a function on the manager that replaces one: its name and the names of its parameters.
 template <auto Method, typename... Names>
 constexpr Call call(std::string_view name, Names... names) {
     return call<Method>(name, decltype(signature(Method))(), names...);

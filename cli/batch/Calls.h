@@ -16,7 +16,7 @@ struct PreparedCall {
 };
 
 /// Finds the method, and of overloads the one, that takes the arguments of a request. Words among the arguments are
-/// replaced by the numbers that they stand for. The request must outlive the call.
+/// replaced by their numbers. The request must outlive the call.
 [[nodiscard]] PreparedCall prepare(Request& request);
 
 /// Whether this call removes the manager, so that no other may follow.

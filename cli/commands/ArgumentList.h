@@ -5,7 +5,7 @@
 #include <variant>
 #include <vector>
 
-/// What the text of an argument stands for. The help names it, and completion offers its values.
+/// What the text of an argument means. The help names it, and completion offers its values.
 enum class ValueKind {
     TEXT,
     PATH, ///< a file or a directory: the shell completes it
@@ -38,7 +38,7 @@ struct Argument {
     ValueKind kind = ValueKind::TEXT;
     std::vector<std::string> choices{}; ///< texts to show and to complete; a CHOICE accepts no other
     bool required = false;
-    bool isCommaSeparated = false; ///< a text stands for several, separated by commas
+    bool isCommaSeparated = false; ///< a text may hold several values, separated by commas
     Target target{};
 
     [[nodiscard]] bool isOption() const { return name.starts_with('-'); }

@@ -59,7 +59,7 @@ struct Written {
 std::string asText(const Written& written, const Terminal& /*any*/) { return written.snapshot; }
 Json asJson(const Written& /*written*/) { return {}; }
 
-/// What begins a text that is no snapshot, but says why there is none.
+/// The start of a text that gives the reason why there is no snapshot.
 constexpr char FAULT = '!';
 
 std::string snapshotOrFault(Tool& tool, const std::string& database) {

@@ -7,7 +7,7 @@
 
 #include <fmt/format.h>
 
-/// The names that a mask of the manager stands for: the answer of `operations`, `options` and `bsdl`.
+/// The names of the members of a mask: the answer of `operations`, `options` and `bsdl`.
 struct MaskMembers {
     std::string device;
     Json asked; ///< the arguments, as the JSON object shows them

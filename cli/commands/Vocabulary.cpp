@@ -1,4 +1,4 @@
-// `vocabulary`: the modes, outputs, operations and options with all texts that stand for them.
+// `vocabulary`: the modes, outputs, operations and options with all their spellings.
 #include "commands/Commands.h"
 
 #include "model/Vocabulary.h"

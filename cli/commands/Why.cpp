@@ -142,7 +142,7 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
             answer.explanation.steps.push_back(std::move(step));
         }
     }
-    tool.messages().forgetBehind(issued);
+    tool.messages().truncate(issued);
     const ExitCode result = tool.answer(answer, status(asked.verdict));
     if (!isKnown) {
         tool.note(catalogue::unknownDevice(question.device).what());

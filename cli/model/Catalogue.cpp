@@ -1,4 +1,4 @@
-// Names and origins from the host layer's database, for lists, suggestions, and to say where a value stands.
+// Names and origins from the host layer's database, for lists, suggestions, and the locations of values.
 #include "model/Catalogue.h"
 
 #include "model/RecordSplitter.h"

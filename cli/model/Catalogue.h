@@ -10,7 +10,7 @@
 #include <string_view>
 #include <vector>
 
-/// What the manager can't tell: which names the database holds, and where a value of theirs stands.
+/// What the manager does not offer: the names in the database, and the locations of their values.
 namespace catalogue {
 
 /// Where a text of the database begins.
@@ -29,7 +29,7 @@ struct Origin {
 
 [[nodiscard]] Origin originOf(const AcdStore::SourceSpan& place);
 
-/// A text of a layer below that another one on top stands for.
+/// A text of a lower layer that a text of an upper layer replaces.
 struct Shadow {
     Origin origin;
     std::string text;
@@ -37,14 +37,14 @@ struct Shadow {
 
 using Shadows = std::vector<Shadow>;
 
-/// The whole values that a value stands for, the upper ones first.
+/// The whole values that a value replaces, the upper ones first.
 [[nodiscard]] Shadows shadowsOf(const AcdStore::Value& value);
 [[nodiscard]] Json asJson(const Shadows& shadows);
 
 /// One entry of a list "name,...:name,...".
 struct Entry {
     Origin origin;
-    bool ofDevice; ///< false: it stands among the family's own keys
+    bool ofDevice; ///< false: it is among the family's own keys
     std::string text;
     Shadows shadows; ///< entries of this name in layers below, the upper ones first
 };

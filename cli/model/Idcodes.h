@@ -34,7 +34,7 @@ public:
             }
             found = m_idcodes.find(*other->second);
         }
-        return Idcode{plain(found->first), plain(found->second)};
+        return Idcode{toStdString(found->first), toStdString(found->second)};
     }
 
 private:

@@ -32,7 +32,6 @@ public:
 
     /// Drops all but the first `count`.
     void truncate(std::size_t count) { m_messages.resize(count); }
-    void forgetBehind(std::size_t count) { truncate(count); }
 
 private:
     Port_MsgManData::Sink m_previous;

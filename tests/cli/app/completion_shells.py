@@ -40,7 +40,7 @@ LINES = [
     ("tarvik lint some-f@", ["lint", "some-folder"]),
 ]
 
-# In place of the tool: completes as it does, and tells how it was run otherwise.
+# In place of the tool: completes as it does, and otherwise prints how it was run.
 WRAPPER = """#!/bin/sh
 if [ "$1" = complete ]; then exec "{tool}" "$@"; fi
 printf 'ran:'; printf ' <%s>' "$@"; printf '\\n'
@@ -87,7 +87,7 @@ def check(name, folder, completions):
     for line, words in LINES:
         shell.type(line.replace("@", "\t") + "\n")
         (ran,) = shell.wait_for(r"ran: ([^\r\n]*)")
-        # Some shells take the slash behind a folder back.
+        # Some shells remove the slash after a folder again.
         ran = ran.replace("/>", ">")
         expected = " ".join(f"<{word}>" for word in words)
         assert ran == expected, f"{name}: {line} ran {ran}"

@@ -20,7 +20,7 @@ json asked(std::vector<std::string> arguments, const std::string& database) {
     return json::parse(runTool(arguments).output);
 }
 
-// The origins tell: every file must be there, with every line where it stood.
+// The origins show that every file is there, with each line at its place.
 TEST(Demonstration, IsTheDatabaseFolder) {
     const json devices = asked({"devices"}, "");
     EXPECT_GT(devices["devices"].size(), 50U);

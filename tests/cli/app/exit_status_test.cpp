@@ -15,7 +15,7 @@ using Words = std::vector<std::string>;
 
 const std::string GOOD = TARVIK_SOURCE_DIRECTORY "/database";
 
-/// Command lines by what they end with. Where there is none of a kind the list is empty.
+/// Command lines by their exit status. A list is empty if no command line has that status.
 struct Endings {
     std::string command;
     std::vector<Words> yes;

@@ -14,7 +14,7 @@ import sys
 import tempfile
 from pathlib import Path
 
-# Commands whose examples show what stands in the way, or what differs.
+# Commands whose examples show an obstacle or a difference.
 MAY_ANSWER_NO = {"why", "diff"}
 
 

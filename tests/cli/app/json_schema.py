@@ -2,7 +2,7 @@
 
     json_schema.py TARVIK SCHEMA DOCUMENT DATABASE BAD_DATABASES
 
-DOCUMENT shows an example of each command, which is held against the real answer.
+DOCUMENT shows an example of each command, which is compared with the real answer.
 """
 
 import json

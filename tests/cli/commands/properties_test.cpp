@@ -1,4 +1,4 @@
-// The commands that tell values: property, and spi with a device.
+// The commands that print values: property, and spi with a device.
 #include "cli/support/SmallDatabase.h"
 
 #include <gmock/gmock.h>

@@ -87,7 +87,7 @@ TEST(Which, ListsTheDevicesThatAllowAnOperation) {
         database.run({"which", "--operation", "ERASE", "--mode", "SPI", "--output", "USB2"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.error, IsEmpty());
-    // In SPI mode it is the flash behind the device that counts.
+    // In SPI mode the answer is about the flash that is connected to the device.
     EXPECT_EQ(outcome.output, "DEVICE  FAMILY\n"
                               "FN10    finch\n"
                               "FN20    finch\n"

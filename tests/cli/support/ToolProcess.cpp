@@ -117,7 +117,7 @@ int waitFor(pid_t process) {
 void drain(int& descriptor, std::string& text) {
     std::array<char, 65536> bytes{};
     ssize_t count = ::read(descriptor, bytes.data(), bytes.size());
-    // That is how a terminal says that nobody writes to it any more.
+    // A terminal reports in this way that its last writer is gone.
     count = count < 0 && errno == EIO ? 0 : check(static_cast<int>(count));
     text.append(bytes.data(), static_cast<std::size_t>(count));
     if (count == 0) {
@@ -125,7 +125,7 @@ void drain(int& descriptor, std::string& text) {
     }
 }
 
-/// Writes some of the text; closes the descriptor at its end, or when nobody reads it any more.
+/// Writes some of the text; closes the descriptor at its end, or when it has no reader any more.
 void feed(int& descriptor, std::string_view& text) {
     const ssize_t count = ::write(descriptor, text.data(), std::min<std::size_t>(text.size(), 4096));
     text.remove_prefix(count < 0 ? 0 : static_cast<std::size_t>(count));

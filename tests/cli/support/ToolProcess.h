@@ -18,7 +18,7 @@ struct ProcessOptions {
     unsigned short terminalColumns = 0;
 };
 
-/// What a run of the tool left behind.
+/// The result of a run of the tool.
 struct ProcessResult {
     int status; ///< the exit status; 128 and more: ended by a signal
     std::string output;

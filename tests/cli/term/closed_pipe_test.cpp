@@ -1,4 +1,4 @@
-// Readers that leave before the end, as `head` does: the tool says nothing of it, and does not crash.
+// Readers that leave before the end, as `head` does: the tool prints no error and does not crash.
 #include "cli/support/DatabaseDirectory.h"
 
 #include <gmock/gmock.h>
@@ -24,7 +24,7 @@ std::string shell(const std::string& command) {
     return text;
 }
 
-/// What is heard of the tool when nobody reads more than the first line: standard error and the exit status.
+/// Standard error and the exit status of the tool when only the first line of its output is read.
 std::string heard(const std::string& database, const std::string& arguments) {
     return shell("unset TARVIK_DATABASE; { \"" TARVIK_TOOL "\" --database \"" + database + "\" " + arguments +
                  " 2>&3 | head -n 1 >/dev/null; echo ${PIPESTATUS[0]}; } 3>&1");

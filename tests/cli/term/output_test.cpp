@@ -1,4 +1,4 @@
-// Where answers go, when there is nobody to take them, or no room.
+// Standard output without a reader, or on a full disk.
 #include "cli/support/SmallDatabase.h"
 
 #include <gmock/gmock.h>
@@ -27,7 +27,7 @@ TEST(Output, ReaderThatLeavesEndsABatchQuietly) {
     EXPECT_THAT(batch.readLine(), HasSubstr("\"id\":1"));
     batch.closeOutput();
     batch.write("{\"id\": 2, \"call\": \"getOperationOrders\"}\n");
-    // It ends although its input goes on.
+    // It ends although its input is still open.
     EXPECT_EQ(batch.wait(), 0);
 }
 
