@@ -59,7 +59,7 @@ void Output::flush() {
     }
     if (errno != EPIPE) {
         throw CommandError(ExitCode::FAULT,
-                           std::string("cannot write to standard output: ") + std::strerror(errno));
+                           std::string("can't write to standard output: ") + std::strerror(errno));
     }
     m_closed = true;
 }

@@ -324,7 +324,7 @@ private:
             if (hasCells && !options.modes.empty() && position(vocabulary::options(), text) &&
                 (options.of(text) & reached).none()) {
                 report(OPTION_WITHOUT_RECORD, value, "PROGRAM_OPTION has no record for {} in the mode of {}",
-                       quoted(text), quoted(name));
+                       lint::quoted(text), lint::quoted(name));
             }
         }
     }

@@ -18,8 +18,9 @@ std::string request(const std::string& call, const std::string& arguments) {
     return line + '\n';
 }
 
-json result(const std::string& call, const std::string& arguments) {
-    return answerTo(request(call, arguments)).at("result");
+json result(const std::string& call, const std::string& arguments,
+            const SmallDatabase& database = SmallDatabase()) {
+    return answerTo(request(call, arguments), database).at("result");
 }
 
 std::string error(const std::string& call, const std::string& arguments) {
@@ -278,8 +279,8 @@ TEST(BatchCalls, HelpListsEveryCallWithItsArguments) {
 
 TEST(BatchCalls, ShowAndWhyAnswerAsTheCommands) {
     const SmallDatabase database;
-    EXPECT_EQ(result("show", R"({"device": "FN10"})"), database.json({"show", "FN10"}));
-    EXPECT_EQ(result("why", R"({"device": "FN10", "mode": "slave serial", "package": "P48"})"),
+    EXPECT_EQ(result("show", R"({"device": "FN10"})", database), database.json({"show", "FN10"}));
+    EXPECT_EQ(result("why", R"({"device": "FN10", "mode": "slave serial", "package": "P48"})", database),
               database.json({"why", "FN10", "--mode", "SS", "--package", "P48"}));
     EXPECT_EQ(error("show", R"({"device": "FN11"})"),
               "the database has no device \"FN11\"; did you mean \"FN10\"?");

@@ -81,8 +81,8 @@ TEST(Families, DevicesAreCountedAndModesNamed) {
     EXPECT_EQ(outcome.status, 0);
     EXPECT_EQ(outcome.error, "");
     EXPECT_EQ(outcome.output, "FAMILY  DEVICES  MODES\n"
-                              "finch   2        BS SS SPI PFF\n"
-                              "spi     3        SPI PFF\n");
+                              "finch   2        BS SS SPI\n"
+                              "spi     3        SPI\n");
 }
 
 TEST(Families, SameInJson) {

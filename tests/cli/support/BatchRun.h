@@ -2,9 +2,9 @@
 
 #include "SmallDatabase.h"
 
-/// The answers of one batch on the small database, line by line.
-inline std::vector<nlohmann::json> batch(const std::string& input) {
-    const SmallDatabase database;
+/// The answers of one batch on a small database, line by line.
+inline std::vector<nlohmann::json> batch(const std::string& input,
+                                         const SmallDatabase& database = SmallDatabase()) {
     ProcessOptions start = database.start({"batch"});
     start.input = input;
     const ProcessResult outcome = runTool(start);
@@ -21,4 +21,6 @@ inline std::vector<nlohmann::json> batch(const std::string& input) {
 }
 
 /// The one answer to the last of these requests.
-inline nlohmann::json answerTo(const std::string& requests) { return batch(requests).back(); }
+inline nlohmann::json answerTo(const std::string& requests, const SmallDatabase& database = SmallDatabase()) {
+    return batch(requests, database).back();
+}
