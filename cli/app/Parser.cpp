@@ -46,8 +46,8 @@ void requireChoice(const Argument& argument, const std::string& text) {
     if (argument.kind == ValueKind::CHOICE &&
         std::find(choices.begin(), choices.end(), text) == choices.end()) {
         throw CommandError(ExitCode::FAULT,
-                           fmt::format("unknown {} \"{}\"{}\naccepted: {}", lowerCase(argument.valueName()),
-                                       text, didYouMean(text, choices), fmt::join(choices, ", ")));
+                           fmt::format("{} cannot be \"{}\"{}\naccepted: {}", argument.name, text,
+                                       didYouMean(text, choices), fmt::join(choices, ", ")));
     }
 }
 
@@ -70,7 +70,7 @@ std::string unexpected(const CommandLine& line, const DeclaredCommand* command, 
     }
     return command == nullptr
                ? fmt::format("unknown command \"{}\"{}", word, didYouMean(word, line.commandNames()))
-               : fmt::format("\"{}\" is one argument too many", word);
+               : fmt::format("unexpected argument \"{}\"", word);
 }
 
 /// What is wrong with the command line, and which help to read.

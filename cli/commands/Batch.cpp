@@ -86,7 +86,7 @@ ExitCode run(Tool& tool) {
 const Command command::BATCH{
     "batch",
     "Answer JSON requests for the whole interface, line by line",
-    "Reads one JSON object a line and writes one a line. The call \"help\" lists all calls with their "
+    "Reads one JSON object per line and writes one per line. The call \"help\" lists all calls with their "
     "arguments.",
     R"(echo '{"id": 1, "call": "getPartFamily", "args": ["KS50"]}' | tarvik batch)"
     "\n"

@@ -99,7 +99,7 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     }
     if (devices.all.empty()) {
         throw CommandError(ExitCode::NO, arguments.glob.empty()
-                                             ? "there is no such device"
+                                             ? "the database has no devices"
                                              : fmt::format("no device matches \"{}\"{}", arguments.glob,
                                                            didYouMean(arguments.glob, catalogue::names())));
     }
@@ -115,7 +115,7 @@ Action declare(ArgumentList& list) {
          .kind = ValueKind::FAMILY,
          .target = &arguments->family},
         {.name = "--names",
-         .description = "Show only the names, one a line",
+         .description = "Show only the names, one per line",
          .target = &arguments->namesOnly},
         {.name = "GLOB",
          .description = "List only the devices whose name matches, in any case; *, ? and [...] are wildcards",

@@ -96,7 +96,7 @@ Json asJson(const Matches& matches) {
 
 CommandError usage() {
     return {ExitCode::FAULT,
-            "give --operation with --mode and --output as you like, or --property KEY=VALUE, or both"
+            "which takes --operation, with or without --mode and --output, or --property KEY=VALUE, or both"
             "\nsee: tarvik which --help"};
 }
 
@@ -199,7 +199,7 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
                               matches.faults.size(), matches.faults.front()));
     }
     if (matches.devices.empty()) {
-        tool.note("there is no such device");
+        tool.note("no device matches");
     }
     return status;
 }

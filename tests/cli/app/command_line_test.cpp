@@ -63,10 +63,10 @@ TEST(CommandLine, UnknownChoicesAreFaultsThatSayWhatIsAccepted) {
     const ProcessResult outcome = runTool({"dump", "operation"});
     EXPECT_EQ(outcome.status, 2);
     EXPECT_THAT(outcome.error,
-                StartsWith("tarvik: unknown table \"operation\"; did you mean \"operations\"?\n"
+                StartsWith("tarvik: TABLE cannot be \"operation\"; did you mean \"operations\"?\n"
                            "accepted: "));
     EXPECT_THAT(runTool({"families", "--color", "red"}).error,
-                StartsWith("tarvik: unknown when \"red\"\naccepted: auto, always, never\n"));
+                StartsWith("tarvik: --color cannot be \"red\"\naccepted: auto, always, never\n"));
 }
 
 TEST(CommandLine, UnknownCommandIsAFaultWithASuggestion) {
@@ -89,7 +89,7 @@ TEST(CommandLine, UnknownOptionIsAFaultWithASuggestion) {
 TEST(CommandLine, TooManyArgumentsAreAFault) {
     const ProcessResult outcome = runTool({"show", "FN10", "FN20"});
     EXPECT_EQ(outcome.status, 2);
-    EXPECT_EQ(outcome.error, "tarvik: \"FN20\" is one argument too many\nsee: tarvik show --help\n");
+    EXPECT_EQ(outcome.error, "tarvik: unexpected argument \"FN20\"\nsee: tarvik show --help\n");
 }
 
 TEST(CommandLine, FaultsAreToldInJsonToo) {

@@ -105,7 +105,7 @@ TEST(Which, SaysWhenThereIsNone) {
     const ProcessResult outcome = SmallDatabase().run({"which", "--property", "CORE=9"});
     EXPECT_EQ(outcome.status, 1);
     EXPECT_THAT(outcome.output, IsEmpty());
-    EXPECT_EQ(outcome.error, "tarvik: there is no such device\n");
+    EXPECT_EQ(outcome.error, "tarvik: no device matches\n");
 }
 
 TEST(Which, AnswersInJson) {
