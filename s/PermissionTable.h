@@ -3,7 +3,7 @@
 // The permission table: which rows (operations, options) are allowed in which mode through which output, in a
 // block for each family or package.
 
-#include <cassert>
+#include <algorithm>
 #include <cstddef>
 #include <cstdint>
 #include <vector>
@@ -24,12 +24,10 @@ public:
     /// A table without a block: every answer is no.
     PermissionTable() = default;
 
-    /// @param rows at most 32, as many as a mask has bits
+    /// @param rows 32 at most, as many as a mask has bits; those after them are outside the table
     PermissionTable(std::size_t blocks, int rows, int modes, int outputs)
-        : m_blocks(blocks), m_rows(rows), m_modes(modes), m_outputs(outputs),
-          m_masks(blocks * static_cast<std::size_t>(modes) * static_cast<std::size_t>(outputs)) {
-        assert(rows <= MAX_ROWS);
-    }
+        : m_blocks(blocks), m_rows(std::min(rows, MAX_ROWS)), m_modes(modes), m_outputs(outputs),
+          m_masks(blocks * static_cast<std::size_t>(modes) * static_cast<std::size_t>(outputs)) {}
 
     void allow(std::size_t block, int row, int mode, int output) {
         if (isCell(block, mode, output) && isRow(row)) {

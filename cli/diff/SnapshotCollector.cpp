@@ -83,7 +83,7 @@ private:
         }
         for (const std::string& fault : {details.operations->fault, details.options->fault, details.fault}) {
             if (!fault.empty()) {
-                answers[value(FAULTS)].insert(fault);
+                answers[value(FAULTS)].insert(withoutPlace(fault));
             }
         }
         return answers;

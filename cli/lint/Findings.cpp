@@ -90,7 +90,7 @@ std::vector<Finding> sorted(std::vector<Finding> findings, const Model& model) {
     return findings;
 }
 
-std::string quoted(std::string_view text) {
+std::string inQuotes(std::string_view text) {
     constexpr std::size_t MAX_LENGTH = 60;
     return text.size() <= MAX_LENGTH ? fmt::format("\"{}\"", text)
                                      : fmt::format("\"{}...\"", text.substr(0, MAX_LENGTH));

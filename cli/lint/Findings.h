@@ -49,7 +49,7 @@ private:
 [[nodiscard]] std::vector<Finding> sorted(std::vector<Finding> findings, const Model& model);
 
 /// The text between quotation marks, shortened when it is long.
-[[nodiscard]] std::string quoted(std::string_view text);
+[[nodiscard]] std::string inQuotes(std::string_view text);
 
 /// For each finding, in their order, a text that identifies it across versions of a database: it does not depend
 /// on line numbers. 16 hexadecimal digits.

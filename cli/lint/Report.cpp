@@ -26,7 +26,10 @@ std::size_t width(std::string_view text) {
 
 /// The line of the file, or of a long line the part around the finding, and a caret below it.
 std::string excerpt(const Finding& finding, const Terminal& terminal) {
-    const std::size_t room = std::max(terminal.width(), EXCERPT_MARGIN + MIN_EXCERPT) - EXCERPT_MARGIN;
+    // A line of a database may have megabytes, so the unlimited lines of a file or a pipe get a short excerpt, too.
+    const std::size_t columns =
+        terminal.isTerminal() ? terminal.width() : std::min(terminal.width(), LINE_WIDTH);
+    const std::size_t room = std::max(columns, EXCERPT_MARGIN + MIN_EXCERPT) - EXCERPT_MARGIN;
     const std::string_view line = finding.location.file->source(finding.location.line);
     const std::size_t at = std::min<std::size_t>(finding.location.column - 1, line.size());
     std::size_t begin = line.size() <= room ? 0 : at - std::min(at, room / 2);

@@ -106,7 +106,7 @@ private:
             const Token code = token(std::min(rest.find_first_of(BLANKS), rest.size()));
             rest.remove_prefix(code.text.size());
             if (!isCode(code.text)) {
-                findings.add(UNREADABLE_COMMENT, code, "there is no code {}", quoted(code.text));
+                findings.add(UNREADABLE_COMMENT, code, "there is no code {}", inQuotes(code.text));
             } else {
                 m_suppressions[comment.line].push_back({code});
             }

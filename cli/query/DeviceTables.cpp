@@ -136,3 +136,7 @@ std::string outputLetters() {
 std::string faultText(const std::exception& fault) {
     return fmt::format("the database cannot be read: {}", fault.what());
 }
+
+std::string withoutPlace(const std::string& faultText) {
+    return faultText.substr(0, faultText.find("; last read: "));
+}

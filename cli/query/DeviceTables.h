@@ -58,3 +58,6 @@ namespace tables {
 
 /// How an exception of the manager reads.
 [[nodiscard]] std::string faultText(const std::exception& fault);
+
+/// The part of a `faultText` that is the same in all copies of a database: without what was read last, and where.
+[[nodiscard]] std::string withoutPlace(const std::string& faultText);

@@ -1,5 +1,7 @@
 #include "Members.h"
 
+#include "database/Store.h"
+
 #include <Port_MsgManData.h>
 
 #include <stdexcept>
@@ -40,7 +42,9 @@ TEST(PartFamily, OfALookUpThatRaisesIsEmpty) {
     directory.makeDirectory("unreadable.acd");
     FamilySession session;
     session.members().m_partFamily = "former";
-    // The scan for devices reports what it can't read.
+    // The scan for devices reports what it can't read. It is still to come, so the start-up's databases have to be
+    // forgotten.
+    acd::Store::resetForTesting();
     AcdStore::setSearchPath({directory.path()});
     Port_MsgManData::setSink([](const Port_MsgManData::Message&) { throw std::runtime_error("no room"); });
     EXPECT_THROW(static_cast<void>(session->getPartFamily("KS50")), std::runtime_error);

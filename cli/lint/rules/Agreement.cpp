@@ -251,7 +251,7 @@ private:
     }
 
     [[nodiscard]] std::string owner(const Section& section) const {
-        return quoted(&section == &m_family.own ? std::string_view(m_family.name) : section.name.text);
+        return inQuotes(&section == &m_family.own ? std::string_view(m_family.name) : section.name.text);
     }
 
     /// Has a mode records for this family? In SPI mode only spi has.
@@ -271,7 +271,7 @@ private:
             if (m_family.kind != schema::File::BASE && m_modes[*mode] &&
                 !m_modes[*mode]->contains(m_family.name)) {
                 report(OFFERED_OUT_OF_MODE, value, "{} of base.acd does not list the family {}", value.text,
-                       quoted(m_family.name));
+                       inQuotes(m_family.name));
             } else if (hasRecords(*mode) && !operations.modes.empty() && !operations.of(name).test(*mode)) {
                 report(PROPERTY_WITHOUT_RECORD, value, "OPERATION of {} has no record for {} in mode {}",
                        owner(section), name, value.text);
@@ -314,7 +314,7 @@ private:
         const Modes reached = found == offered.end() ? Modes() : found->second & wanted;
         if (reached.none()) {
             report(UNREACHABLE_OPTIONS, values.front(),
-                   "{} is never given: the property {} does not list the mode", quoted(name), operation);
+                   "{} is never given: the property {} does not list the mode", inQuotes(name), operation);
             return;
         }
         // Only modes with cells have options; nothing can be said of Kite and PFF modes.
@@ -324,7 +324,7 @@ private:
             if (hasCells && !options.modes.empty() && position(vocabulary::options(), text) &&
                 (options.of(text) & reached).none()) {
                 report(OPTION_WITHOUT_RECORD, value, "PROGRAM_OPTION has no record for {} in the mode of {}",
-                       lint::quoted(text), lint::quoted(name));
+                       inQuotes(text), inQuotes(name));
             }
         }
     }
@@ -352,7 +352,7 @@ void checkModes(const Model& model, const std::map<std::string_view, Modes>& use
         if (hasModes && base.find(modes[mode]) == nullptr && user != used.end()) {
             findings.add(NO_MODE_KEY, model.base()->start(),
                          "there is no key {}, though family {} uses the mode", modes[mode],
-                         quoted(user->first));
+                         inQuotes(user->first));
         }
         const std::vector<Item>& items = base.items(modes[mode]);
         for (std::size_t i = 1; items.size() > 1 && i < items[1].fields.size(); ++i) {
@@ -361,7 +361,7 @@ void checkModes(const Model& model, const std::map<std::string_view, Modes>& use
             // A family that offers nothing anywhere is not finished yet.
             if (found != used.end() && found->second.any() && !found->second.test(mode)) {
                 findings.add(IDLE_FAMILY, family, "the family {} offers nothing in mode {}",
-                             quoted(family.text), modes[mode]);
+                             inQuotes(family.text), modes[mode]);
             }
         }
     }
@@ -385,7 +385,7 @@ void checkParts(const Model& model, const std::vector<std::optional<std::set<std
         if (!family.empty() && !modes[*mode]->contains(family)) {
             findings.add(PART_OUT_OF_MODE, part,
                          "{} does not list the family {} of {}, so it refuses the part anyway",
-                         vocabulary::modes()[*mode], quoted(family), quoted(name));
+                         vocabulary::modes()[*mode], inQuotes(family), inQuotes(name));
         }
     }
 }

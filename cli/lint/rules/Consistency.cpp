@@ -159,9 +159,9 @@ std::set<std::size_t> checkRareNames(const Domain& domain, Findings& findings) {
         if (const auto meant = rare.find(use.name->text); meant != rare.end()) {
             found.insert(use.section);
             findings.add(RARE_NAME, *use.name, "{} is used {}, {} in {} {}; did you mean {}?",
-                         quoted(use.name->text), sections[use.name->text].size() == 1 ? "once" : "twice",
-                         quoted(meant->second), sections[meant->second].size(), domain.owners,
-                         quoted(meant->second));
+                         inQuotes(use.name->text), sections[use.name->text].size() == 1 ? "once" : "twice",
+                         inQuotes(meant->second), sections[meant->second].size(), domain.owners,
+                         inQuotes(meant->second));
         }
     }
     return found;
@@ -204,7 +204,7 @@ void checkValues(const Domain& domain, Findings& findings) {
             if (good >= 4 && !others.empty() && good * 5 >= (good + others.size() - 1) * 4) {
                 for (const Token* value : others) {
                     findings.add(UNUSUAL_VALUE, *value, "{} is not {}, as {} is in {} of {} {}",
-                                 quoted(value->text), kind.text, name, good, good + others.size(),
+                                 inQuotes(value->text), kind.text, name, good, good + others.size(),
                                  domain.owners);
                 }
             }
@@ -237,7 +237,7 @@ void checkMissing(const std::vector<Sibling>& siblings, const std::set<std::stri
         for (const Sibling& sibling : siblings) {
             if (sibling.value != nullptr && !sibling.isReported && !sibling.names.contains(name)) {
                 findings.add(MISSING_PROPERTY, sibling.value->key, "{} is missing here; {} of {} {} have it",
-                             quoted(name), count, siblings.size(), owners);
+                             inQuotes(name), count, siblings.size(), owners);
             }
         }
     }
@@ -346,7 +346,7 @@ void checkPackages(const Model& model, Findings& findings) {
                 if (rank(spelling) < rank(*common) && spelling.second.size() <= MAX_RARE) {
                     findings.add(CONFUSABLE_PACKAGE, *use,
                                  "{} looks like {}, which is listed {}; did you mean that?",
-                                 quoted(spelling.first), quoted(common->first),
+                                 inQuotes(spelling.first), inQuotes(common->first),
                                  common->second.size() == 1 ? std::string("once")
                                                             : fmt::format("{} times", common->second.size()));
                 }
@@ -397,7 +397,7 @@ void checkLetters(const AcdLines& file, unsigned line, Findings& findings) {
         const bool isMark = line == 1 && begin == 0 && word.starts_with("\ufeff");
         if (const std::string what = confusableIn(isMark ? word.substr(3) : word); !what.empty()) {
             findings.add(CONFUSABLE_LETTER, {word, {&file, line, static_cast<unsigned>(begin + 1)}},
-                         "{} contains {}", quoted(word), what);
+                         "{} contains {}", inQuotes(word), what);
         }
         begin = end + 1;
     }

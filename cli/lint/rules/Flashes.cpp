@@ -109,7 +109,7 @@ bool isFlashFamily(const Model& model, std::string_view name) {
 
 void checkCase(const Token& name, Findings& findings) {
     if (!isUpperCase(name.text)) {
-        findings.add(NAME_NOT_UPPER_CASE, name, "the flash {} is never found", quoted(name.text));
+        findings.add(NAME_NOT_UPPER_CASE, name, "the flash {} is never found", inQuotes(name.text));
     }
 }
 
@@ -122,7 +122,7 @@ void checkFamilies(const Model& model, Findings& findings) {
         }
         checkCase(list.family, findings);
         if (list.devices.empty()) {
-            findings.add(NO_DEVICE_LIST, list.family, "the family {} has no {}_DEVICES", quoted(family),
+            findings.add(NO_DEVICE_LIST, list.family, "the family {} has no {}_DEVICES", inQuotes(family),
                          family);
         }
         for (const Token& flash : list.devices) {
@@ -131,8 +131,8 @@ void checkFamilies(const Model& model, Findings& findings) {
             // Two classes are reported by the rule of classes, twice in one list by the rule of lists.
             if (!isFirst && known->second != family &&
                 !(schema::isFlashClass(known->second) && schema::isFlashClass(family))) {
-                findings.add(IN_SEVERAL_FAMILIES, flash, "{} stands in family {} already", quoted(flash.text),
-                             quoted(known->second));
+                findings.add(IN_SEVERAL_FAMILIES, flash, "{} stands in family {} already",
+                             inQuotes(flash.text), inQuotes(known->second));
             }
         }
     }
@@ -150,12 +150,12 @@ void checkUnclassed(const Model& model, Findings& findings) {
         if (!schema::isFlashClass(list.family.text) && shared != nullptr) {
             findings.add(UNSHARED_PROPERTIES, shared->key,
                          "the flashes of {} do not have these properties: it is no class",
-                         quoted(list.family.text));
+                         inQuotes(list.family.text));
         }
         for (const Token& flash : list.devices) {
             if (!flash.text.empty() && !classed.contains(lowerCase(flash.text)) &&
                 model.spiKeys().find(schema::propertyKey(flash.text)) == nullptr) {
-                findings.add(NO_PROPERTIES, flash, "{} is in no class and has no {}", quoted(flash.text),
+                findings.add(NO_PROPERTIES, flash, "{} is in no class and has no {}", inQuotes(flash.text),
                              schema::propertyKey(flash.text));
             }
         }
@@ -169,7 +169,7 @@ void checkClasses(const Model& model, Findings& findings) {
         const bool isFamily = isFlashFamily(model, name);
         if (properties != nullptr && !isFamily) {
             findings.add(CLASS_WITHOUT_FAMILY, properties->key,
-                         "never read: DEVICE_FAMILY does not list the class {}", quoted(name));
+                         "never read: DEVICE_FAMILY does not list the class {}", inQuotes(name));
         }
         for (const Token& flash : model.spiKeys().list(schema::devicesKey(name))) {
             if (flash.text.empty()) {
@@ -178,12 +178,12 @@ void checkClasses(const Model& model, Findings& findings) {
             // Classes are searched in any case.
             const auto [known, isFirst] = classes.try_emplace(lowerCase(flash.text), name);
             if (!isFirst && known->second != name) {
-                findings.add(IN_SEVERAL_CLASSES, flash, "{} stands in class {} already", quoted(flash.text),
-                             quoted(known->second));
+                findings.add(IN_SEVERAL_CLASSES, flash, "{} stands in class {} already", inQuotes(flash.text),
+                             inQuotes(known->second));
             }
             if (!isFamily && !model.isFlashInAnyCase(std::string(flash.text))) {
                 findings.add(UNKNOWN_IN_CLASS, flash, "no family of DEVICE_FAMILY has the flash {}{}",
-                             quoted(flash.text), findings.didYouMean(flash.text, model.flashNames()));
+                             inQuotes(flash.text), findings.didYouMean(flash.text, model.flashNames()));
             }
         }
     }
@@ -198,7 +198,7 @@ void checkMultiboot(const Model& model, Findings& findings) {
             const std::string name(token.text);
             if (!name.empty() && !model.isFlashInAnyCase(name) && model.deviceInAnyCase(name) == nullptr) {
                 findings.add(UNKNOWN_IN_MULTIBOOT, token, "{} is neither a flash nor a device{}",
-                             quoted(name), findings.didYouMean(name, candidates, listed));
+                             inQuotes(name), findings.didYouMean(name, candidates, listed));
             }
         }
     }
@@ -215,12 +215,12 @@ void checkProperties(const Model& model, Findings& findings) {
             const Token& name = item.fields.front();
             if (!isUpperCase(name.text)) {
                 findings.add(PROPERTY_NOT_UPPER_CASE, name, "the property {} is never found",
-                             quoted(name.text));
+                             inQuotes(name.text));
             }
             const auto [known, isFirst] = joined.try_emplace(std::string(flash).append(name.text), flash);
             if (!isFirst && known->second != flash) {
-                findings.add(SAME_JOINED_NAME, name, "{} with {} is one with a property of {}", quoted(flash),
-                             quoted(name.text), quoted(known->second));
+                findings.add(SAME_JOINED_NAME, name, "{} with {} is one with a property of {}",
+                             inQuotes(flash), inQuotes(name.text), inQuotes(known->second));
             }
         }
     }

@@ -149,18 +149,18 @@ void checkCode(const Token& device, const Token& code, bool counts, IdcodeIndex&
     const std::optional<Pattern> pattern = patternOf(code.text);
     if (!pattern) {
         findings.add(MALFORMED_CODE, code, "{} is not 0x and eight hexadecimal digits or X",
-                     quoted(code.text));
+                     inQuotes(code.text));
         return;
     }
     if ((pattern->mask & 1U) != 0 && (pattern->bits & 1U) == 0) {
-        findings.add(BIT_0_CLEAR, code, "bit 0 of {} is clear", quoted(code.text));
+        findings.add(BIT_0_CLEAR, code, "bit 0 of {} is clear", inQuotes(code.text));
     }
     if (!counts) {
         return;
     }
     if (const Token* const other = codes.find(*pattern); other != nullptr && other->text != device.text) {
-        findings.add(AMBIGUOUS_CODE, code, "the IDCODE of {} matches that of {} too", quoted(device.text),
-                     quoted(other->text));
+        findings.add(AMBIGUOUS_CODE, code, "the IDCODE of {} matches that of {} too", inQuotes(device.text),
+                     inQuotes(other->text));
     }
     codes.add({*pattern, &device});
 }
@@ -172,9 +172,9 @@ void checkDevice(const Model& model, const Token& device, const std::vector<Toke
     }
     if (model.isFamily(device.text) || model.isFlashInAnyCase(std::string(device.text))) {
         findings.add(UNKNOWN_DEVICE, device, "{} is no device of a family, and has no IDCODE",
-                     quoted(device.text));
+                     inQuotes(device.text));
     } else {
-        findings.add(UNKNOWN_DEVICE, device, "unknown device {}{}", quoted(device.text),
+        findings.add(UNKNOWN_DEVICE, device, "unknown device {}{}", inQuotes(device.text),
                      findings.didYouMean(device.text, model.deviceNames(), used));
     }
 }
@@ -199,13 +199,13 @@ void check(const Model& model, Findings& findings) {
         // A layer on top may append another code on purpose.
         const AcdLines*& file = withCode[device.text];
         if (std::exchange(file, device.location.file) == device.location.file) {
-            findings.add(DEVICE_TWICE, device, "the former IDCODE of {} is lost", quoted(device.text));
+            findings.add(DEVICE_TWICE, device, "the former IDCODE of {} is lost", inQuotes(device.text));
         }
         if (fields.size() < 2) {
-            findings.add(MALFORMED_ENTRY, device, "no code behind {}", quoted(device.text));
+            findings.add(MALFORMED_ENTRY, device, "no code behind {}", inQuotes(device.text));
         } else if (fields.size() > 2) {
             findings.add(MALFORMED_ENTRY, fields[2], "{} is never read: entries stand between \":\"",
-                         quoted(fields[2].text));
+                         inQuotes(fields[2].text));
         }
         if (fields.size() > 1 && !fields[1].text.empty()) {
             checkCode(device, fields[1],
@@ -217,7 +217,7 @@ void check(const Model& model, Findings& findings) {
     for (const auto& [name, device] : model.devices()) {
         if (!withCode.contains(name)) {
             findings.add(NO_CODE, device.section->name, "IDCODE of base.acd lacks the device {}",
-                         quoted(name));
+                         inQuotes(name));
         }
     }
 }

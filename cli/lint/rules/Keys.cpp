@@ -64,7 +64,7 @@ void checkDuplicates(const Model& model, Findings& findings) {
                 const auto [known, isFirst] = lines.try_emplace({section, line.name}, line.line);
                 if (!isFirst && line.kind == AcdLines::Kind::ASSIGNMENT) {
                     findings.add(DUPLICATE_KEY, {line.name, {&file, line.line, line.column}},
-                                 "the key {} is set again: what line {} gave is lost", quoted(line.name),
+                                 "the key {} is set again: what line {} gave is lost", inQuotes(line.name),
                                  known->second);
                 }
                 known->second = line.line;
@@ -135,7 +135,7 @@ private:
 
     void add(const AcdLines& file, const AcdLines::Line& line, const std::string& hint) {
         m_findings.add(UNKNOWN_KEY, {line.name, {&file, line.line, line.column}},
-                       "nobody reads the key {} here{}", quoted(line.name), hint);
+                       "nobody reads the key {} here{}", inQuotes(line.name), hint);
     }
 
     schema::File m_kind;
@@ -162,7 +162,7 @@ void checkSections(const Model& model, Findings& findings) {
             if (const Value* const value = device.section->find(key)) {
                 findings.add(IGNORED_OPERATIONS, value->key,
                              "{} of {} is never read: DEVICE_SUPPORTED does not list the device", key,
-                             quoted(name));
+                             inQuotes(name));
             }
         }
         const Value* const options = device.section->find(schema::PROGRAM_OPTION);
@@ -171,7 +171,7 @@ void checkSections(const Model& model, Findings& findings) {
                 LEAKING_OPTIONS, options->key,
                 "the options of {} leak into those of family {}: PROGRAM_OPTION_PACKAGE does not list the "
                 "device",
-                quoted(name), quoted(device.family->name));
+                inQuotes(name), inQuotes(device.family->name));
         }
     }
 }

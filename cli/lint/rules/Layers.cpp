@@ -51,7 +51,7 @@ void checkHidings(std::string_view key, const Value& value, Findings& findings) 
                      areProperties ? "propert" : "name",
                      areProperties ? (hiding.names.size() == 1 ? "y" : "ies")
                                    : (hiding.names.size() == 1 ? "" : "s"),
-                     below.file->path(), below.line, quoted(hiding.names.front().text),
+                     below.file->path(), below.line, inQuotes(hiding.names.front().text),
                      hiding.names.size() == 1 ? "" : " and others");
     }
 }
@@ -63,7 +63,7 @@ void check(const Model& model, Findings& findings) {
                 checkHidings(key, value, findings);
                 for (const Token& text : value.joinedAppends) {
                     findings.add(JOINED_APPEND, text, "{} is joined to the text before it; begin with \"{}\"",
-                                 quoted(text.text), schema::firstListed(family.kind, key) <= 1 ? "," : ":");
+                                 inQuotes(text.text), schema::firstListed(family.kind, key) <= 1 ? "," : ":");
                 }
             }
         });
@@ -73,7 +73,7 @@ void check(const Model& model, Findings& findings) {
                 if (value != nullptr && !value->isAssigned && family.own.find(table.key) != nullptr) {
                     findings.add(APPEND_WITHOUT_VALUE, value->key,
                                  "the section of {} has no {} of its own: this hides the family's",
-                                 quoted(device.name.text), table.key);
+                                 inQuotes(device.name.text), table.key);
                 }
             }
         }

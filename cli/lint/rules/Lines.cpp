@@ -170,7 +170,7 @@ void checkSwallowed(const AcdLines& file, const AcdLines::Line& line, Findings& 
         if (const char* const what = looksLike(text)) {
             findings.add(SWALLOWED_LINE, {text, {&file, span.line, span.column}},
                          "this is no line of its own but part of the value of {}, though it looks like {}",
-                         quoted(line.name), what);
+                         inQuotes(line.name), what);
         }
     }
 }
@@ -204,7 +204,7 @@ void check(const Model& model, Findings& findings) {
             for (const auto& [key, value] : section.values) {
                 for (const Token& text : value.oversizedAppends) {
                     findings.add(VALUE_TOO_LONG, text, "the value of {} would grow over 1 GiB by this",
-                                 quoted(key));
+                                 inQuotes(key));
                 }
             }
         });

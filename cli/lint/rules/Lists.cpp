@@ -90,14 +90,14 @@ void checkTexts(const std::vector<Token>& tokens, Findings& findings) {
                              isLast ? "a separator at the end leaves an empty item behind it" : "empty item");
         } else if (!text.empty() && (isBlank(text.front()) || isBlank(text.back()))) {
             findings.add(BLANK_AROUND_SEPARATOR, token, "the blanks of {} are part of the text",
-                         quoted(text));
+                         inQuotes(text));
         }
         // A "#" at the start of a continuation line is found as such.
         const std::string_view line = token.location.file->source(token.location.line);
         const bool isOnItsLine =
             line.find('#', std::min<std::size_t>(token.location.column - 1, line.size())) != line.npos;
         if (isOnItsLine && hasComment(text)) {
-            findings.add(COMMENT_AFTER_VALUE, token, "the comment is part of the text {}", quoted(text));
+            findings.add(COMMENT_AFTER_VALUE, token, "the comment is part of the text {}", inQuotes(text));
         }
     }
 }
@@ -123,7 +123,7 @@ void checkTwice(const Item& item, std::size_t first, Findings& findings) {
     for (std::size_t i = first; i < item.fields.size(); ++i) {
         const Token& token = item.fields[i];
         if (!token.text.empty() && !seen.insert(token.text).second) {
-            findings.add(DUPLICATE_ITEM, token, "{} is listed twice", quoted(token.text));
+            findings.add(DUPLICATE_ITEM, token, "{} is listed twice", inQuotes(token.text));
         }
     }
 }

@@ -88,7 +88,7 @@ bool contains(const std::vector<std::string>& all, std::string_view text) {
 
 void checkLabel(const Token& label, bool isEntry, Findings& findings) {
     if (isEntry) {
-        findings.add(NO_LABEL, label, "{} stands where the label does, and is skipped", quoted(label.text));
+        findings.add(NO_LABEL, label, "{} stands where the label does, and is skipped", inQuotes(label.text));
     }
 }
 
@@ -97,7 +97,7 @@ void checkOutputs(const std::vector<Token>& outputs, Findings& findings) {
     for (std::size_t i = 1; i < outputs.size(); ++i) {
         const std::string_view text = outputs[i].text;
         if (!text.empty() && !contains(schema::modeOutputs(), text)) {
-            findings.add(UNKNOWN_MODE_OUTPUT, outputs[i], "unknown output {}{}", quoted(text),
+            findings.add(UNKNOWN_MODE_OUTPUT, outputs[i], "unknown output {}{}", inQuotes(text),
                          findings.didYouMean(text, schema::modeOutputs(), outputs));
         }
     }
@@ -112,10 +112,10 @@ void checkFamilies(const Model& model, const std::vector<Token>& families, Findi
         }
         if (const Device* const device = model.device(text)) {
             findings.add(UNKNOWN_MODE_FAMILY, families[i],
-                         "{} is a device; only its family {} can stand here", quoted(text),
-                         quoted(device->family->name));
+                         "{} is a device; only its family {} can stand here", inQuotes(text),
+                         inQuotes(device->family->name));
         } else {
-            findings.add(UNKNOWN_MODE_FAMILY, families[i], "unknown family {}{}", quoted(text),
+            findings.add(UNKNOWN_MODE_FAMILY, families[i], "unknown family {}{}", inQuotes(text),
                          findings.didYouMean(text, model.familyNames(), families));
         }
     }
@@ -145,20 +145,20 @@ void checkPart(const Model& model, const Token& part, Findings& findings) {
     const std::size_t second = first == text.npos ? first : text.find('_', first + 1);
     if (second == text.npos || first == 0 || second == first + 1 || second + 1 == text.size() ||
         text.find('_', second + 1) != text.npos) {
-        findings.add(MALFORMED_PART, part, "{} is not MODE_DEVICE_PACKAGE", quoted(text));
+        findings.add(MALFORMED_PART, part, "{} is not MODE_DEVICE_PACKAGE", inQuotes(text));
         return;
     }
     const std::string_view mode = text.substr(0, first);
     const std::string_view name = text.substr(first + 1, second - first - 1);
     const std::string_view package = text.substr(second + 1);
     if (!contains(vocabulary::modes(), mode)) {
-        findings.add(UNKNOWN_PART_MODE, part, "unknown mode {} in {}{}", quoted(mode), quoted(text),
+        findings.add(UNKNOWN_PART_MODE, part, "unknown mode {} in {}{}", inQuotes(mode), inQuotes(text),
                      findings.didYouMean(mode, vocabulary::modes()));
     }
     if (mode == "SPI") {
         if (name != "spi") {
             findings.add(SPI_PART, part, "never looked up: in SPI mode {} is; did you mean \"SPI_spi_{}\"?",
-                         quoted("spi"), package);
+                         inQuotes("spi"), package);
         }
         return;
     }
@@ -167,7 +167,7 @@ void checkPart(const Model& model, const Token& part, Findings& findings) {
     }
     const Device* const device = model.device(name);
     if (device == nullptr) {
-        findings.add(UNKNOWN_PART_DEVICE, part, "unknown device {} in {}{}", quoted(name), quoted(text),
+        findings.add(UNKNOWN_PART_DEVICE, part, "unknown device {} in {}{}", inQuotes(name), inQuotes(text),
                      findings.didYouMean(name, model.deviceNames()));
         return;
     }
@@ -177,7 +177,7 @@ void checkPart(const Model& model, const Token& part, Findings& findings) {
     }
     // The packages of a device that lists none are unknown.
     if (!packages.empty() && !contains(packages, package)) {
-        findings.add(UNKNOWN_PART_PACKAGE, part, "{} has no package {}{}", quoted(name), quoted(package),
+        findings.add(UNKNOWN_PART_PACKAGE, part, "{} has no package {}{}", inQuotes(name), inQuotes(package),
                      findings.didYouMean(package, packages));
     }
 }

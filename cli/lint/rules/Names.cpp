@@ -90,10 +90,10 @@ order is read.)",
 
 void checkName(std::string_view kind, const Token& name, Findings& findings) {
     if (name.text.find('%') != name.text.npos) {
-        findings.add(PERCENT_IN_NAME, name, "the {} {} holds \"%\"", kind, quoted(name.text));
+        findings.add(PERCENT_IN_NAME, name, "the {} {} holds \"%\"", kind, inQuotes(name.text));
     }
     if (name.text.size() > MAX_NAME) {
-        findings.add(NAME_TOO_LONG, name, "the {} {} has {} bytes; dumps show 15", kind, quoted(name.text),
+        findings.add(NAME_TOO_LONG, name, "the {} {} has {} bytes; dumps show 15", kind, inQuotes(name.text),
                      name.text.size());
     }
 }
@@ -101,7 +101,7 @@ void checkName(std::string_view kind, const Token& name, Findings& findings) {
 void checkSeparators(std::string_view kind, const Token& name, Findings& findings) {
     if (name.text.find_first_of(",:") != name.text.npos) {
         findings.add(SEPARATOR_IN_NAME, name, "no list can hold the name of the {} {}", kind,
-                     quoted(name.text));
+                     inQuotes(name.text));
     }
 }
 
@@ -109,7 +109,8 @@ void checkFamily(const FamilyData& family, Findings& findings) {
     // The file does not contain its name, so the first line stands for it.
     const Token name{family.name, family.start().location};
     if (family.name != lowerCase(family.name)) {
-        findings.add(FAMILY_NOT_LOWER_CASE, name, "the family {} is not in lower case", quoted(family.name));
+        findings.add(FAMILY_NOT_LOWER_CASE, name, "the family {} is not in lower case",
+                     inQuotes(family.name));
     }
     checkName("family", name, findings);
     checkSeparators("family", name, findings);
@@ -122,7 +123,7 @@ void checkReopened(const AcdLines& file, Findings& findings) {
             const auto [known, isFirst] = lines.try_emplace(lowerCase(line.name), line.line);
             if (!isFirst) {
                 findings.add(DEVICE_REOPENED, {line.name, {&file, line.line, line.column}},
-                             "the section of {} is opened in line {} already", quoted(line.name),
+                             "the section of {} is opened in line {} already", inQuotes(line.name),
                              known->second);
             }
         }
@@ -135,27 +136,27 @@ std::string otherOwner(const Model& model, const std::string& name) {
         return "spi.acd has a flash of this name, which comes first";
     }
     return fmt::format("family {} has it already, and comes first",
-                       quoted(model.deviceInAnyCase(name)->family->name));
+                       inQuotes(model.deviceInAnyCase(name)->family->name));
 }
 
 void checkDevice(const Model& model, const FamilyData& family, const Section& section, Findings& findings) {
     const Token& name = section.name;
     if (family.kind != schema::File::FAMILY) {
         findings.add(SECTION_IN_CATALOGUE, name, "the device {} in family {} is never known",
-                     quoted(name.text), quoted(family.name));
+                     inQuotes(name.text), inQuotes(family.name));
         return;
     }
     if (model.isFamilyInAnyCase(std::string(name.text))) {
         findings.add(DEVICE_NAMED_AS_FAMILY, name,
-                     "the device {} is named as a family, which is found in its place", quoted(name.text));
+                     "the device {} is named as a family, which is found in its place", inQuotes(name.text));
     }
     if (const std::size_t cut = name.text.find('_'); cut != name.text.npos) {
         findings.add(UNDERSCORE_IN_DEVICE, name, "the name {} is cut to {} when it is asked for",
-                     quoted(name.text), quoted(name.text.substr(0, cut)));
+                     inQuotes(name.text), inQuotes(name.text.substr(0, cut)));
     }
     const std::string text(name.text);
     if (model.deviceInAnyCase(text)->section != &section || model.isFlashInAnyCase(text)) {
-        findings.add(DEVICE_IN_TWO_FAMILIES, name, "the section of {} is never read: {}", quoted(text),
+        findings.add(DEVICE_IN_TWO_FAMILIES, name, "the section of {} is never read: {}", inQuotes(text),
                      otherOwner(model, text));
     }
     checkName("device", name, findings);
@@ -185,7 +186,7 @@ void check(const Model& model, Findings& findings) {
         for (const std::string& other : file.caseCollisions()) {
             findings.add(SAME_FILE_NAME, startOf(file),
                          "nothing is read from {}: this file is called alike and comes first",
-                         quoted(other.substr(other.rfind('/') + 1)));
+                         inQuotes(other.substr(other.rfind('/') + 1)));
         }
     }
     for (const FamilyData& family : model.families()) {

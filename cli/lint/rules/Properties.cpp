@@ -121,17 +121,17 @@ void checkTwice(const std::vector<Item>& items, Findings& findings) {
         const AcdLines*& file = files[name.text];
         // A layer on top may append another value on purpose.
         if (std::exchange(file, name.location.file) == name.location.file && !name.text.empty()) {
-            findings.add(NAME_TWICE, name, "what {} was given before is lost", quoted(name.text));
+            findings.add(NAME_TWICE, name, "what {} was given before is lost", inQuotes(name.text));
         }
     }
 }
 
 void checkSingle(const Item& item, Findings& findings) {
     if (item.fields.size() < 2) {
-        findings.add(NO_VALUE, item.whole, "no value behind {}", quoted(item.whole.text));
+        findings.add(NO_VALUE, item.whole, "no value behind {}", inQuotes(item.whole.text));
     } else if (item.fields.size() > 2) {
         findings.add(SEVERAL_VALUES, item.fields[2], "{} is never read: {} has one value",
-                     quoted(item.fields[2].text), quoted(item.fields[0].text));
+                     inQuotes(item.fields[2].text), inQuotes(item.fields[0].text));
     }
 }
 
@@ -140,9 +140,9 @@ void checkCounted(const Item& item, Findings& findings) {
     const std::optional<std::size_t> count = fields.size() < 2 ? std::nullopt : number(fields[1].text);
     if (!count) {
         findings.add(NO_COUNT, fields.size() < 2 ? item.whole : fields[1], "no number of values behind {}",
-                     quoted(fields[0].text));
+                     inQuotes(fields[0].text));
     } else if (*count != fields.size() - 2) {
-        findings.add(WRONG_COUNT, fields[1], "{} says {} values and has {}", quoted(fields[0].text), *count,
+        findings.add(WRONG_COUNT, fields[1], "{} says {} values and has {}", inQuotes(fields[0].text), *count,
                      fields.size() - 2);
     }
 }
@@ -176,7 +176,7 @@ void checkMeaning(const Item& item, std::size_t firstValue, Findings& findings) 
     const bool isUpperOption = upper.starts_with(schema::OPTIONS_PREFIX) &&
                                namesOperation(std::string_view(upper).substr(schema::OPTIONS_PREFIX.size()));
     if (isOption ? name.text != upper || !isUpperOption : isUpperOption) {
-        findings.add(UNKNOWN_OPERATION_NAME, name, "{} belongs to no operation{}", quoted(name.text),
+        findings.add(UNKNOWN_OPERATION_NAME, name, "{} belongs to no operation{}", inQuotes(name.text),
                      findings.didYouMean(name.text, optionPropertyNames()));
     }
     if (!isOption && !contains(vocabulary::operations(), name.text)) {
@@ -193,7 +193,7 @@ void checkMeaning(const Item& item, std::size_t firstValue, Findings& findings) 
                                      ? "; did you mean \"BS\"?"
                                      : findings.didYouMean(value.text, known, item.fields);
         findings.add(isOption ? UNKNOWN_OPTION_VALUE : UNKNOWN_MODE_KEY, value, "unknown {} {}{}",
-                     isOption ? "option" : "mode key", quoted(value.text), hint);
+                     isOption ? "option" : "mode key", inQuotes(value.text), hint);
     }
 }
 
@@ -203,7 +203,7 @@ void checkFlags(const Item& item, std::size_t firstValue, Findings& findings) {
         for (const char* const flag : {"TRUE", "FALSE"}) {
             if (sameWithoutCase(value.text, flag) && value.text != flag) {
                 findings.add(FLAG_NOT_UPPER_CASE, value, "{} is not {}: flags are compared with case",
-                             quoted(value.text), flag);
+                             inQuotes(value.text), flag);
             }
         }
     }
@@ -232,8 +232,8 @@ void checkHiddenOptions(const Item& item, const Section& section, const Section&
     }
     const std::string_view forAllModes = name.text.substr(0, cut);
     if (hasValue(section, forAllModes).value_or(hasValue(family, forAllModes).value_or(false))) {
-        findings.add(HIDDEN_OPTIONS, name, "{} is never looked at: there is {}", quoted(name.text),
-                     quoted(forAllModes));
+        findings.add(HIDDEN_OPTIONS, name, "{} is never looked at: there is {}", inQuotes(name.text),
+                     inQuotes(forAllModes));
     }
 }
 
@@ -247,7 +247,8 @@ void checkBothKeys(const Section& section, Findings& findings) {
         // A layer on top may replace a single value by a list on purpose.
         const auto known = files.find(name.text);
         if (!name.text.empty() && known != files.end() && known->second == name.location.file) {
-            findings.add(IN_BOTH_KEYS, name, "{} stands in PROPERTIES too, which counts", quoted(name.text));
+            findings.add(IN_BOTH_KEYS, name, "{} stands in PROPERTIES too, which counts",
+                         inQuotes(name.text));
         }
     }
 }

@@ -92,14 +92,14 @@ void checkSupported(const Model& model, Findings& findings) {
     const std::vector<Token>& listed = model.baseKeys().list(schema::DEVICE_SUPPORTED);
     for (const Token& name : listed) {
         if (!name.text.empty() && !isKnown(model, name.text)) {
-            findings.add(UNKNOWN_SUPPORTED, name, "{} is neither a family nor a device{}", quoted(name.text),
-                         findings.didYouMean(name.text, candidates, listed));
+            findings.add(UNKNOWN_SUPPORTED, name, "{} is neither a family nor a device{}",
+                         inQuotes(name.text), findings.didYouMean(name.text, candidates, listed));
         }
         const Device* const device = model.device(name.text);
         if (device != nullptr && device->section->find(schema::OPERATION) == nullptr &&
             device->section->find(schema::BSDL_OPERATION) == nullptr) {
             findings.add(NO_TABLES, name, "the section of {} has neither OPERATION nor BSDL_OPERATION",
-                         quoted(name.text));
+                         inQuotes(name.text));
         }
     }
 }
@@ -149,18 +149,18 @@ void checkOptionOwners(const Model& model, Findings& findings) {
         case Part::UNKNOWN:
             findings.add(UNKNOWN_OPTION_OWNER, name,
                          "{} is neither a family nor a device, nor a device with a package{}",
-                         quoted(name.text), findings.didYouMean(name.text, candidates, listed));
+                         inQuotes(name.text), findings.didYouMean(name.text, candidates, listed));
             break;
         case Part::OTHER_PACKAGE:
             packages.insert(packages.end(), candidates.begin(), candidates.end());
-            findings.add(UNKNOWN_PACKAGE, name, "no device has the package of {}{}", quoted(name.text),
+            findings.add(UNKNOWN_PACKAGE, name, "no device has the package of {}{}", inQuotes(name.text),
                          findings.didYouMean(name.text, packages, listed));
             break;
         case Part::KNOWN:
             if (model.supported().contains(device)) {
                 findings.add(PACKAGE_OF_SUPPORTED, name,
-                             "the table of {} stays empty: DEVICE_SUPPORTED lists {}", quoted(name.text),
-                             quoted(device));
+                             "the table of {} stays empty: DEVICE_SUPPORTED lists {}", inQuotes(name.text),
+                             inQuotes(device));
             }
             break;
         }
@@ -185,11 +185,11 @@ Token listKey(const Model& model, std::string_view key) {
 void checkTables(const Model& model, const std::string& family, Findings& findings) {
     if (!model.supported().contains(family)) {
         findings.add(UNSUPPORTED_FAMILY, listKey(model, schema::DEVICE_SUPPORTED),
-                     "DEVICE_SUPPORTED lacks the family {}", quoted(family));
+                     "DEVICE_SUPPORTED lacks the family {}", inQuotes(family));
     }
     if (!model.optionPackages().contains(family)) {
         findings.add(NO_OPTION_TABLE, listKey(model, schema::PROGRAM_OPTION_PACKAGE),
-                     "PROGRAM_OPTION_PACKAGE lacks the family {}", quoted(family));
+                     "PROGRAM_OPTION_PACKAGE lacks the family {}", inQuotes(family));
     }
 }
 
@@ -198,7 +198,7 @@ void checkFamilies(const Model& model, Findings& findings) {
         if (!model.supported().contains(family.name) && !model.optionPackages().contains(family.name) &&
             !isUnderAMode(model, family.name)) {
             findings.add(UNLISTED_FAMILY, family.start(), "no list of base.acd names the family {}",
-                         quoted(family.name));
+                         inQuotes(family.name));
         } else {
             checkTables(model, family.name, findings);
         }
@@ -210,7 +210,7 @@ void checkFamilies(const Model& model, Findings& findings) {
     for (const std::string_view name : model.supported()) {
         if (model.device(name) != nullptr && !model.optionPackages().contains(name)) {
             findings.add(NO_OPTION_TABLE, listKey(model, schema::PROGRAM_OPTION_PACKAGE),
-                         "PROGRAM_OPTION_PACKAGE lacks {}, a device of DEVICE_SUPPORTED", quoted(name));
+                         "PROGRAM_OPTION_PACKAGE lacks {}, a device of DEVICE_SUPPORTED", inQuotes(name));
         }
     }
 }

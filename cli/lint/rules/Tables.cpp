@@ -183,7 +183,7 @@ public:
             isInMode = mode && modeTakesFamily(*mode, fields[1]);
         }
         if (fields.size() <= m_table.firstOutput) {
-            m_findings.add(NO_OUTPUT, record.whole, "no output in {}", quoted(record.whole.text));
+            m_findings.add(NO_OUTPUT, record.whole, "no output in {}", inQuotes(record.whole.text));
         }
         for (std::size_t i = m_table.firstOutput; i < fields.size(); ++i) {
             const std::optional<std::size_t> output = readOutput(fields[i]);
@@ -191,8 +191,8 @@ public:
                 checkModeOutput(*mode, fields[i]);
             }
             if (row && mode && output && !m_cells.insert({*row, *mode, *output}).second) {
-                m_findings.add(CELL_TWICE, fields[i], "{} of {} is given already", quoted(fields[i].text),
-                               quoted(record.whole.text));
+                m_findings.add(CELL_TWICE, fields[i], "{} of {} is given already", inQuotes(fields[i].text),
+                               inQuotes(record.whole.text));
             }
         }
     }
@@ -201,7 +201,7 @@ private:
     std::optional<std::size_t> operation(const Token& token) {
         const std::optional<std::size_t> found = position(vocabulary::operations(), token.text, true);
         if (!found && !token.text.empty()) {
-            m_findings.add(UNKNOWN_OPERATION, token, "unknown operation {}{}", quoted(token.text),
+            m_findings.add(UNKNOWN_OPERATION, token, "unknown operation {}{}", inQuotes(token.text),
                            m_findings.didYouMean(token.text, vocabulary::operations()));
         }
         return found;
@@ -211,9 +211,9 @@ private:
         const std::optional<std::size_t> found = position(vocabulary::options(), token.text, false);
         if (found && *found >= schema::tableOptions().size()) {
             m_findings.add(UNREADABLE_OPTION, token, "a database can't give the option {}",
-                           quoted(token.text));
+                           inQuotes(token.text));
         } else if (!found && !token.text.empty()) {
-            m_findings.add(UNKNOWN_OPTION, token, "unknown option {}{}", quoted(token.text),
+            m_findings.add(UNKNOWN_OPTION, token, "unknown option {}{}", inQuotes(token.text),
                            m_findings.didYouMean(token.text, schema::tableOptions()));
         }
         return found;
@@ -227,13 +227,13 @@ private:
             if (sameWithoutCase(text, "BS")) {
                 m_findings.add(ACCIDENTAL_MODE, token,
                                "{} counts as Boundary Scan by accident; did you mean \"Bscan\"?",
-                               quoted(text));
+                               inQuotes(text));
             } else if (!text.empty()) {
                 m_findings.add(UNKNOWN_MODE, token, "unknown mode {}, which counts as Boundary Scan{}",
-                               quoted(text), m_findings.didYouMean(text, schema::tableModes()));
+                               inQuotes(text), m_findings.didYouMean(text, schema::tableModes()));
             }
         } else if (mode > MODE_TYPE::SPI) {
-            m_findings.add(MODE_WITHOUT_CELL, token, "the table has no cells for mode {}", quoted(text));
+            m_findings.add(MODE_WITHOUT_CELL, token, "the table has no cells for mode {}", inQuotes(text));
             return std::nullopt;
         } else if (mode == MODE_TYPE::SPI && m_family.kind == schema::File::FAMILY) {
             m_findings.addText(SPI_MODE_ELSEWHERE, token, "in SPI mode only the tables of spi.acd are asked");
@@ -249,7 +249,7 @@ private:
             families && m_family.kind != schema::File::BASE && !families->contains(m_family.name);
         if (isMissing) {
             m_findings.add(MODE_WITHOUT_FAMILY, token, "{} of base.acd does not list the family {}",
-                           vocabulary::modes()[mode], quoted(m_family.name));
+                           vocabulary::modes()[mode], inQuotes(m_family.name));
         }
         return !isMissing;
     }
@@ -258,7 +258,7 @@ private:
         const auto& outputs = m_modes[mode].outputs;
         if (outputs && !outputs->contains(token.text)) {
             m_findings.add(MODE_WITHOUT_OUTPUT, token, "{} of base.acd does not list the output {}",
-                           vocabulary::modes()[mode], quoted(token.text));
+                           vocabulary::modes()[mode], inQuotes(token.text));
         }
     }
 
@@ -270,11 +270,12 @@ private:
         }
         if (position(schema::modeOutputs(), token.text, false)) {
             m_findings.add(OUTPUT_WITHOUT_CELL, token, "the table has no cells for output {}",
-                           quoted(token.text));
+                           inQuotes(token.text));
         } else if (position(vocabulary::outputs(), token.text, false)) {
-            m_findings.add(UNKNOWN_OUTPUT, token, "a database can't give the output {}", quoted(token.text));
+            m_findings.add(UNKNOWN_OUTPUT, token, "a database can't give the output {}",
+                           inQuotes(token.text));
         } else {
-            m_findings.add(UNKNOWN_OUTPUT, token, "unknown output {}{}", quoted(token.text),
+            m_findings.add(UNKNOWN_OUTPUT, token, "unknown output {}{}", inQuotes(token.text),
                            m_findings.didYouMean(token.text, schema::tableOutputs()));
         }
         return std::nullopt;

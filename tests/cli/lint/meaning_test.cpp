@@ -51,7 +51,7 @@ TEST(LayerRules, OneFindingStandsForAllThatALayerHides) {
                       {"kestrel.acd", "[KS50]\n[KS100]\n[KS150]\n"}};
     const DatabaseDirectory bottom(below);
     const DatabaseDirectory top(Files{{"base.acd", "IDCODE = KS150,0xX410CFB7\n"}});
-    const Outcome outcome = runLint({top.path(), bottom.path()});
+    const ProcessResult outcome = runLint({top.path(), bottom.path()});
     EXPECT_EQ(outcome.output.rfind(top.path("base.acd") + ":1:1: error: hides 2 names of " +
                                        bottom.path("base.acd") +
                                        ":3 (\"KS50\" and others); did you mean \"+=\"? [R102]\n",
@@ -198,7 +198,7 @@ TEST(Suggestions, AreNamesThatThePlaceLacks) {
 
 TEST(LintOptions, AFileIsLintedWithinItsDirectory) {
     const DatabaseDirectory directory(withFamily("NONSENSE = 1\nOPERATION = PROGRM,Bscan,USB2\n[KS60]\n"));
-    const Outcome outcome = runLint({directory.path("kestrel.acd")});
+    const ProcessResult outcome = runLint({directory.path("kestrel.acd")});
     EXPECT_THAT(outcome.output, HasSubstr(directory.path("kestrel.acd") + ":2:13: error: unknown operation"));
     EXPECT_THAT(outcome.output, testing::Not(HasSubstr("base.acd:")));
 }
@@ -206,7 +206,7 @@ TEST(LintOptions, AFileIsLintedWithinItsDirectory) {
 TEST(LintOptions, MaxLimitsWhatIsShownAndCountsAll) {
     const DatabaseDirectory directory(
         withFamily("NONSENSE = 1\nNONSENS = 1\nOPERATION = PROGRM,Bscan,USB2\n[KS50]\n"));
-    const Outcome outcome = runLint({directory.path(), "--max", "1"});
+    const ProcessResult outcome = runLint({directory.path(), "--max", "1"});
     EXPECT_THAT(outcome.output, HasSubstr(":1:1: warning"));
     EXPECT_THAT(outcome.output, testing::Not(HasSubstr("T101")));
     EXPECT_EQ(outcome.error, "tarvik: 1 error, 2 warnings; 1 shown\nK102: 2, T101: 1\n");

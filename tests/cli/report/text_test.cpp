@@ -7,8 +7,8 @@ namespace {
 
 using report::displayable;
 using report::escaped;
-using report::fragment;
 using report::jsonString;
+using report::urlFragment;
 
 using namespace std::string_literals;
 
@@ -63,8 +63,8 @@ TEST(ReportText, DataCantEndItsScript) {
 }
 
 TEST(ReportText, FragmentsTakeAnyName) {
-    EXPECT_EQ(fragment("KS50-x_1.5"), "KS50-x_1.5");
-    EXPECT_EQ(fragment("a b%\"<é"), "a%20b%25%22%3C%C3%A9");
+    EXPECT_EQ(urlFragment("KS50-x_1.5"), "KS50-x_1.5");
+    EXPECT_EQ(urlFragment("a b%\"<é"), "a%20b%25%22%3C%C3%A9");
 }
 
 } // namespace

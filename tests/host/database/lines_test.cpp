@@ -1,9 +1,9 @@
 // The lines of a file as the host layer shows them to tools.
+#include "DatabaseFixtures.h"
+
 #include <AcdLines.h>
-#include <AcdStore.h>
 
 #include "cli/support/DatabaseDirectory.h"
-#include "support/Fixtures.h"
 
 #include <TarvikException.h>
 
@@ -150,7 +150,7 @@ TEST(AcdLines, TellOfALineThatIsTooLong) {
 
 TEST(AcdLines, OfTheDatabaseAreReadFromDisk) {
     const DatabaseDirectory directory(DatabaseDirectory::Files{{"kestrel.acd", "[KS50]\n"}});
-    AcdStore::setSearchPath({directory.path()});
+    useDirectories({directory.path()});
     const std::vector<AcdLines> all = AcdLines::ofDatabase();
     ASSERT_EQ(all.size(), 1U);
     EXPECT_EQ(all[0].path(), directory.path("kestrel.acd"));
@@ -159,7 +159,7 @@ TEST(AcdLines, OfTheDatabaseAreReadFromDisk) {
 
 TEST(AcdLines, OfADatabaseThatCantBeReadRaise) {
     const DatabaseDirectory directory(DatabaseDirectory::Files{{"kestrel.acd", ""}});
-    AcdStore::setSearchPath({directory.path()});
+    useDirectories({directory.path()});
     EXPECT_EQ(AcdStore::families().size(), 1U);
     std::filesystem::remove(directory.path("kestrel.acd"));
     MessageRecorder messages;
@@ -174,7 +174,7 @@ TEST(AcdLines, AreFoundWhereTheSearchPathWasListed) {
     const DatabaseDirectory elsewhere;
     const std::filesystem::path path = directory.path();
     std::filesystem::current_path(path.parent_path());
-    AcdStore::setSearchPath({path.filename().string()});
+    useDirectories({path.filename().string()});
     ASSERT_EQ(AcdStore::families().size(), 1U);
     // Hosts change their directory as they like.
     std::filesystem::current_path(elsewhere.path());
@@ -185,7 +185,7 @@ TEST(AcdLines, AreFoundWhereTheSearchPathWasListed) {
 TEST(AcdLines, KnowWhichFilesDoNotCount) {
     const DatabaseDirectory directory(
         DatabaseDirectory::Files{{"kestrel.ACD", "[KS50]\n"}, {"kestrel.acd", "[KS75]\n"}});
-    AcdStore::setSearchPath({directory.path()});
+    useDirectories({directory.path()});
     const std::vector<AcdLines> files = AcdLines::ofDatabase();
     ASSERT_EQ(files.size(), 1U);
     EXPECT_EQ(files.front().lines().front().name, "KS50");

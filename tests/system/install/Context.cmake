@@ -15,7 +15,7 @@ KS50 is of family kestrel
 Program
 Verify
 Vendor Korvel
-No such property: DataNotFoundException
+No such property: DataNotFoundException at ../s/ConstraintsManager, line 437
 ]])
     message(FATAL_ERROR "${program} answers:\n${output}")
   endif()

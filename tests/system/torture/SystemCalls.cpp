@@ -65,13 +65,13 @@ extern "C" {
 // The names that the linker gives.
 // NOLINTBEGIN(bugprone-reserved-identifier)
 
-int __real_open(const char* path, int flags, ...);
-int __real_fstat(int descriptor, struct stat* status);
+int __real_open64(const char* path, int flags, ...);
+int __real_fstat64(int descriptor, struct stat64* status);
 ssize_t __real_read(int descriptor, void* buffer, std::size_t size);
 DIR* __real_opendir(const char* path);
-dirent* __real_readdir(DIR* directory);
+dirent64* __real_readdir64(DIR* directory);
 
-int __wrap_open(const char* path, int flags, ...) {
+int __wrap_open64(const char* path, int flags, ...) {
     if (fails(SystemCalls::Kind::OPEN, path)) {
         return -1;
     }
@@ -82,14 +82,14 @@ int __wrap_open(const char* path, int flags, ...) {
         mode = va_arg(arguments, mode_t);
         va_end(arguments);
     }
-    const int descriptor = __real_open(path, flags, mode);
+    const int descriptor = __real_open64(path, flags, mode);
     watched().files[descriptor] = path;
     return descriptor;
 }
 
-int __wrap_fstat(int descriptor, struct stat* status) {
+int __wrap_fstat64(int descriptor, struct stat64* status) {
     return fails(SystemCalls::Kind::STAT, watched().files[descriptor]) ? -1
-                                                                       : __real_fstat(descriptor, status);
+                                                                       : __real_fstat64(descriptor, status);
 }
 
 ssize_t __wrap_read(int descriptor, void* buffer, std::size_t size) {
@@ -109,9 +109,9 @@ DIR* __wrap_opendir(const char* path) {
     return directory;
 }
 
-dirent* __wrap_readdir(DIR* directory) {
+dirent64* __wrap_readdir64(DIR* directory) {
     return fails(SystemCalls::Kind::ENTRY, watched().directories[directory]) ? nullptr
-                                                                             : __real_readdir(directory);
+                                                                             : __real_readdir64(directory);
 }
 
 // NOLINTEND(bugprone-reserved-identifier)

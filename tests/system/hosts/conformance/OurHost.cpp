@@ -1,5 +1,7 @@
 #include "HostUnderTest.h"
 
+#include "database/Store.h"
+
 #include <AcdStore.h>
 #include <Port_MsgManData.h>
 
@@ -31,6 +33,8 @@ void host_under_test::install(const Databases& databases) {
             }
         }
     }
+    // Databases are settled once they have been looked for.
+    acd::Store::resetForTesting();
     AcdStore::setMemoryFiles(std::move(files));
     Port_MsgManData::setSink([](const Port_MsgManData::Message& message) {
         messages().push_back(
