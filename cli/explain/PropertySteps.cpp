@@ -175,9 +175,11 @@ bool ExplanationBuilder::flashProperty() {
     }
     const std::string& value = *found->values.begin();
     const bool isYes = !value.empty() && (!m_question.value || *m_question.value == value);
+    const auto shown = [](const std::string& text) { return text.empty() ? "empty" : text; };
+    const bool isOther = m_question.value && *m_question.value != value;
     add(isYes ? "record" : "absent",
-        fmt::format("{} of the {} is {}{}", key, from, value.empty() ? "empty" : value,
-                    isYes || !m_question.value ? "" : fmt::format(", not {}", *m_question.value)),
+        fmt::format("{} of the {} is {}{}", key, from, shown(value),
+                    isOther ? ", not " + shown(*m_question.value) : ""),
         found->record);
     return isYes;
 }

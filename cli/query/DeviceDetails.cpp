@@ -73,14 +73,30 @@ void DeviceFactsReader::addFacts(ConstraintsManager& manager, DeviceDetails& det
     if (details.flash) {
         details.flashProperties = flashProperties(manager, device);
     }
-    try {
-        if (details.fault.empty()) {
-            // Loads all records, properties or none.
-            static_cast<void>(manager.getDeviceStringProperties(device.c_str(), ""));
-            details.properties = m_properties.read(manager, device, isOrderDependent);
+    if (!details.fault.empty()) {
+        return;
+    }
+    const auto ask = [&](ConstraintsManager& asked,
+                         const std::string& key) -> std::optional<std::vector<std::string>> {
+        try {
+            return propertyValues(asked, device, key);
+        } catch (const TarvikException& fault) {
+            details.fault = faultText(fault);
+            return std::nullopt;
         }
-    } catch (const TarvikException& fault) {
-        details.fault = faultText(fault);
+    };
+    // No record has this key, so the manager loads all there is, and the family of the name, too.
+    const char* const missing = ":";
+    const std::string family = plain(manager.getPartFamily(device.c_str()));
+    if (isOrderDependent) {
+        // One name may have properties of its own although its family's data raise.
+        const MutedMessages muted;
+        static_cast<void>(ask(*freshManager(), missing));
+        details.properties = m_properties.read(
+            device, family, [&](const std::string& key) { return ask(*freshManager(), key); });
+    } else if (ask(manager, missing)) {
+        details.properties =
+            m_properties.read(device, family, [&](const std::string& key) { return ask(manager, key); });
     }
 }
 

@@ -1,7 +1,6 @@
 // Lists properties: the names come from the database, the values from the manager.
 #include "query/Properties.h"
 
-#include "query/FreshManager.h"
 #include "query/Tool.h"
 #include "term/Table.h"
 #include "text/Suggest.h"
@@ -42,6 +41,22 @@ Entries propertyEntries(const std::string& owner) {
     return all;
 }
 
+/// The entries of an owner that the manager also finds under another name, because it joins owner and property with "_":
+/// "x_PINS" of "kes" is "PINS" of "kes_x".
+Entries entriesUnder(const std::string& name, const std::string& owner, const Entries& entries) {
+    Entries found;
+    const std::string prefix = name + '_';
+    if (owner.starts_with(prefix) || name.starts_with(owner + '_')) {
+        for (const auto& [key, entry] : entries) {
+            const std::string joined = owner + '_' + key;
+            if (joined.starts_with(prefix)) {
+                found.emplace(joined.substr(prefix.size()), entry);
+            }
+        }
+    }
+    return found;
+}
+
 /// The class whose properties stand in for those that the flash lacks; of several the last one. Empty: none.
 std::string flashClass(const std::string& device) {
     std::string found;
@@ -69,27 +84,23 @@ const PropertyReader::Entries& PropertyReader::entriesOfFamily(const std::string
     return known->second;
 }
 
-Properties PropertyReader::read(ConstraintsManager& manager, const std::string& device,
-                                bool isOrderDependent) {
+Properties PropertyReader::read(const std::string& device, const std::string& family, const Query& ask) {
     Entries own = propertyEntries(device);
-    const Entries& inherited = entriesOfFamily(plain(manager.getPartFamily(device.c_str())));
+    const Entries& inherited = entriesOfFamily(family);
+    // The manager stores the family's properties last, and looks under the device's name first.
+    for (auto& [key, entry] : entriesUnder(family, device, own)) {
+        if (inherited.count(key) == 0) {
+            own.try_emplace(key, std::move(entry));
+        }
+    }
+    own.merge(entriesUnder(device, family, inherited));
     Properties properties;
     properties.reserve(own.size() + inherited.size());
     const auto add = [&](const std::string& key, catalogue::Entry entry) {
-        Property property{
-            key, {}, entry.ofDevice ? "device" : "family", std::move(entry.origin), std::move(entry.shadows)};
-        const auto ask = [&](ConstraintsManager& asked) {
-            for (const StringBase& value : asked.getDeviceStringProperties(device.c_str(), key.c_str())) {
-                property.values.push_back(plain(value));
-            }
-        };
-        if (isOrderDependent) {
-            const MutedMessages muted;
-            ask(*freshManager());
-        } else {
-            ask(manager);
+        if (std::optional<std::vector<std::string>> values = ask(key)) {
+            properties.push_back({key, std::move(*values), entry.ofDevice ? "device" : "family",
+                                  std::move(entry.origin), std::move(entry.shadows)});
         }
-        properties.push_back(std::move(property));
     };
     auto below = inherited.begin();
     for (auto& [key, entry] : own) {
@@ -105,6 +116,21 @@ Properties PropertyReader::read(ConstraintsManager& manager, const std::string& 
         add(below->first, below->second);
     }
     return properties;
+}
+
+std::vector<std::string> propertyValues(ConstraintsManager& manager, const std::string& device,
+                                        const std::string& key) {
+    std::vector<std::string> values;
+    for (const StringBase& value : manager.getDeviceStringProperties(device.c_str(), key.c_str())) {
+        values.push_back(plain(value));
+    }
+    return values;
+}
+
+Properties deviceProperties(ConstraintsManager& manager, const std::string& device) {
+    return PropertyReader().read(
+        device, plain(manager.getPartFamily(device.c_str())),
+        [&](const std::string& key) { return propertyValues(manager, device, key); });
 }
 
 Properties flashProperties(const ConstraintsManager& manager, const std::string& device) {

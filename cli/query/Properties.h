@@ -2,7 +2,9 @@
 
 #include "model/Catalogue.h"
 
+#include <functional>
 #include <map>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -24,10 +26,11 @@ using Properties = std::vector<Property>;
 /// Reads the properties of devices; what devices of a family share is looked up once.
 class PropertyReader {
 public:
+    /// Asks for the values of a property; nothing leaves it out.
+    using Query = std::function<std::optional<std::vector<std::string>>(const std::string& key)>;
+
     /// The properties of a device and of its family.
-    /// @param isOrderDependent asks for each property of a manager of its own
-    [[nodiscard]] Properties read(ConstraintsManager& manager, const std::string& device,
-                                  bool isOrderDependent = false);
+    [[nodiscard]] Properties read(const std::string& device, const std::string& family, const Query& ask);
 
 private:
     using Entries = std::map<std::string, catalogue::Entry>;
@@ -37,10 +40,14 @@ private:
     std::map<std::string, Entries> m_families;
 };
 
+/// The values of a device's property, in byte order.
+/// @throw TarvikException if the manager raises
+[[nodiscard]] std::vector<std::string> propertyValues(ConstraintsManager& manager, const std::string& device,
+                                                      const std::string& key);
+
 /// The properties of a device and of its family.
-[[nodiscard]] inline Properties deviceProperties(ConstraintsManager& manager, const std::string& device) {
-    return PropertyReader().read(manager, device);
-}
+/// @throw TarvikException if the manager raises
+[[nodiscard]] Properties deviceProperties(ConstraintsManager& manager, const std::string& device);
 
 /// The properties of an SPI flash and of its class.
 [[nodiscard]] Properties flashProperties(const ConstraintsManager& manager, const std::string& device);

@@ -265,6 +265,10 @@ bool addWhatIsMissing(EditableDatabase& database, const Question& question, cons
                 database.append(match.str(1), match.str(2), ':', record);
             }
         }
+    } else if (question.kind == Kind::PROPERTY && question.value == "" &&
+               says("(neither the flash|.* of the (flash|class .*) is) .*")) {
+        // An empty property of a flash is none.
+        return false;
     } else if (says("neither the flash nor its class has a property .*")) {
         database.append("spi.acd", upper(question.device) + "_PROPERTY", ':',
                         upper(question.property) + "," + question.value.value_or("x"));
@@ -275,7 +279,7 @@ bool addWhatIsMissing(EditableDatabase& database, const Question& question, cons
         const std::string name =
             question.kind == Kind::PROPERTY ? question.device : why::withoutPackage(question.device);
         if (absent.place) {
-            const bool isSingle = database.lineOf(absent.place->origin).starts_with("PROPERTY ");
+            const bool isSingle = !database.lineOf(absent.place->origin).starts_with("PROPERTIES ");
             database.insertAfter(*absent.place, ":" + key + (isSingle ? "," : ",1,") + value);
         } else {
             database.append(database.familyOf(name) + ".acd", "PROPERTY", ':', key + "," + value);

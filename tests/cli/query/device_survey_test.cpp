@@ -17,6 +17,9 @@ using reference::Health;
 using reference::Picker;
 using TARVIKNS::MODE_TYPE;
 using TARVIKNS::OUTPUT_TYPE;
+using testing::ElementsAre;
+using testing::Pair;
+using testing::UnorderedElementsAre;
 using Topics = DeviceSurvey::Topics;
 
 std::vector<DeviceDetails> survey(const Topics& topics) {
@@ -182,6 +185,38 @@ void expectFreshAnswersOverRandomDatabases(Health health, std::uint64_t seed) {
 TEST(DeviceSurvey, OverSoundDatabases) { expectFreshAnswersOverRandomDatabases(Health::SOUND, 100); }
 
 TEST(DeviceSurvey, OverDamagedDatabases) { expectFreshAnswersOverRandomDatabases(Health::DAMAGED, 900); }
+
+/// The values of a device's properties by key.
+std::map<std::string, std::vector<std::string>> valuesOf(const std::vector<DeviceDetails>& all,
+                                                         const std::string& device) {
+    std::map<std::string, std::vector<std::string>> values;
+    for (const DeviceDetails& details : all) {
+        for (const Property& property : details.properties) {
+            if (details.name == device) {
+                values[property.key] = property.values;
+            }
+        }
+    }
+    return values;
+}
+
+TEST(DeviceSurvey, ListsPropertiesThatAnotherOwnersKeyGives) {
+    const OpenDatabase database(std::map<std::string, std::string>{
+        {"base.acd", "DEVICE_SUPPORTED = zor_x\n"},
+        {"kes.acd", "PROPERTY = x_PINS,7:PINS,5\n[kes_x]\nPROPERTY = A,1\n"},
+        {"zor_x.acd", "PROPERTY = B,2\n[zor]\nPROPERTY = x_PINS,3\n"}});
+    const std::vector<DeviceDetails> all = survey({.facts = true});
+    EXPECT_THAT(valuesOf(all, "kes_x"),
+                UnorderedElementsAre(Pair("A", ElementsAre("1")), Pair("x_A", ElementsAre("1")),
+                                     Pair("PINS", ElementsAre("7")), Pair("x_PINS", ElementsAre("7"))))
+        << "the key of kes and x_PINS is that of kes_x and PINS";
+    EXPECT_THAT(valuesOf(all, "zor"),
+                UnorderedElementsAre(Pair("B", ElementsAre("2")), Pair("PINS", ElementsAre("3")),
+                                     Pair("x_B", ElementsAre("2")), Pair("x_PINS", ElementsAre("3"))));
+    for (const DeviceDetails& details : all) {
+        expectFreshFacts(details);
+    }
+}
 
 /// A question about the device's properties.
 bool hasA1(ConstraintsManager& manager, const std::string& device) {
