@@ -17,6 +17,8 @@ template <class... Functions>
 struct Overloaded : Functions... {
     using Functions::operator()...;
 };
+template <class... Functions>
+Overloaded(Functions...) -> Overloaded<Functions...>;
 
 std::string namesOf(const Argument& argument) {
     return argument.letter == '\0' ? argument.name : fmt::format("-{},{}", argument.letter, argument.name);

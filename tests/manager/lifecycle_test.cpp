@@ -134,9 +134,9 @@ TEST(ModeLookUp, RaisesAtItsLocationForAValueThatIsNoMode) {
     ManagerFixture session(Base{""});
     for (const int mode : {9, -1, 2147483647, -2147483647 - 1}) {
         for (const auto& [location, lookUp] : MODE_LOOK_UPS) {
-            EXPECT_EQ(
-                raisedLine<OutOfRangeException>([&] { (void)(session.members().*lookUp)(MODE_TYPE{mode}); }),
-                location);
+            EXPECT_EQ(raisedLine<OutOfRangeException>(
+                          [&, look = lookUp] { (void)(session.members().*look)(MODE_TYPE{mode}); }),
+                      location);
         }
     }
     EXPECT_THAT(session.messages(), IsEmpty());
