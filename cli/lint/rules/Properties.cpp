@@ -260,7 +260,7 @@ void checkSection(const Section& section, const Section& family, Findings& findi
             if (item.whole.text.empty()) {
                 continue; // found as an empty item
             }
-            if (key.key == schema::PROPERTY) {
+            if (std::string_view(key.key) == schema::PROPERTY) {
                 checkSingle(item, findings);
             } else {
                 checkCounted(item, findings);

@@ -31,7 +31,8 @@ int main(void) {
         printf("Vendor %s\n", text);
     }
     if (tarvik_get_device_string_property("KS50", "NO_SUCH_PROPERTY", &text) == TARVIK_DATA_NOT_FOUND) {
-        printf("No such property: %s\n", tarvik_last_error()->type);
+        const tarvik_error* error = tarvik_last_error();
+        printf("No such property: %s at %s, line %d\n", error->type, error->source, error->line);
     }
     return tarvik_remove_constraints_manager() == TARVIK_OK ? 0 : 1;
 }
