@@ -29,8 +29,8 @@ std::array<char, PATH_MAX> ownFile{};
         if (file.size() < ownFile.size()) {
             file.copy(ownFile.data(), file.size());
         }
-    } catch (const std::exception&) {
-        // No memory: it is looked for again when it is needed.
+    } catch (const std::bad_alloc&) {
+        return; // There is no installed database then.
     }
 }
 
@@ -56,9 +56,6 @@ SearchPath defaultSearchPath() {
         if (std::vector<std::string> directories = splitDirectories(list); !directories.empty()) {
             return {std::move(directories), {}};
         }
-    }
-    if (ownFile.front() == '\0') {
-        rememberOwnFile();
     }
     return installedSearchPath(ownFile.data());
 }

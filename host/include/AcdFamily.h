@@ -80,9 +80,6 @@ public:
     AcdFamily& operator=(const AcdFamily&) = delete;
     ~AcdFamily();
 
-    /// @return the files, the bottom layer first
-    [[nodiscard]] const std::vector<const AcdLines*>& layers() const noexcept { return m_layers; }
-
     /// @return the family's own keys; lives as long as this object, as all other results do
     [[nodiscard]] const Section& own() const noexcept { return m_sections.front(); }
 

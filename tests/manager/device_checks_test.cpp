@@ -72,6 +72,14 @@ TEST(DeviceChecks, AnUnknownDeviceCountsAsBase) {
     EXPECT_THAT(manager.messages(), ElementsAre(info(229, "nobody is not supported in Slave Serial mode\n")));
 }
 
+TEST(DeviceChecks, AnExcludedPackageCanHaveALongName) {
+    const std::string package(500, 'P');
+    ManagerFixture manager(slaveSerialBut("SS_dev1_" + package));
+    EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, "dev1", package.c_str()));
+    EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::SS, "dev1", (package + 'P').c_str()));
+    EXPECT_TRUE(manager->checkConstraints(MODE_TYPE::SS, "dev1", package.substr(1).c_str()));
+}
+
 TEST(DeviceChecks, AnExcludedPackageIsRefused) {
     ManagerFixture manager(slaveSerialBut("SS_dev1_pkg1"));
     EXPECT_FALSE(manager->checkConstraints(MODE_TYPE::SS, "dev1", "pkg1"));

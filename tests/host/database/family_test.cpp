@@ -57,6 +57,24 @@ TEST(AcdFamily, HasItsOwnKeysAndThoseOfItsSections) {
     EXPECT_THAT(keysOf(family.sections()[2]), IsEmpty());
 }
 
+TEST(AcdFamily, FindsKeysByTheirWholeName) {
+    const Layers layers({"B = b\nD = d\n"});
+    const AcdFamily family(layers.files());
+    ASSERT_NE(family.own().find("B"), nullptr);
+    EXPECT_EQ(family.own().find("B")->value(), "b");
+    for (const char* const key : {"A", "C", "E", "BB", ""}) {
+        EXPECT_EQ(family.own().find(key), nullptr) << key;
+    }
+}
+
+TEST(AcdFamily, LocatesSectionsThatOneLayerHas) {
+    const Layers layers({"A = a\n[KS50]\n", "B = b\n\n[KS100]\n"});
+    const AcdFamily family(layers.files());
+    ASSERT_EQ(family.sections().size(), 3U);
+    EXPECT_EQ(shown(family.sections()[1].location), "layer0:2:2");
+    EXPECT_EQ(shown(family.sections()[2].location), "layer1:3:2");
+}
+
 TEST(AcdFamily, MergesLayersAndRepeatedSections) {
     const Layers layers({"A = low\n[KS50]\nB = b\n[OTHER]\n[ks50]\nC = c\n", "A = top\n[Ks50]\nB += ,d\n"});
     const AcdFamily family(layers.files());
