@@ -3,8 +3,8 @@
 #include <array>
 #include <climits>
 #include <cstdlib>
-#include <exception>
 #include <filesystem>
+#include <new>
 #include <system_error>
 #include <utility>
 
