@@ -91,7 +91,7 @@ public:
         std::string_view
             device; ///< whose accessor was asked, as its section spells it; empty: the family's own
 
-        std::string_view key;
+        std::string_view key;       ///< that was asked for
         std::string_view separator; ///< between items; empty: the whole value is item 0
         short item;                 ///< the index that was asked for, counted from 0
         const char* subSeparator;   ///< between the fields of an item; null: the whole item was asked for

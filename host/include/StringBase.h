@@ -126,9 +126,9 @@ public:
     /// @return the checksum of all by now
     [[nodiscard]] static std::uint32_t CRC32(const char* bytes, std::size_t length,
                                              std::uint32_t former = 0) noexcept;
-
-    // Comparisons with every kind of text: byte order as unsigned bytes, the shorter first on a tie; a null text is the
-    // empty text. Friends, so that comparisons without a StringBase never consider them.
+    /// @{
+    /// Compares bytes as unsigned, the shorter first on a tie. Never considered without a StringBase. @param left a text
+    /// @param right a text; null is the empty text, as for left @return the result of the comparison
     friend bool operator==(const StringBase& left, const StringBase& right) noexcept {
         return left.m_text == right.m_text;
     }
@@ -162,7 +162,7 @@ public:
     friend bool operator<(const Text& left, const StringBase& right) noexcept {
         return view(left) < right.m_text;
     }
-
+    /// @}
 private:
     static std::string_view view(const char* text) noexcept {
         return text == nullptr ? std::string_view() : std::string_view(text);
