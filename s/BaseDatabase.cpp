@@ -12,8 +12,6 @@
 // The base database: the mode tables, the lists of names, and the size of the permission tables, which follows from
 // those lists.
 
-using TARVIKNS::MODE_TYPE;
-
 /// The tables of a mode; null for a value that is no mode.
 const ConstraintsManager::Implementation::ModeTable*
 ConstraintsManager::Implementation::modeTable(MODE_TYPE mode) {

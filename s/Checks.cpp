@@ -10,7 +10,6 @@
 // operations, a refusal is a message in the user's words and never an exception.
 
 using TARVIKNS::MODE_TYPE;
-using TARVIKNS::OP_TYPE;
 using TARVIKNS::OUTPUT_TYPE;
 namespace location = diagnostics::location;
 
