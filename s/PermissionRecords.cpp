@@ -6,9 +6,6 @@
 // The records of a family's database that fill the permission tables. A cell that is set stays set, even if a later
 // record raises.
 
-using TARVIKNS::MODE_TYPE;
-using TARVIKNS::OP_TYPE;
-using TARVIKNS::OUTPUT_TYPE;
 using TARVIKNS::PROGRAM_OPTION;
 
 namespace {

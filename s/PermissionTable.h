@@ -3,7 +3,6 @@
 // The permission table: which rows (operations, options) are allowed in which mode through which output, in a
 // block for each family or package.
 
-#include <algorithm>
 #include <cstddef>
 #include <cstdint>
 #include <vector>
@@ -26,7 +25,7 @@ public:
 
     /// @param rows 32 at most, as many as a mask has bits; those after them are outside the table
     PermissionTable(std::size_t blocks, int rows, int modes, int outputs)
-        : m_blocks(blocks), m_rows(std::min(rows, MAX_ROWS)), m_modes(modes), m_outputs(outputs),
+        : m_blocks(blocks), m_rows(rows), m_modes(modes), m_outputs(outputs),
           m_masks(blocks * static_cast<std::size_t>(modes) * static_cast<std::size_t>(outputs)) {}
 
     void allow(std::size_t block, int row, int mode, int output) {
@@ -51,7 +50,7 @@ private:
 
     [[nodiscard]] static bool isWithin(int value, int bound) noexcept { return value >= 0 && value < bound; }
 
-    [[nodiscard]] bool isRow(int row) const noexcept { return isWithin(row, m_rows); }
+    [[nodiscard]] bool isRow(int row) const noexcept { return isWithin(row, m_rows) && row < MAX_ROWS; }
 
     [[nodiscard]] bool isCell(std::size_t block, int mode, int output) const noexcept {
         return block < m_blocks && isWithin(mode, m_modes) && isWithin(output, m_outputs);

@@ -7,9 +7,6 @@
 // What a device offers, as masks. Which values each question rejects, with which message, and whether before or after the
 // family's block is looked up, differs deliberately between them.
 
-using TARVIKNS::MODE_TYPE;
-using TARVIKNS::OUTPUT_TYPE;
-
 namespace {
 
 constexpr const char* OUTPUT_OUT_OF_RANGE = "Outstream(Cable or file type) is out of range -- %d.\n";
