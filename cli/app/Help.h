@@ -7,4 +7,4 @@
 [[nodiscard]] std::string helpText(const CommandLine& line, const DeclaredCommand* command);
 
 /// How a command is called: "check [OPTIONS] --mode MODE [DEVICE]".
-[[nodiscard]] std::string usageOf(const DeclaredCommand& command);
+[[nodiscard]] std::string usageOf(const DeclaredCommand& declared);
