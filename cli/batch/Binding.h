@@ -45,9 +45,7 @@ constexpr std::string_view resultName() {
     } else if constexpr (std::is_same_v<Type, bool> ||
                          std::is_convertible_v<Type, const ConstraintsManager*>) {
         return "boolean";
-    } else if constexpr (std::is_same_v<Type, const char*>) {
-        return "text or null";
-    } else if constexpr (std::is_same_v<Type, Json>) {
+    } else if constexpr (std::is_same_v<Type, const char*> || std::is_same_v<Type, Json>) {
         return "text or null";
     } else if constexpr (std::is_same_v<Type, StringBase>) {
         return "text";
