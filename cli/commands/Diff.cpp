@@ -66,7 +66,7 @@ std::string snapshotOrFault(Tool& tool, const std::string& database) {
     try {
         openDatabase(layers(database));
         Progress progress("asking about each device");
-        const std::string snapshot = diff::takeSnapshot(
+        std::string snapshot = diff::takeSnapshot(
             [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
         static_cast<void>(tool.messages().take());
         return snapshot;
