@@ -176,9 +176,7 @@ Matches find(const Filter& filter) {
     const DeviceSurvey::Topics asked = topics(filter);
     DeviceSurvey(asked).run(
         [&](const DeviceDetails& device) {
-            if (asked.operations && !device.operations->fault.empty()) {
-                matches.faults.push_back(device.name);
-            } else if (!device.fault.empty()) {
+            if (!device.fault.empty() || (asked.operations && !device.operations->fault.empty())) {
                 matches.faults.push_back(device.name);
             } else if ((!asked.operations || allows(*device.operations, filter)) &&
                        (!asked.question || device.answer)) {

@@ -74,6 +74,7 @@ bool ExplanationBuilder::output() {
         add("note", fmt::format("no database can name {}: that word counts as NONE", output));
     }
     std::vector<std::string> keys;
+    keys.reserve(outputs.size());
     for (const OUTPUT_TYPE listed : outputs) {
         keys.push_back(vocabulary::key(listed));
     }

@@ -96,7 +96,7 @@ std::string ExplanationBuilder::operationOwner() {
 /// listed or a family, else its family.
 std::string ExplanationBuilder::optionOwner() {
     const std::string& device = m_question.device;
-    const std::string joined = device + m_question.package.value_or("");
+    std::string joined = device + m_question.package.value_or("");
     const bool isFamily = m_asked.familyOf(device) == device;
     const auto isListed = [&](const std::string& name) {
         const Match listing = m_asked.startUp.findItem(schema::PROGRAM_OPTION_PACKAGE, name);

@@ -138,8 +138,8 @@ void Value::restoreHidden(schema::File file, std::string_view name) {
         std::vector<Item> below = itemsOf(*source, ignored);
         Hiding hiding{key, source->key, {}};
         std::size_t kept = 0;
-        for (std::size_t i = 0; i < below.size(); ++i) {
-            const std::vector<Token>& fields = below[i].fields;
+        for (const Item& item : below) {
+            const std::vector<Token>& fields = item.fields;
             for (std::size_t j = isNamed ? 0 : first; j < (isNamed ? 1 : fields.size()); ++j) {
                 if (known.contains(fields[j].text)) {
                     ++kept;

@@ -42,6 +42,7 @@ std::vector<Word> modeWords() {
 template <typename Rows>
 std::vector<Word> wordsOf(const Rows& rows) {
     std::vector<Word> words;
+    words.reserve(rows.size());
     for (const auto& row : rows) {
         words.push_back({row.key, {}, row.display});
     }
@@ -50,6 +51,7 @@ std::vector<Word> wordsOf(const Rows& rows) {
 
 std::vector<Word> optionWords() {
     std::vector<Word> words;
+    words.reserve(OPTIONS.size());
     for (const Option& option : OPTIONS) {
         words.push_back({option.key, {}, ""});
     }
