@@ -8,7 +8,7 @@ namespace {
 
 /// The element of this number in a list by numbers, which is made if it is not there. Most reads are about the last one.
 template <typename Element>
-Element& findOrInsert(std::vector<Element>& list, int Element::*number, Element&& element) {
+Element& findOrInsert(std::vector<Element>& list, int Element::*number, Element element) {
     auto place = std::find_if(list.rbegin(), list.rend(),
                               [&](const Element& known) { return known.*number <= element.*number; });
     if (place == list.rend() || (*place).*number != element.*number) {
