@@ -29,13 +29,14 @@ public:
           m_masks(blocks * static_cast<std::size_t>(modes) * static_cast<std::size_t>(outputs)) {}
 
     void allow(std::size_t block, int row, int mode, int output) {
-        if (isCell(block, mode, output) && isRow(row)) {
+        // The width of a mask is checked here, next to the shift that depends on it.
+        if (isCell(block, mode, output) && isWithin(row, m_rows) && row < MAX_ROWS) {
             m_masks[position(block, mode, output)] |= std::uint32_t{1} << row;
         }
     }
 
     [[nodiscard]] bool allows(std::size_t block, int row, int mode, int output) const noexcept {
-        return isRow(row) && (mask(block, mode, output) >> row & 1U) != 0;
+        return isWithin(row, m_rows) && row < MAX_ROWS && (mask(block, mode, output) >> row & 1U) != 0;
     }
 
     /// Bit i is set when row i is allowed.
@@ -49,8 +50,6 @@ private:
     static constexpr int MAX_ROWS = 32;
 
     [[nodiscard]] static bool isWithin(int value, int bound) noexcept { return value >= 0 && value < bound; }
-
-    [[nodiscard]] bool isRow(int row) const noexcept { return isWithin(row, m_rows) && row < MAX_ROWS; }
 
     [[nodiscard]] bool isCell(std::size_t block, int mode, int output) const noexcept {
         return block < m_blocks && isWithin(mode, m_modes) && isWithin(output, m_outputs);
