@@ -3,6 +3,7 @@
 
 #include "commands/CommonArguments.h"
 #include "commands/MaskMembers.h"
+#include "query/AskedDevice.h"
 
 #include <tarvik/ConstraintsManager.h>
 
@@ -17,10 +18,11 @@ struct Arguments {
 
 ExitCode run(Tool& tool, const Arguments& arguments) {
     const TARVIKNS::OUTPUT_TYPE output = vocabulary::readOutput(arguments.output);
+    const std::string device = askedDevice(tool, arguments.device).name;
     ConstraintsManager& manager = tool.manager();
-    const int mask = manager.getBsdlOperations(arguments.device.c_str(), output);
-    Json asked{{"device", arguments.device}, {"output", vocabulary::key(output)}};
-    return showMembers(tool, operationMembers(manager, arguments.device, std::move(asked), mask));
+    const int mask = manager.getBsdlOperations(device.c_str(), output);
+    Json asked{{"device", device}, {"output", vocabulary::key(output)}};
+    return showMembers(tool, operationMembers(manager, device, std::move(asked), mask));
 }
 
 Action declare(ArgumentList& list) {

@@ -58,7 +58,7 @@ struct MaskMembers {
 
 /// Shows the members. An empty answer is a no, with a note so that it is not taken for a failure.
 [[nodiscard]] inline ExitCode showMembers(Tool& tool, const MaskMembers& members) {
-    questions::requireKnown(tool.manager(), members.device);
+    questions::requireKnown(tool, members.device);
     const ExitCode status = tool.answer(members, members.keys.empty() ? ExitCode::NO : ExitCode::YES);
     if (members.keys.empty()) {
         tool.note(

@@ -3,6 +3,7 @@
 
 #include "commands/CommonArguments.h"
 #include "model/Vocabulary.h"
+#include "query/AskedDevice.h"
 #include "query/ManagerQueries.h"
 #include "query/Tool.h"
 
@@ -46,17 +47,17 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     const TARVIKNS::MODE_TYPE mode = vocabulary::readMode(arguments.mode);
     // Properties are named by the key of an operation, not by the text that was given.
     const std::string& operation = vocabulary::key(vocabulary::readOperation(arguments.operation));
+    const std::string device = askedDevice(tool, arguments.device).name;
     ConstraintsManager& manager = tool.manager();
-    OperationOptions answer{arguments.device, operation, vocabulary::key(mode), {}};
+    OperationOptions answer{device, operation, vocabulary::key(mode), {}};
     for (const StringBase& option :
-         manager.getDeviceOperationOptions(arguments.device.c_str(), operation.c_str(), mode)) {
+         manager.getDeviceOperationOptions(device.c_str(), operation.c_str(), mode)) {
         answer.options.push_back(toStdString(option));
     }
-    questions::requireKnown(manager, arguments.device);
+    questions::requireKnown(tool, device);
     const ExitCode status = tool.answer(answer, answer.options.empty() ? ExitCode::NO : ExitCode::YES);
     if (answer.options.empty()) {
-        tool.note(
-            fmt::format("{} of {} has no options in mode {}", operation, arguments.device, answer.mode));
+        tool.note(fmt::format("{} of {} has no options in mode {}", operation, device, answer.mode));
     }
     return status;
 }

@@ -3,6 +3,7 @@
 
 #include "commands/CommonArguments.h"
 #include "commands/MaskMembers.h"
+#include "query/AskedDevice.h"
 
 #include <tarvik/ConstraintsManager.h>
 
@@ -19,11 +20,11 @@ struct Arguments {
 ExitCode run(Tool& tool, const Arguments& arguments) {
     const TARVIKNS::MODE_TYPE mode = vocabulary::readMode(arguments.mode);
     const TARVIKNS::OUTPUT_TYPE output = vocabulary::readOutput(arguments.output);
+    const std::string device = askedDevice(tool, arguments.device).name;
     ConstraintsManager& manager = tool.manager();
-    const int mask = manager.getDeviceOperations(arguments.device.c_str(), mode, output);
-    Json asked{
-        {"device", arguments.device}, {"mode", vocabulary::key(mode)}, {"output", vocabulary::key(output)}};
-    return showMembers(tool, operationMembers(manager, arguments.device, std::move(asked), mask));
+    const int mask = manager.getDeviceOperations(device.c_str(), mode, output);
+    Json asked{{"device", device}, {"mode", vocabulary::key(mode)}, {"output", vocabulary::key(output)}};
+    return showMembers(tool, operationMembers(manager, device, std::move(asked), mask));
 }
 
 Action declare(ArgumentList& list) {

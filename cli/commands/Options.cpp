@@ -3,6 +3,7 @@
 
 #include "commands/CommonArguments.h"
 #include "commands/MaskMembers.h"
+#include "query/AskedDevice.h"
 
 #include <tarvik/ConstraintsManager.h>
 
@@ -20,14 +21,15 @@ struct Arguments {
 ExitCode run(Tool& tool, const Arguments& arguments) {
     const TARVIKNS::MODE_TYPE mode = vocabulary::readMode(arguments.mode);
     const TARVIKNS::OUTPUT_TYPE output = vocabulary::readOutput(arguments.output);
-    const char* const package = arguments.package ? arguments.package->c_str() : nullptr;
+    const AskedDevice asked = askedDevice(tool, arguments.device, arguments.package, PackageUse::TAKEN);
+    const char* const package = asked.package ? asked.package->c_str() : nullptr;
     ConstraintsManager& manager = tool.manager();
-    const int mask = manager.getProgramOptions(arguments.device.c_str(), mode, output, package);
-    Json asked{{"device", arguments.device},
-               {"mode", vocabulary::key(mode)},
-               {"output", vocabulary::key(output)},
-               {"package", arguments.package ? Json(*arguments.package) : Json()}};
-    MaskMembers members{arguments.device, std::move(asked), "options", mask, {}, {}};
+    const int mask = manager.getProgramOptions(asked.name.c_str(), mode, output, package);
+    Json question{{"device", asked.name},
+                  {"mode", vocabulary::key(mode)},
+                  {"output", vocabulary::key(output)},
+                  {"package", asked.package ? Json(*asked.package) : Json()}};
+    MaskMembers members{asked.name, std::move(question), "options", mask, {}, {}};
     for (const TARVIKNS::PROGRAM_OPTION option : questions::options(manager, mask)) {
         members.keys.push_back(vocabulary::key(option));
     }

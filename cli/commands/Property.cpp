@@ -2,6 +2,7 @@
 #include "commands/Commands.h"
 
 #include "commands/CommonArguments.h"
+#include "query/AskedDevice.h"
 #include "query/ManagerQueries.h"
 #include "query/Properties.h"
 #include "query/Tool.h"
@@ -35,11 +36,11 @@ std::vector<std::string> values(ConstraintsManager& manager, const char* device,
 }
 
 ExitCode run(Tool& tool, const Arguments& arguments) {
+    const std::string device = askedDevice(tool, arguments.device).name;
     ConstraintsManager& manager = tool.manager();
-    const std::string& device = arguments.device;
     const PropertyAnswer answer{device, arguments.key,
                                 values(manager, device.c_str(), arguments.key.c_str())};
-    questions::requireKnown(manager, device);
+    questions::requireKnown(tool, device);
     return showProperty(tool, answer,
                         manager.isSpiDevice(device.c_str()) ? flashProperties(manager, device)
                                                             : deviceProperties(manager, device));

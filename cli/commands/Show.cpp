@@ -3,6 +3,7 @@
 
 #include "commands/CommonArguments.h"
 #include "model/Vocabulary.h"
+#include "query/AskedDevice.h"
 #include "query/DeviceDetails.h"
 #include "query/Tool.h"
 #include "term/Table.h"
@@ -184,8 +185,7 @@ Json asJson(const Shown& shown) {
 }
 
 ExitCode run(Tool& tool, const std::string& device) {
-    tool.openDatabase();
-    return tool.answer(Shown{deviceDetails(device)});
+    return tool.answer(Shown{deviceDetails(askedDevice(tool, device).name)});
 }
 
 Action declare(ArgumentList& list) {

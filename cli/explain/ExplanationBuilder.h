@@ -56,14 +56,20 @@ private:
         catalogue::Shadows shadows; ///< records of lower layers that it replaced
     };
     [[nodiscard]] bool operationInMode();
+    [[nodiscard]] bool operationOptions();
     [[nodiscard]] bool property();
     [[nodiscard]] bool flashProperty();
     [[nodiscard]] std::optional<Property> findProperty(const std::string& device, const std::string& key);
+    [[nodiscard]] std::optional<Property> storedOrInherited(const std::string& device,
+                                                            const std::string& key) const;
     [[nodiscard]] std::optional<Property> storedProperty(const std::string& device, const std::string& wanted,
                                                          const std::string& key) const;
     [[nodiscard]] std::optional<Property> storedFlashProperty(const std::string& wanted) const;
     [[nodiscard]] bool holds(const Property& found, const std::string& key,
                              const std::optional<std::string>& value);
+
+    // Multiboot.
+    [[nodiscard]] bool multiboot();
 
     // Names.
     std::string addNameStep();

@@ -36,10 +36,16 @@ void Tool::note(const std::string& text) const {
     }
 }
 
+void Tool::noteAsked(const std::string& text, Json asked) {
+    note(text);
+    m_asked = std::move(asked);
+}
+
 Json Tool::answerOf(const std::function<ExitCode(Tool&)>& command) {
     Json answer;
     const bool json = std::exchange(m_settings.json, true);
     m_captured = &answer;
+    m_asked = {};
     const auto restore = [&] {
         m_captured = nullptr;
         m_settings.json = json;
@@ -85,6 +91,9 @@ void Tool::showJson(const Json& facts) {
 void Tool::writeJson(const Json& facts, const std::vector<Messages::Message>& messages) {
     Json document{{"version", 1}};
     document.update(facts);
+    if (!m_asked.is_null()) {
+        document["asked"] = m_asked;
+    }
     document["messages"] = asJson(messages);
     if (m_captured != nullptr) {
         *m_captured = std::move(document);

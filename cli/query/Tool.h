@@ -19,6 +19,7 @@ public:
         std::vector<std::string> databases;
         bool json = false;
         bool verbose = false;
+        bool literal = false;
         Terminal::Colours colours = Terminal::Colours::AUTOMATIC;
     };
 
@@ -48,8 +49,15 @@ public:
         return status;
     }
 
+    /// Are names passed to the manager as they were typed?
+    [[nodiscard]] bool isLiteral() const noexcept { return m_settings.literal; }
+
     /// Shows the user something besides the answer, on standard error.
     void note(const std::string& text) const;
+
+    /// Notes what is asked about in place of what was typed.
+    /// @param asked the member "asked" of the JSON object
+    void noteAsked(const std::string& text, Json asked);
 
     /// Runs a command and returns the JSON object that it would write with `--json`, instead of writing it. Its notes
     /// are dropped.
@@ -74,5 +82,6 @@ private:
     Output m_output;
     Terminal m_terminal;
     bool m_opened = false;
+    Json m_asked;               ///< null if everything is asked about as typed
     Json* m_captured = nullptr; ///< takes the JSON object in place of standard output
 };

@@ -87,12 +87,12 @@ TEST(Show, WholeSheetInJson) {
     EXPECT_EQ(answer["messages"], json::array());
 }
 
-TEST(Show, NameInAnotherCaseIsShownInBoth) {
+TEST(Show, LiteralNameInAnotherCaseIsShownInBoth) {
     const SmallDatabase database;
-    const ProcessResult outcome = database.run({"show", "Fn20"});
+    const ProcessResult outcome = database.run({"--literal", "show", "Fn20"});
     EXPECT_THAT(outcome.output,
                 StartsWith("Device  Fn20 (in the database: FN20)\nFamily  finch\nIDCODE  0x0020"));
-    EXPECT_EQ(database.json({"show", "Fn20"})["spelling"], "FN20");
+    EXPECT_EQ(database.json({"--literal", "show", "Fn20"})["spelling"], "FN20");
 }
 
 TEST(Show, FamilyIsSpeltAsItsFile) {

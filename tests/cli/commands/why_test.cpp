@@ -59,6 +59,9 @@ TEST(Why, AnswersEachFormOfQuestion) {
         {"FN20", "--mode", "BS", "--output", "USB2", "--option", "ERASE"},
         {"FN10", "--output", "SVF", "--bsdl", "HIGHZ"},
         {"FN10", "--property", "VENDOR", "--value", "Korvel"},
+        {"FN10", "--mode", "BS", "--operation-options", "PROGRAM", "--value", "ERASE"},
+        {"FN10", "--multiboot", "MB_SPI", "--width", "NONE", "--lead"},
+        {"FN10", "--mode", "BS", "--output", "USB2", "--package", "P48", "--operation", "PROGRAM"},
     };
     for (std::vector<std::string> question : questions) {
         question.insert(question.begin(), "why");
@@ -78,7 +81,7 @@ TEST(Why, SuggestsNamesThatAreNear) {
 TEST(Why, ListsTheFormsOfQuestionsWhenNoneFits) {
     const ProcessResult outcome = SmallDatabase().run({"why", "FN10"});
     EXPECT_EQ(outcome.status, 2);
-    EXPECT_THAT(outcome.error, StartsWith("tarvik: why takes one of\n  --mode M --output O\n"));
+    EXPECT_THAT(outcome.error, StartsWith("tarvik: why takes one of these:\n  --mode M --output O\n"));
 }
 
 TEST(Which, ListsTheDevicesThatAllowAnOperation) {
