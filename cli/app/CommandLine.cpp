@@ -51,8 +51,8 @@ CommandLine::CommandLine() {
          .target = &colours},
     };
     groups = {
-        {"Devices", declared({&command::DEVICES, &command::FAMILIES, &command::VOCABULARY, &command::SHOW,
-                              &command::SPI, &command::REPORT})},
+        {"Devices", declared({&command::DEVICES, &command::IDENTIFY, &command::FAMILIES, &command::VOCABULARY,
+                              &command::SHOW, &command::SPI, &command::REPORT})},
         {"Questions", declared({&command::CHECK, &command::OPERATIONS, &command::OPTIONS, &command::BSDL,
                                 &command::OPERATION_OPTIONS, &command::PROPERTY, &command::MULTIBOOT,
                                 &command::WHY, &command::WHICH})},

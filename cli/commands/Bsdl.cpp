@@ -19,10 +19,11 @@ struct Arguments {
 ExitCode run(Tool& tool, const Arguments& arguments) {
     const TARVIKNS::OUTPUT_TYPE output = vocabulary::readOutput(arguments.output);
     const std::string device = askedDevice(tool, arguments.device).name;
-    ConstraintsManager& manager = tool.manager();
-    const int mask = manager.getBsdlOperations(device.c_str(), output);
     Json asked{{"device", device}, {"output", vocabulary::key(output)}};
-    return showMembers(tool, operationMembers(manager, device, std::move(asked), mask));
+    const auto ask = [&](ConstraintsManager& manager) {
+        return manager.getBsdlOperations(device.c_str(), output);
+    };
+    return showMembers(tool, {device, std::move(asked), "operations", ask, addOperations});
 }
 
 Action declare(ArgumentList& list) {

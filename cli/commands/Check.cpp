@@ -4,6 +4,7 @@
 #include "commands/CommonArguments.h"
 #include "commands/QuestionArguments.h"
 #include "model/Vocabulary.h"
+#include "query/ApplicationFault.h"
 #include "query/ManagerQueries.h"
 #include "query/Tool.h"
 #include "term/Verdict.h"
@@ -68,6 +69,10 @@ ExitCode run(Tool& tool, const QuestionArguments& arguments) {
     if (arguments.device) {
         questions::requireKnown(tool, asked.question.device);
     }
+    const auto inWords = [](bool isAllowed) { return isAllowed ? "yes" : "no"; };
+    noteApplicationFault(
+        tool, [&](ConstraintsManager& manager) { return inWords(why::isAllowed(manager, asked.question)); },
+        inWords(answer.isAllowed));
     const ExitCode status = tool.answer(answer, answer.isAllowed ? ExitCode::YES : ExitCode::NO);
     for (const std::string& check : asked.skipped) {
         tool.note(check);

@@ -3,6 +3,7 @@
 
 #include "commands/CommonArguments.h"
 #include "model/Vocabulary.h"
+#include "query/ApplicationFault.h"
 #include "query/AskedDevice.h"
 #include "query/ManagerQueries.h"
 #include "query/Tool.h"
@@ -10,6 +11,7 @@
 #include <tarvik/ConstraintsManager.h>
 
 #include <fmt/format.h>
+#include <fmt/ranges.h>
 
 #include <memory>
 
@@ -48,13 +50,21 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     // Properties are named by the key of an operation, not by the text that was given.
     const std::string& operation = vocabulary::key(vocabulary::readOperation(arguments.operation));
     const std::string device = askedDevice(tool, arguments.device).name;
-    ConstraintsManager& manager = tool.manager();
-    OperationOptions answer{device, operation, vocabulary::key(mode), {}};
-    for (const StringBase& option :
-         manager.getDeviceOperationOptions(device.c_str(), operation.c_str(), mode)) {
-        answer.options.push_back(toStdString(option));
-    }
+    const auto ask = [&](ConstraintsManager& manager) {
+        std::vector<std::string> options;
+        for (const StringBase& option :
+             manager.getDeviceOperationOptions(device.c_str(), operation.c_str(), mode)) {
+            options.push_back(toStdString(option));
+        }
+        return options;
+    };
+    const auto inWords = [](const std::vector<std::string>& options) {
+        return options.empty() ? "nothing" : fmt::format("{}", fmt::join(options, ", "));
+    };
+    const OperationOptions answer{device, operation, vocabulary::key(mode), ask(tool.manager())};
     questions::requireKnown(tool, device);
+    noteApplicationFault(
+        tool, [&](ConstraintsManager& manager) { return inWords(ask(manager)); }, inWords(answer.options));
     const ExitCode status = tool.answer(answer, answer.options.empty() ? ExitCode::NO : ExitCode::YES);
     if (answer.options.empty()) {
         tool.note(fmt::format("{} of {} has no options in mode {}", operation, device, answer.mode));

@@ -21,10 +21,11 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     const TARVIKNS::MODE_TYPE mode = vocabulary::readMode(arguments.mode);
     const TARVIKNS::OUTPUT_TYPE output = vocabulary::readOutput(arguments.output);
     const std::string device = askedDevice(tool, arguments.device).name;
-    ConstraintsManager& manager = tool.manager();
-    const int mask = manager.getDeviceOperations(device.c_str(), mode, output);
     Json asked{{"device", device}, {"mode", vocabulary::key(mode)}, {"output", vocabulary::key(output)}};
-    return showMembers(tool, operationMembers(manager, device, std::move(asked), mask));
+    const auto ask = [&](ConstraintsManager& manager) {
+        return manager.getDeviceOperations(device.c_str(), mode, output);
+    };
+    return showMembers(tool, {device, std::move(asked), "operations", ask, addOperations});
 }
 
 Action declare(ArgumentList& list) {

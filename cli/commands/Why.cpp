@@ -5,6 +5,7 @@
 #include "commands/QuestionArguments.h"
 #include "explain/Explanation.h"
 #include "explain/Inquiry.h"
+#include "query/ApplicationFault.h"
 #include "query/ManagerQueries.h"
 #include "query/Tool.h"
 
@@ -39,6 +40,20 @@ void addSkippedChecks(why::Answer& answer) {
     }
 }
 
+/// A step about what an application gets, if that is something else.
+void addApplicationFault(why::Answer& answer) {
+    const auto inWords = [](Verdict verdict) { return verdict == Verdict::YES ? "yes" : "no"; };
+    const std::optional<ApplicationFault> fault = findApplicationFault([&](ConstraintsManager& manager) {
+        return inWords(why::isAllowed(manager, answer.question) ? Verdict::YES : Verdict::NO);
+    });
+    if (fault) {
+        answer.explanation.steps.push_back(
+            {"fault",
+             (fault->record ? "" : reasonOf(*fault) + ": ") + effectOf(*fault, inWords(answer.verdict)),
+             fault->record});
+    }
+}
+
 ExitCode run(Tool& tool, const QuestionArguments& arguments) {
     const AskedQuestion asked = readQuestion(tool, arguments, QuestionScope::ALL, "why");
     const why::Question& question = asked.question;
@@ -50,6 +65,7 @@ ExitCode run(Tool& tool, const QuestionArguments& arguments) {
     // Further questions serve the explanation: what the manager reports about them is not about the user's question.
     const std::size_t issued = tool.messages().count();
     why::Answer answer{question, inquiry.verdict, why::explain(question), asked.skipped};
+    addApplicationFault(answer);
     if (inquiry.verdict == Verdict::NO) {
         for (why::Step& step : why::alternatives(question)) {
             answer.explanation.steps.push_back(std::move(step));

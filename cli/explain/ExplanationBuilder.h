@@ -43,6 +43,7 @@ private:
     [[nodiscard]] bool isAllowedIn(const std::string& table);
     [[nodiscard]] std::vector<Permission> permissionsOf(const std::string& table) const;
     [[nodiscard]] bool isAllowedBy(const ReadLog::Item& record) const;
+    void addMisspelledRecords(const std::string& word);
     void addUnknownMode(const Permission& permission);
     void addUnusedWords(const Permission& permission);
     [[nodiscard]] const ReadLog::Value* consulted() const;

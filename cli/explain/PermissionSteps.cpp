@@ -230,6 +230,7 @@ bool ExplanationBuilder::isAllowedIn(const std::string& table) {
                 : fmt::format("none of the {} records for {} allows it{}", permissions.size(), word, where),
             {permissions.front().value, &permissions.front().record->whole});
     }
+    addMisspelledRecords(word);
     if (isOption && m_question.option > TARVIKNS::PROGRAM_OPTION::SECTOR_LOCKDOWN) {
         add("note", fmt::format("no database can name the option {}", word));
     }
@@ -272,6 +273,23 @@ void ExplanationBuilder::addShadowedRecords(const std::string& database, const s
                 records.all.empty() ? "a layer on top" : catalogue::asText(records.all.front().whole.origin);
             m_steps.push_back(
                 {"note", fmt::format("{} replaces {}, without this record", where, key), record.whole});
+        }
+    }
+}
+
+/// Notes the records that would be about the operation that is asked for if their word were not mistyped.
+void ExplanationBuilder::addMisspelledRecords(const std::string& word) {
+    const ReadLog::Value* const value = consulted();
+    if (m_question.kind == Kind::OPTION || value == nullptr) {
+        return;
+    }
+    for (const ReadLog::Item& record : value->items) {
+        const char* const text = textOf(record, 0);
+        const bool isUnknown =
+            text != nullptr && ConstraintsManager::operationString2Type(text) == TARVIKNS::NO_OPERATION;
+        if (isUnknown && suggest(text, vocabulary::operations()) == word) {
+            add("note", fmt::format("\"{}\" is not an operation; is {} meant?", text, word),
+                {value, &record.whole});
         }
     }
 }

@@ -53,10 +53,19 @@ std::optional<std::string> findDevice(const std::string& name) {
     return family == nullptr ? std::nullopt : findIn(AcdStore::devices(family), name);
 }
 
-/// A device of a family that cannot be read is not an unknown one.
-void requireReadableFamilies() {
+/// A name may belong to a family that cannot be read.
+/// @throw CommandError (FAULT) if there is such a family
+void requireReadableFamilies(const std::string& device) {
     for (const std::string& family : AcdStore::families()) {
-        static_cast<void>(AcdStore::devices(family));
+        try {
+            static_cast<void>(AcdStore::devices(family));
+        } catch (const DataNotFoundException&) {
+            throw CommandError(
+                ExitCode::FAULT,
+                fmt::format("the family {} cannot be read, so it is unknown whether there is a "
+                            "device \"{}\"",
+                            family, device));
+        }
     }
 }
 
@@ -114,7 +123,7 @@ AskedDevice askedDevice(Tool& tool, const std::string& device, const std::option
         }
     }
     if (!name) {
-        requireReadableFamilies();
+        requireReadableFamilies(device);
         throw catalogue::unknownDevice(device);
     }
     asked.name = *name;
@@ -125,12 +134,12 @@ AskedDevice askedDevice(Tool& tool, const std::string& device, const std::option
         const std::string typedPackage = package ? fmt::format(" in package \"{}\"", *package) : "";
         asked.reading = fmt::format("\"{}\"{} is device {}{}", device, typedPackage, asked.name,
                                     inPackage(asked.package));
-        const bool isUnused = asked.package && use == PackageUse::IGNORED;
-        tool.noteAsked(asked.reading + (isUnused ? ", and the package makes no difference here" : "") +
-                           "; use --literal to ask about the name as typed",
-                       {{"typed", device},
-                        {"device", asked.name},
-                        {"package", asked.package ? Json(*asked.package) : Json()}});
+        const char* const unused =
+            asked.package && use == PackageUse::IGNORED ? ", and the package makes no difference here" : "";
+        tool.note(asked.reading + unused + "; use --literal to ask about the name as typed", "asked",
+                  {{"typed", device},
+                   {"device", asked.name},
+                   {"package", asked.package ? Json(*asked.package) : Json()}});
     }
     return asked;
 }

@@ -55,9 +55,8 @@ public:
     /// Shows the user something besides the answer, on standard error.
     void note(const std::string& text) const;
 
-    /// Notes what is asked about in place of what was typed.
-    /// @param asked the member "asked" of the JSON object
-    void noteAsked(const std::string& text, Json asked);
+    /// The same, and adds a member to the JSON object of the answer.
+    void note(const std::string& text, const char* member, Json value);
 
     /// Runs a command and returns the JSON object that it would write with `--json`, instead of writing it. Its notes
     /// are dropped.
@@ -82,6 +81,6 @@ private:
     Output m_output;
     Terminal m_terminal;
     bool m_opened = false;
-    Json m_asked;               ///< null if everything is asked about as typed
-    Json* m_captured = nullptr; ///< takes the JSON object in place of standard output
+    Json m_remarks = Json::object(); ///< further members of the JSON object
+    Json* m_captured = nullptr;      ///< takes the JSON object in place of standard output
 };

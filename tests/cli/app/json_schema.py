@@ -22,6 +22,9 @@ NOT_IN_JSON = {"batch", "help"}
 QUESTIONS = """
 devices
 devices 'zz*'
+identify 0x14104FB7 0x24104FB5
+identify 0x14104FX7
+identify zz
 families
 vocabulary
 show KS50

@@ -177,7 +177,12 @@ TEST(Show, BadRecordsRaiseNothing) {
     const ProcessResult outcome = runTool({"--database", directory.path(), "show", "FN10"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.output, HasSubstr("PROGRAM  --U--"));
-    EXPECT_EQ(outcome.error, "Operation NOTHING is not defined.\n");
+    EXPECT_EQ(
+        outcome.error,
+        "tarvik: " + directory.path("finch.acd") +
+            ":1:13: \"NOTHING\" is faulty: an application gets OutOfRangeException (location 1631), and "
+            "afterwards answers without this record and those after it\n"
+            "Operation NOTHING is not defined.\n");
 }
 
 TEST(Show, NamesWhatLayersShadow) {

@@ -134,8 +134,8 @@ TEST(Which, NamesTheDevicesThatHaveNoAnswer) {
          {"spi.acd", "DEVICE_FAMILY = ST1\n"}});
     const ProcessResult outcome =
         runTool({"--database", database.path(), "which", "--property", "VENDOR=Korvel"});
-    EXPECT_EQ(outcome.status, 1);
-    EXPECT_THAT(outcome.error, HasSubstr("no answer for 2 devices, the first \"FN10\": see tarvik why"));
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_THAT(outcome.error, HasSubstr("no answer for 2 devices, the first FN10: see tarvik show FN10"));
     EXPECT_THAT(
         runTool({"--database", database.path(), "--json", "which", "--property", "VENDOR=Korvel"}).output,
         HasSubstr("\"faults\":[\"FN10\",\"FN20\"]"));
