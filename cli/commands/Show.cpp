@@ -149,9 +149,7 @@ std::string heading(const DeviceDetails& details, const Terminal& terminal) {
 
 std::string asText(const Shown& shown, const Terminal& terminal) {
     const DeviceDetails& details = shown.details;
-    // What the family of flashes has for all of them is not found by the name of a flash.
-    return heading(details, terminal) +
-           (details.flash ? "" : section("Properties", details.properties, terminal)) +
+    return heading(details, terminal) + section("Properties", details.shownProperties(), terminal) +
            section("Flash properties", details.flashProperties, terminal) + packagesText(details, terminal) +
            multibootText(details.multiboot, terminal) +
            matrix("Operations", details.operations->rows, true, terminal) +
@@ -238,7 +236,7 @@ Json asJson(const Shown& shown) {
             {"family", details.family},
             {"idcode", details.idcode ? asJson(*details.idcode) : Json()},
             {"modes", details.modes},
-            {"properties", asJson(details.flash ? Properties() : details.properties)},
+            {"properties", asJson(details.shownProperties())},
             {"flash", details.flash},
             {"flashClass", details.flashClass.empty() ? Json() : Json(details.flashClass)},
             {"flashProperties", asJson(details.flashProperties)},

@@ -74,6 +74,11 @@ void completePackages(DeviceDetails& details) {
 
 } // namespace
 
+const Properties& DeviceDetails::shownProperties() const {
+    static const Properties none;
+    return flash ? none : properties;
+}
+
 std::string DeviceDetails::whyIncomplete() const {
     if (!isKnown()) {
         return catalogue::unknownDevice(name).what();

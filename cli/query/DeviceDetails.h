@@ -64,6 +64,10 @@ struct DeviceDetails {
     /// Does the manager know the device?
     [[nodiscard]] bool isKnown() const { return family != "base"; }
 
+    /// The properties under the device's name. None for a flash: what spi.acd has for all flashes together is not found
+    /// by the name of one.
+    [[nodiscard]] const Properties& shownProperties() const;
+
     /// Why some answer is missing: the manager raises, or does not know the device. Empty if none is.
     [[nodiscard]] std::string whyIncomplete() const;
 };
