@@ -172,7 +172,7 @@ std::vector<std::string> optionPropertyNames() {
 void checkMeaning(const Item& item, std::size_t firstValue, Findings& findings) {
     const Token& name = item.fields.front();
     const bool isOption = name.text.starts_with(schema::OPTIONS_PREFIX);
-    const std::string upper = plain(UT_STR::Upper(std::string(name.text).c_str()));
+    const std::string upper = toStdString(UT_STR::Upper(std::string(name.text).c_str()));
     const bool isUpperOption = upper.starts_with(schema::OPTIONS_PREFIX) &&
                                namesOperation(std::string_view(upper).substr(schema::OPTIONS_PREFIX.size()));
     if (isOption ? name.text != upper || !isUpperOption : isUpperOption) {
