@@ -20,6 +20,11 @@ public:
     }
     void add(std::string_view name);
 
+    /// Takes names that are packed already.
+    /// @param ends as `ends()` gives them
+    /// @return whether they fit together, no name being empty; otherwise nothing changes
+    [[nodiscard]] bool assign(std::string_view bytes, std::vector<std::uint32_t> ends);
+
     [[nodiscard]] const std::vector<char>& bytes() const noexcept { return m_bytes; }
 
     /// How many of the bytes belong to the names up to and with each.
