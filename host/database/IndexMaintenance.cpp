@@ -7,7 +7,6 @@
 #include <memory>
 #include <optional>
 #include <string_view>
-#include <utility>
 
 namespace acd {
 
@@ -25,11 +24,10 @@ IndexContents describeDirectory(const std::string& directory, std::uint64_t devi
         try {
             IndexedFile& file = contents.files.emplace_back();
             file.name = name;
-            // The scan may open the file twice; the status is the one from before the first byte was read.
-            bool isOpen = false;
             file.sections = scan.names([&] {
                 auto source = std::make_unique<FileSource>(directory + '/' + name);
-                file.status = std::exchange(isOpen, true) ? file.status : source->status();
+                // From before the first byte is read: what changes the file from here on changes its status, too.
+                file.status = source->status();
                 return source;
             });
         } catch (const ReadError& unreadable) {
