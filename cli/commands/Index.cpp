@@ -175,7 +175,7 @@ const Command command::INDEX{
     "The index, index.acx, lets programs find a device without reading all files. It is not used once any "
     "file has "
     "changed: write it again then. With --show, the exit status is 1 if the index is not used.",
-    "tarvik index mydatabase\n"
-    "tarvik index --show mydatabase",
+    "tarvik index database\n"
+    "tarvik index --show database",
     declare,
 };
