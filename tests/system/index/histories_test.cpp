@@ -221,12 +221,13 @@ private:
         }
         log("link " + path + "\n");
         const std::string from = file();
+        std::error_code none;
         if (chance(50)) {
             (void)::unlink(path.c_str());
-            (void)::symlink(target.c_str(), path.c_str());
+            fs::create_symlink(target, path, none);
         } else if (from != path && fs::is_regular_file(fs::symlink_status(from))) {
             (void)::unlink(path.c_str());
-            (void)::link(from.c_str(), path.c_str());
+            fs::create_hard_link(from, path, none);
             virtualTime::touch(path);
         }
     }
