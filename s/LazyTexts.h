@@ -4,9 +4,11 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <cstdint>
 #include <cstring>
 #include <iterator>
 #include <map>
+#include <memory>
 #include <string_view>
 #include <utility>
 #include <vector>
@@ -22,20 +24,22 @@ public:
     /// @param name the rest of it
     /// @param value any text
     void set(std::string_view owner, std::string_view name, std::string_view value) {
-        const Lengths lengths{owner.size() + name.size(), value.size()};
-        reserve(sizeof lengths + lengths.key + lengths.value);
-        append({reinterpret_cast<const char*>(&lengths), sizeof lengths});
-        append(owner);
-        append(name);
-        append(value);
+        const Lengths lengths{static_cast<std::uint32_t>(owner.size() + name.size()),
+                              static_cast<std::uint32_t>(value.size())};
+        char* end = reserve(sizeof lengths + owner.size() + name.size() + value.size());
+        std::memcpy(end, &lengths, sizeof lengths);
+        end += sizeof lengths;
+        for (const std::string_view text : {owner, name, value}) {
+            end += text.copy(end, text.size());
+        }
     }
 
     /// Sorts the log into the map, unless that was done before. If memory runs out, the next call does it again.
     /// @return the map; always the same object
     [[nodiscard]] const Map& get() const {
         auto last = m_map.end();
-        for (const std::vector<char>& block : m_log) {
-            for (const char* next = block.data(); next != block.data() + block.size();) {
+        for (const Block& block : m_log) {
+            for (const char* next = block.bytes.get(); next != block.bytes.get() + block.size;) {
                 Lengths lengths;
                 std::memcpy(&lengths, next, sizeof lengths);
                 const char* const key = next + sizeof lengths;
@@ -51,27 +55,33 @@ public:
     }
 
 private:
-    /// What is in front of the two texts of an entry.
+    /// What is in front of the two texts of an entry. No text of a database is longer than 1 GiB.
     struct Lengths {
-        std::size_t key;
-        std::size_t value;
+        std::uint32_t key;
+        std::uint32_t value;
+    };
+
+    struct Block {
+        std::unique_ptr<char[]> bytes;
+        std::size_t capacity;
+        std::size_t size;
     };
 
     static constexpr std::size_t MIN_BLOCK = std::size_t{1} << 10;
     static constexpr std::size_t MAX_BLOCK = std::size_t{1} << 16;
 
-    /// Makes room for an entry, which is in one block as a whole, so that appending to it does not fail.
-    void reserve(std::size_t size) {
-        if (m_log.empty() || m_log.back().capacity() - m_log.back().size() < size) {
-            const std::size_t former = m_log.empty() ? 0 : m_log.back().capacity();
-            std::vector<char> block;
-            block.reserve(std::max(size, std::clamp(2 * former, MIN_BLOCK, MAX_BLOCK)));
-            m_log.push_back(std::move(block));
+    /// Makes room for an entry, which is in one block as a whole.
+    [[nodiscard]] char* reserve(std::size_t size) {
+        if (m_log.empty() || m_log.back().capacity - m_log.back().size < size) {
+            const std::size_t former = m_log.empty() ? 0 : m_log.back().capacity;
+            const std::size_t capacity = std::max(size, std::clamp(2 * former, MIN_BLOCK, MAX_BLOCK));
+            // Without values: most of a block may never be used.
+            m_log.push_back({std::unique_ptr<char[]>(new char[capacity]), capacity, 0});
         }
+        Block& block = m_log.back();
+        return block.bytes.get() + std::exchange(block.size, block.size + size);
     }
 
-    void append(std::string_view text) { m_log.back().insert(m_log.back().end(), text.begin(), text.end()); }
-
     mutable Map m_map;
-    mutable std::vector<std::vector<char>> m_log;
+    mutable std::vector<Block> m_log;
 };
