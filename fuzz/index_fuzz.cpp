@@ -27,13 +27,11 @@ void use(const acd::DirectoryIndex& index) {
     acd::DeviceIndex devices;
     for (const acd::IndexedFile& file : index.contents().files) {
         devices.add(file.sections, 0);
-        std::uint32_t begin = 0;
-        for (const std::uint32_t end : file.sections.ends()) {
-            if (devices.family({file.sections.bytes().data() + begin, end - begin}) != 0) {
+        file.sections.forEach([&devices](std::string_view name) {
+            if (devices.family(name) != 0) {
                 fuzz::fail("a section is not found");
             }
-            begin = end;
-        }
+        });
         const acd::PackedStrings* const sections = index.sections(file.name);
         if (sections != nullptr && !index.contents().isSettled(file)) {
             // Names may repeat here; the directory's listing, which has none twice, is compared before.

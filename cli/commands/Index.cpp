@@ -71,7 +71,8 @@ StateName nameOf(acd::IndexState state) {
 }
 
 std::string asText(const acd::FileTime& time) {
-    constexpr std::int64_t LAST_SECOND = 253402300799; // of the year 9999: a file system can record any number
+    constexpr std::int64_t LAST_SECOND =
+        253402300799; // of the year 9999: a file system can record any number
     if (time.seconds < 0 || time.seconds > LAST_SECOND) {
         return fmt::format("{}.{:09}", time.seconds, time.nanoseconds);
     }
@@ -96,11 +97,7 @@ std::string asText(const Shown& shown, const Terminal& terminal) {
 
 Json asJson(const acd::PackedStrings& strings) {
     Json list = Json::array();
-    std::size_t begin = 0;
-    for (const std::size_t end : strings.ends()) {
-        list.push_back(std::string(strings.bytes().data() + begin, end - begin));
-        begin = end;
-    }
+    strings.forEach([&list](std::string_view name) { list.push_back(std::string(name)); });
     return list;
 }
 

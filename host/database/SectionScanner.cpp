@@ -2,6 +2,8 @@
 
 #include "database/LineReader.h"
 
+#include <AcdText.h>
+
 #include <algorithm>
 #include <cstring>
 #include <utility>
@@ -49,6 +51,20 @@ bool PackedStrings::assign(std::string_view bytes, std::vector<std::uint32_t> en
     m_bytes.assign(bytes.begin(), bytes.end());
     m_ends = std::move(ends);
     return true;
+}
+
+bool PackedStrings::containsIgnoreCase(std::string_view name) const noexcept {
+    std::uint32_t begin = 0;
+    for (const std::uint32_t end : m_ends) {
+        // Most names differ in their length or their last byte.
+        if (end - begin == name.size() &&
+            AcdText::toLower(m_bytes[end - 1]) == AcdText::toLower(name.back()) &&
+            AcdText::equalsIgnoreCase({m_bytes.data() + begin, name.size()}, name)) {
+            return true;
+        }
+        begin = end;
+    }
+    return false;
 }
 
 SectionScanner::SectionScanner(std::size_t bufferSize)
