@@ -57,9 +57,8 @@ void ConstraintsManager::Implementation::loadModeDeviceSets() {
 }
 
 void ConstraintsManager::Implementation::loadDeviceIdcodes() {
-    auto last = m_deviceIdcodes.end();
-    forEachRecord(*m_devKey, "IDCODE", [&](const Record& record, StringBase device) {
-        last = insertWithHint(m_deviceIdcodes, last, std::move(device), record.field(1));
+    forEachRecord(*m_devKey, "IDCODE", [&](const Record& record, const StringBase& device) {
+        m_deviceIdcodes.set(device, {}, view(record.field(1)));
     });
 }
 
