@@ -117,7 +117,8 @@ lint::Report examine(const lint::Model& model, const Rules& selected, const Rule
     // Comments first: one that suppresses a finding is used, even if that finding is not selected.
     std::vector<lint::Finding> all = lint::withoutSuppressed(model, findings);
     std::erase_if(all, [&](const lint::Finding& finding) {
-        return (!selected.empty() && !selected.contains(finding.rule)) || ignored.contains(finding.rule);
+        return (!selected.empty() && !selected.contains(finding.rule)) || ignored.contains(finding.rule) ||
+               (finding.rule->needsAllFiles && !model.isComplete());
     });
     return {lint::sorted(std::move(all), model)};
 }
@@ -160,30 +161,26 @@ std::size_t readCount(const std::string& text) {
     return count;
 }
 
-/// Shows at most that many findings, and how many there are of each rule.
-ExitCode showSome(Tool& tool, lint::Report report, std::size_t most, ExitCode status) {
-    if (!report.findings.empty()) {
-        tool.note(fmt::format("{}; {} shown\n{}", summary(report), std::min(most, report.findings.size()),
+/// Shows findings as text, and how many there are of each rule.
+ExitCode showText(Tool& tool, lint::Report report, const Arguments& arguments, ExitCode status) {
+    const std::size_t found = report.findings.size();
+    const std::size_t shown = arguments.most ? std::min(readCount(*arguments.most), found) : found;
+    if (found != 0) {
+        tool.note(fmt::format("{}{}\n{}", summary(report),
+                              arguments.most ? fmt::format("; {} shown", shown) : std::string(),
                               countsByCode(report)));
     }
-    report.findings.erase(report.findings.begin() +
-                              static_cast<std::ptrdiff_t>(std::min(most, report.findings.size())),
+    report.findings.erase(report.findings.begin() + static_cast<std::ptrdiff_t>(shown),
                           report.findings.end());
     return tool.answer(report, status);
 }
 
-ExitCode show(Tool& tool, const lint::Report& report, const Arguments& arguments) {
+ExitCode show(Tool& tool, lint::Report report, const Arguments& arguments, bool isComplete) {
     const bool isRefused =
         report.count(lint::Severity::ERROR) != 0 || (arguments.strict && !report.findings.empty());
-    const ExitCode status = isRefused ? ExitCode::NO : ExitCode::YES;
+    const ExitCode status = !isComplete ? ExitCode::FAULT : isRefused ? ExitCode::NO : ExitCode::YES;
     if (arguments.format == "text") {
-        if (arguments.most) {
-            return showSome(tool, report, readCount(*arguments.most), status);
-        }
-        if (!report.findings.empty()) {
-            tool.note(summary(report));
-        }
-        return tool.answer(report, status);
+        return showText(tool, std::move(report), arguments, status);
     }
     std::string text;
     if (arguments.format == "github") {
@@ -245,7 +242,7 @@ ExitCode run(Tool& tool, Arguments arguments) {
     if (!arguments.baseline.empty()) {
         dropKnown(report, arguments.baseline);
     }
-    return show(tool, report, arguments);
+    return show(tool, std::move(report), arguments, model.isComplete());
 }
 
 Action declare(ArgumentList& list) {
@@ -289,7 +286,7 @@ Action declare(ArgumentList& list) {
          .target = &arguments->baseline},
         {.name = "--max",
          .value = "N",
-         .description = "Print at most N findings, and how many there are of each rule",
+         .description = "Print at most N findings",
          .target = &arguments->most},
         {.name = "--strict",
          .description = "Exit with status 1 for warnings, too",

@@ -60,18 +60,26 @@ void Findings::addText(const Rule& rule, const Token& token, std::string text) {
 
 std::string Findings::didYouMean(std::string_view text, const std::vector<std::string>& candidates,
                                  const std::vector<Token>& used) {
-    const std::size_t cost = candidates.size() + used.size();
-    if (cost > m_comparisonsLeft) {
+    if (used.size() > m_comparisonsLeft) {
         return {};
     }
-    m_comparisonsLeft -= cost;
+    m_comparisonsLeft -= used.size();
     std::set<std::string_view> names;
     for (const Token& token : used) {
         names.insert(token.text);
     }
+    return didYouMean(text, candidates,
+                      [&names](const std::string& candidate) { return names.contains(candidate); });
+}
+
+std::string Findings::didYouMean(std::string_view text, const std::vector<std::string>& candidates,
+                                 const std::function<bool(const std::string&)>& isUsed) {
+    if (candidates.size() > m_comparisonsLeft) {
+        return {};
+    }
+    m_comparisonsLeft -= candidates.size();
     std::vector<std::string> unused;
-    std::copy_if(candidates.begin(), candidates.end(), std::back_inserter(unused),
-                 [&names](const std::string& candidate) { return !names.contains(candidate); });
+    std::copy_if(candidates.begin(), candidates.end(), std::back_inserter(unused), std::not_fn(isUsed));
     return ::didYouMean(text, unused);
 }
 

@@ -6,6 +6,7 @@
 #include <fmt/format.h>
 
 #include <cstddef>
+#include <functional>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -35,6 +36,11 @@ public:
     /// @param used names that the place already has: they are never suggested
     [[nodiscard]] std::string didYouMean(std::string_view text, const std::vector<std::string>& candidates,
                                          const std::vector<Token>& used = {});
+
+    /// Likewise.
+    /// @param isUsed says of a candidate whether the place already has it
+    [[nodiscard]] std::string didYouMean(std::string_view text, const std::vector<std::string>& candidates,
+                                         const std::function<bool(const std::string&)>& isUsed);
 
     [[nodiscard]] const std::vector<Finding>& all() const noexcept { return m_findings; }
 

@@ -301,6 +301,11 @@ void Model::findFlashes() {
     }
 }
 
+bool Model::isComplete() const {
+    return std::all_of(m_files.begin(), m_files.end(),
+                       [](const AcdLines& file) { return file.readError().empty(); });
+}
+
 const Section& Model::baseKeys() const {
     static const Section none{};
     return m_base == nullptr ? none : m_base->own;

@@ -76,8 +76,10 @@ std::vector<AcdLines> AcdLines::ofDatabase() {
     std::vector<AcdLines> all;
     for (const auto& family : store.families()) {
         for (const acd::SourceFile& file : family->files) {
-            const acd::Text text = store.read(file);
+            std::string error;
+            const acd::Text text = store.tryRead(file, error);
             all.emplace_back(std::string_view(text.bytes.get(), text.size), file.path, family->name);
+            all.back().m_readError = std::move(error);
             all.back().m_caseCollisions = file.caseCollisions;
         }
     }

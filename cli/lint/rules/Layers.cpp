@@ -13,7 +13,8 @@ constexpr Rule APPEND_WITHOUT_VALUE{
     R"("+=" in a section that has no value of its own)",
     R"(In a section "+=" adds to the section's own value, not to that of the family. Without one the appended text is the
 whole value of the device and hides the family's records. Write out all records with "=".)",
-    "OPERATION = PROGRAM,Bscan,USB2\n[KS50]\nOPERATION += :VERIFY,Bscan,USB2"};
+    "OPERATION = PROGRAM,Bscan,USB2\n[KS50]\nOPERATION += :VERIFY,Bscan,USB2",
+    true};
 constexpr Rule HIDDEN_NAMES{
     "R102",
     "hidden-names",

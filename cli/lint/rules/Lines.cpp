@@ -98,7 +98,7 @@ constexpr Rule SWALLOWED_LINE{
     "swallowed-line",
     Severity::ERROR,
     "continuation that looks like a header, a key or a comment",
-    R"(After a "\" at the end of a line the next line is part of the value, whatever it looks like: a header opens
+    R"(After a "\" at the end of a line the next line is part of the value, even if it looks like something else: a header opens
 no section, a key sets nothing, and a comment is text. Remove the "\", or move the comment above the key.)",
     "PROPERTY = PINS,140: \\\n[KS100]"};
 
@@ -110,6 +110,14 @@ constexpr Rule LONE_CR{
     R"(Lines end in LF or CRLF; a CR anywhere else is part of the text. A file whose lines end in CR alone is a single
 line.)",
     "PROPERTY = PINS,140<CR>PROPERTIES = PACKAGES,1,TQ100"};
+constexpr Rule UNREADABLE_FILE{
+    "L114",
+    "unreadable-file",
+    Severity::ERROR,
+    "file that cannot be read",
+    R"(The file cannot be opened or read, or it is not a regular file. Its devices do not exist for applications. The other
+files are checked, but names that this file may define are not reported as unknown. The exit status is 2.)",
+    ""};
 
 const Rule* ruleFor(AcdLines::ParseError error) {
     switch (error) {
@@ -169,8 +177,7 @@ void checkSwallowed(const AcdLines& file, const AcdLines::Line& line, Findings& 
         const std::string_view text = source.substr(std::min<std::size_t>(span.column - 1, source.size()));
         if (const char* const what = looksLike(text)) {
             findings.add(SWALLOWED_LINE, {text, {&file, span.line, span.column}},
-                         "this is no line of its own but part of the value of {}, though it looks like {}",
-                         inQuotes(line.name), what);
+                         "this continues the value of {}, but looks like {}", inQuotes(line.name), what);
         }
     }
 }
@@ -186,6 +193,9 @@ void checkReturns(const AcdLines& file, unsigned line, Findings& findings) {
 
 void check(const Model& model, Findings& findings) {
     for (const AcdLines& file : model.files()) {
+        if (!file.readError().empty()) {
+            findings.add(UNREADABLE_FILE, startOf(file), "the file cannot be read: {}", file.readError());
+        }
         for (const AcdLines::Comment& comment : file.comments()) {
             checkReturns(file, comment.line, findings);
         }
@@ -217,7 +227,7 @@ RuleSet lineRules() {
     return {"lines",
             {&NO_EQUALS_SIGN, &EMPTY_KEY, &BLANK_IN_KEY, &NUL_BYTE, &LINE_TOO_LONG, &CONTINUED_AT_END,
              &UNCLOSED_HEADER, &EMPTY_NAME, &BLANK_IN_NAME, &TEXT_AFTER_HEADER, &VALUE_TOO_LONG,
-             &SWALLOWED_LINE, &LONE_CR},
+             &SWALLOWED_LINE, &LONE_CR, &UNREADABLE_FILE},
             check};
 }
 

@@ -87,7 +87,7 @@ void checkTexts(const std::vector<Token>& tokens, Findings& findings) {
         if (text.empty() && tokens.size() > 1) {
             const bool isLast = &token == &tokens.back();
             findings.addText(isLast ? TRAILING_SEPARATOR : EMPTY_ITEM, token,
-                             isLast ? "a separator at the end leaves an empty item behind it" : "empty item");
+                             isLast ? "a separator at the end adds an empty item" : "empty item");
         } else if (!text.empty() && (isBlank(text.front()) || isBlank(text.back()))) {
             findings.add(BLANK_AROUND_SEPARATOR, token, "the blanks of {} are part of the text",
                          inQuotes(text));

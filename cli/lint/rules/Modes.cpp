@@ -5,6 +5,7 @@
 #include "model/Vocabulary.h"
 
 #include <algorithm>
+#include <set>
 
 namespace lint {
 
@@ -63,15 +64,17 @@ constexpr Rule UNKNOWN_PART_DEVICE{
     "unknown-part-device",
     Severity::ERROR,
     "excluded part with an unknown device",
-    R"(No family's file has a section for the device, and it is no flash either.)",
-    "NOT_SUPPORTED_PART_IN_MODE = SM_KS55_TQ100"};
+    R"(No family's file has a section for the device, and it is not a flash either.)",
+    "NOT_SUPPORTED_PART_IN_MODE = SM_KS55_TQ100",
+    true};
 constexpr Rule UNKNOWN_PART_PACKAGE{
     "M204",
     "unknown-part-package",
     Severity::ERROR,
     "excluded part with a package that the device does not have",
-    "The device's property PACKAGES does not list the package, so this part is never asked for.",
-    "NOT_SUPPORTED_PART_IN_MODE = SM_KS50_TQ101"};
+    "The device's property PACKAGES does not list the package, so applications never ask for this part.",
+    "NOT_SUPPORTED_PART_IN_MODE = SM_KS50_TQ101",
+    true};
 
 constexpr Rule SPI_PART{
     "M206",
@@ -88,7 +91,8 @@ bool contains(const std::vector<std::string>& all, std::string_view text) {
 
 void checkLabel(const Token& label, bool isEntry, Findings& findings) {
     if (isEntry) {
-        findings.add(NO_LABEL, label, "{} stands where the label does, and is skipped", inQuotes(label.text));
+        findings.add(NO_LABEL, label, "{} is in the place of the label, and is skipped",
+                     inQuotes(label.text));
     }
 }
 
@@ -112,7 +116,7 @@ void checkFamilies(const Model& model, const std::vector<Token>& families, Findi
         }
         if (const Device* const device = model.device(text)) {
             findings.add(UNKNOWN_MODE_FAMILY, families[i],
-                         "{} is a device; only its family {} can stand here", inQuotes(text),
+                         "{} is a device; only its family {} can be listed here", inQuotes(text),
                          inQuotes(device->family->name));
         } else {
             findings.add(UNKNOWN_MODE_FAMILY, families[i], "unknown family {}{}", inQuotes(text),
@@ -127,9 +131,9 @@ void checkMode(const Model& model, const Value& value, Findings& findings) {
         return; // a layer empties the key on purpose
     }
     if (items.size() > 2) {
-        findings.addText(NOT_TWO_ITEMS, items[2].whole, "what stands behind the families is never read");
+        findings.addText(NOT_TWO_ITEMS, items[2].whole, "text after the families is never read");
     } else if (items.size() < 2) {
-        findings.addText(NOT_TWO_ITEMS, value.key, "no list of families behind the outputs");
+        findings.addText(NOT_TWO_ITEMS, value.key, "no list of families after the outputs");
     }
     if (!items.empty()) {
         checkOutputs(items[0].fields, findings);
@@ -139,7 +143,9 @@ void checkMode(const Model& model, const Value& value, Findings& findings) {
     }
 }
 
-void checkPart(const Model& model, const Token& part, Findings& findings) {
+void checkPart(const Model& model, const Token& part, const std::set<std::string_view>& excluded,
+               Findings& findings) {
+    const auto isExcluded = [&excluded](const std::string& other) { return excluded.contains(other); };
     const std::string_view text = part.text;
     const std::size_t first = text.find('_');
     const std::size_t second = first == text.npos ? first : text.find('_', first + 1);
@@ -153,11 +159,14 @@ void checkPart(const Model& model, const Token& part, Findings& findings) {
     const std::string_view package = text.substr(second + 1);
     if (!contains(vocabulary::modes(), mode)) {
         findings.add(UNKNOWN_PART_MODE, part, "unknown mode {} in {}{}", inQuotes(mode), inQuotes(text),
-                     findings.didYouMean(mode, vocabulary::modes()));
+                     findings.didYouMean(mode, vocabulary::modes(), [&](const std::string& other) {
+                         return isExcluded(fmt::format("{}_{}_{}", other, name, package));
+                     }));
     }
     if (mode == "SPI") {
         if (name != "spi") {
-            findings.add(SPI_PART, part, "never looked up: in SPI mode {} is; did you mean \"SPI_spi_{}\"?",
+            findings.add(SPI_PART, part,
+                         "never looked up: in SPI mode every device is {}; did you mean \"SPI_spi_{}\"?",
                          inQuotes("spi"), package);
         }
         return;
@@ -168,7 +177,9 @@ void checkPart(const Model& model, const Token& part, Findings& findings) {
     const Device* const device = model.device(name);
     if (device == nullptr) {
         findings.add(UNKNOWN_PART_DEVICE, part, "unknown device {} in {}{}", inQuotes(name), inQuotes(text),
-                     findings.didYouMean(name, model.deviceNames()));
+                     findings.didYouMean(name, model.deviceNames(), [&](const std::string& other) {
+                         return isExcluded(fmt::format("{}_{}_{}", mode, other, package));
+                     }));
         return;
     }
     std::vector<std::string> packages;
@@ -178,7 +189,9 @@ void checkPart(const Model& model, const Token& part, Findings& findings) {
     // The packages of a device that lists none are unknown.
     if (!packages.empty() && !contains(packages, package)) {
         findings.add(UNKNOWN_PART_PACKAGE, part, "{} has no package {}{}", inQuotes(name), inQuotes(package),
-                     findings.didYouMean(package, packages));
+                     findings.didYouMean(package, packages, [&](const std::string& other) {
+                         return isExcluded(fmt::format("{}_{}_{}", mode, name, other));
+                     }));
     }
 }
 
@@ -188,9 +201,13 @@ void check(const Model& model, Findings& findings) {
             checkMode(model, *value, findings);
         }
     }
+    std::set<std::string_view> excluded;
+    for (const Token& part : model.baseKeys().list(schema::NOT_SUPPORTED_PART_IN_MODE)) {
+        excluded.insert(part.text);
+    }
     for (const Token& part : model.baseKeys().list(schema::NOT_SUPPORTED_PART_IN_MODE)) {
         if (!part.text.empty()) {
-            checkPart(model, part, findings);
+            checkPart(model, part, excluded, findings);
         }
     }
 }

@@ -17,7 +17,8 @@ constexpr Rule UNKNOWN_SUPPORTED{
     "supported name that is neither family nor device",
     R"(DEVICE_SUPPORTED lists families and devices exactly as their file or header spells them, case included. Any
 other name gets a table that stays empty. Flashes all belong to family "spi".)",
-    "DEVICE_SUPPORTED = base,kestral"};
+    "DEVICE_SUPPORTED = base,kestral",
+    true};
 constexpr Rule UNKNOWN_OPTION_OWNER{
     "B102",
     "unknown-option-owner",
@@ -25,14 +26,16 @@ constexpr Rule UNKNOWN_OPTION_OWNER{
     "option table for a name that is neither family, device nor device with package",
     R"(PROGRAM_OPTION_PACKAGE lists families, devices, and devices with a package directly after them (KS50PQ208,
 without "_"), case included. Any other name gets a table that stays empty.)",
-    "PROGRAM_OPTION_PACKAGE = base,KS50_PQ208"};
+    "PROGRAM_OPTION_PACKAGE = base,KS50_PQ208",
+    true};
 constexpr Rule UNKNOWN_PACKAGE{
     "B103",
     "unknown-package",
     Severity::ERROR,
     "option table for a package that the device does not have",
-    "The device's property PACKAGES does not list the package, so the table is never asked for.",
-    "PROGRAM_OPTION_PACKAGE = base,KS50PQ280"};
+    "The device's property PACKAGES does not list the package, so the table is never used.",
+    "PROGRAM_OPTION_PACKAGE = base,KS50PQ280",
+    true};
 constexpr Rule UNLISTED_FAMILY{
     "B104",
     "unlisted-family",
@@ -73,8 +76,9 @@ constexpr Rule NO_TABLES{
     Severity::WARNING,
     "device of DEVICE_SUPPORTED without tables of its own",
     R"(The section has neither OPERATION nor BSDL_OPERATION, so the device has the operations of its family anyway, but it is
-no longer found with its package behind "_". Remove the name, or add the tables.)",
-    "# while [KS50] has no OPERATION\nDEVICE_SUPPORTED = base,KS50,kestrel"};
+no longer found when its package follows after "_". Remove the name, or add the tables.)",
+    "# while [KS50] has no OPERATION\nDEVICE_SUPPORTED = base,KS50,kestrel",
+    true};
 
 bool isKnown(const Model& model, std::string_view name) {
     // "spi" is a family of every database, even of one without flashes.
