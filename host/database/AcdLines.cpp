@@ -5,7 +5,6 @@
 
 #include <algorithm>
 #include <array>
-#include <functional>
 #include <iterator>
 #include <memory>
 #include <utility>
@@ -117,23 +116,6 @@ std::string_view AcdLines::source(unsigned line) const noexcept {
         text.remove_prefix(acd::BYTE_ORDER_MARK.size());
     }
     return text;
-}
-
-/// The line that a name belongs to; null if it is not of this file.
-const AcdLines::Line* AcdLines::lineOfName(const char* name) const noexcept {
-    const std::less<> isBefore;
-    const char* const begin = m_joined.data();
-    if (isBefore(name, begin) || !isBefore(name, begin + m_joined.size())) {
-        return nullptr;
-    }
-    // Joined lines start where the first of them starts in the source.
-    const auto next =
-        std::upper_bound(m_starts.begin(), m_starts.end(), static_cast<std::size_t>(name - begin));
-    const auto number = static_cast<unsigned>(next - m_starts.begin());
-    const auto following =
-        std::upper_bound(m_lines.begin(), m_lines.end(), number,
-                         [](unsigned wanted, const Line& line) { return wanted < line.firstLine; });
-    return following == m_lines.begin() ? nullptr : &*std::prev(following);
 }
 
 void AcdLines::readLines() {

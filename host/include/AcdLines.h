@@ -108,9 +108,6 @@ public:
     [[nodiscard]] std::string_view source(unsigned line) const noexcept;
 
 private:
-    friend class AcdFamily;
-
-    [[nodiscard]] const Line* lineOfName(const char* name) const noexcept;
     void splitSource();
     void readLines();
     [[nodiscard]] unsigned addComments(unsigned first, unsigned last);

@@ -384,7 +384,7 @@ void checkParts(const Model& model, const std::vector<std::optional<std::set<std
         }
         const std::string_view name = part.text.substr(first + 1, second - first - 1);
         const Device* const device = model.device(name);
-        const std::string_view family = model.isFlashInAnyCase(std::string(name)) ? std::string_view("spi")
+        const std::string_view family = model.isFlashInAnyCase(std::string(name)) ? schema::SPI_FAMILY
                                         : device != nullptr                       ? device->family->name
                                                                                   : std::string_view();
         if (!family.empty() && !modes[*mode]->contains(family)) {

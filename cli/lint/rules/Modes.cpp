@@ -163,11 +163,11 @@ void checkPart(const Model& model, const Token& part, const std::set<std::string
                          return isExcluded(fmt::format("{}_{}_{}", other, name, package));
                      }));
     }
-    if (mode == "SPI") {
-        if (name != "spi") {
+    if (mode == schema::SPI_MODE) {
+        if (name != schema::SPI_FAMILY) {
             findings.add(SPI_PART, part,
                          "never looked up: in SPI mode every device is {}; did you mean \"SPI_spi_{}\"?",
-                         inQuotes("spi"), package);
+                         inQuotes(schema::SPI_FAMILY), package);
         }
         return;
     }

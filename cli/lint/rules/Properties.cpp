@@ -161,9 +161,9 @@ bool namesOperation(std::string_view name) {
 std::vector<std::string> optionPropertyNames() {
     std::vector<std::string> all;
     for (const std::string& operation : vocabulary::operations()) {
-        all.push_back("OP_" + operation);
+        all.push_back(std::string(schema::OPTIONS_PREFIX).append(operation));
         for (const std::string& mode : vocabulary::modes()) {
-            all.push_back("OP_" + operation + '_' + mode);
+            all.push_back(fmt::format("{}{}_{}", schema::OPTIONS_PREFIX, operation, mode));
         }
     }
     return all;

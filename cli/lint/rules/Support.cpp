@@ -82,7 +82,7 @@ no longer found when its package follows after "_". Remove the name, or add the 
 
 bool isKnown(const Model& model, std::string_view name) {
     // "spi" is a family of every database, even of one without flashes.
-    return model.isFamily(name) || model.device(name) != nullptr || name == "spi";
+    return model.isFamily(name) || model.device(name) != nullptr || name == schema::SPI_FAMILY;
 }
 
 std::vector<std::string> familiesAndDevices(const Model& model) {
@@ -208,8 +208,8 @@ void checkFamilies(const Model& model, Findings& findings) {
         }
     }
     // In SPI mode every device is looked up as spi, with or without flashes.
-    if (model.spi() == nullptr && model.baseKeys().find("SPI") != nullptr) {
-        checkTables(model, "spi", findings);
+    if (model.spi() == nullptr && model.baseKeys().find(schema::SPI_MODE) != nullptr) {
+        checkTables(model, std::string(schema::SPI_FAMILY), findings);
     }
     for (const std::string_view name : model.supported()) {
         if (model.device(name) != nullptr && !model.optionPackages().contains(name)) {
