@@ -1,5 +1,6 @@
 // `lint`: reports what is wrong with a database, by file, line and column.
 #include "commands/Commands.h"
+#include "commands/DatabaseArguments.h"
 
 #include "lint/Report.h"
 #include "lint/Suppressions.h"
@@ -14,13 +15,11 @@
 #include <algorithm>
 #include <charconv>
 #include <cstddef>
-#include <filesystem>
 #include <fstream>
 #include <iterator>
 #include <memory>
 #include <optional>
 #include <set>
-#include <system_error>
 #include <utility>
 
 namespace {
@@ -198,46 +197,24 @@ ExitCode show(Tool& tool, lint::Report report, const Arguments& arguments, bool 
     return status;
 }
 
-/// Replaces files by their directories.
-/// @return the files; empty when only directories are given
-std::set<std::string> takeFiles(std::vector<std::string>& paths) {
-    std::set<std::string> files;
-    std::vector<std::string> directories;
-    for (const std::string& path : paths) {
-        std::error_code ignored;
-        const bool isFile = std::filesystem::is_regular_file(path, ignored);
-        const std::string parent = std::filesystem::path(path).parent_path().string();
-        const std::string directory = !isFile ? path : parent.empty() ? "." : parent;
-        if (isFile) {
-            files.insert(
-                (std::filesystem::path(directory) / std::filesystem::path(path).filename()).string());
-        }
-        if (std::find(directories.begin(), directories.end(), directory) == directories.end()) {
-            directories.push_back(directory);
-        }
-    }
-    paths = std::move(directories);
-    return files;
-}
-
-ExitCode run(Tool& tool, Arguments arguments) {
+ExitCode run(Tool& tool, const Arguments& arguments) {
     const Rules selected = rulesOf(arguments.selected);
     const Rules ignored = rulesOf(arguments.ignored);
     if (!arguments.explained.empty()) {
         return explain(tool, arguments);
     }
-    const std::set<std::string> files = takeFiles(arguments.directories);
-    if (arguments.directories.empty()) {
+    const DatabaseArguments database(arguments.directories);
+    if (database.directories.empty()) {
         tool.openDatabase();
     } else {
-        ::openDatabase(arguments.directories);
+        ::openDatabase(database.directories);
     }
     const lint::Model model(AcdLines::ofDatabase());
     // The rules report the readers' faults, too, with a code.
     static_cast<void>(tool.messages().take());
     lint::Report report = examine(model, selected, ignored);
-    std::erase_if(report.findings, [&files](const lint::Finding& finding) {
-        return !files.empty() && !files.contains(std::string(finding.location.file->path()));
+    std::erase_if(report.findings, [&database](const lint::Finding& finding) {
+        return !database.isMeant(finding.location.file->path());
     });
     if (!arguments.baseline.empty()) {
         dropKnown(report, arguments.baseline);
