@@ -108,12 +108,6 @@ bool isOperation(std::string_view name) {
     return all.contains(name);
 }
 
-std::string upperCase(std::string_view text) {
-    std::string upper(text);
-    std::transform(upper.begin(), upper.end(), upper.begin(), AcdText::toUpper);
-    return upper;
-}
-
 /// Which words of a table have a record in which modes.
 struct Table {
     std::map<std::string, Modes> modes;                             ///< by operation or option

@@ -114,7 +114,8 @@ bool isFlashFamily(const Model& model, std::string_view name) {
 
 void checkCase(const Token& name, Findings& findings) {
     if (!isUpperCase(name.text)) {
-        findings.add(NAME_NOT_UPPER_CASE, name, "the flash {} is never found", inQuotes(name.text));
+        findings.add(NAME_NOT_UPPER_CASE, name, "the flash {} is never found", inQuotes(name.text)).fix =
+            replacing(name, upperCase(name.text));
     }
 }
 
@@ -188,9 +189,9 @@ void checkClasses(const Model& model, Findings& findings) {
                              inQuotes(known->second));
             }
             if (!isFamily && !model.isFlashInAnyCase(std::string(flash.text))) {
-                findings.add(UNKNOWN_IN_CLASS, flash, "no family of DEVICE_FAMILY has the flash {}{}",
-                             inQuotes(flash.text),
-                             findings.didYouMean(flash.text, model.flashNames(), listed));
+                findings.addUnknown(UNKNOWN_IN_CLASS, flash, flash,
+                                    findings.suggest(flash.text, model.flashNames(), listed),
+                                    "no family of DEVICE_FAMILY has the flash {}", inQuotes(flash.text));
             }
         }
     }
@@ -204,8 +205,9 @@ void checkMultiboot(const Model& model, Findings& findings) {
         for (const Token& token : listed) {
             const std::string name(token.text);
             if (!name.empty() && !model.isFlashInAnyCase(name) && model.deviceInAnyCase(name) == nullptr) {
-                findings.add(UNKNOWN_IN_MULTIBOOT, token, "{} is neither a flash nor a device{}",
-                             inQuotes(name), findings.didYouMean(name, candidates, listed));
+                findings.addUnknown(UNKNOWN_IN_MULTIBOOT, token, token,
+                                    findings.suggest(name, candidates, listed),
+                                    "{} is neither a flash nor a device", inQuotes(name));
             }
         }
     }
@@ -221,8 +223,9 @@ void checkProperties(const Model& model, Findings& findings) {
         for (const Item& item : value.items) {
             const Token& name = item.fields.front();
             if (!isUpperCase(name.text)) {
-                findings.add(PROPERTY_NOT_UPPER_CASE, name, "the property {} is never found",
-                             inQuotes(name.text));
+                findings
+                    .add(PROPERTY_NOT_UPPER_CASE, name, "the property {} is never found", inQuotes(name.text))
+                    .fix = replacing(name, upperCase(name.text));
             }
             const auto [known, isFirst] = joined.try_emplace(std::string(flash).append(name.text), flash);
             if (!isFirst && known->second != flash) {

@@ -97,6 +97,15 @@ std::optional<Pattern> patternOf(std::string_view text) {
     return pattern;
 }
 
+/// With "0x" and "X" as they must be.
+std::string inUsualCase(std::string_view text) {
+    std::string code = upperCase(text);
+    if (code.size() > 1 && code[1] == 'X') {
+        code[1] = 'x';
+    }
+    return code;
+}
+
 /// Finds patterns that match a common code. There are few different masks, however many codes there are.
 class IdcodeIndex {
 public:
@@ -149,8 +158,9 @@ private:
 void checkCode(const Token& device, const Token& code, bool counts, IdcodeIndex& codes, Findings& findings) {
     const std::optional<Pattern> pattern = patternOf(code.text);
     if (!pattern) {
-        findings.add(MALFORMED_CODE, code, "{} is not 0x and eight hexadecimal digits or X",
-                     inQuotes(code.text));
+        findings
+            .add(MALFORMED_CODE, code, "{} is not 0x and eight hexadecimal digits or X", inQuotes(code.text))
+            .fix = patternOf(inUsualCase(code.text)) ? replacing(code, inUsualCase(code.text)) : std::nullopt;
         return;
     }
     if ((pattern->mask & 1U) != 0 && (pattern->bits & 1U) == 0) {
@@ -175,8 +185,9 @@ void checkDevice(const Model& model, const Token& device, const std::vector<Toke
         findings.add(UNKNOWN_DEVICE, device, "{} is not a device of a family, so it has no IDCODE",
                      inQuotes(device.text));
     } else {
-        findings.add(UNKNOWN_DEVICE, device, "unknown device {}{}", inQuotes(device.text),
-                     findings.didYouMean(device.text, model.deviceNames(), used));
+        findings.addUnknown(UNKNOWN_DEVICE, device, device,
+                            findings.suggest(device.text, model.deviceNames(), used), "unknown device {}",
+                            inQuotes(device.text));
     }
 }
 

@@ -119,10 +119,13 @@ public:
             } else if (line.kind == AcdLines::Kind::INVALID) {
                 open = line.closesSection ? Open::NOTHING : open;
             } else if (open == Open::OWN && !isRead(line.name)) {
-                add(line, hint(line.name, section, m_own));
+                addUnknown(line, section, m_own);
             } else if (open == Open::SECTION && schema::shapeInSection(line.name) == schema::Shape::NONE) {
-                add(line, isRead(line.name) ? "; it belongs before the first section"
-                                            : hint(line.name, section, m_inSection));
+                if (isRead(line.name)) {
+                    add(line, {}, "; it belongs before the first section");
+                } else {
+                    addUnknown(line, section, m_inSection);
+                }
             }
         }
     }
@@ -132,13 +135,16 @@ private:
         return std::binary_search(m_own.begin(), m_own.end(), key);
     }
 
-    /// The nearest key that the section does not set in this file.
-    [[nodiscard]] std::string hint(std::string_view key, const std::string& section,
-                                   const std::vector<std::string>& known) {
-        const std::string file = fileHint(key, m_kind);
-        return !file.empty() ? file : m_findings.didYouMean(key, known, [&](const std::string& other) {
-            return keysSet().contains({section, other});
-        });
+    /// Adds a finding about a key that the file does not have, with the nearest one that the section does not set.
+    void addUnknown(const AcdLines::Line& line, const std::string& section,
+                    const std::vector<std::string>& known) {
+        if (const std::string file = fileHint(line.name, m_kind); !file.empty()) {
+            add(line, {}, file);
+        } else {
+            add(line, m_findings.suggest(line.name, known, [&](const std::string& other) {
+                return keysSet().contains({section, other});
+            }));
+        }
     }
 
     /// The keys that the file sets, each with its section in lower case: collected for the first unknown key only.
@@ -155,9 +161,10 @@ private:
         return m_set;
     }
 
-    void add(const AcdLines::Line& line, const std::string& hint) {
-        m_findings.add(UNKNOWN_KEY, {line.name, {m_file, line.line, line.column}},
-                       "the key {} is not read here{}", inQuotes(line.name), hint);
+    void add(const AcdLines::Line& line, const Suggestion& suggestion, const std::string& hint = {}) {
+        const Token key{line.name, {m_file, line.line, line.column}};
+        m_findings.addUnknown(UNKNOWN_KEY, key, key, suggestion, "the key {} is not read here{}",
+                              inQuotes(line.name), hint);
     }
 
     schema::File m_kind;

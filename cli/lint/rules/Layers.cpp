@@ -63,8 +63,11 @@ void check(const Model& model, Findings& findings) {
             for (const auto& [key, value] : section.values) {
                 checkHidings(key, value, findings);
                 for (const Token& text : value.joinedAppends) {
-                    findings.add(JOINED_APPEND, text, "{} is joined to the text before it; begin with \"{}\"",
-                                 inQuotes(text.text), schema::firstListed(family.kind, key) <= 1 ? "," : ":");
+                    const char* const separator = schema::firstListed(family.kind, key) <= 1 ? "," : ":";
+                    findings
+                        .add(JOINED_APPEND, text, "{} is joined to the text before it; begin with \"{}\"",
+                             inQuotes(text.text), separator)
+                        .fix = insertingBefore(partOf(text, 0, 0), separator);
                 }
             }
         });

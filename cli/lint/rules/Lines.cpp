@@ -147,6 +147,51 @@ const Rule* ruleFor(AcdLines::ParseError error) {
     return nullptr;
 }
 
+bool isOneWord(std::string_view text) { return !text.empty() && text.find_first_of(" \t[]#\\") == text.npos; }
+
+/// A header with one name in it, and a comment after it on a line of its own before it.
+std::optional<Fix> fixOfHeader(const AcdLines& file, const AcdLines::Line& line) {
+    const std::string_view source = file.source(line.firstLine);
+    const std::size_t open = source.find('[');
+    if (open == source.npos || line.firstLine != line.lastLine) {
+        return std::nullopt;
+    }
+    const std::string_view whole = source.substr(open);
+    const std::size_t close = std::min(whole.find(']'), whole.size());
+    const auto trimmed = [](std::string_view text) {
+        const std::size_t begin = std::min(text.find_first_not_of(" \t"), text.size());
+        return text.substr(begin, text.find_last_not_of(" \t") + 1 - begin);
+    };
+    const std::string_view name = trimmed(whole.substr(1, close - 1));
+    const std::string_view rest = trimmed(whole.substr(std::min(close + 1, whole.size())));
+    if (!isOneWord(name) || (!rest.empty() && !rest.starts_with('#'))) {
+        return std::nullopt;
+    }
+    const std::string comment = rest.empty() ? std::string() : std::string(rest) + '\n';
+    return replacing({whole, {&file, line.firstLine, static_cast<unsigned>(open) + 1}},
+                     fmt::format("{}[{}]", comment, name));
+}
+
+/// The last line without the separator and the "\" before what is not there.
+std::optional<Fix> fixOfLastLine(const AcdLines& file, const AcdLines::Line& line) {
+    const std::string_view source = file.source(line.line);
+    const std::size_t end = source.find_last_not_of(" \t,:\\") + 1;
+    return replacing({source.substr(end), {&file, line.line, static_cast<unsigned>(end) + 1}}, "");
+}
+
+std::optional<Fix> fixOf(const AcdLines& file, const AcdLines::Line& line) {
+    switch (line.error) {
+    case AcdLines::ParseError::UNCLOSED_HEADER:
+    case AcdLines::ParseError::BLANK_IN_NAME:
+    case AcdLines::ParseError::TEXT_BEHIND_HEADER:
+        return fixOfHeader(file, line);
+    case AcdLines::ParseError::CONTINUED_AT_END:
+        return fixOfLastLine(file, line);
+    default:
+        return std::nullopt;
+    }
+}
+
 /// Does the text begin with `KEY =`?
 bool looksLikeKey(std::string_view text) {
     const std::size_t end = text.find_first_not_of("ABCDEFGHIJKLMNOPQRSTUVWXYZ0123456789_");
@@ -201,7 +246,8 @@ void check(const Model& model, Findings& findings) {
         }
         for (const AcdLines::Line& line : file.lines()) {
             if (const Rule* const rule = ruleFor(line.error)) {
-                findings.addText(*rule, {{}, {&file, line.line, line.column}}, line.text);
+                findings.addText(*rule, {{}, {&file, line.line, line.column}}, line.text).fix =
+                    fixOf(file, line);
             }
             checkSwallowed(file, line, findings);
             for (unsigned number = line.firstLine; number <= line.lastLine; ++number) {

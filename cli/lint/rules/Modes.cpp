@@ -3,6 +3,7 @@
 #include "lint/rules/RuleSets.h"
 
 #include "model/Vocabulary.h"
+#include "text/Suggest.h"
 
 #include <algorithm>
 #include <set>
@@ -101,8 +102,9 @@ void checkOutputs(const std::vector<Token>& outputs, Findings& findings) {
     for (std::size_t i = 1; i < outputs.size(); ++i) {
         const std::string_view text = outputs[i].text;
         if (!text.empty() && !contains(schema::modeOutputs(), text)) {
-            findings.add(UNKNOWN_MODE_OUTPUT, outputs[i], "unknown output {}{}", inQuotes(text),
-                         findings.didYouMean(text, schema::modeOutputs(), outputs));
+            findings.addUnknown(UNKNOWN_MODE_OUTPUT, outputs[i], outputs[i],
+                                findings.suggest(text, schema::modeOutputs(), outputs), "unknown output {}",
+                                inQuotes(text));
         }
     }
 }
@@ -119,8 +121,9 @@ void checkFamilies(const Model& model, const std::vector<Token>& families, Findi
                          "{} is a device; only its family {} can be listed here", inQuotes(text),
                          inQuotes(device->family->name));
         } else {
-            findings.add(UNKNOWN_MODE_FAMILY, families[i], "unknown family {}{}", inQuotes(text),
-                         findings.didYouMean(text, model.familyNames(), families));
+            findings.addUnknown(UNKNOWN_MODE_FAMILY, families[i], families[i],
+                                findings.suggest(text, model.familyNames(), families), "unknown family {}",
+                                inQuotes(text));
         }
     }
 }
@@ -158,16 +161,24 @@ void checkPart(const Model& model, const Token& part, const std::set<std::string
     const std::string_view name = text.substr(first + 1, second - first - 1);
     const std::string_view package = text.substr(second + 1);
     if (!contains(vocabulary::modes(), mode)) {
-        findings.add(UNKNOWN_PART_MODE, part, "unknown mode {} in {}{}", inQuotes(mode), inQuotes(text),
-                     findings.didYouMean(mode, vocabulary::modes(), [&](const std::string& other) {
-                         return isExcluded(fmt::format("{}_{}_{}", other, name, package));
-                     }));
+        findings.addUnknown(UNKNOWN_PART_MODE, part, partOf(part, 0, mode.size()),
+                            findings.suggest(mode, vocabulary::modes(),
+                                             [&](const std::string& other) {
+                                                 return isExcluded(
+                                                     fmt::format("{}_{}_{}", other, name, package));
+                                             }),
+                            "unknown mode {} in {}", inQuotes(mode), inQuotes(text));
     }
     if (mode == schema::SPI_MODE) {
         if (name != schema::SPI_FAMILY) {
-            findings.add(SPI_PART, part,
-                         "never looked up: in SPI mode every device is {}; did you mean \"SPI_spi_{}\"?",
-                         inQuotes(schema::SPI_FAMILY), package);
+            Finding& finding =
+                findings.add(SPI_PART, part,
+                             "never looked up: in SPI mode every device is {}; did you mean \"SPI_spi_{}\"?",
+                             inQuotes(schema::SPI_FAMILY), package);
+            if (sameWithoutCase(name, schema::SPI_FAMILY)) {
+                finding.fix =
+                    replacing(partOf(part, first + 1, name.size()), std::string(schema::SPI_FAMILY));
+            }
         }
         return;
     }
@@ -176,10 +187,13 @@ void checkPart(const Model& model, const Token& part, const std::set<std::string
     }
     const Device* const device = model.device(name);
     if (device == nullptr) {
-        findings.add(UNKNOWN_PART_DEVICE, part, "unknown device {} in {}{}", inQuotes(name), inQuotes(text),
-                     findings.didYouMean(name, model.deviceNames(), [&](const std::string& other) {
-                         return isExcluded(fmt::format("{}_{}_{}", mode, other, package));
-                     }));
+        findings.addUnknown(UNKNOWN_PART_DEVICE, part, partOf(part, first + 1, name.size()),
+                            findings.suggest(name, model.deviceNames(),
+                                             [&](const std::string& other) {
+                                                 return isExcluded(
+                                                     fmt::format("{}_{}_{}", mode, other, package));
+                                             }),
+                            "unknown device {} in {}", inQuotes(name), inQuotes(text));
         return;
     }
     std::vector<std::string> packages;
@@ -188,10 +202,13 @@ void checkPart(const Model& model, const Token& part, const std::set<std::string
     }
     // The packages of a device that lists none are unknown.
     if (!packages.empty() && !contains(packages, package)) {
-        findings.add(UNKNOWN_PART_PACKAGE, part, "{} has no package {}{}", inQuotes(name), inQuotes(package),
-                     findings.didYouMean(package, packages, [&](const std::string& other) {
-                         return isExcluded(fmt::format("{}_{}_{}", mode, name, other));
-                     }));
+        findings.addUnknown(UNKNOWN_PART_PACKAGE, part, partOf(part, second + 1, package.size()),
+                            findings.suggest(package, packages,
+                                             [&](const std::string& other) {
+                                                 return isExcluded(
+                                                     fmt::format("{}_{}_{}", mode, name, other));
+                                             }),
+                            "{} has no package {}", inQuotes(name), inQuotes(package));
     }
 }
 

@@ -140,11 +140,16 @@ void checkCounted(const Item& item, Findings& findings) {
     const std::vector<Token>& fields = item.fields;
     const std::optional<std::size_t> count = fields.size() < 2 ? std::nullopt : number(fields[1].text);
     if (!count) {
-        findings.add(NO_COUNT, fields.size() < 2 ? item.whole : fields[1], "no number of values after {}",
-                     inQuotes(fields[0].text));
+        Finding& finding = findings.add(NO_COUNT, fields.size() < 2 ? item.whole : fields[1],
+                                        "no number of values after {}", inQuotes(fields[0].text));
+        if (fields.size() > 1) {
+            finding.fix = insertingBefore(fields[1], fmt::format("{},", fields.size() - 1));
+        }
     } else if (*count != fields.size() - 2) {
-        findings.add(WRONG_COUNT, fields[1], "{} says {} values and has {}", inQuotes(fields[0].text), *count,
-                     fields.size() - 2);
+        findings
+            .add(WRONG_COUNT, fields[1], "{} says {} values and has {}", inQuotes(fields[0].text), *count,
+                 fields.size() - 2)
+            .fix = replacing(fields[1], std::to_string(fields.size() - 2));
     }
 }
 
@@ -178,10 +183,11 @@ void checkMeaning(const Item& item, std::size_t firstValue, const std::set<std::
     const bool isUpperOption = upper.starts_with(schema::OPTIONS_PREFIX) &&
                                namesOperation(std::string_view(upper).substr(schema::OPTIONS_PREFIX.size()));
     if (isOption ? name.text != upper || !isUpperOption : isUpperOption) {
-        findings.add(
-            UNKNOWN_OPERATION_NAME, name, "{} belongs to no operation{}", inQuotes(name.text),
-            findings.didYouMean(name.text, optionPropertyNames(),
-                                [&names](const std::string& other) { return names.contains(other); }));
+        findings.addUnknown(
+            UNKNOWN_OPERATION_NAME, name, name,
+            findings.suggest(name.text, optionPropertyNames(),
+                             [&names](const std::string& other) { return names.contains(other); }),
+            "{} belongs to no operation", inQuotes(name.text));
     }
     if (!isOption && !contains(vocabulary::operations(), name.text)) {
         return;
@@ -193,11 +199,11 @@ void checkMeaning(const Item& item, std::size_t firstValue, const std::set<std::
             continue;
         }
         // The word that records use for a mode is the likeliest mistake.
-        const std::string hint = !isOption && sameWithoutCase(value.text, "Bscan")
-                                     ? "; did you mean \"BS\"?"
-                                     : findings.didYouMean(value.text, known, item.fields);
-        findings.add(isOption ? UNKNOWN_OPTION_VALUE : UNKNOWN_MODE_KEY, value, "unknown {} {}{}",
-                     isOption ? "option" : "mode key", inQuotes(value.text), hint);
+        const Suggestion suggestion = !isOption && sameWithoutCase(value.text, "Bscan")
+                                          ? Suggestion{"BS", true}
+                                          : findings.suggest(value.text, known, item.fields);
+        findings.addUnknown(isOption ? UNKNOWN_OPTION_VALUE : UNKNOWN_MODE_KEY, value, value, suggestion,
+                            "unknown {} {}", isOption ? "option" : "mode key", inQuotes(value.text));
     }
 }
 
@@ -206,8 +212,10 @@ void checkFlags(const Item& item, std::size_t firstValue, Findings& findings) {
         const Token& value = item.fields[i];
         for (const char* const flag : {"TRUE", "FALSE"}) {
             if (sameWithoutCase(value.text, flag) && value.text != flag) {
-                findings.add(FLAG_NOT_UPPER_CASE, value, "{} is not {}: flags are compared with case",
-                             inQuotes(value.text), flag);
+                findings
+                    .add(FLAG_NOT_UPPER_CASE, value, "{} is not {}: flags are compared with case",
+                         inQuotes(value.text), flag)
+                    .fix = replacing(value, flag);
             }
         }
     }

@@ -96,8 +96,9 @@ void checkSupported(const Model& model, Findings& findings) {
     const std::vector<Token>& listed = model.baseKeys().list(schema::DEVICE_SUPPORTED);
     for (const Token& name : listed) {
         if (!name.text.empty() && !isKnown(model, name.text)) {
-            findings.add(UNKNOWN_SUPPORTED, name, "{} is neither a family nor a device{}",
-                         inQuotes(name.text), findings.didYouMean(name.text, candidates, listed));
+            findings.addUnknown(UNKNOWN_SUPPORTED, name, name,
+                                findings.suggest(name.text, candidates, listed),
+                                "{} is neither a family nor a device", inQuotes(name.text));
         }
         const Device* const device = model.device(name.text);
         if (device != nullptr && device->section->find(schema::OPERATION) == nullptr &&
@@ -151,14 +152,14 @@ void checkOptionOwners(const Model& model, Findings& findings) {
         std::string device;
         switch (partOf(model, name.text, packages, device)) {
         case Part::UNKNOWN:
-            findings.add(UNKNOWN_OPTION_OWNER, name,
-                         "{} is neither a family nor a device, nor a device with a package{}",
-                         inQuotes(name.text), findings.didYouMean(name.text, candidates, listed));
+            findings.addUnknown(
+                UNKNOWN_OPTION_OWNER, name, name, findings.suggest(name.text, candidates, listed),
+                "{} is neither a family nor a device, nor a device with a package", inQuotes(name.text));
             break;
         case Part::OTHER_PACKAGE:
             packages.insert(packages.end(), candidates.begin(), candidates.end());
-            findings.add(UNKNOWN_PACKAGE, name, "no device has the package of {}{}", inQuotes(name.text),
-                         findings.didYouMean(name.text, packages, listed));
+            findings.addUnknown(UNKNOWN_PACKAGE, name, name, findings.suggest(name.text, packages, listed),
+                                "no device has the package of {}", inQuotes(name.text));
             break;
         case Part::KNOWN:
             if (model.supported().contains(device)) {

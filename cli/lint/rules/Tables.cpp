@@ -189,9 +189,9 @@ private:
     }
 
     /// The nearest word that the mode of the record does not have yet.
-    [[nodiscard]] std::string suggestion(const Item& record, const std::vector<std::string>& words) {
+    [[nodiscard]] Suggestion suggestion(const Item& record, const std::vector<std::string>& words) {
         const auto [text, mode] = rowOf(record);
-        return m_findings.didYouMean(text, words, [this, mode = mode](const std::string& word) {
+        return m_findings.suggest(text, words, [this, mode = mode](const std::string& word) {
             return m_rows.contains({word, mode});
         });
     }
@@ -217,8 +217,10 @@ private:
                 checkModeOutput(*mode, fields[i]);
             }
             if (row && mode && output && !m_cells.insert({*row, *mode, *output}).second) {
-                m_findings.add(CELL_TWICE, fields[i], "{} of {} is given already", inQuotes(fields[i].text),
-                               inQuotes(record.whole.text));
+                m_findings
+                    .add(CELL_TWICE, fields[i], "{} of {} is given already", inQuotes(fields[i].text),
+                         inQuotes(record.whole.text))
+                    .fix = removing(fields[i]);
             }
         }
     }
@@ -227,8 +229,9 @@ private:
         const Token& token = record.fields[0];
         const std::optional<std::size_t> found = position(vocabulary::operations(), token.text, true);
         if (!found && !token.text.empty()) {
-            m_findings.add(UNKNOWN_OPERATION, token, "unknown operation {}{}", inQuotes(token.text),
-                           suggestion(record, vocabulary::operations()));
+            m_findings.addUnknown(UNKNOWN_OPERATION, token, token,
+                                  suggestion(record, vocabulary::operations()), "unknown operation {}",
+                                  inQuotes(token.text));
         }
         return found;
     }
@@ -240,8 +243,8 @@ private:
             m_findings.add(UNREADABLE_OPTION, token, "a database cannot give the option {}",
                            inQuotes(token.text));
         } else if (!found && !token.text.empty()) {
-            m_findings.add(UNKNOWN_OPTION, token, "unknown option {}{}", inQuotes(token.text),
-                           suggestion(record, schema::tableOptions()));
+            m_findings.addUnknown(UNKNOWN_OPTION, token, token, suggestion(record, schema::tableOptions()),
+                                  "unknown option {}", inQuotes(token.text));
         }
         return found;
     }
@@ -252,13 +255,15 @@ private:
         const MODE_TYPE mode = ConstraintsManager::modeString2Type(text.c_str());
         if (mode == MODE_TYPE::BS && !sameWithoutCase(text, "Bscan")) {
             if (sameWithoutCase(text, "BS")) {
-                m_findings.add(
-                    ACCIDENTAL_MODE, token,
-                    "{} is read as Boundary Scan only because it is unknown; did you mean \"Bscan\"?",
-                    inQuotes(text));
+                m_findings
+                    .add(ACCIDENTAL_MODE, token,
+                         "{} is read as Boundary Scan only because it is unknown; did you mean \"Bscan\"?",
+                         inQuotes(text))
+                    .fix = replacing(token, "Bscan");
             } else if (!text.empty()) {
-                m_findings.add(UNKNOWN_MODE, token, "unknown mode {}, which is read as Boundary Scan{}",
-                               inQuotes(text), m_findings.didYouMean(text, schema::tableModes()));
+                m_findings.addUnknown(UNKNOWN_MODE, token, token,
+                                      m_findings.suggest(text, schema::tableModes()),
+                                      "unknown mode {}, which is read as Boundary Scan", inQuotes(text));
             }
         } else if (mode > MODE_TYPE::SPI) {
             m_findings.add(MODE_WITHOUT_CELL, token, "the table has no cells for mode {}", inQuotes(text));
@@ -297,14 +302,18 @@ private:
             return found;
         }
         if (position(schema::modeOutputs(), token.text, false)) {
-            m_findings.add(OUTPUT_WITHOUT_CELL, token, "the table has no cells for output {}",
-                           inQuotes(token.text));
+            Finding& finding = m_findings.add(OUTPUT_WITHOUT_CELL, token,
+                                              "the table has no cells for output {}", inQuotes(token.text));
+            if (fields.size() > m_table.firstOutput + 1) {
+                finding.fix = removing(token);
+            }
         } else if (position(vocabulary::outputs(), token.text, false)) {
             m_findings.add(UNKNOWN_OUTPUT, token, "a database cannot give the output {}",
                            inQuotes(token.text));
         } else {
-            m_findings.add(UNKNOWN_OUTPUT, token, "unknown output {}{}", inQuotes(token.text),
-                           m_findings.didYouMean(token.text, schema::tableOutputs(), fields));
+            m_findings.addUnknown(UNKNOWN_OUTPUT, token, token,
+                                  m_findings.suggest(token.text, schema::tableOutputs(), fields),
+                                  "unknown output {}", inQuotes(token.text));
         }
         return std::nullopt;
     }
