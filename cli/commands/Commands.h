@@ -12,6 +12,7 @@ extern const Command DEVICES;
 extern const Command DIFF;
 extern const Command DUMP;
 extern const Command FAMILIES;
+extern const Command FORMAT;
 extern const Command INDEX;
 extern const Command LINT;
 extern const Command MULTIBOOT;

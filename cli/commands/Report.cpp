@@ -3,8 +3,8 @@
 
 #include "query/DeviceSurvey.h"
 #include "query/Tool.h"
-#include "report/AtomicFile.h"
 #include "report/Page.h"
+#include "term/AtomicFile.h"
 #include "term/Progress.h"
 
 #include <fmt/format.h>
@@ -53,7 +53,7 @@ ExitCode run(Tool& tool, const std::string& file) {
     if (file == STANDARD_OUTPUT) {
         return tool.answer(Shown{page});
     }
-    report::writeFile(file, page.html());
+    writeFile(file, page.html());
     return tool.answer(Written{file, page.devices(), page.families()});
 }
 

@@ -101,6 +101,7 @@ std::vector<Endings> endings(const std::string& database) {
          {{GOOD}, {"--explain", "T101"}},
          {{}, {database}},
          {{"/nowhere"}, {"--select", "ZZ"}, {"--format", "zz"}, {"--explain", "ZZ"}}},
+        {"format", {{"--check", GOOD}, {"--diff", database}}, {{"--check", database}}, {{"/nowhere"}}},
         {"diff",
          {{database, database}},
          {{GOOD, database}},
@@ -149,7 +150,7 @@ TEST(ExitStatus, OfEveryCommandWithoutItsDatabase) {
     for (const Endings& each : endings(database.path())) {
         // Two are about the tool itself, and two name their databases.
         if (each.command == "vocabulary" || each.command == "help" || each.command == "diff" ||
-            each.command == "index") {
+            each.command == "format" || each.command == "index") {
             continue;
         }
         Words words = each.command == "lint" ? Words{} : each.yes.front();

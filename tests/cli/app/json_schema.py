@@ -93,6 +93,9 @@ lint
 lint --explain all
 lint --explain ZZ
 lint nowhere
+format --check database
+format --diff mine
+format nowhere
 diff nowhere nowhere
 report
 report --file page.html
