@@ -61,7 +61,7 @@ bool answersAlike(const Files& files, const Files& others) {
 TEST(FormatOfRandomDatabases, ChangesNoAnswer) {
     const std::uint64_t seed = setting("TARVIK_PROPERTY_SEED", 1);
     const std::uint64_t count = setting("TARVIK_PROPERTY_DATABASES", 40);
-    reference::Picker pick{rc::Random(seed)};
+    reference::RandomSource pick{rc::Random(seed)};
     for (std::uint64_t i = 0; i < count && !testing::Test::HasFailure(); ++i) {
         const reference::Health health =
             pick.chance(30) ? reference::Health::DAMAGED : reference::Health::SOUND;
