@@ -15,7 +15,7 @@
 
 namespace {
 
-using why::Question;
+using explanation::Question;
 
 /// The answer, with those to the parts of a complete question.
 struct Answer {
@@ -25,7 +25,8 @@ struct Answer {
 };
 
 std::string asText(const Answer& answer, const Terminal& terminal) {
-    std::string text = asText(Verdict{answer.isAllowed, why::inWords(answer.asked.question), {}}, terminal);
+    std::string text =
+        asText(Verdict{answer.isAllowed, explanation::inWords(answer.asked.question), {}}, terminal);
     for (const Verdict& part : answer.parts) {
         text += "  " + asText(part, terminal);
     }
@@ -34,7 +35,7 @@ std::string asText(const Answer& answer, const Terminal& terminal) {
 
 Json asJson(const Answer& answer) {
     const Question& question = answer.asked.question;
-    const Json asked = why::inJson(question);
+    const Json asked = explanation::inJson(question);
     Json object{{"allowed", answer.isAllowed}};
     for (const char* const member : {"device", "mode", "output", "package", "operation"}) {
         object[member] = asked.value(member, Json());
@@ -50,15 +51,15 @@ Json asJson(const Answer& answer) {
 }
 
 Answer ask(ConstraintsManager& manager, const AskedQuestion& asked) {
-    const std::vector<Question> parts = why::partsOf(asked.question);
+    const std::vector<Question> parts = explanation::partsOf(asked.question);
     if (parts.empty()) {
-        return {asked, why::isAllowed(manager, asked.question)};
+        return {asked, explanation::isAllowed(manager, asked.question)};
     }
     Answer answer{asked};
     for (const Question& part : parts) {
-        const bool isAllowed = why::isAllowed(manager, part);
+        const bool isAllowed = explanation::isAllowed(manager, part);
         answer.isAllowed = answer.isAllowed && isAllowed;
-        answer.parts.push_back({isAllowed, why::inWords(part), why::inJson(part)});
+        answer.parts.push_back({isAllowed, explanation::inWords(part), explanation::inJson(part)});
     }
     return answer;
 }
@@ -71,7 +72,8 @@ ExitCode run(Tool& tool, const QuestionArguments& arguments) {
     }
     const auto inWords = [](bool isAllowed) { return isAllowed ? "yes" : "no"; };
     noteApplicationFault(
-        tool, [&](ConstraintsManager& manager) { return inWords(why::isAllowed(manager, asked.question)); },
+        tool,
+        [&](ConstraintsManager& manager) { return inWords(explanation::isAllowed(manager, asked.question)); },
         inWords(answer.isAllowed));
     const ExitCode status = tool.answer(answer, answer.isAllowed ? ExitCode::YES : ExitCode::NO);
     for (const std::string& check : asked.skipped) {

@@ -18,12 +18,13 @@ ExitCode run(Tool& tool, const QuestionArguments& arguments) {
         throw CommandError(ExitCode::FAULT,
                            "multiboot takes either --lead or --chain\nsee: tarvik multiboot --help");
     }
-    const why::Question question = readQuestion(tool, arguments, QuestionScope::ALL, "multiboot").question;
-    const bool supported = why::isAllowed(tool.manager(), question);
+    const explanation::Question question =
+        readQuestion(tool, arguments, QuestionScope::ALL, "multiboot").question;
+    const bool supported = explanation::isAllowed(tool.manager(), question);
     if (!supported) {
         questions::requireKnown(tool, question.device);
     }
-    return tool.answer(Verdict{supported, why::inWords(question), why::inJson(question)},
+    return tool.answer(Verdict{supported, explanation::inWords(question), explanation::inJson(question)},
                        supported ? ExitCode::YES : ExitCode::NO);
 }
 

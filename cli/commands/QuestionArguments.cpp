@@ -11,7 +11,7 @@
 
 namespace {
 
-using why::Question;
+using explanation::Question;
 using Kind = Question::Kind;
 using Member = std::optional<std::string> QuestionArguments::*;
 
@@ -146,7 +146,7 @@ AskedQuestion readQuestion(Tool& tool, const QuestionArguments& arguments, Quest
         }
     }
     tool.openDatabase();
-    asked.skipped = why::skippedChecks(question);
+    asked.skipped = explanation::skippedChecks(question);
     return asked;
 }
 

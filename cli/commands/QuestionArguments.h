@@ -35,7 +35,7 @@ enum class QuestionScope {
 
 /// A question as the manager is asked it.
 struct AskedQuestion {
-    why::Question question;
+    explanation::Question question;
     std::string reading;              ///< how the device was read, as in `AskedDevice`
     std::vector<std::string> skipped; ///< a line for each check that the question leaves out
 };

@@ -3,8 +3,8 @@
 
 #include "query/DeviceSurvey.h"
 #include "query/Tool.h"
-#include "report/AtomicFile.h"
 #include "report/Page.h"
+#include "term/AtomicFile.h"
 #include "term/Progress.h"
 
 #include <fmt/format.h>
@@ -61,10 +61,10 @@ ExitCode run(Tool& tool, const std::string& file) {
                 }
             },
             [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
-    if (file == STANDARD_OUTPUT || report::isStandardOutput(file)) {
+    if (file == STANDARD_OUTPUT || isStandardOutput(file)) {
         static_cast<void>(tool.answer(Shown{page}));
     } else {
-        report::writeFile(file, page.html());
+        writeFile(file, page.html());
         static_cast<void>(tool.answer(Written{file, page.devices(), page.families(), faults}));
     }
     if (faults.empty()) {

@@ -16,35 +16,35 @@
 
 namespace {
 
-using why::Verdict;
+using explanation::Conclusion;
 
-ExitCode status(Verdict verdict) {
+ExitCode status(Conclusion verdict) {
     switch (verdict) {
-    case Verdict::YES:
+    case Conclusion::YES:
         return ExitCode::YES;
-    case Verdict::NO:
+    case Conclusion::NO:
         return ExitCode::NO;
-    case Verdict::FAULT:
+    case Conclusion::FAULT:
         break;
     }
     return ExitCode::FAULT;
 }
 
 /// Puts a step for each skipped check in front, unless the explanation itself names it.
-void addSkippedChecks(why::Answer& answer) {
-    std::vector<why::Step>& steps = answer.explanation.steps;
+void addSkippedChecks(explanation::Answer& answer) {
+    std::vector<explanation::Step>& steps = answer.explanation.steps;
     for (auto check = answer.skipped.rbegin(); check != answer.skipped.rend(); ++check) {
-        if (std::ranges::find(steps, *check, &why::Step::text) == steps.end()) {
+        if (std::ranges::find(steps, *check, &explanation::Step::text) == steps.end()) {
             steps.insert(steps.begin(), {"skipped", *check});
         }
     }
 }
 
 /// A step about what an application gets, if that is something else.
-void addApplicationFault(why::Answer& answer) {
-    const auto inWords = [](Verdict verdict) { return verdict == Verdict::YES ? "yes" : "no"; };
+void addApplicationFault(explanation::Answer& answer) {
+    const auto inWords = [](Conclusion verdict) { return verdict == Conclusion::YES ? "yes" : "no"; };
     const std::optional<ApplicationFault> fault = findApplicationFault([&](ConstraintsManager& manager) {
-        return inWords(why::isAllowed(manager, answer.question) ? Verdict::YES : Verdict::NO);
+        return inWords(explanation::isAllowed(manager, answer.question) ? Conclusion::YES : Conclusion::NO);
     });
     if (fault) {
         answer.explanation.steps.push_back(
@@ -56,18 +56,18 @@ void addApplicationFault(why::Answer& answer) {
 
 ExitCode run(Tool& tool, const QuestionArguments& arguments) {
     const AskedQuestion asked = readQuestion(tool, arguments, QuestionScope::ALL, "why");
-    const why::Question& question = asked.question;
-    const why::Inquiry inquiry(question);
+    const explanation::Question& question = asked.question;
+    const explanation::Inquiry inquiry(question);
     if (arguments.device && !tool.isLiteral() && !inquiry.manager->isKorvelDevice(question.device.c_str())) {
         throw catalogue::unknownDevice(question.device);
     }
 
     // Further questions serve the explanation: what the manager reports about them is not about the user's question.
     const std::size_t issued = tool.messages().count();
-    why::Answer answer{question, inquiry.verdict, why::explain(question), asked.skipped};
+    explanation::Answer answer{question, inquiry.verdict, explanation::explain(question), asked.skipped};
     addApplicationFault(answer);
-    if (inquiry.verdict == Verdict::NO) {
-        for (why::Step& step : why::alternatives(question)) {
+    if (inquiry.verdict == Conclusion::NO) {
+        for (explanation::Step& step : explanation::alternatives(question)) {
             answer.explanation.steps.push_back(std::move(step));
         }
     }

@@ -16,7 +16,7 @@
 #include <algorithm>
 #include <utility>
 
-namespace why {
+namespace explanation {
 
 namespace {
 
@@ -81,7 +81,7 @@ public:
     }
 
 private:
-    [[nodiscard]] bool isYes() const { return askFreshManager(m_question) == Verdict::YES; }
+    [[nodiscard]] bool isYes() const { return askFreshManager(m_question) == Conclusion::YES; }
 
     /// In SPI mode the tables of all flashes answer for every device.
     [[nodiscard]] bool isAnsweredForAll() const {
@@ -136,7 +136,7 @@ private:
         for (int output = 0; output < outputCount; ++output) {
             with(&Question::output, static_cast<OUTPUT_TYPE>(output), [&] {
                 const Explanation explanation = explain(m_question);
-                if (explanation.verdict != Verdict::YES) {
+                if (explanation.verdict != Conclusion::YES) {
                     return;
                 }
                 // The mode tables name each output by itself: their places would fill the screen.
@@ -179,7 +179,7 @@ private:
             other.multibootType = type;
             other.width = width;
             other.isLead = isLead;
-            if (askFreshManager(other) == Verdict::YES) {
+            if (askFreshManager(other) == Conclusion::YES) {
                 found.push_back(fmt::format("{} device of {} {}", isLead ? "lead" : "chain", type, width));
             }
         });
@@ -207,7 +207,7 @@ private:
         if (std::find(keys.begin(), keys.end(), m_question.property) != keys.end()) {
             return;
         }
-        if (const std::optional<std::string> meant = nearest(m_question.property, keys)) {
+        if (const std::optional<std::string> meant = suggest(m_question.property, keys)) {
             add("instead", fmt::format("there is a property {}", *meant));
         }
     }
@@ -280,7 +280,7 @@ private:
 std::vector<Step> alternatives(const Question& question) {
     std::vector<Step> steps;
     for (const Question& part : partsOf(question)) {
-        if (askFreshManager(part) == Verdict::NO) {
+        if (askFreshManager(part) == Conclusion::NO) {
             const std::vector<Step> found = alternatives(part);
             if (!found.empty()) {
                 steps.push_back({"part", "no: " + inWords(part)});
@@ -293,4 +293,4 @@ std::vector<Step> alternatives(const Question& question) {
     return steps;
 }
 
-} // namespace why
+} // namespace explanation

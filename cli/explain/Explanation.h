@@ -8,7 +8,7 @@
 #include <string>
 #include <vector>
 
-namespace why {
+namespace explanation {
 
 using catalogue::SourceText;
 
@@ -24,7 +24,7 @@ struct Step {
 };
 
 struct Explanation {
-    Verdict verdict = Verdict::NO; ///< that the steps come to
+    Conclusion verdict = Conclusion::NO; ///< that the steps come to
     std::vector<Step> steps;
 
     /// The last record that decides something; null when there is none.
@@ -40,7 +40,7 @@ struct Explanation {
 /// What is shown: the manager's verdict, and how the records lead there.
 struct Answer {
     Question question;
-    Verdict verdict;
+    Conclusion verdict;
     Explanation explanation;
     std::vector<std::string> skipped{}; ///< as `skippedChecks`
 
@@ -50,4 +50,4 @@ struct Answer {
 [[nodiscard]] std::string asText(const Answer& answer, const Terminal& terminal);
 [[nodiscard]] Json asJson(const Answer& answer);
 
-} // namespace why
+} // namespace explanation

@@ -5,7 +5,7 @@
 
 #include <fmt/format.h>
 
-namespace why {
+namespace explanation {
 
 bool ExplanationBuilder::multiboot() {
     const std::string key = fmt::format("{}_{}_{}", m_question.multibootType, m_question.width,
@@ -30,4 +30,4 @@ bool ExplanationBuilder::multiboot() {
     return false;
 }
 
-} // namespace why
+} // namespace explanation

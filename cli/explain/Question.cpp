@@ -13,7 +13,7 @@
 
 #include <algorithm>
 
-namespace why {
+namespace explanation {
 
 namespace {
 
@@ -142,11 +142,11 @@ const char* positionOf(const Question& question) { return question.isLead ? "lea
 
 } // namespace
 
-Verdict ask(ConstraintsManager& manager, const Question& question) {
+Conclusion ask(ConstraintsManager& manager, const Question& question) {
     try {
-        return isAllowed(manager, question) ? Verdict::YES : Verdict::NO;
+        return isAllowed(manager, question) ? Conclusion::YES : Conclusion::NO;
     } catch (const DataMismatchException&) {
-        return Verdict::FAULT;
+        return Conclusion::FAULT;
     }
 }
 
@@ -271,4 +271,4 @@ Json inJson(const Question& question) {
     return asked;
 }
 
-} // namespace why
+} // namespace explanation

@@ -10,7 +10,7 @@
 
 class ConstraintsManager;
 
-namespace why {
+namespace explanation {
 
 /// A question that is answered by yes or no. Members that its kind does not take are not read.
 struct Question {
@@ -46,7 +46,7 @@ struct Question {
     [[nodiscard]] bool takesPackage() const;
 };
 
-enum class Verdict {
+enum class Conclusion {
     YES,
     NO,
     FAULT, ///< the database has a fault at which the manager raises
@@ -57,7 +57,7 @@ enum class Verdict {
 [[nodiscard]] bool isAllowed(ConstraintsManager& manager, const Question& question);
 
 /// The same without an exception.
-[[nodiscard]] Verdict ask(ConstraintsManager& manager, const Question& question);
+[[nodiscard]] Conclusion ask(ConstraintsManager& manager, const Question& question);
 
 /// The questions that a question is composed of; empty for all but the complete ones.
 [[nodiscard]] std::vector<Question> partsOf(const Question& question);
@@ -69,4 +69,4 @@ enum class Verdict {
 [[nodiscard]] std::string inWords(const Question& question);
 [[nodiscard]] Json inJson(const Question& question);
 
-} // namespace why
+} // namespace explanation

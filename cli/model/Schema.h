@@ -29,6 +29,12 @@ enum class Shape {
 inline constexpr const char* BASE = "base.acd";
 inline constexpr const char* SPI = "spi.acd";
 
+/// The family of all flashes, and of every device in SPI mode.
+inline constexpr std::string_view SPI_FAMILY = "spi";
+
+/// The key of SPI mode.
+inline constexpr std::string_view SPI_MODE = "SPI";
+
 inline constexpr const char* DEVICE_SUPPORTED = "DEVICE_SUPPORTED";
 inline constexpr const char* PROGRAM_OPTION_PACKAGE = "PROGRAM_OPTION_PACKAGE";
 inline constexpr const char* NOT_SUPPORTED_PART_IN_MODE = "NOT_SUPPORTED_PART_IN_MODE";

@@ -4,7 +4,6 @@
 #include "database/LineReader.h"
 
 #include <algorithm>
-#include <array>
 #include <cstring>
 #include <iterator>
 #include <tuple>
@@ -14,13 +13,6 @@
 // section and key, so that all lines about a key are adjacent and are merged together.
 
 namespace acd {
-
-namespace {
-
-constexpr std::array KINDS{Line::Kind::HEADER, Line::Kind::ASSIGNMENT, Line::Kind::APPEND,
-                           Line::Kind::INVALID};
-
-} // namespace
 
 /// Fills a database; what it needs for that only goes with it.
 class DatabaseBuilder {
@@ -139,7 +131,10 @@ void DatabaseBuilder::merge() {
         m_database.m_values.push_back(join(standing, last));
         first = last;
     }
-    m_database.m_spans.shrink_to_fit();
+    // A copy is not worth it for less.
+    if (m_database.m_spans.capacity() > 2 * m_database.m_spans.size()) {
+        m_database.m_spans.shrink_to_fit();
+    }
 }
 
 /// Records the values of lower layers that an upper layer replaces.
@@ -218,6 +213,7 @@ Database::Database(std::vector<LayerText> layers, std::vector<LayerError>& error
     Line line;
     for (std::uint32_t layer = 0; layer != m_layers.size(); ++layer) {
         const Text& text = m_layers[layer].text;
+        m_spans.reserve(m_spans.size() + expectedLines(text.size));
         LineReader reader(text.bytes.get(), text.size);
         builder.openLayer(layer);
         while (reader.next(line)) {
@@ -232,28 +228,6 @@ Database::Database(std::vector<LayerText> layers, std::vector<LayerError>& error
         errors.push_back(
             {append.layer, {ParseErrorKind::VALUE_TOO_LONG, false, append.location, excerpt(append.text)}});
     }
-}
-
-Database::Database(const std::vector<const AcdLines*>& layers, std::vector<OversizedAppend>& oversized,
-                   std::size_t maxValueLength) {
-    DatabaseBuilder builder(*this, oversized, maxValueLength);
-    Line line;
-    for (const AcdLines* const file : layers) {
-        builder.openLayer(static_cast<std::uint32_t>(m_layers.size()));
-        m_layers.push_back({file->path(), {}});
-        for (const AcdLines::Line& source : file->lines()) {
-            line.kind = KINDS[static_cast<std::size_t>(source.kind)];
-            line.name = source.name;
-            line.value = source.value;
-            line.error.closesSection = source.closesSection;
-            line.spans.clear();
-            for (const AcdLines::SourceSpan& span : source.spans) {
-                line.spans.push_back({static_cast<std::uint32_t>(span.offset), {span.line, span.column}});
-            }
-            builder.add(line);
-        }
-    }
-    builder.merge();
 }
 
 const Section* Database::section(std::string_view name) const noexcept {

@@ -102,10 +102,15 @@ std::vector<Endings> endings(const std::string& database) {
          {{GOOD}, {"--explain", "T101"}},
          {{}, {database}},
          {{"/nowhere"}, {"--select", "ZZ"}, {"--format", "zz"}, {"--explain", "ZZ"}}},
+        {"format", {{"--check", GOOD}, {"--diff", database}}, {{"--check", database}}, {{"/nowhere"}}},
         {"diff",
          {{database, database}},
          {{GOOD, database}},
          {{database}, {database, "/nowhere"}, {"/nowhere", database}}},
+        {"index",
+         {{database}, {"--show", database}},
+         {{"--show", GOOD}},
+         {{}, {"/nowhere"}, {"--show", "/nowhere"}, {"--show", database, database}}},
         {"report", {{"--file", "/dev/null"}}, {}, {{}, {"--file", "/nowhere/page.html"}}},
         {"batch", {{}}, {}, {{"zz"}}},
         {"help", {{}, {"check"}}, {}, {{"zz"}}},
@@ -144,8 +149,9 @@ TEST(ExitStatus, OfEveryCommandWithoutItsDatabase) {
     const SmallDatabase database;
     const DatabaseDirectory empty;
     for (const Endings& each : endings(database.path())) {
-        // Two are about the tool itself, and one names its databases.
-        if (each.command == "vocabulary" || each.command == "help" || each.command == "diff") {
+        // Two are about the tool itself, and two name their databases.
+        if (each.command == "vocabulary" || each.command == "help" || each.command == "diff" ||
+            each.command == "format" || each.command == "index") {
             continue;
         }
         Words words = each.command == "lint" ? Words{} : each.yes.front();

@@ -117,11 +117,19 @@ lint
 lint --explain all
 lint --explain ZZ
 lint nowhere
+format --check database
+format --diff mine
+format nowhere
 diff nowhere nowhere
 report
 report --file page.html
 report --file -
 report --file nowhere/page.html
+index nowhere
+index --show nowhere
+index --show site
+index site
+index --show site
 --database site:database show KS50
 --database site:database why KS50 --property PINS
 families extra

@@ -3,14 +3,14 @@
 #include "explain/Question.h"
 #include "model/Multiboot.h"
 
-#include "reference/Picker.h"
+#include "reference/RandomSource.h"
 #include "reference/Words.h"
 
 #include <string>
 
 namespace reference {
 
-[[nodiscard]] inline std::string randomName(Picker& pick) {
+[[nodiscard]] inline std::string randomName(RandomSource& pick) {
     switch (pick.below(10)) {
     case 0:
         return pick.from(words::FAMILIES);
@@ -27,14 +27,14 @@ namespace reference {
 }
 
 template <typename Type>
-[[nodiscard]] Type below(Picker& pick, int count) {
+[[nodiscard]] Type below(RandomSource& pick, int count) {
     return static_cast<Type>(pick.below(count));
 }
 
 /// A question in words that random databases are made of.
-[[nodiscard]] inline why::Question randomQuestion(Picker& pick) {
-    using Kind = why::Question::Kind;
-    why::Question question;
+[[nodiscard]] inline explanation::Question randomQuestion(RandomSource& pick) {
+    using Kind = explanation::Question::Kind;
+    explanation::Question question;
     constexpr int KINDS = static_cast<int>(Kind::COMPLETE_IN_MODE) + 1;
     question.kind = below<Kind>(pick, pick.chance(70) ? 8 : KINDS);
     question.device = randomName(pick);

@@ -1,5 +1,5 @@
 // Replaces a file as a whole, so that a reader never finds half a page and a run that fails keeps the former one.
-#include "report/AtomicFile.h"
+#include "term/AtomicFile.h"
 
 #include "term/ExitCode.h"
 
@@ -11,8 +11,6 @@
 #include <filesystem>
 #include <sys/stat.h>
 #include <unistd.h>
-
-namespace report {
 
 namespace {
 
@@ -69,9 +67,15 @@ std::filesystem::path targetOf(const std::filesystem::path& path) {
     return target;
 }
 
-/// Would another file in the place of this one differ in more than its text?
-bool isUnique(const struct stat& former) {
-    return former.st_nlink == 1 && former.st_uid == ::geteuid() && former.st_gid == ::getegid();
+/// Gives a new file the owner and the permissions of the former one.
+/// @return whether it has them
+bool copyStatus(int descriptor, const struct stat& former) {
+    struct stat made {};
+    // In this order: a new owner clears some permissions.
+    return ::fstat(descriptor, &made) == 0 &&
+           ((made.st_uid == former.st_uid && made.st_gid == former.st_gid) ||
+            ::fchown(descriptor, former.st_uid, former.st_gid) == 0) &&
+           ::fchmod(descriptor, former.st_mode & (S_IRWXU | S_IRWXG | S_IRWXO)) == 0;
 }
 
 /// The permissions of a new file of this process.
@@ -84,7 +88,7 @@ mode_t usualPermissions() {
 /// Creates a file next to the target. Its name does not depend on the target's, which may be as long as names can be.
 /// @return its descriptor; -1 if it cannot be created
 int createBeside(const std::filesystem::path& target, std::string& name) {
-    name = (target.parent_path() / ".tarvik-report.XXXXXX").string();
+    name = (target.parent_path() / ".tarvik.XXXXXX").string();
     return ::mkostemp(name.data(), O_CLOEXEC);
 }
 
@@ -97,23 +101,26 @@ void writeFile(const std::string& path, std::string_view text) {
     if (!exists && errno != ENOENT) {
         fault.raise(errno);
     }
-    if (exists && (!S_ISREG(former.st_mode) || !isUnique(former))) {
+    if (exists && (!S_ISREG(former.st_mode) || former.st_nlink != 1)) {
         writeInPlace(path, text, fault);
         return;
     }
     const std::filesystem::path target = targetOf(path);
     std::string beside;
     const int descriptor = createBeside(target, beside);
-    if (descriptor < 0) {
-        if (!exists) {
-            fault.raise(errno);
+    if (descriptor < 0 && !exists) {
+        fault.raise(errno);
+    }
+    if (exists && (descriptor < 0 || !copyStatus(descriptor, former))) {
+        // No other file can take its place, but the file itself may be writable.
+        if (descriptor >= 0) {
+            ::close(descriptor);
+            ::unlink(beside.c_str());
         }
-        // The directory takes no new file, but the file itself may be writable.
         writeInPlace(path, text, fault);
         return;
     }
-    const mode_t permissions = exists ? former.st_mode & (S_IRWXU | S_IRWXG | S_IRWXO) : usualPermissions();
-    int error = ::fchmod(descriptor, permissions) == 0 ? 0 : errno;
+    int error = exists || ::fchmod(descriptor, usualPermissions()) == 0 ? 0 : errno;
     const int written = writeAndClose(descriptor, text);
     error = error == 0 ? written : error;
     if (error == 0 && ::rename(beside.c_str(), target.c_str()) != 0) {
@@ -131,5 +138,3 @@ bool isStandardOutput(const std::string& path) {
     return ::stat(path.c_str(), &file) == 0 && ::fstat(STDOUT_FILENO, &output) == 0 &&
            file.st_dev == output.st_dev && file.st_ino == output.st_ino;
 }
-
-} // namespace report
