@@ -84,10 +84,10 @@ def figures(results):
             yield "loading: part of a flat unordered_map", size, loading["manager"] / loading[HASH_MAP], 1.5
             yield "memory: part of a flat unordered_map", size, memory["manager"] / memory[HASH_MAP], 2
             yield "dump operations, ms", size, results["dump operations", size]["process"], 1000
-            for command, limit in (("which, property", 1000), ("lint", 3000), ("diff", 3000), ("report", 3000)):
+            for command, limit in (("which, property", 1000), ("lint", 1500), ("diff", 3000), ("report", 3000)):
                 yield f"{command}, ms", size, results[f"{command}, by the clock", size]["process"], limit
-            for command in ("lint", "diff"):
-                yield f"{command}, MiB", size, results[f"{command}, peak memory", size]["process"], 500e6 / 2**20
+            for command, limit in (("lint", 400), ("diff", 500e6 / 2**20)):
+                yield f"{command}, MiB", size, results[f"{command}, peak memory", size]["process"], limit
     if "S" in sizes and "L" in sizes:
         measure = "operations, independent"
         yield "operations: growth", "S to L", results[measure, "L"]["manager"] / results[measure, "S"]["manager"], 4

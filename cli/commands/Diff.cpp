@@ -1,8 +1,8 @@
 // `diff`: which answers two databases give differently.
 #include "commands/Commands.h"
 
+#include "diff/CompareDatabases.h"
 #include "diff/Presentation.h"
-#include "diff/Subprocess.h"
 #include "query/Database.h"
 #include "query/DeviceTables.h"
 #include "query/Tool.h"
@@ -47,10 +47,6 @@ std::string asText(const ReleaseNotes& notes, const Terminal& /*any*/) {
 }
 Json asJson(const ReleaseNotes& notes) { return diff::asJson(notes.comparison); }
 
-/// The format in which a process writes the answers of one database for the process that compares them. It is not
-/// offered to people.
-constexpr const char* SNAPSHOT = "snapshot";
-
 /// A snapshot, or why there is none.
 struct Written {
     std::string snapshot;
@@ -58,9 +54,6 @@ struct Written {
 
 std::string asText(const Written& written, const Terminal& /*any*/) { return written.snapshot; }
 Json asJson(const Written& /*written*/) { return {}; }
-
-/// The start of a text that gives the reason why there is no snapshot.
-constexpr char FAULT = '!';
 
 std::string snapshotOrFault(Tool& tool, const std::string& database) {
     try {
@@ -71,7 +64,7 @@ std::string snapshotOrFault(Tool& tool, const std::string& database) {
         static_cast<void>(tool.messages().take());
         return snapshot;
     } catch (const std::exception& fault) {
-        std::string reason(1, FAULT);
+        std::string reason(1, diff::FAULT_MARK);
         for (const Messages::Message& message : tool.messages().take()) {
             reason += message.channel == Port_MsgManData::Channel::INFO ? message.text : "";
         }
@@ -80,35 +73,15 @@ std::string snapshotOrFault(Tool& tool, const std::string& database) {
     }
 }
 
-std::string outputOf(diff::Subprocess& process) {
-    std::string text = process.output();
-    if (text.starts_with(FAULT)) {
-        throw CommandError(ExitCode::FAULT, text.substr(1));
-    }
-    return text;
-}
-
-diff::Comparison compare(const Arguments& arguments) {
-    const auto snapshotOf = [](const std::string& database) {
-        return std::vector<std::string>{"diff", "--format", SNAPSHOT, "--", database, database};
-    };
-    // Both take about the same time, so one of them shows the progress.
-    diff::Subprocess oldProcess(snapshotOf(arguments.oldDatabase), false);
-    diff::Subprocess newProcess(snapshotOf(arguments.newDatabase), true);
-    const diff::Snapshot before(outputOf(oldProcess));
-    const diff::Snapshot after(outputOf(newProcess));
-    return diff::compare(before, after);
-}
-
 ExitCode run(Tool& tool, const Arguments& arguments) {
-    if (arguments.format == SNAPSHOT) {
+    if (arguments.format == diff::SNAPSHOT_FORMAT) {
         return tool.answer(Written{snapshotOrFault(tool, arguments.oldDatabase)});
     }
     if (arguments.format != "text" && arguments.format != "markdown") {
         throw CommandError(ExitCode::FAULT,
                            fmt::format("unknown format \"{}\"\nformats: text, markdown", arguments.format));
     }
-    const diff::Comparison comparison = compare(arguments);
+    const diff::Comparison comparison = diff::compareDatabases(arguments.oldDatabase, arguments.newDatabase);
     ExitCode status = comparison.isEmpty() ? ExitCode::YES : ExitCode::NO;
     if (!comparison.unanswered.empty()) {
         tool.note(fmt::format(

@@ -1,12 +1,18 @@
 // `lint`: reports what is wrong with a database, by file, line and column.
 #include "commands/Commands.h"
+#include "commands/DatabaseArguments.h"
 
+#include "diff/Presentation.h"
+#include "edit/Fixes.h"
+#include "lint/Check.h"
 #include "lint/Report.h"
-#include "lint/Suppressions.h"
 #include "query/Database.h"
 #include "query/Tool.h"
+#include "term/AtomicFile.h"
 #include "term/Progress.h"
 #include "term/Table.h"
+
+#include <AcdStore.h>
 
 #include <fmt/format.h>
 #include <fmt/ranges.h>
@@ -14,13 +20,11 @@
 #include <algorithm>
 #include <charconv>
 #include <cstddef>
-#include <filesystem>
 #include <fstream>
 #include <iterator>
 #include <memory>
 #include <optional>
 #include <set>
-#include <system_error>
 #include <utility>
 
 namespace {
@@ -34,6 +38,9 @@ struct Arguments {
     std::string baseline;
     std::optional<std::string> most;
     bool strict = false;
+    bool fix = false;
+    bool unsafeFixes = false;
+    bool diff = false;
 };
 
 using Rules = std::set<const lint::Rule*>;
@@ -104,24 +111,6 @@ ExitCode explain(Tool& tool, const Arguments& arguments) {
     return tool.answer(explanations);
 }
 
-lint::Report examine(const lint::Model& model, const Rules& selected, const Rules& ignored) {
-    lint::Findings findings;
-    Progress progress("looking for findings");
-    std::size_t done = 0;
-    for (const lint::RuleSet& set : lint::ruleSets()) {
-        if (set.check != nullptr) {
-            set.check(model, findings);
-        }
-        progress.reach(++done, lint::ruleSets().size());
-    }
-    // Comments first: one that suppresses a finding is used, even if that finding is not selected.
-    std::vector<lint::Finding> all = lint::withoutSuppressed(model, findings);
-    std::erase_if(all, [&](const lint::Finding& finding) {
-        return (!selected.empty() && !selected.contains(finding.rule)) || ignored.contains(finding.rule);
-    });
-    return {lint::sorted(std::move(all), model)};
-}
-
 /// The fingerprints of a former report.
 std::set<std::string> readBaseline(const std::string& path) {
     std::ifstream file(path, std::ios::binary);
@@ -160,30 +149,33 @@ std::size_t readCount(const std::string& text) {
     return count;
 }
 
-/// Shows at most that many findings, and how many there are of each rule.
-ExitCode showSome(Tool& tool, lint::Report report, std::size_t most, ExitCode status) {
-    if (!report.findings.empty()) {
-        tool.note(fmt::format("{}; {} shown\n{}", summary(report), std::min(most, report.findings.size()),
-                              countsByCode(report)));
+std::string hintOfFixes(const lint::Report& report) {
+    const auto fixable =
+        std::count_if(report.findings.begin(), report.findings.end(),
+                      [](const lint::Finding& finding) { return finding.fix && finding.fix->isSafe; });
+    return fixable == 0 ? std::string() : fmt::format("\n{} can be fixed by --fix", fixable);
+}
+
+/// Shows findings as text, and how many there are of each rule.
+ExitCode showText(Tool& tool, lint::Report report, const Arguments& arguments, ExitCode status) {
+    const std::size_t found = report.findings.size();
+    const std::size_t shown = arguments.most ? std::min(readCount(*arguments.most), found) : found;
+    if (found != 0) {
+        tool.note(fmt::format("{}{}\n{}{}", summary(report),
+                              arguments.most ? fmt::format("; {} shown", shown) : std::string(),
+                              countsByCode(report), hintOfFixes(report)));
     }
-    report.findings.erase(report.findings.begin() +
-                              static_cast<std::ptrdiff_t>(std::min(most, report.findings.size())),
+    report.findings.erase(report.findings.begin() + static_cast<std::ptrdiff_t>(shown),
                           report.findings.end());
     return tool.answer(report, status);
 }
 
-ExitCode show(Tool& tool, const lint::Report& report, const Arguments& arguments) {
+ExitCode show(Tool& tool, lint::Report report, const Arguments& arguments, bool isComplete) {
     const bool isRefused =
         report.count(lint::Severity::ERROR) != 0 || (arguments.strict && !report.findings.empty());
-    const ExitCode status = isRefused ? ExitCode::NO : ExitCode::YES;
+    const ExitCode status = !isComplete ? ExitCode::FAULT : isRefused ? ExitCode::NO : ExitCode::YES;
     if (arguments.format == "text") {
-        if (arguments.most) {
-            return showSome(tool, report, readCount(*arguments.most), status);
-        }
-        if (!report.findings.empty()) {
-            tool.note(summary(report));
-        }
-        return tool.answer(report, status);
+        return showText(tool, std::move(report), arguments, status);
     }
     std::string text;
     if (arguments.format == "github") {
@@ -201,51 +193,75 @@ ExitCode show(Tool& tool, const lint::Report& report, const Arguments& arguments
     return status;
 }
 
-/// Replaces files by their directories.
-/// @return the files; empty when only directories are given
-std::set<std::string> takeFiles(std::vector<std::string>& paths) {
-    std::set<std::string> files;
-    std::vector<std::string> directories;
-    for (const std::string& path : paths) {
-        std::error_code ignored;
-        const bool isFile = std::filesystem::is_regular_file(path, ignored);
-        const std::string parent = std::filesystem::path(path).parent_path().string();
-        const std::string directory = !isFile ? path : parent.empty() ? "." : parent;
-        if (isFile) {
-            files.insert(
-                (std::filesystem::path(directory) / std::filesystem::path(path).filename()).string());
-        }
-        if (std::find(directories.begin(), directories.end(), directory) == directories.end()) {
-            directories.push_back(directory);
+/// Fixes findings, and writes the files unless only the difference is wanted.
+/// @return the files as they are then
+std::vector<AcdLines> fixed(Tool& tool, std::vector<AcdLines> files, const lint::Selection& selection,
+                            const Arguments& arguments, const DatabaseArguments& database) {
+    const std::vector<std::string> directories = AcdStore::searchPath();
+    if (directories.empty()) {
+        throw CommandError(ExitCode::FAULT, "the built-in demonstration cannot be changed: name a directory");
+    }
+    const edit::FixResult result = edit::fixFindings(
+        files, {selection, arguments.unsafeFixes, [&database](const lint::Finding& finding) {
+                    return database.isMeant(finding.location.file->path());
+                }});
+    if (arguments.diff) {
+        tool.output().write(fmt::format("{}", fmt::join(result.diffs, "")));
+        return files;
+    }
+    if (result.fixed == 0) {
+        return files;
+    }
+    const std::optional<diff::Comparison> effect = edit::effectOf(directories, result.rewrites);
+    for (const edit::Rewrite& rewrite : result.rewrites) {
+        writeFile(rewrite.path, rewrite.text);
+    }
+    std::string note =
+        fmt::format("fixed {} finding{} in {} file{}", result.fixed, result.fixed == 1 ? "" : "s",
+                    result.rewrites.size(), result.rewrites.size() == 1 ? "" : "s");
+    if (effect && !effect->isEmpty()) {
+        note += "; answers that change:\n" + diff::asMarkdown(*effect);
+    }
+    tool.note(note);
+    for (AcdLines& file : files) {
+        const auto rewrite =
+            std::find_if(result.rewrites.begin(), result.rewrites.end(),
+                         [&file](const edit::Rewrite& each) { return each.path == file.path(); });
+        if (rewrite != result.rewrites.end()) {
+            file = AcdLines(rewrite->text, std::string(file.path()), std::string(file.family()));
         }
     }
-    paths = std::move(directories);
     return files;
 }
 
-ExitCode run(Tool& tool, Arguments arguments) {
-    const Rules selected = rulesOf(arguments.selected);
-    const Rules ignored = rulesOf(arguments.ignored);
+ExitCode run(Tool& tool, const Arguments& arguments) {
+    const lint::Selection selection{rulesOf(arguments.selected), rulesOf(arguments.ignored)};
     if (!arguments.explained.empty()) {
         return explain(tool, arguments);
     }
-    const std::set<std::string> files = takeFiles(arguments.directories);
-    if (arguments.directories.empty()) {
+    const DatabaseArguments database(arguments.directories);
+    if (database.directories.empty()) {
         tool.openDatabase();
     } else {
-        ::openDatabase(arguments.directories);
+        ::openDatabase(database.directories);
     }
-    const lint::Model model(AcdLines::ofDatabase());
+    std::vector<AcdLines> files = AcdLines::ofDatabase();
+    if (arguments.fix || arguments.unsafeFixes || arguments.diff) {
+        files = fixed(tool, std::move(files), selection, arguments, database);
+    }
+    const lint::Model model(std::move(files));
     // The rules report the readers' faults, too, with a code.
     static_cast<void>(tool.messages().take());
-    lint::Report report = examine(model, selected, ignored);
-    std::erase_if(report.findings, [&files](const lint::Finding& finding) {
-        return !files.empty() && !files.contains(std::string(finding.location.file->path()));
+    Progress progress("looking for findings");
+    lint::Report report{check(
+        model, selection, [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); })};
+    std::erase_if(report.findings, [&database](const lint::Finding& finding) {
+        return !database.isMeant(finding.location.file->path());
     });
     if (!arguments.baseline.empty()) {
         dropKnown(report, arguments.baseline);
     }
-    return show(tool, report, arguments);
+    return show(tool, std::move(report), arguments, model.isComplete());
 }
 
 Action declare(ArgumentList& list) {
@@ -289,8 +305,17 @@ Action declare(ArgumentList& list) {
          .target = &arguments->baseline},
         {.name = "--max",
          .value = "N",
-         .description = "Print at most N findings, and how many there are of each rule",
+         .description = "Print at most N findings",
          .target = &arguments->most},
+        {.name = "--fix",
+         .description = "Remove the findings that can be fixed safely, and write the files",
+         .target = &arguments->fix},
+        {.name = "--unsafe-fixes",
+         .description = "Apply guesses as well, such as the nearest name",
+         .target = &arguments->unsafeFixes},
+        {.name = "--diff",
+         .description = "Write nothing; show what --fix would change",
+         .target = &arguments->diff},
         {.name = "--strict",
          .description = "Exit with status 1 for warnings, too",
          .target = &arguments->strict},
@@ -306,6 +331,7 @@ const Command command::LINT{
     "",
     "tarvik lint database\n"
     "tarvik lint site company --strict --format sarif\n"
+    "tarvik lint --fix database\n"
     "tarvik lint --explain T105",
     declare,
 };

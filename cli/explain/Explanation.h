@@ -8,14 +8,15 @@
 #include <string>
 #include <vector>
 
-namespace why {
+namespace explanation {
 
 using catalogue::SourceText;
 
 /// One link of the chain that leads to an answer.
 struct Step {
     /// "name", "family", "table", "rule", "record" (which decides), "absent" (what decides is missing), "note" (an
-    /// oddity on the way), "fault", or after a no "instead" and "differs".
+    /// oddity on the way), "fault", "part" (of a complete question), "skipped" (a check that the form leaves out), or
+    /// after a no "instead" and "differs".
     std::string topic;
     std::string text;
     std::optional<SourceText> place{}; ///< the text of the database, and where it is written
@@ -23,7 +24,7 @@ struct Step {
 };
 
 struct Explanation {
-    Verdict verdict = Verdict::NO; ///< that the steps come to
+    Conclusion verdict = Conclusion::NO; ///< that the steps come to
     std::vector<Step> steps;
 
     /// The last record that decides something; null when there is none.
@@ -39,8 +40,9 @@ struct Explanation {
 /// What is shown: the manager's verdict, and how the records lead there.
 struct Answer {
     Question question;
-    Verdict verdict;
+    Conclusion verdict;
     Explanation explanation;
+    std::vector<std::string> skipped{}; ///< as `skippedChecks`
 
     [[nodiscard]] bool agrees() const { return verdict == explanation.verdict; }
 };
@@ -48,4 +50,4 @@ struct Answer {
 [[nodiscard]] std::string asText(const Answer& answer, const Terminal& terminal);
 [[nodiscard]] Json asJson(const Answer& answer);
 
-} // namespace why
+} // namespace explanation

@@ -11,9 +11,35 @@
 
 #include <fmt/format.h>
 
-namespace why {
+#include <algorithm>
+#include <iterator>
 
-Explanation explain(const Question& question) { return ExplanationBuilder(question).build(); }
+namespace explanation {
+
+namespace {
+
+/// Explains each part of a question by itself.
+Explanation explainParts(const std::vector<Question>& parts) {
+    Explanation whole{Conclusion::YES, {}};
+    for (const Question& part : parts) {
+        Explanation one = explain(part);
+        const char* const verdict = one.verdict == Conclusion::YES  ? "yes"
+                                    : one.verdict == Conclusion::NO ? "no"
+                                                                    : "no answer";
+        whole.steps.push_back({"part", fmt::format("{}: {}", verdict, inWords(part))});
+        std::move(one.steps.begin(), one.steps.end(), std::back_inserter(whole.steps));
+        // YES, NO and FAULT, in this order: the worst one is that of the whole.
+        whole.verdict = std::max(whole.verdict, one.verdict);
+    }
+    return whole;
+}
+
+} // namespace
+
+Explanation explain(const Question& question) {
+    const std::vector<Question> parts = partsOf(question);
+    return parts.empty() ? ExplanationBuilder(question).build() : explainParts(parts);
+}
 
 const SourceText* Explanation::decidingRecord() const {
     const SourceText* found = nullptr;
@@ -29,17 +55,17 @@ Explanation ExplanationBuilder::build() {
     if (m_asked.startUp.values().empty()) {
         add("fault", "there is no base database, so the manager knows nothing");
     }
-    const Verdict verdict = this->verdict();
+    const Conclusion verdict = this->verdict();
     return {verdict, std::move(m_steps)};
 }
 
-Verdict ExplanationBuilder::verdict() {
-    if (m_asked.verdict != Verdict::FAULT) {
-        return isYes() ? Verdict::YES : Verdict::NO;
+Conclusion ExplanationBuilder::verdict() {
+    if (m_asked.verdict != Conclusion::FAULT) {
+        return isYes() ? Conclusion::YES : Conclusion::NO;
     }
     const Match culprit = m_asked.reads.last();
     if (!culprit) {
-        return Verdict::NO;
+        return Conclusion::NO;
     }
     add("fault",
         fmt::format("no database can name an option \"{}\": the manager raises when it reads the options of "
@@ -47,7 +73,7 @@ Verdict ExplanationBuilder::verdict() {
                     culprit.text->text,
                     culprit.value->fromSection ? culprit.value->device : culprit.value->family),
         culprit);
-    return Verdict::FAULT;
+    return Conclusion::FAULT;
 }
 
 bool ExplanationBuilder::isYes() {
@@ -68,6 +94,16 @@ bool ExplanationBuilder::isYes() {
         return operationInMode();
     case Question::Kind::PROPERTY:
         return property();
+    case Question::Kind::OPERATION_OPTIONS:
+        return operationOptions();
+    case Question::Kind::MULTIBOOT:
+        return multiboot();
+    case Question::Kind::DEVICE_IN_MODE:
+        return modeAllowsDevice();
+    case Question::Kind::COMPLETE:
+    case Question::Kind::COMPLETE_IN_MODE:
+        // These are explained part by part.
+        break;
     }
     return false;
 }
@@ -75,7 +111,7 @@ bool ExplanationBuilder::isYes() {
 std::string withoutPackage(const std::string& device) {
     StringBase name(device.c_str());
     ConstraintsManager::removePackageName(name);
-    return plain(name);
+    return toStdString(name);
 }
 
 std::string ExplanationBuilder::addNameStep() {
@@ -89,7 +125,7 @@ std::string ExplanationBuilder::addNameStep() {
 
 /// Where spi.acd lists a flash or a family of flashes.
 ReadLog::Match ExplanationBuilder::flashListing(const std::string& name) const {
-    const std::string upper = plain(UT_STR::Upper(name.c_str()));
+    const std::string upper = toStdString(UT_STR::Upper(name.c_str()));
     Match found = m_asked.startUp.findItem(schema::DEVICE_FAMILY, upper);
     if (const ReadLog::Value* const families = m_asked.startUp.find(schema::DEVICE_FAMILY)) {
         for (auto family = families->items.begin(); !found && family != families->items.end(); ++family) {
@@ -112,7 +148,7 @@ std::string ExplanationBuilder::addFamilyStep(const std::string& name) {
                         hides ? fmt::format(", before what {}.acd says", module) : ""),
             listing);
     } else if (module == nullptr && sameWithoutCase(name, "spi")) {
-        add("family", fmt::format("\"{}\" stands for all flashes: family spi", name));
+        add("family", fmt::format("\"{}\" means all flashes: family spi", name));
     } else if (module == nullptr) {
         add("family", fmt::format("no file, section or flash is called \"{}\": family base", base));
     } else if (sameWithoutCase(base, family) || sameWithoutCase(base, family + ".acd")) {
@@ -131,4 +167,4 @@ void ExplanationBuilder::add(const char* topic, std::string text, const Match& p
     m_steps.push_back({topic, std::move(text), place.sourceText(), place.value->shadows()});
 }
 
-} // namespace why
+} // namespace explanation

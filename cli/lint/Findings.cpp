@@ -50,29 +50,40 @@ std::uint64_t hash(std::string_view text) {
 
 } // namespace
 
-void Findings::addText(const Rule& rule, const Token& token, std::string text) {
+Finding& Findings::addText(const Rule& rule, const Token& token, std::string text) {
     // A text that continues in the next line is marked up to the end of its first line.
     const SourceLocation& location = token.location;
     const std::size_t lineLength = location.file->source(location.line).size();
     const std::size_t rest = lineLength - std::min<std::size_t>(lineLength, location.column - 1);
-    m_findings.push_back({&rule, location, std::min(token.text.size(), rest), std::move(text)});
+    return m_findings.emplace_back(
+        Finding{&rule, location, std::min(token.text.size(), rest), std::move(text)});
 }
 
-std::string Findings::didYouMean(std::string_view text, const std::vector<std::string>& candidates,
-                                 const std::vector<Token>& used) {
-    const std::size_t cost = candidates.size() + used.size();
-    if (cost > m_comparisonsLeft) {
+Suggestion Findings::suggest(std::string_view text, const std::vector<std::string>& candidates,
+                             const std::vector<Token>& used) {
+    if (used.size() > m_comparisonsLeft) {
         return {};
     }
-    m_comparisonsLeft -= cost;
+    m_comparisonsLeft -= used.size();
     std::set<std::string_view> names;
     for (const Token& token : used) {
         names.insert(token.text);
     }
+    return suggest(text, candidates,
+                   [&names](const std::string& candidate) { return names.contains(candidate); });
+}
+
+Suggestion Findings::suggest(std::string_view text, const std::vector<std::string>& candidates,
+                             const std::function<bool(const std::string&)>& isUsed) {
+    if (candidates.size() > m_comparisonsLeft) {
+        return {};
+    }
+    m_comparisonsLeft -= candidates.size();
     std::vector<std::string> unused;
-    std::copy_if(candidates.begin(), candidates.end(), std::back_inserter(unused),
-                 [&names](const std::string& candidate) { return !names.contains(candidate); });
-    return ::didYouMean(text, unused);
+    std::copy_if(candidates.begin(), candidates.end(), std::back_inserter(unused), std::not_fn(isUsed));
+    std::optional<std::string> name = ::suggest(text, unused);
+    const bool isOtherCase = name && sameWithoutCase(*name, text);
+    return {std::move(name), isOtherCase};
 }
 
 std::vector<Finding> sorted(std::vector<Finding> findings, const Model& model) {

@@ -216,8 +216,8 @@ Model::Model(std::vector<AcdLines> files) : m_files(std::move(files)) {
     }
     // spi is a family even without a file.
     if (m_spi == nullptr) {
-        m_familyNames.emplace_back("spi");
-        m_lowerFamilies.insert("spi");
+        m_familyNames.emplace_back(schema::SPI_FAMILY);
+        m_lowerFamilies.emplace(schema::SPI_FAMILY);
     }
     splitValues();
     m_supported = texts(baseKeys().list(schema::DEVICE_SUPPORTED));
@@ -299,6 +299,11 @@ void Model::findFlashes() {
     for (const std::string& name : m_flashNames) {
         m_lowerFlashes.insert(lowerCase(name));
     }
+}
+
+bool Model::isComplete() const {
+    return std::all_of(m_files.begin(), m_files.end(),
+                       [](const AcdLines& file) { return file.readError().empty(); });
 }
 
 const Section& Model::baseKeys() const {

@@ -149,6 +149,9 @@ public:
     [[nodiscard]] const std::vector<AcdLines>& files() const noexcept { return m_files; }
     [[nodiscard]] const std::deque<FamilyData>& families() const noexcept { return m_families; }
 
+    /// Could all files be read?
+    [[nodiscard]] bool isComplete() const;
+
     /// Null when the family has no file.
     [[nodiscard]] const FamilyData* base() const noexcept { return m_base; }
     [[nodiscard]] const FamilyData* spi() const noexcept { return m_spi; }

@@ -106,27 +106,46 @@ std::string asText(const Report& report, const Terminal& terminal) {
         const std::string severityText = fmt::format("{}:", nameOf(severity));
         text += fmt::format("{} {} {} [{}]\n", terminal.heading(place),
                             severity == Severity::ERROR ? terminal.bad(severityText)
-                                                        : terminal.doubtful(severityText),
+                                                        : terminal.warning(severityText),
                             printable(finding.text), finding.rule->code);
         text += excerpt(finding, terminal);
     }
     return text;
 }
 
+namespace {
+
+Json asJson(const Fix& fix) {
+    Json edits = Json::array();
+    for (const TextEdit& edit : fix.edits) {
+        edits.push_back({{"line", edit.location.line},
+                         {"column", edit.location.column},
+                         {"length", edit.length},
+                         {"text", edit.text}});
+    }
+    return {{"safe", fix.isSafe}, {"edits", edits}};
+}
+
+} // namespace
+
 Json asJson(const Report& report) {
     const std::vector<std::string> names = fingerprints(report.findings);
     Json list = Json::array();
     for (std::size_t i = 0; i < report.findings.size(); ++i) {
         const Finding& finding = report.findings[i];
-        list.push_back({{"file", finding.location.file->path()},
-                        {"line", finding.location.line},
-                        {"column", finding.location.column},
-                        {"length", finding.length},
-                        {"level", nameOf(finding.rule->severity)},
-                        {"code", finding.rule->code},
-                        {"name", finding.rule->slug},
-                        {"text", finding.text},
-                        {"fingerprint", names[i]}});
+        Json object{{"file", finding.location.file->path()},
+                    {"line", finding.location.line},
+                    {"column", finding.location.column},
+                    {"length", finding.length},
+                    {"level", nameOf(finding.rule->severity)},
+                    {"code", finding.rule->code},
+                    {"name", finding.rule->slug},
+                    {"text", finding.text},
+                    {"fingerprint", names[i]}};
+        if (finding.fix) {
+            object["fix"] = asJson(*finding.fix);
+        }
+        list.push_back(std::move(object));
     }
     return {{"errors", report.count(Severity::ERROR)},
             {"warnings", report.count(Severity::WARNING)},

@@ -19,9 +19,10 @@ struct Rule {
     std::string_view code; ///< a letter and three digits; never given to another rule
     std::string_view slug; ///< its name in words: "unknown-operation"
     Severity severity;
-    std::string_view title;   ///< in one line
-    std::string_view detail;  ///< why it matters, and what to write instead; a line break is a blank
-    std::string_view example; ///< lines that are found
+    std::string_view title;     ///< in one line
+    std::string_view detail;    ///< why it matters, and what to write instead; a line break is a blank
+    std::string_view example;   ///< lines that are found
+    bool needsAllFiles = false; ///< it finds what is nowhere: a file that cannot be read may have it
 
     /// The detail on one line.
     [[nodiscard]] std::string explanation() const;

@@ -70,6 +70,25 @@ Json region(const Finding& finding, Columns& columns) {
             {"endColumn", endColumn}};
 }
 
+/// The fix of a finding, all of whose edits are in the file of the finding.
+Json asSarif(const Fix& fix) {
+    Json replacements = Json::array();
+    for (const TextEdit& edit : fix.edits) {
+        Columns columns;
+        const std::size_t begin = edit.location.column - 1;
+        const std::size_t startColumn = columns.at(edit.location, begin);
+        replacements.push_back({{"deletedRegion",
+                                 {{"startLine", edit.location.line},
+                                  {"startColumn", startColumn},
+                                  {"endLine", edit.location.line},
+                                  {"endColumn", columns.at(edit.location, begin + edit.length)}}},
+                                {"insertedContent", {{"text", edit.text}}}});
+    }
+    const std::string& path = fix.edits.front().location.file->path();
+    return {{"artifactChanges",
+             Json::array({{{"artifactLocation", {{"uri", asUri(path)}}}, {"replacements", replacements}}})}};
+}
+
 Json descriptor(const Rule& rule) {
     Json object{{"id", rule.code},
                 {"name", rule.slug},
@@ -95,16 +114,19 @@ Json asSarif(const Report& report) {
     for (std::size_t i = 0; i < report.findings.size(); ++i) {
         const Finding& finding = report.findings[i];
         const auto index = std::find(rules().begin(), rules().end(), finding.rule) - rules().begin();
-        results.push_back(
-            {{"ruleId", finding.rule->code},
-             {"ruleIndex", index},
-             {"level", nameOf(finding.rule->severity)},
-             {"message", {{"text", finding.text}}},
-             {"locations",
-              Json::array({{{"physicalLocation",
-                             {{"artifactLocation", {{"uri", asUri(finding.location.file->path())}}},
-                              {"region", region(finding, columns)}}}}})},
-             {"partialFingerprints", {{"tarvikLint/v1", names[i]}}}});
+        Json result({{"ruleId", finding.rule->code},
+                     {"ruleIndex", index},
+                     {"level", nameOf(finding.rule->severity)},
+                     {"message", {{"text", finding.text}}},
+                     {"locations",
+                      Json::array({{{"physicalLocation",
+                                     {{"artifactLocation", {{"uri", asUri(finding.location.file->path())}}},
+                                      {"region", region(finding, columns)}}}}})},
+                     {"partialFingerprints", {{"tarvikLint/v1", names[i]}}}});
+        if (finding.fix && finding.fix->isSafe) {
+            result["fixes"] = Json::array({asSarif(*finding.fix)});
+        }
+        results.push_back(std::move(result));
     }
     return {
         {"$schema", "https://json.schemastore.org/sarif-2.1.0.json"},

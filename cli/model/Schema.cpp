@@ -36,7 +36,7 @@ File fileOf(std::string_view family) {
     if (sameWithoutCase(family, "base")) {
         return File::BASE;
     }
-    return sameWithoutCase(family, "spi") ? File::SPI : File::FAMILY;
+    return sameWithoutCase(family, SPI_FAMILY) ? File::SPI : File::FAMILY;
 }
 
 bool isFlashClass(std::string_view name) { return contains(FLASH_CLASSES, name); }

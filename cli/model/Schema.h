@@ -29,6 +29,12 @@ enum class Shape {
 inline constexpr const char* BASE = "base.acd";
 inline constexpr const char* SPI = "spi.acd";
 
+/// The family of all flashes, and of every device in SPI mode.
+inline constexpr std::string_view SPI_FAMILY = "spi";
+
+/// The key of SPI mode.
+inline constexpr std::string_view SPI_MODE = "SPI";
+
 inline constexpr const char* DEVICE_SUPPORTED = "DEVICE_SUPPORTED";
 inline constexpr const char* PROGRAM_OPTION_PACKAGE = "PROGRAM_OPTION_PACKAGE";
 inline constexpr const char* NOT_SUPPORTED_PART_IN_MODE = "NOT_SUPPORTED_PART_IN_MODE";
@@ -42,6 +48,9 @@ inline constexpr const char* DEVICE_FAMILY = "DEVICE_FAMILY";
 
 /// The property that lists a device's packages. The manager gives it no meaning of its own.
 inline constexpr const char* PACKAGES = "PACKAGES";
+
+/// The property that gives a flash's package, likewise.
+inline constexpr const char* PACKAGE = "PACKAGE";
 
 /// Begins the properties that list the options of an operation.
 inline constexpr std::string_view OPTIONS_PREFIX = "OP_";

@@ -5,7 +5,6 @@
 
 #include <algorithm>
 #include <array>
-#include <functional>
 #include <iterator>
 #include <memory>
 #include <utility>
@@ -76,8 +75,10 @@ std::vector<AcdLines> AcdLines::ofDatabase() {
     std::vector<AcdLines> all;
     for (const auto& family : store.families()) {
         for (const acd::SourceFile& file : family->files) {
-            const acd::Text text = store.read(file);
+            std::string error;
+            const acd::Text text = store.tryRead(file, error);
             all.emplace_back(std::string_view(text.bytes.get(), text.size), file.path, family->name);
+            all.back().m_readError = std::move(error);
             all.back().m_caseCollisions = file.caseCollisions;
         }
     }
@@ -115,23 +116,6 @@ std::string_view AcdLines::source(unsigned line) const noexcept {
         text.remove_prefix(acd::BYTE_ORDER_MARK.size());
     }
     return text;
-}
-
-/// The line that a name belongs to; null if it is not of this file.
-const AcdLines::Line* AcdLines::lineOfName(const char* name) const noexcept {
-    const std::less<> isBefore;
-    const char* const begin = m_joined.data();
-    if (isBefore(name, begin) || !isBefore(name, begin + m_joined.size())) {
-        return nullptr;
-    }
-    // Joined lines start where the first of them starts in the source.
-    const auto next =
-        std::upper_bound(m_starts.begin(), m_starts.end(), static_cast<std::size_t>(name - begin));
-    const auto number = static_cast<unsigned>(next - m_starts.begin());
-    const auto following =
-        std::upper_bound(m_lines.begin(), m_lines.end(), number,
-                         [](unsigned wanted, const Line& line) { return wanted < line.firstLine; });
-    return following == m_lines.begin() ? nullptr : &*std::prev(following);
 }
 
 void AcdLines::readLines() {

@@ -4,7 +4,6 @@
 #include "database/LineReader.h"
 
 #include <algorithm>
-#include <array>
 #include <cstring>
 #include <iterator>
 #include <tuple>
@@ -14,13 +13,6 @@
 // section and key, so that all lines about a key are adjacent and are merged together.
 
 namespace acd {
-
-namespace {
-
-constexpr std::array KINDS{Line::Kind::HEADER, Line::Kind::ASSIGNMENT, Line::Kind::APPEND,
-                           Line::Kind::INVALID};
-
-} // namespace
 
 /// Fills a database; what it needs for that only goes with it.
 class DatabaseBuilder {
@@ -236,28 +228,6 @@ Database::Database(std::vector<LayerText> layers, std::vector<LayerError>& error
         errors.push_back(
             {append.layer, {ParseErrorKind::VALUE_TOO_LONG, false, append.location, excerpt(append.text)}});
     }
-}
-
-Database::Database(const std::vector<const AcdLines*>& layers, std::vector<OversizedAppend>& oversized,
-                   std::size_t maxValueLength) {
-    DatabaseBuilder builder(*this, oversized, maxValueLength);
-    Line line;
-    for (const AcdLines* const file : layers) {
-        builder.openLayer(static_cast<std::uint32_t>(m_layers.size()));
-        m_layers.push_back({file->path(), {}});
-        for (const AcdLines::Line& source : file->lines()) {
-            line.kind = KINDS[static_cast<std::size_t>(source.kind)];
-            line.name = source.name;
-            line.value = source.value;
-            line.error.closesSection = source.closesSection;
-            line.spans.clear();
-            for (const AcdLines::SourceSpan& span : source.spans) {
-                line.spans.push_back({static_cast<std::uint32_t>(span.offset), {span.line, span.column}});
-            }
-            builder.add(line);
-        }
-    }
-    builder.merge();
 }
 
 const Section* Database::section(std::string_view name) const noexcept {

@@ -4,8 +4,6 @@
 #include "database/FileReading.h"
 #include "database/ParseError.h"
 
-#include <AcdLines.h>
-
 #include <cstddef>
 #include <cstdint>
 #include <memory>
@@ -83,13 +81,6 @@ public:
     /// @param maxValueLength what no value may grow over by appending, at most 4 GiB
     explicit Database(std::vector<LayerText> layers, std::vector<LayerError>& errors,
                       std::size_t maxValueLength = MAX_FILE_SIZE);
-
-    /// Merges files that were parsed already and must outlive the database.
-    /// @param layers the bottom one first
-    /// @param oversized the texts that would make a value too long are added here
-    /// @param maxValueLength as above
-    Database(const std::vector<const AcdLines*>& layers, std::vector<OversizedAppend>& oversized,
-             std::size_t maxValueLength);
 
     Database(const Database&) = delete;
     Database& operator=(const Database&) = delete;

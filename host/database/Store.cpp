@@ -150,14 +150,15 @@ const Database& Store::databaseOfFile(std::string_view fileName) {
     return family == nullptr ? m_nothing : database(*family);
 }
 
-Text Store::read(const SourceFile& file) {
+Text Store::tryRead(const SourceFile& file, std::string& error) {
     try {
         return readAll(*catalogue().open(file));
     } catch (const ReadError& unreadable) {
+        error = unreadable.what();
         m_messages.add(file.path, location::FILE_UNREADABLE, unreadable.what());
     }
     m_messages.issue();
-    raise(location::FILE_UNREADABLE);
+    return {};
 }
 
 PM_DEVKEY& Store::accessor(const DatabaseHandle& opened) {

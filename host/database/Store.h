@@ -65,9 +65,9 @@ public:
     /// @throw DataNotFoundException when it can't be read
     [[nodiscard]] const Database& databaseOfFile(std::string_view fileName);
 
-    /// Reads a file of a family, whole.
-    /// @throw DataNotFoundException when it can't be read
-    [[nodiscard]] Text read(const SourceFile& file);
+    /// Reads a file of a family, whole. Reports one that can't be read.
+    /// @param error set to the reason why it can't be read; the text is empty then
+    [[nodiscard]] Text tryRead(const SourceFile& file, std::string& error);
 
     /// The one accessor of what was opened, however often that is.
     [[nodiscard]] PM_DEVKEY& accessor(const DatabaseHandle& opened);

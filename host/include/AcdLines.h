@@ -65,8 +65,8 @@ public:
     };
 
     /// All files of the search path, or all memory files.
-    /// @return by family in byte order of the file names, and of a family the bottom layer first
-    /// @throw DataNotFoundException when a file can't be read; an info message that names it goes before
+    /// @return by family in byte order of the file names, and of a family the bottom layer first; a file that can't be
+    ///         read has no lines and a `readError()`, and an info message names it
     [[nodiscard]] static std::vector<AcdLines> ofDatabase();
 
     /// Parses a text.
@@ -90,6 +90,9 @@ public:
     /// @return the name of its family, as the readers spell it
     [[nodiscard]] const std::string& family() const noexcept { return m_family; }
 
+    /// @return why the file can't be read; empty when it was read
+    [[nodiscard]] const std::string& readError() const noexcept { return m_readError; }
+
     /// Files that are never read.
     /// @return the paths of files of the same directory whose names differ from this one's in case alone
     [[nodiscard]] const std::vector<std::string>& caseCollisions() const noexcept { return m_caseCollisions; }
@@ -105,15 +108,13 @@ public:
     [[nodiscard]] std::string_view source(unsigned line) const noexcept;
 
 private:
-    friend class AcdFamily;
-
-    [[nodiscard]] const Line* lineOfName(const char* name) const noexcept;
     void splitSource();
     void readLines();
     [[nodiscard]] unsigned addComments(unsigned first, unsigned last);
 
     std::string m_path;
     std::string m_family;
+    std::string m_readError;
     std::vector<std::string> m_caseCollisions;
     std::vector<char> m_source; ///< vectors, since their texts stay where they are when they are moved
     std::vector<char> m_joined; ///< the same bytes with continuations joined: what the lines' texts are

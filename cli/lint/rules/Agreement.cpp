@@ -35,7 +35,8 @@ constexpr Rule IDLE_FAMILY{
     "family under a mode in which it offers nothing",
     R"(The mode accepts the family, but neither its tables nor its properties offer anything in the mode. In SPI mode all
 devices are looked up as "spi", so only spi has tables there.)",
-    "# while kestrel.acd has no record with SSerial\nSS = outputs,USB2:families,kestrel"};
+    "# while kestrel.acd has no record with SSerial\nSS = outputs,USB2:families,kestrel",
+    true};
 constexpr Rule PART_OUT_OF_MODE{
     "M205",
     "part-out-of-mode",
@@ -59,7 +60,8 @@ constexpr Rule PROPERTY_WITHOUT_RECORD{
     "operation offered by a property but by no record",
     R"(The property offers the operation in the mode, but OPERATION has no record for it: an application that asks with an
 output gets no, and one that asks without gets yes. Kite and PFF modes have no records.)",
-    "OPERATION  = VERIFY,Bscan,USB2\nPROPERTIES = VERIFY,2,BS,SM"};
+    "OPERATION  = VERIFY,Bscan,USB2\nPROPERTIES = VERIFY,2,BS,SM",
+    true};
 constexpr Rule RECORD_WITHOUT_PROPERTY{
     "P207",
     "record-without-property",
@@ -68,7 +70,8 @@ constexpr Rule RECORD_WITHOUT_PROPERTY{
     R"(OPERATION has a record for the operation and the mode, but the property of that name does not list the mode: an
 application that asks with an output gets yes, and one that asks without gets no. Families without any such property
 are not checked.)",
-    "OPERATION  = VERIFY,Bscan,USB2:VERIFY,Smap,USB2\nPROPERTIES = VERIFY,1,BS"};
+    "OPERATION  = VERIFY,Bscan,USB2:VERIFY,Smap,USB2\nPROPERTIES = VERIFY,1,BS",
+    true};
 constexpr Rule OPTION_WITHOUT_RECORD{
     "P208",
     "option-without-record",
@@ -76,7 +79,8 @@ constexpr Rule OPTION_WITHOUT_RECORD{
     "option of an operation that no table allows",
     R"(OP_ and an operation list an option, but PROGRAM_OPTION has no record for it in this mode, or in any mode of the
 operation.)",
-    "PROGRAM_OPTION = VERIFY,Bscan,USB2\nPROPERTIES     = PROGRAM,1,BS:OP_PROGRAM_BS,2,VERIFY,ERASE"};
+    "PROGRAM_OPTION = VERIFY,Bscan,USB2\nPROPERTIES     = PROGRAM,1,BS:OP_PROGRAM_BS,2,VERIFY,ERASE",
+    true};
 constexpr Rule UNREACHABLE_OPTIONS{
     "P209",
     "unreachable-options",
@@ -84,7 +88,8 @@ constexpr Rule UNREACHABLE_OPTIONS{
     "options of an operation that is not offered",
     R"(Options are given only in the modes that the property of their operation lists; here it does not list the mode, or
 it does not exist, so these options are never given.)",
-    "PROPERTIES = PROGRAM,1,BS:OP_PROGRAM_SM,1,VERIFY"};
+    "PROPERTIES = PROGRAM,1,BS:OP_PROGRAM_SM,1,VERIFY",
+    true};
 
 /// How many modes have cells in the tables.
 constexpr std::size_t TABLE_MODES = static_cast<std::size_t>(MODE_TYPE::SPI) + 1;
@@ -101,12 +106,6 @@ bool isOperation(std::string_view name) {
     static const std::set<std::string_view> all(vocabulary::operations().begin(),
                                                 vocabulary::operations().end());
     return all.contains(name);
-}
-
-std::string upperCase(std::string_view text) {
-    std::string upper(text);
-    std::transform(upper.begin(), upper.end(), upper.begin(), AcdText::toUpper);
-    return upper;
 }
 
 /// Which words of a table have a record in which modes.
@@ -379,7 +378,7 @@ void checkParts(const Model& model, const std::vector<std::optional<std::set<std
         }
         const std::string_view name = part.text.substr(first + 1, second - first - 1);
         const Device* const device = model.device(name);
-        const std::string_view family = model.isFlashInAnyCase(std::string(name)) ? std::string_view("spi")
+        const std::string_view family = model.isFlashInAnyCase(std::string(name)) ? schema::SPI_FAMILY
                                         : device != nullptr                       ? device->family->name
                                                                                   : std::string_view();
         if (!family.empty() && !modes[*mode]->contains(family)) {

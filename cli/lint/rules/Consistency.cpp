@@ -31,12 +31,13 @@ constexpr Rule MISSING_PROPERTY{
     "property that only one device of the family lacks",
     R"(All other devices of the family, or flashes of the class, have the property, and the family has no value that the
 device could inherit.)",
-    "# while all other devices of the family have PINS\n[KS50]\nPROPERTY = CELLS,1152"};
+    "# while all other devices of the family have PINS\n[KS50]\nPROPERTY = CELLS,1152",
+    true};
 constexpr Rule UNUSUAL_VALUE{
     "C103",
     "unusual-value",
     Severity::WARNING,
-    "value that is no number or flag as elsewhere",
+    "value that is not a number or flag, as it is elsewhere",
     R"(At least four of five other values of the property are decimal numbers, or TRUE and FALSE. Applications read this one
 as a number up to its first other character, or as a flag that is not set.)",
     "PROPERTY = PINS,14O"};
@@ -298,8 +299,9 @@ void checkFlashes(const Model& model, Findings& findings) {
         std::vector<Sibling> siblings;
         for (const Token& flash : family.devices) {
             const std::string key = schema::propertyKey(flash.text);
-            siblings.push_back(
-                {model.spiKeys().find(key), names(flash.text), reported.contains(numbers[key])});
+            const auto number = numbers.find(key);
+            siblings.push_back({model.spiKeys().find(key), names(flash.text),
+                                number != numbers.end() && reported.contains(number->second)});
         }
         const bool isClass = schema::isFlashClass(family.family.text);
         checkMissing(siblings, isClass ? names(family.family.text) : std::set<std::string_view>(),

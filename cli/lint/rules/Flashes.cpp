@@ -33,15 +33,17 @@ constexpr Rule NO_DEVICE_LIST{
     Severity::ERROR,
     "SPI family without devices",
     R"(DEVICE_FAMILY names a family that has no FAMILY_DEVICES, so no flash belongs to it.)",
-    "DEVICE_FAMILY = ST1,ST9"};
+    "DEVICE_FAMILY = ST1,ST9",
+    true};
 constexpr Rule CLASS_WITHOUT_FAMILY{
     "S104",
     "class-without-family",
     Severity::ERROR,
-    "properties of a class that is no SPI family",
+    "properties of a class that is not an SPI family",
     R"(The properties of a class are read only if DEVICE_FAMILY lists the class as a family. Otherwise its flashes do
 not have them.)",
-    "DEVICE_FAMILY = ST1\nAT1_PROPERTY = VENDOR,Orveth"};
+    "DEVICE_FAMILY = ST1\nAT1_PROPERTY = VENDOR,Orveth",
+    true};
 constexpr Rule IN_SEVERAL_CLASSES{
     "S105",
     "flash-in-several-classes",
@@ -55,16 +57,18 @@ constexpr Rule UNKNOWN_IN_CLASS{
     "unknown-flash-in-class",
     Severity::ERROR,
     "unknown flash in a class",
-    R"(The list of a class that is no SPI family contains a flash that no family lists, so the manager does not know
+    R"(The list of a class that is not an SPI family contains a flash that no family lists, so the manager does not know
 the flash.)",
-    "DEVICE_FAMILY = NV1\nST1_DEVICES = TMF1M"};
+    "DEVICE_FAMILY = NV1\nST1_DEVICES = TMF1M",
+    true};
 constexpr Rule UNKNOWN_IN_MULTIBOOT{
     "S107",
     "unknown-in-multiboot",
     Severity::ERROR,
     "unknown device in a multiboot list",
     R"(The name is neither a flash nor a device of a family, in any case, so this entry has no effect.)",
-    "TYPE_MB_SPI_NONE_LEAD = TMF3M"};
+    "TYPE_MB_SPI_NONE_LEAD = TMF3M",
+    true};
 constexpr Rule IN_SEVERAL_FAMILIES{
     "S108",
     "flash-in-several-families",
@@ -78,7 +82,7 @@ constexpr Rule SAME_JOINED_NAME{
     Severity::ERROR,
     "two flash properties with one joined name",
     R"(Flash and property are joined without a separator, so AB with CD and ABC with D are the same property, and the
-last value counts.)",
+last value is used.)",
     "AB_PROPERTY = CD,1\nABC_PROPERTY = D,2"};
 
 constexpr Rule NO_PROPERTIES{
@@ -87,12 +91,13 @@ constexpr Rule NO_PROPERTIES{
     Severity::WARNING,
     "flash without any properties",
     R"(The flash is in no class and has no _PROPERTY key, so each of its properties is the empty text, no and 0.)",
-    "DEVICE_FAMILY = NV1\nNV1_DEVICES = MRS1M"};
+    "DEVICE_FAMILY = NV1\nNV1_DEVICES = MRS1M",
+    true};
 constexpr Rule UNSHARED_PROPERTIES{
     "S111",
     "unshared-properties",
     Severity::WARNING,
-    "properties of an SPI family that is no class",
+    "properties of an SPI family that is not a class",
     R"(Only the classes AT1, ST1, ST2, BPI1, BPI2 and BPI3 share their properties with their flashes. Those of any other
 family are found only under the family's own name.)",
     "DEVICE_FAMILY = NV1\nNV1_PROPERTY = VENDOR,Quillan"};
@@ -109,7 +114,8 @@ bool isFlashFamily(const Model& model, std::string_view name) {
 
 void checkCase(const Token& name, Findings& findings) {
     if (!isUpperCase(name.text)) {
-        findings.add(NAME_NOT_UPPER_CASE, name, "the flash {} is never found", inQuotes(name.text));
+        findings.add(NAME_NOT_UPPER_CASE, name, "the flash {} is never found", inQuotes(name.text)).fix =
+            replacing(name, upperCase(name.text));
     }
 }
 
@@ -131,8 +137,8 @@ void checkFamilies(const Model& model, Findings& findings) {
             // Two classes are reported by the rule of classes, twice in one list by the rule of lists.
             if (!isFirst && known->second != family &&
                 !(schema::isFlashClass(known->second) && schema::isFlashClass(family))) {
-                findings.add(IN_SEVERAL_FAMILIES, flash, "{} stands in family {} already",
-                             inQuotes(flash.text), inQuotes(known->second));
+                findings.add(IN_SEVERAL_FAMILIES, flash, "{} is already in family {}", inQuotes(flash.text),
+                             inQuotes(known->second));
             }
         }
     }
@@ -149,7 +155,7 @@ void checkUnclassed(const Model& model, Findings& findings) {
         const Value* const shared = model.spiKeys().find(schema::propertyKey(list.family.text));
         if (!schema::isFlashClass(list.family.text) && shared != nullptr) {
             findings.add(UNSHARED_PROPERTIES, shared->key,
-                         "the flashes of {} do not have these properties: it is no class",
+                         "the flashes of {} do not have these properties: it is not a class",
                          inQuotes(list.family.text));
         }
         for (const Token& flash : list.devices) {
@@ -171,19 +177,21 @@ void checkClasses(const Model& model, Findings& findings) {
             findings.add(CLASS_WITHOUT_FAMILY, properties->key,
                          "never read: DEVICE_FAMILY does not list the class {}", inQuotes(name));
         }
-        for (const Token& flash : model.spiKeys().list(schema::devicesKey(name))) {
+        const std::vector<Token>& listed = model.spiKeys().list(schema::devicesKey(name));
+        for (const Token& flash : listed) {
             if (flash.text.empty()) {
                 continue;
             }
             // Classes are searched in any case.
             const auto [known, isFirst] = classes.try_emplace(lowerCase(flash.text), name);
             if (!isFirst && known->second != name) {
-                findings.add(IN_SEVERAL_CLASSES, flash, "{} stands in class {} already", inQuotes(flash.text),
+                findings.add(IN_SEVERAL_CLASSES, flash, "{} is already in class {}", inQuotes(flash.text),
                              inQuotes(known->second));
             }
             if (!isFamily && !model.isFlashInAnyCase(std::string(flash.text))) {
-                findings.add(UNKNOWN_IN_CLASS, flash, "no family of DEVICE_FAMILY has the flash {}{}",
-                             inQuotes(flash.text), findings.didYouMean(flash.text, model.flashNames()));
+                findings.addUnknown(UNKNOWN_IN_CLASS, flash, flash,
+                                    findings.suggest(flash.text, model.flashNames(), listed),
+                                    "no family of DEVICE_FAMILY has the flash {}", inQuotes(flash.text));
             }
         }
     }
@@ -197,8 +205,9 @@ void checkMultiboot(const Model& model, Findings& findings) {
         for (const Token& token : listed) {
             const std::string name(token.text);
             if (!name.empty() && !model.isFlashInAnyCase(name) && model.deviceInAnyCase(name) == nullptr) {
-                findings.add(UNKNOWN_IN_MULTIBOOT, token, "{} is neither a flash nor a device{}",
-                             inQuotes(name), findings.didYouMean(name, candidates, listed));
+                findings.addUnknown(UNKNOWN_IN_MULTIBOOT, token, token,
+                                    findings.suggest(name, candidates, listed),
+                                    "{} is neither a flash nor a device", inQuotes(name));
             }
         }
     }
@@ -214,12 +223,13 @@ void checkProperties(const Model& model, Findings& findings) {
         for (const Item& item : value.items) {
             const Token& name = item.fields.front();
             if (!isUpperCase(name.text)) {
-                findings.add(PROPERTY_NOT_UPPER_CASE, name, "the property {} is never found",
-                             inQuotes(name.text));
+                findings
+                    .add(PROPERTY_NOT_UPPER_CASE, name, "the property {} is never found", inQuotes(name.text))
+                    .fix = replacing(name, upperCase(name.text));
             }
             const auto [known, isFirst] = joined.try_emplace(std::string(flash).append(name.text), flash);
             if (!isFirst && known->second != flash) {
-                findings.add(SAME_JOINED_NAME, name, "{} with {} is one with a property of {}",
+                findings.add(SAME_JOINED_NAME, name, "{} and {} make the same name as a property of {}",
                              inQuotes(flash), inQuotes(name.text), inQuotes(known->second));
             }
         }

@@ -41,7 +41,8 @@ constexpr Rule UNKNOWN_DEVICE{
     Severity::ERROR,
     "IDCODE of an unknown device",
     R"(No family's file has a section of exactly this name. Families and flashes have no IDCODE.)",
-    "IDCODE = ks50,0xX4104FB7"};
+    "IDCODE = ks50,0xX4104FB7",
+    true};
 constexpr Rule NO_CODE{
     "D105",
     "no-idcode",
@@ -54,7 +55,7 @@ constexpr Rule DEVICE_TWICE{"D106",
                             "two-idcodes",
                             Severity::ERROR,
                             "device with two IDCODEs",
-                            "Of two IDCODEs of one device the last counts; the first is lost.",
+                            "Of two IDCODEs of one device the last is used; the first is lost.",
                             "IDCODE = KS50,0xX4104FB7:KS50,0xX4108FB7"};
 constexpr Rule MALFORMED_ENTRY{
     "D107",
@@ -94,6 +95,15 @@ std::optional<Pattern> patternOf(std::string_view text) {
         pattern.mask = (pattern.mask << 4U) | (value ? 0xFU : 0U);
     }
     return pattern;
+}
+
+/// With "0x" and "X" as they must be.
+std::string inUsualCase(std::string_view text) {
+    std::string code = upperCase(text);
+    if (code.size() > 1 && code[1] == 'X') {
+        code[1] = 'x';
+    }
+    return code;
 }
 
 /// Finds patterns that match a common code. There are few different masks, however many codes there are.
@@ -148,8 +158,9 @@ private:
 void checkCode(const Token& device, const Token& code, bool counts, IdcodeIndex& codes, Findings& findings) {
     const std::optional<Pattern> pattern = patternOf(code.text);
     if (!pattern) {
-        findings.add(MALFORMED_CODE, code, "{} is not 0x and eight hexadecimal digits or X",
-                     inQuotes(code.text));
+        findings
+            .add(MALFORMED_CODE, code, "{} is not 0x and eight hexadecimal digits or X", inQuotes(code.text))
+            .fix = patternOf(inUsualCase(code.text)) ? replacing(code, inUsualCase(code.text)) : std::nullopt;
         return;
     }
     if ((pattern->mask & 1U) != 0 && (pattern->bits & 1U) == 0) {
@@ -171,11 +182,12 @@ void checkDevice(const Model& model, const Token& device, const std::vector<Toke
         return;
     }
     if (model.isFamily(device.text) || model.isFlashInAnyCase(std::string(device.text))) {
-        findings.add(UNKNOWN_DEVICE, device, "{} is no device of a family, and has no IDCODE",
+        findings.add(UNKNOWN_DEVICE, device, "{} is not a device of a family, so it has no IDCODE",
                      inQuotes(device.text));
     } else {
-        findings.add(UNKNOWN_DEVICE, device, "unknown device {}{}", inQuotes(device.text),
-                     findings.didYouMean(device.text, model.deviceNames(), used));
+        findings.addUnknown(UNKNOWN_DEVICE, device, device,
+                            findings.suggest(device.text, model.deviceNames(), used), "unknown device {}",
+                            inQuotes(device.text));
     }
 }
 
@@ -202,9 +214,9 @@ void check(const Model& model, Findings& findings) {
             findings.add(DEVICE_TWICE, device, "the former IDCODE of {} is lost", inQuotes(device.text));
         }
         if (fields.size() < 2) {
-            findings.add(MALFORMED_ENTRY, device, "no code behind {}", inQuotes(device.text));
+            findings.add(MALFORMED_ENTRY, device, "no code after {}", inQuotes(device.text));
         } else if (fields.size() > 2) {
-            findings.add(MALFORMED_ENTRY, fields[2], "{} is never read: entries stand between \":\"",
+            findings.add(MALFORMED_ENTRY, fields[2], "{} is never read: entries are separated by \":\"",
                          inQuotes(fields[2].text));
         }
         if (fields.size() > 1 && !fields[1].text.empty()) {

@@ -8,6 +8,7 @@
 
 #include <algorithm>
 #include <map>
+#include <set>
 #include <utility>
 
 namespace lint {
@@ -19,7 +20,7 @@ constexpr Rule DUPLICATE_KEY{
     "duplicate-key",
     Severity::ERROR,
     "key set twice in one section",
-    R"(In one section of one file the last "=" counts, and the former value of the key is lost. Join the values, or
+    R"(In one section of one file the last "=" wins, and the former value of the key is lost. Join the values, or
 add to the first with "+=". A layer on top may set a key again; that is what layers are for.)",
     "PROPERTY = VENDOR,Korvel\nPROPERTY = KIND,FPGA"};
 constexpr Rule UNKNOWN_KEY{
@@ -64,7 +65,7 @@ void checkDuplicates(const Model& model, Findings& findings) {
                 const auto [known, isFirst] = lines.try_emplace({section, line.name}, line.line);
                 if (!isFirst && line.kind == AcdLines::Kind::ASSIGNMENT) {
                     findings.add(DUPLICATE_KEY, {line.name, {&file, line.line, line.column}},
-                                 "the key {} is set again: what line {} gave is lost", inQuotes(line.name),
+                                 "the key {} is set again; the value of line {} is lost", inQuotes(line.name),
                                  known->second);
                 }
                 known->second = line.line;
@@ -108,17 +109,23 @@ public:
 
     void check(const AcdLines& file) {
         enum class Open { OWN, SECTION, NOTHING } open = Open::OWN;
+        std::string section;
+        m_file = &file;
+        m_set.clear();
         for (const AcdLines::Line& line : file.lines()) {
             if (line.kind == AcdLines::Kind::HEADER) {
                 open = Open::SECTION;
+                section = lowerCase(line.name);
             } else if (line.kind == AcdLines::Kind::INVALID) {
                 open = line.closesSection ? Open::NOTHING : open;
             } else if (open == Open::OWN && !isRead(line.name)) {
-                add(file, line, hint(line.name, m_own));
+                addUnknown(line, section, m_own);
             } else if (open == Open::SECTION && schema::shapeInSection(line.name) == schema::Shape::NONE) {
-                add(file, line,
-                    isRead(line.name) ? "; it belongs before the first section"
-                                      : hint(line.name, m_inSection));
+                if (isRead(line.name)) {
+                    add(line, {}, "; it belongs before the first section");
+                } else {
+                    addUnknown(line, section, m_inSection);
+                }
             }
         }
     }
@@ -128,20 +135,44 @@ private:
         return std::binary_search(m_own.begin(), m_own.end(), key);
     }
 
-    [[nodiscard]] std::string hint(std::string_view key, const std::vector<std::string>& known) {
-        const std::string file = fileHint(key, m_kind);
-        return file.empty() ? m_findings.didYouMean(key, known) : file;
+    /// Adds a finding about a key that the file does not have, with the nearest one that the section does not set.
+    void addUnknown(const AcdLines::Line& line, const std::string& section,
+                    const std::vector<std::string>& known) {
+        if (const std::string file = fileHint(line.name, m_kind); !file.empty()) {
+            add(line, {}, file);
+        } else {
+            add(line, m_findings.suggest(line.name, known, [&](const std::string& other) {
+                return keysSet().contains({section, other});
+            }));
+        }
     }
 
-    void add(const AcdLines& file, const AcdLines::Line& line, const std::string& hint) {
-        m_findings.add(UNKNOWN_KEY, {line.name, {&file, line.line, line.column}},
-                       "nobody reads the key {} here{}", inQuotes(line.name), hint);
+    /// The keys that the file sets, each with its section in lower case: collected for the first unknown key only.
+    [[nodiscard]] const std::set<std::pair<std::string, std::string>>& keysSet() {
+        std::string section;
+        for (auto line = m_set.empty() ? m_file->lines().begin() : m_file->lines().end();
+             line != m_file->lines().end(); ++line) {
+            if (line->kind == AcdLines::Kind::HEADER) {
+                section = lowerCase(line->name);
+            } else if (line->kind != AcdLines::Kind::INVALID) {
+                m_set.emplace(section, line->name);
+            }
+        }
+        return m_set;
+    }
+
+    void add(const AcdLines::Line& line, const Suggestion& suggestion, const std::string& hint = {}) {
+        const Token key{line.name, {m_file, line.line, line.column}};
+        m_findings.addUnknown(UNKNOWN_KEY, key, key, suggestion, "the key {} is not read here{}",
+                              inQuotes(line.name), hint);
     }
 
     schema::File m_kind;
     std::vector<std::string> m_own;
     std::vector<std::string> m_inSection = schema::fixedKeys(schema::File::FAMILY);
     Findings& m_findings;
+    const AcdLines* m_file = nullptr;
+    std::set<std::pair<std::string, std::string>> m_set;
 };
 
 void checkKnown(const Model& model, Findings& findings) {

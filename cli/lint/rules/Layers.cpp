@@ -13,7 +13,8 @@ constexpr Rule APPEND_WITHOUT_VALUE{
     R"("+=" in a section that has no value of its own)",
     R"(In a section "+=" adds to the section's own value, not to that of the family. Without one the appended text is the
 whole value of the device and hides the family's records. Write out all records with "=".)",
-    "OPERATION = PROGRAM,Bscan,USB2\n[KS50]\nOPERATION += :VERIFY,Bscan,USB2"};
+    "OPERATION = PROGRAM,Bscan,USB2\n[KS50]\nOPERATION += :VERIFY,Bscan,USB2",
+    true};
 constexpr Rule HIDDEN_NAMES{
     "R102",
     "hidden-names",
@@ -62,8 +63,11 @@ void check(const Model& model, Findings& findings) {
             for (const auto& [key, value] : section.values) {
                 checkHidings(key, value, findings);
                 for (const Token& text : value.joinedAppends) {
-                    findings.add(JOINED_APPEND, text, "{} is joined to the text before it; begin with \"{}\"",
-                                 inQuotes(text.text), schema::firstListed(family.kind, key) <= 1 ? "," : ":");
+                    const char* const separator = schema::firstListed(family.kind, key) <= 1 ? "," : ":";
+                    findings
+                        .add(JOINED_APPEND, text, "{} is joined to the text before it; begin with \"{}\"",
+                             inQuotes(text.text), separator)
+                        .fix = insertingBefore(partOf(text, 0, 0), separator);
                 }
             }
         });

@@ -98,7 +98,7 @@ constexpr Rule SWALLOWED_LINE{
     "swallowed-line",
     Severity::ERROR,
     "continuation that looks like a header, a key or a comment",
-    R"(After a "\" at the end of a line the next line is part of the value, whatever it looks like: a header opens
+    R"(After a "\" at the end of a line the next line is part of the value, even if it looks like something else: a header opens
 no section, a key sets nothing, and a comment is text. Remove the "\", or move the comment above the key.)",
     "PROPERTY = PINS,140: \\\n[KS100]"};
 
@@ -110,6 +110,14 @@ constexpr Rule LONE_CR{
     R"(Lines end in LF or CRLF; a CR anywhere else is part of the text. A file whose lines end in CR alone is a single
 line.)",
     "PROPERTY = PINS,140<CR>PROPERTIES = PACKAGES,1,TQ100"};
+constexpr Rule UNREADABLE_FILE{
+    "L114",
+    "unreadable-file",
+    Severity::ERROR,
+    "file that cannot be read",
+    R"(The file cannot be opened or read, or it is not a regular file. Its devices do not exist for applications. The other
+files are checked, but names that this file may define are not reported as unknown. The exit status is 2.)",
+    ""};
 
 const Rule* ruleFor(AcdLines::ParseError error) {
     switch (error) {
@@ -137,6 +145,51 @@ const Rule* ruleFor(AcdLines::ParseError error) {
         break;
     }
     return nullptr;
+}
+
+bool isOneWord(std::string_view text) { return !text.empty() && text.find_first_of(" \t[]#\\") == text.npos; }
+
+/// A header with one name in it, and a comment after it on a line of its own before it.
+std::optional<Fix> fixOfHeader(const AcdLines& file, const AcdLines::Line& line) {
+    const std::string_view source = file.source(line.firstLine);
+    const std::size_t open = source.find('[');
+    if (open == source.npos || line.firstLine != line.lastLine) {
+        return std::nullopt;
+    }
+    const std::string_view whole = source.substr(open);
+    const std::size_t close = std::min(whole.find(']'), whole.size());
+    const auto trimmed = [](std::string_view text) {
+        const std::size_t begin = std::min(text.find_first_not_of(" \t"), text.size());
+        return text.substr(begin, text.find_last_not_of(" \t") + 1 - begin);
+    };
+    const std::string_view name = trimmed(whole.substr(1, close - 1));
+    const std::string_view rest = trimmed(whole.substr(std::min(close + 1, whole.size())));
+    if (!isOneWord(name) || (!rest.empty() && !rest.starts_with('#'))) {
+        return std::nullopt;
+    }
+    const std::string comment = rest.empty() ? std::string() : std::string(rest) + '\n';
+    return replacing({whole, {&file, line.firstLine, static_cast<unsigned>(open) + 1}},
+                     fmt::format("{}[{}]", comment, name));
+}
+
+/// The last line without the separator and the "\" before what is not there.
+std::optional<Fix> fixOfLastLine(const AcdLines& file, const AcdLines::Line& line) {
+    const std::string_view source = file.source(line.line);
+    const std::size_t end = source.find_last_not_of(" \t,:\\") + 1;
+    return replacing({source.substr(end), {&file, line.line, static_cast<unsigned>(end) + 1}}, "");
+}
+
+std::optional<Fix> fixOf(const AcdLines& file, const AcdLines::Line& line) {
+    switch (line.error) {
+    case AcdLines::ParseError::UNCLOSED_HEADER:
+    case AcdLines::ParseError::BLANK_IN_NAME:
+    case AcdLines::ParseError::TEXT_BEHIND_HEADER:
+        return fixOfHeader(file, line);
+    case AcdLines::ParseError::CONTINUED_AT_END:
+        return fixOfLastLine(file, line);
+    default:
+        return std::nullopt;
+    }
 }
 
 /// Does the text begin with `KEY =`?
@@ -169,8 +222,7 @@ void checkSwallowed(const AcdLines& file, const AcdLines::Line& line, Findings& 
         const std::string_view text = source.substr(std::min<std::size_t>(span.column - 1, source.size()));
         if (const char* const what = looksLike(text)) {
             findings.add(SWALLOWED_LINE, {text, {&file, span.line, span.column}},
-                         "this is no line of its own but part of the value of {}, though it looks like {}",
-                         inQuotes(line.name), what);
+                         "this continues the value of {}, but looks like {}", inQuotes(line.name), what);
         }
     }
 }
@@ -186,12 +238,16 @@ void checkReturns(const AcdLines& file, unsigned line, Findings& findings) {
 
 void check(const Model& model, Findings& findings) {
     for (const AcdLines& file : model.files()) {
+        if (!file.readError().empty()) {
+            findings.add(UNREADABLE_FILE, startOf(file), "the file cannot be read: {}", file.readError());
+        }
         for (const AcdLines::Comment& comment : file.comments()) {
             checkReturns(file, comment.line, findings);
         }
         for (const AcdLines::Line& line : file.lines()) {
             if (const Rule* const rule = ruleFor(line.error)) {
-                findings.addText(*rule, {{}, {&file, line.line, line.column}}, line.text);
+                findings.addText(*rule, {{}, {&file, line.line, line.column}}, line.text).fix =
+                    fixOf(file, line);
             }
             checkSwallowed(file, line, findings);
             for (unsigned number = line.firstLine; number <= line.lastLine; ++number) {
@@ -217,7 +273,7 @@ RuleSet lineRules() {
     return {"lines",
             {&NO_EQUALS_SIGN, &EMPTY_KEY, &BLANK_IN_KEY, &NUL_BYTE, &LINE_TOO_LONG, &CONTINUED_AT_END,
              &UNCLOSED_HEADER, &EMPTY_NAME, &BLANK_IN_NAME, &TEXT_AFTER_HEADER, &VALUE_TOO_LONG,
-             &SWALLOWED_LINE, &LONE_CR},
+             &SWALLOWED_LINE, &LONE_CR, &UNREADABLE_FILE},
             check};
 }
 

@@ -3,6 +3,7 @@
 #include "lint/rules/RuleSets.h"
 
 #include <algorithm>
+#include <optional>
 #include <set>
 
 namespace lint {
@@ -65,6 +66,26 @@ constexpr Rule DOUBLED_OPERATOR{
 
 bool isBlank(char byte) { return byte == ' ' || byte == '\t'; }
 
+std::string withoutBlanks(std::string_view text) {
+    const std::size_t begin = std::min(text.find_first_not_of(" \t"), text.size());
+    return std::string(text.substr(begin, text.find_last_not_of(" \t") + 1 - begin));
+}
+
+/// "=" in place of "==", and "+=" in place of "=+".
+std::optional<Fix> withOneOperator(const Token& value) {
+    const Token second = partOf(value, 0, 1);
+    const std::string_view line = value.location.file->source(value.location.line);
+    if (second.text == "=") {
+        return replacing(second, "");
+    }
+    if (value.location.column < 2 || !line.substr(value.location.column - 2).starts_with("=+")) {
+        return std::nullopt;
+    }
+    SourceLocation first = value.location;
+    --first.column;
+    return Fix{{{first, 2, "+="}}};
+}
+
 bool isNumberOrFlag(std::string_view text) {
     return text == "TRUE" || text == "FALSE" ||
            (!text.empty() && text.find_first_not_of("0123456789.-") == text.npos);
@@ -86,11 +107,14 @@ void checkTexts(const std::vector<Token>& tokens, Findings& findings) {
         const std::string_view text = token.text;
         if (text.empty() && tokens.size() > 1) {
             const bool isLast = &token == &tokens.back();
-            findings.addText(isLast ? TRAILING_SEPARATOR : EMPTY_ITEM, token,
-                             isLast ? "a separator at the end leaves an empty item behind it" : "empty item");
+            findings
+                .addText(isLast ? TRAILING_SEPARATOR : EMPTY_ITEM, token,
+                         isLast ? "a separator at the end adds an empty item" : "empty item")
+                .fix = removing(token);
         } else if (!text.empty() && (isBlank(text.front()) || isBlank(text.back()))) {
-            findings.add(BLANK_AROUND_SEPARATOR, token, "the blanks of {} are part of the text",
-                         inQuotes(text));
+            findings
+                .add(BLANK_AROUND_SEPARATOR, token, "the blanks of {} are part of the text", inQuotes(text))
+                .fix = replacing(token, withoutBlanks(text));
         }
         // A "#" at the start of a continuation line is found as such.
         const std::string_view line = token.location.file->source(token.location.line);
@@ -123,7 +147,8 @@ void checkTwice(const Item& item, std::size_t first, Findings& findings) {
     for (std::size_t i = first; i < item.fields.size(); ++i) {
         const Token& token = item.fields[i];
         if (!token.text.empty() && !seen.insert(token.text).second) {
-            findings.add(DUPLICATE_ITEM, token, "{} is listed twice", inQuotes(token.text));
+            findings.add(DUPLICATE_ITEM, token, "{} is listed twice", inQuotes(token.text)).fix =
+                removing(token);
         }
     }
 }
@@ -136,8 +161,9 @@ void check(const Model& model, Findings& findings) {
                 if (!value.items.empty()) {
                     const Token& first = value.items.front().whole;
                     if (first.text.starts_with('=') || first.text.starts_with('+')) {
-                        findings.add(DOUBLED_OPERATOR, first, "the value begins with \"{}\"",
-                                     first.text.front());
+                        findings
+                            .add(DOUBLED_OPERATOR, first, "the value begins with \"{}\"", first.text.front())
+                            .fix = withOneOperator(first);
                     }
                 }
                 for (const Item& item : value.items) {

@@ -3,8 +3,10 @@
 #include "lint/rules/RuleSets.h"
 
 #include "model/Vocabulary.h"
+#include "text/Suggest.h"
 
 #include <algorithm>
+#include <set>
 
 namespace lint {
 
@@ -63,15 +65,17 @@ constexpr Rule UNKNOWN_PART_DEVICE{
     "unknown-part-device",
     Severity::ERROR,
     "excluded part with an unknown device",
-    R"(No family's file has a section for the device, and it is no flash either.)",
-    "NOT_SUPPORTED_PART_IN_MODE = SM_KS55_TQ100"};
+    R"(No family's file has a section for the device, and it is not a flash either.)",
+    "NOT_SUPPORTED_PART_IN_MODE = SM_KS55_TQ100",
+    true};
 constexpr Rule UNKNOWN_PART_PACKAGE{
     "M204",
     "unknown-part-package",
     Severity::ERROR,
     "excluded part with a package that the device does not have",
-    "The device's property PACKAGES does not list the package, so this part is never asked for.",
-    "NOT_SUPPORTED_PART_IN_MODE = SM_KS50_TQ101"};
+    "The device's property PACKAGES does not list the package, so applications never ask for this part.",
+    "NOT_SUPPORTED_PART_IN_MODE = SM_KS50_TQ101",
+    true};
 
 constexpr Rule SPI_PART{
     "M206",
@@ -88,7 +92,8 @@ bool contains(const std::vector<std::string>& all, std::string_view text) {
 
 void checkLabel(const Token& label, bool isEntry, Findings& findings) {
     if (isEntry) {
-        findings.add(NO_LABEL, label, "{} stands where the label does, and is skipped", inQuotes(label.text));
+        findings.add(NO_LABEL, label, "{} is in the place of the label, and is skipped",
+                     inQuotes(label.text));
     }
 }
 
@@ -97,8 +102,9 @@ void checkOutputs(const std::vector<Token>& outputs, Findings& findings) {
     for (std::size_t i = 1; i < outputs.size(); ++i) {
         const std::string_view text = outputs[i].text;
         if (!text.empty() && !contains(schema::modeOutputs(), text)) {
-            findings.add(UNKNOWN_MODE_OUTPUT, outputs[i], "unknown output {}{}", inQuotes(text),
-                         findings.didYouMean(text, schema::modeOutputs(), outputs));
+            findings.addUnknown(UNKNOWN_MODE_OUTPUT, outputs[i], outputs[i],
+                                findings.suggest(text, schema::modeOutputs(), outputs), "unknown output {}",
+                                inQuotes(text));
         }
     }
 }
@@ -112,11 +118,12 @@ void checkFamilies(const Model& model, const std::vector<Token>& families, Findi
         }
         if (const Device* const device = model.device(text)) {
             findings.add(UNKNOWN_MODE_FAMILY, families[i],
-                         "{} is a device; only its family {} can stand here", inQuotes(text),
+                         "{} is a device; only its family {} can be listed here", inQuotes(text),
                          inQuotes(device->family->name));
         } else {
-            findings.add(UNKNOWN_MODE_FAMILY, families[i], "unknown family {}{}", inQuotes(text),
-                         findings.didYouMean(text, model.familyNames(), families));
+            findings.addUnknown(UNKNOWN_MODE_FAMILY, families[i], families[i],
+                                findings.suggest(text, model.familyNames(), families), "unknown family {}",
+                                inQuotes(text));
         }
     }
 }
@@ -127,9 +134,9 @@ void checkMode(const Model& model, const Value& value, Findings& findings) {
         return; // a layer empties the key on purpose
     }
     if (items.size() > 2) {
-        findings.addText(NOT_TWO_ITEMS, items[2].whole, "what stands behind the families is never read");
+        findings.addText(NOT_TWO_ITEMS, items[2].whole, "text after the families is never read");
     } else if (items.size() < 2) {
-        findings.addText(NOT_TWO_ITEMS, value.key, "no list of families behind the outputs");
+        findings.addText(NOT_TWO_ITEMS, value.key, "no list of families after the outputs");
     }
     if (!items.empty()) {
         checkOutputs(items[0].fields, findings);
@@ -139,7 +146,9 @@ void checkMode(const Model& model, const Value& value, Findings& findings) {
     }
 }
 
-void checkPart(const Model& model, const Token& part, Findings& findings) {
+void checkPart(const Model& model, const Token& part, const std::set<std::string_view>& excluded,
+               Findings& findings) {
+    const auto isExcluded = [&excluded](const std::string& other) { return excluded.contains(other); };
     const std::string_view text = part.text;
     const std::size_t first = text.find('_');
     const std::size_t second = first == text.npos ? first : text.find('_', first + 1);
@@ -152,13 +161,24 @@ void checkPart(const Model& model, const Token& part, Findings& findings) {
     const std::string_view name = text.substr(first + 1, second - first - 1);
     const std::string_view package = text.substr(second + 1);
     if (!contains(vocabulary::modes(), mode)) {
-        findings.add(UNKNOWN_PART_MODE, part, "unknown mode {} in {}{}", inQuotes(mode), inQuotes(text),
-                     findings.didYouMean(mode, vocabulary::modes()));
+        findings.addUnknown(UNKNOWN_PART_MODE, part, partOf(part, 0, mode.size()),
+                            findings.suggest(mode, vocabulary::modes(),
+                                             [&](const std::string& other) {
+                                                 return isExcluded(
+                                                     fmt::format("{}_{}_{}", other, name, package));
+                                             }),
+                            "unknown mode {} in {}", inQuotes(mode), inQuotes(text));
     }
-    if (mode == "SPI") {
-        if (name != "spi") {
-            findings.add(SPI_PART, part, "never looked up: in SPI mode {} is; did you mean \"SPI_spi_{}\"?",
-                         inQuotes("spi"), package);
+    if (mode == schema::SPI_MODE) {
+        if (name != schema::SPI_FAMILY) {
+            Finding& finding =
+                findings.add(SPI_PART, part,
+                             "never looked up: in SPI mode every device is {}; did you mean \"SPI_spi_{}\"?",
+                             inQuotes(schema::SPI_FAMILY), package);
+            if (sameWithoutCase(name, schema::SPI_FAMILY)) {
+                finding.fix =
+                    replacing(partOf(part, first + 1, name.size()), std::string(schema::SPI_FAMILY));
+            }
         }
         return;
     }
@@ -167,8 +187,13 @@ void checkPart(const Model& model, const Token& part, Findings& findings) {
     }
     const Device* const device = model.device(name);
     if (device == nullptr) {
-        findings.add(UNKNOWN_PART_DEVICE, part, "unknown device {} in {}{}", inQuotes(name), inQuotes(text),
-                     findings.didYouMean(name, model.deviceNames()));
+        findings.addUnknown(UNKNOWN_PART_DEVICE, part, partOf(part, first + 1, name.size()),
+                            findings.suggest(name, model.deviceNames(),
+                                             [&](const std::string& other) {
+                                                 return isExcluded(
+                                                     fmt::format("{}_{}_{}", mode, other, package));
+                                             }),
+                            "unknown device {} in {}", inQuotes(name), inQuotes(text));
         return;
     }
     std::vector<std::string> packages;
@@ -177,8 +202,13 @@ void checkPart(const Model& model, const Token& part, Findings& findings) {
     }
     // The packages of a device that lists none are unknown.
     if (!packages.empty() && !contains(packages, package)) {
-        findings.add(UNKNOWN_PART_PACKAGE, part, "{} has no package {}{}", inQuotes(name), inQuotes(package),
-                     findings.didYouMean(package, packages));
+        findings.addUnknown(UNKNOWN_PART_PACKAGE, part, partOf(part, second + 1, package.size()),
+                            findings.suggest(package, packages,
+                                             [&](const std::string& other) {
+                                                 return isExcluded(
+                                                     fmt::format("{}_{}_{}", mode, name, other));
+                                             }),
+                            "{} has no package {}", inQuotes(name), inQuotes(package));
     }
 }
 
@@ -188,9 +218,13 @@ void check(const Model& model, Findings& findings) {
             checkMode(model, *value, findings);
         }
     }
+    std::set<std::string_view> excluded;
+    for (const Token& part : model.baseKeys().list(schema::NOT_SUPPORTED_PART_IN_MODE)) {
+        excluded.insert(part.text);
+    }
     for (const Token& part : model.baseKeys().list(schema::NOT_SUPPORTED_PART_IN_MODE)) {
         if (!part.text.empty()) {
-            checkPart(model, part, findings);
+            checkPart(model, part, excluded, findings);
         }
     }
 }

@@ -12,6 +12,7 @@
 #include <charconv>
 #include <map>
 #include <optional>
+#include <set>
 #include <utility>
 
 namespace lint {
@@ -61,7 +62,7 @@ constexpr Rule NAME_TWICE{"P106",
                           "property-twice",
                           Severity::ERROR,
                           "property given twice",
-                          "Of two entries with one name in one key the last counts; the other is lost.",
+                          "Of two entries with one name in one key the last is used; the other is lost.",
                           "PROPERTY = VENDOR,Korvel:VENDOR,Orveth"};
 constexpr Rule FLAG_NOT_UPPER_CASE{
     "P107",
@@ -77,7 +78,7 @@ constexpr Rule UNKNOWN_MODE_KEY{
     Severity::ERROR,
     "unknown mode in the property of an operation",
     R"(A property with the name of an operation lists the keys of the modes that offer it: BS, SS, SM, BSFILE, DP770,
-SPI, KITECF, KITEMPM, PFF. Any other text is never asked for.)",
+SPI, KITECF, KITEMPM, PFF. Applications never ask for any other text.)",
     "PROPERTIES = PROGRAM,1,Bscan"};
 constexpr Rule UNKNOWN_OPTION_VALUE{
     "P202",
@@ -92,7 +93,7 @@ constexpr Rule UNKNOWN_OPERATION_NAME{
     Severity::ERROR,
     "OP_ property that belongs to no operation",
     R"(Options are looked up under OP_ and an operation, or OP_, an operation, "_" and a mode key, in upper case. Any
-other name is never asked for.)",
+other name is never looked up.)",
     "PROPERTIES = OP_PROGRM,1,VERIFY"};
 constexpr Rule HIDDEN_OPTIONS{
     "P204",
@@ -121,14 +122,14 @@ void checkTwice(const std::vector<Item>& items, Findings& findings) {
         const AcdLines*& file = files[name.text];
         // A layer on top may append another value on purpose.
         if (std::exchange(file, name.location.file) == name.location.file && !name.text.empty()) {
-            findings.add(NAME_TWICE, name, "what {} was given before is lost", inQuotes(name.text));
+            findings.add(NAME_TWICE, name, "the former value of {} is lost", inQuotes(name.text));
         }
     }
 }
 
 void checkSingle(const Item& item, Findings& findings) {
     if (item.fields.size() < 2) {
-        findings.add(NO_VALUE, item.whole, "no value behind {}", inQuotes(item.whole.text));
+        findings.add(NO_VALUE, item.whole, "no value after {}", inQuotes(item.whole.text));
     } else if (item.fields.size() > 2) {
         findings.add(SEVERAL_VALUES, item.fields[2], "{} is never read: {} has one value",
                      inQuotes(item.fields[2].text), inQuotes(item.fields[0].text));
@@ -139,11 +140,16 @@ void checkCounted(const Item& item, Findings& findings) {
     const std::vector<Token>& fields = item.fields;
     const std::optional<std::size_t> count = fields.size() < 2 ? std::nullopt : number(fields[1].text);
     if (!count) {
-        findings.add(NO_COUNT, fields.size() < 2 ? item.whole : fields[1], "no number of values behind {}",
-                     inQuotes(fields[0].text));
+        Finding& finding = findings.add(NO_COUNT, fields.size() < 2 ? item.whole : fields[1],
+                                        "no number of values after {}", inQuotes(fields[0].text));
+        if (fields.size() > 1) {
+            finding.fix = insertingBefore(fields[1], fmt::format("{},", fields.size() - 1));
+        }
     } else if (*count != fields.size() - 2) {
-        findings.add(WRONG_COUNT, fields[1], "{} says {} values and has {}", inQuotes(fields[0].text), *count,
-                     fields.size() - 2);
+        findings
+            .add(WRONG_COUNT, fields[1], "{} says {} values and has {}", inQuotes(fields[0].text), *count,
+                 fields.size() - 2)
+            .fix = replacing(fields[1], std::to_string(fields.size() - 2));
     }
 }
 
@@ -160,24 +166,28 @@ bool namesOperation(std::string_view name) {
 std::vector<std::string> optionPropertyNames() {
     std::vector<std::string> all;
     for (const std::string& operation : vocabulary::operations()) {
-        all.push_back("OP_" + operation);
+        all.push_back(std::string(schema::OPTIONS_PREFIX).append(operation));
         for (const std::string& mode : vocabulary::modes()) {
-            all.push_back("OP_" + operation + '_' + mode);
+            all.push_back(fmt::format("{}{}_{}", schema::OPTIONS_PREFIX, operation, mode));
         }
     }
     return all;
 }
 
 /// Checks the properties whose name has a meaning for the manager.
-void checkMeaning(const Item& item, std::size_t firstValue, Findings& findings) {
+void checkMeaning(const Item& item, std::size_t firstValue, const std::set<std::string_view>& names,
+                  Findings& findings) {
     const Token& name = item.fields.front();
     const bool isOption = name.text.starts_with(schema::OPTIONS_PREFIX);
-    const std::string upper = plain(UT_STR::Upper(std::string(name.text).c_str()));
+    const std::string upper = toStdString(UT_STR::Upper(std::string(name.text).c_str()));
     const bool isUpperOption = upper.starts_with(schema::OPTIONS_PREFIX) &&
                                namesOperation(std::string_view(upper).substr(schema::OPTIONS_PREFIX.size()));
     if (isOption ? name.text != upper || !isUpperOption : isUpperOption) {
-        findings.add(UNKNOWN_OPERATION_NAME, name, "{} belongs to no operation{}", inQuotes(name.text),
-                     findings.didYouMean(name.text, optionPropertyNames()));
+        findings.addUnknown(
+            UNKNOWN_OPERATION_NAME, name, name,
+            findings.suggest(name.text, optionPropertyNames(),
+                             [&names](const std::string& other) { return names.contains(other); }),
+            "{} belongs to no operation", inQuotes(name.text));
     }
     if (!isOption && !contains(vocabulary::operations(), name.text)) {
         return;
@@ -189,11 +199,11 @@ void checkMeaning(const Item& item, std::size_t firstValue, Findings& findings) 
             continue;
         }
         // The word that records use for a mode is the likeliest mistake.
-        const std::string hint = !isOption && sameWithoutCase(value.text, "Bscan")
-                                     ? "; did you mean \"BS\"?"
-                                     : findings.didYouMean(value.text, known, item.fields);
-        findings.add(isOption ? UNKNOWN_OPTION_VALUE : UNKNOWN_MODE_KEY, value, "unknown {} {}{}",
-                     isOption ? "option" : "mode key", inQuotes(value.text), hint);
+        const Suggestion suggestion = !isOption && sameWithoutCase(value.text, "Bscan")
+                                          ? Suggestion{"BS", true}
+                                          : findings.suggest(value.text, known, item.fields);
+        findings.addUnknown(isOption ? UNKNOWN_OPTION_VALUE : UNKNOWN_MODE_KEY, value, value, suggestion,
+                            "unknown {} {}", isOption ? "option" : "mode key", inQuotes(value.text));
     }
 }
 
@@ -202,8 +212,10 @@ void checkFlags(const Item& item, std::size_t firstValue, Findings& findings) {
         const Token& value = item.fields[i];
         for (const char* const flag : {"TRUE", "FALSE"}) {
             if (sameWithoutCase(value.text, flag) && value.text != flag) {
-                findings.add(FLAG_NOT_UPPER_CASE, value, "{} is not {}: flags are compared with case",
-                             inQuotes(value.text), flag);
+                findings
+                    .add(FLAG_NOT_UPPER_CASE, value, "{} is not {}: flags are compared with case",
+                         inQuotes(value.text), flag)
+                    .fix = replacing(value, flag);
             }
         }
     }
@@ -247,13 +259,19 @@ void checkBothKeys(const Section& section, Findings& findings) {
         // A layer on top may replace a single value by a list on purpose.
         const auto known = files.find(name.text);
         if (!name.text.empty() && known != files.end() && known->second == name.location.file) {
-            findings.add(IN_BOTH_KEYS, name, "{} stands in PROPERTIES too, which counts",
+            findings.add(IN_BOTH_KEYS, name, "{} is in PROPERTIES too, whose value is used",
                          inQuotes(name.text));
         }
     }
 }
 
 void checkSection(const Section& section, const Section& family, Findings& findings) {
+    std::set<std::string_view> names;
+    for (const schema::PropertyKey key : schema::PROPERTY_KEYS) {
+        for (const Item& item : section.items(key.key)) {
+            names.insert(item.fields.front().text);
+        }
+    }
     for (const schema::PropertyKey key : schema::PROPERTY_KEYS) {
         checkTwice(section.items(key.key), findings);
         for (const Item& item : section.items(key.key)) {
@@ -265,7 +283,7 @@ void checkSection(const Section& section, const Section& family, Findings& findi
             } else {
                 checkCounted(item, findings);
             }
-            checkMeaning(item, key.firstValue, findings);
+            checkMeaning(item, key.firstValue, names, findings);
             checkFlags(item, key.firstValue, findings);
             checkHiddenOptions(item, section, family, findings);
         }

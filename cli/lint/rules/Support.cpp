@@ -17,7 +17,8 @@ constexpr Rule UNKNOWN_SUPPORTED{
     "supported name that is neither family nor device",
     R"(DEVICE_SUPPORTED lists families and devices exactly as their file or header spells them, case included. Any
 other name gets a table that stays empty. Flashes all belong to family "spi".)",
-    "DEVICE_SUPPORTED = base,kestral"};
+    "DEVICE_SUPPORTED = base,kestral",
+    true};
 constexpr Rule UNKNOWN_OPTION_OWNER{
     "B102",
     "unknown-option-owner",
@@ -25,14 +26,16 @@ constexpr Rule UNKNOWN_OPTION_OWNER{
     "option table for a name that is neither family, device nor device with package",
     R"(PROGRAM_OPTION_PACKAGE lists families, devices, and devices with a package directly after them (KS50PQ208,
 without "_"), case included. Any other name gets a table that stays empty.)",
-    "PROGRAM_OPTION_PACKAGE = base,KS50_PQ208"};
+    "PROGRAM_OPTION_PACKAGE = base,KS50_PQ208",
+    true};
 constexpr Rule UNKNOWN_PACKAGE{
     "B103",
     "unknown-package",
     Severity::ERROR,
     "option table for a package that the device does not have",
-    "The device's property PACKAGES does not list the package, so the table is never asked for.",
-    "PROGRAM_OPTION_PACKAGE = base,KS50PQ280"};
+    "The device's property PACKAGES does not list the package, so the table is never used.",
+    "PROGRAM_OPTION_PACKAGE = base,KS50PQ280",
+    true};
 constexpr Rule UNLISTED_FAMILY{
     "B104",
     "unlisted-family",
@@ -73,12 +76,13 @@ constexpr Rule NO_TABLES{
     Severity::WARNING,
     "device of DEVICE_SUPPORTED without tables of its own",
     R"(The section has neither OPERATION nor BSDL_OPERATION, so the device has the operations of its family anyway, but it is
-no longer found with its package behind "_". Remove the name, or add the tables.)",
-    "# while [KS50] has no OPERATION\nDEVICE_SUPPORTED = base,KS50,kestrel"};
+no longer found when its package follows after "_". Remove the name, or add the tables.)",
+    "# while [KS50] has no OPERATION\nDEVICE_SUPPORTED = base,KS50,kestrel",
+    true};
 
 bool isKnown(const Model& model, std::string_view name) {
     // "spi" is a family of every database, even of one without flashes.
-    return model.isFamily(name) || model.device(name) != nullptr || name == "spi";
+    return model.isFamily(name) || model.device(name) != nullptr || name == schema::SPI_FAMILY;
 }
 
 std::vector<std::string> familiesAndDevices(const Model& model) {
@@ -92,8 +96,9 @@ void checkSupported(const Model& model, Findings& findings) {
     const std::vector<Token>& listed = model.baseKeys().list(schema::DEVICE_SUPPORTED);
     for (const Token& name : listed) {
         if (!name.text.empty() && !isKnown(model, name.text)) {
-            findings.add(UNKNOWN_SUPPORTED, name, "{} is neither a family nor a device{}",
-                         inQuotes(name.text), findings.didYouMean(name.text, candidates, listed));
+            findings.addUnknown(UNKNOWN_SUPPORTED, name, name,
+                                findings.suggest(name.text, candidates, listed),
+                                "{} is neither a family nor a device", inQuotes(name.text));
         }
         const Device* const device = model.device(name.text);
         if (device != nullptr && device->section->find(schema::OPERATION) == nullptr &&
@@ -147,14 +152,14 @@ void checkOptionOwners(const Model& model, Findings& findings) {
         std::string device;
         switch (partOf(model, name.text, packages, device)) {
         case Part::UNKNOWN:
-            findings.add(UNKNOWN_OPTION_OWNER, name,
-                         "{} is neither a family nor a device, nor a device with a package{}",
-                         inQuotes(name.text), findings.didYouMean(name.text, candidates, listed));
+            findings.addUnknown(
+                UNKNOWN_OPTION_OWNER, name, name, findings.suggest(name.text, candidates, listed),
+                "{} is neither a family nor a device, nor a device with a package", inQuotes(name.text));
             break;
         case Part::OTHER_PACKAGE:
             packages.insert(packages.end(), candidates.begin(), candidates.end());
-            findings.add(UNKNOWN_PACKAGE, name, "no device has the package of {}{}", inQuotes(name.text),
-                         findings.didYouMean(name.text, packages, listed));
+            findings.addUnknown(UNKNOWN_PACKAGE, name, name, findings.suggest(name.text, packages, listed),
+                                "no device has the package of {}", inQuotes(name.text));
             break;
         case Part::KNOWN:
             if (model.supported().contains(device)) {
@@ -204,8 +209,8 @@ void checkFamilies(const Model& model, Findings& findings) {
         }
     }
     // In SPI mode every device is looked up as spi, with or without flashes.
-    if (model.spi() == nullptr && model.baseKeys().find("SPI") != nullptr) {
-        checkTables(model, "spi", findings);
+    if (model.spi() == nullptr && model.baseKeys().find(schema::SPI_MODE) != nullptr) {
+        checkTables(model, std::string(schema::SPI_FAMILY), findings);
     }
     for (const std::string_view name : model.supported()) {
         if (model.device(name) != nullptr && !model.optionPackages().contains(name)) {

@@ -104,7 +104,7 @@ constexpr Rule SPI_MODE_ELSEWHERE{
     "spi-mode-elsewhere",
     Severity::WARNING,
     "mode SPI outside spi.acd",
-    R"(In SPI mode the manager asks for family "spi" whatever the device, so a record with that mode has an effect only
+    R"(In SPI mode the manager asks for family "spi" for all devices, so a record with that mode has an effect only
 in spi.acd.)",
     "# in kestrel.acd\nOPERATION = PROGRAM,SPI,USB2"};
 constexpr Rule MODE_WITHOUT_FAMILY{
@@ -170,12 +170,38 @@ public:
                Findings& findings)
         : m_table(table), m_family(family), m_modes(modes), m_findings(findings) {}
 
-    void check(const Item& record) {
+    void check(const std::vector<Item>& records) {
+        for (const Item& record : records) {
+            m_rows.insert(rowOf(record));
+        }
+        for (const Item& record : records) {
+            checkRecord(record);
+        }
+    }
+
+private:
+    /// The operation or option of a record, and its mode.
+    using Row = std::pair<std::string_view, std::string_view>;
+
+    [[nodiscard]] Row rowOf(const Item& record) const {
+        const bool hasMode = m_table.firstOutput > 1 && record.fields.size() > 1;
+        return {record.fields[0].text, hasMode ? record.fields[1].text : std::string_view()};
+    }
+
+    /// The nearest word that the mode of the record does not have yet.
+    [[nodiscard]] Suggestion suggestion(const Item& record, const std::vector<std::string>& words) {
+        const auto [text, mode] = rowOf(record);
+        return m_findings.suggest(text, words, [this, mode = mode](const std::string& word) {
+            return m_rows.contains({word, mode});
+        });
+    }
+
+    void checkRecord(const Item& record) {
         const std::vector<Token>& fields = record.fields;
         if (record.whole.text.empty()) {
             return; // found as an empty item
         }
-        const std::optional<std::size_t> row = m_table.hasOptions ? option(fields[0]) : operation(fields[0]);
+        const std::optional<std::size_t> row = m_table.hasOptions ? option(record) : operation(record);
         std::optional<std::size_t> mode = 0;
         bool isInMode = false;
         if (m_table.firstOutput > 1 && fields.size() > 1) {
@@ -186,35 +212,39 @@ public:
             m_findings.add(NO_OUTPUT, record.whole, "no output in {}", inQuotes(record.whole.text));
         }
         for (std::size_t i = m_table.firstOutput; i < fields.size(); ++i) {
-            const std::optional<std::size_t> output = readOutput(fields[i]);
+            const std::optional<std::size_t> output = readOutput(fields[i], fields);
             if (isInMode && output) {
                 checkModeOutput(*mode, fields[i]);
             }
             if (row && mode && output && !m_cells.insert({*row, *mode, *output}).second) {
-                m_findings.add(CELL_TWICE, fields[i], "{} of {} is given already", inQuotes(fields[i].text),
-                               inQuotes(record.whole.text));
+                m_findings
+                    .add(CELL_TWICE, fields[i], "{} of {} is given already", inQuotes(fields[i].text),
+                         inQuotes(record.whole.text))
+                    .fix = removing(fields[i]);
             }
         }
     }
 
-private:
-    std::optional<std::size_t> operation(const Token& token) {
+    std::optional<std::size_t> operation(const Item& record) {
+        const Token& token = record.fields[0];
         const std::optional<std::size_t> found = position(vocabulary::operations(), token.text, true);
         if (!found && !token.text.empty()) {
-            m_findings.add(UNKNOWN_OPERATION, token, "unknown operation {}{}", inQuotes(token.text),
-                           m_findings.didYouMean(token.text, vocabulary::operations()));
+            m_findings.addUnknown(UNKNOWN_OPERATION, token, token,
+                                  suggestion(record, vocabulary::operations()), "unknown operation {}",
+                                  inQuotes(token.text));
         }
         return found;
     }
 
-    std::optional<std::size_t> option(const Token& token) {
+    std::optional<std::size_t> option(const Item& record) {
+        const Token& token = record.fields[0];
         const std::optional<std::size_t> found = position(vocabulary::options(), token.text, false);
         if (found && *found >= schema::tableOptions().size()) {
-            m_findings.add(UNREADABLE_OPTION, token, "a database can't give the option {}",
+            m_findings.add(UNREADABLE_OPTION, token, "a database cannot give the option {}",
                            inQuotes(token.text));
         } else if (!found && !token.text.empty()) {
-            m_findings.add(UNKNOWN_OPTION, token, "unknown option {}{}", inQuotes(token.text),
-                           m_findings.didYouMean(token.text, schema::tableOptions()));
+            m_findings.addUnknown(UNKNOWN_OPTION, token, token, suggestion(record, schema::tableOptions()),
+                                  "unknown option {}", inQuotes(token.text));
         }
         return found;
     }
@@ -225,18 +255,21 @@ private:
         const MODE_TYPE mode = ConstraintsManager::modeString2Type(text.c_str());
         if (mode == MODE_TYPE::BS && !sameWithoutCase(text, "Bscan")) {
             if (sameWithoutCase(text, "BS")) {
-                m_findings.add(ACCIDENTAL_MODE, token,
-                               "{} counts as Boundary Scan by accident; did you mean \"Bscan\"?",
-                               inQuotes(text));
+                m_findings
+                    .add(ACCIDENTAL_MODE, token,
+                         "{} is read as Boundary Scan only because it is unknown; did you mean \"Bscan\"?",
+                         inQuotes(text))
+                    .fix = replacing(token, "Bscan");
             } else if (!text.empty()) {
-                m_findings.add(UNKNOWN_MODE, token, "unknown mode {}, which counts as Boundary Scan{}",
-                               inQuotes(text), m_findings.didYouMean(text, schema::tableModes()));
+                m_findings.addUnknown(UNKNOWN_MODE, token, token,
+                                      m_findings.suggest(text, schema::tableModes()),
+                                      "unknown mode {}, which is read as Boundary Scan", inQuotes(text));
             }
         } else if (mode > MODE_TYPE::SPI) {
             m_findings.add(MODE_WITHOUT_CELL, token, "the table has no cells for mode {}", inQuotes(text));
             return std::nullopt;
         } else if (mode == MODE_TYPE::SPI && m_family.kind == schema::File::FAMILY) {
-            m_findings.addText(SPI_MODE_ELSEWHERE, token, "in SPI mode only the tables of spi.acd are asked");
+            m_findings.addText(SPI_MODE_ELSEWHERE, token, "in SPI mode only the tables of spi.acd are used");
             return std::nullopt;
         }
         return static_cast<std::size_t>(mode);
@@ -263,20 +296,24 @@ private:
     }
 
     /// @return an output with a cell; nothing for any other
-    std::optional<std::size_t> readOutput(const Token& token) {
+    std::optional<std::size_t> readOutput(const Token& token, const std::vector<Token>& fields) {
         const std::optional<std::size_t> found = position(schema::tableOutputs(), token.text, false);
         if (found || token.text.empty()) {
             return found;
         }
         if (position(schema::modeOutputs(), token.text, false)) {
-            m_findings.add(OUTPUT_WITHOUT_CELL, token, "the table has no cells for output {}",
-                           inQuotes(token.text));
+            Finding& finding = m_findings.add(OUTPUT_WITHOUT_CELL, token,
+                                              "the table has no cells for output {}", inQuotes(token.text));
+            if (fields.size() > m_table.firstOutput + 1) {
+                finding.fix = removing(token);
+            }
         } else if (position(vocabulary::outputs(), token.text, false)) {
-            m_findings.add(UNKNOWN_OUTPUT, token, "a database can't give the output {}",
+            m_findings.add(UNKNOWN_OUTPUT, token, "a database cannot give the output {}",
                            inQuotes(token.text));
         } else {
-            m_findings.add(UNKNOWN_OUTPUT, token, "unknown output {}{}", inQuotes(token.text),
-                           m_findings.didYouMean(token.text, schema::tableOutputs()));
+            m_findings.addUnknown(UNKNOWN_OUTPUT, token, token,
+                                  m_findings.suggest(token.text, schema::tableOutputs(), fields),
+                                  "unknown output {}", inQuotes(token.text));
         }
         return std::nullopt;
     }
@@ -285,6 +322,7 @@ private:
     const FamilyData& m_family;
     const AllModeLists& m_modes;
     Findings& m_findings;
+    std::set<Row> m_rows; ///< of all records
     std::set<std::tuple<std::size_t, std::size_t, std::size_t>> m_cells;
 };
 
@@ -293,10 +331,7 @@ void check(const Model& model, Findings& findings) {
     for (const FamilyData& family : model.families()) {
         family.forEachSection([&](const Section& section) {
             for (const schema::Table& table : schema::TABLES) {
-                TableCheck check(table, family, modes, findings);
-                for (const Item& record : section.items(table.key)) {
-                    check.check(record);
-                }
+                TableCheck(table, family, modes, findings).check(section.items(table.key));
             }
         });
     }

@@ -43,7 +43,7 @@ TEST_F(Completion, OffersCommandsWithTheirSummaries) {
     EXPECT_THAT(offered({"d"}), ElementsAre("devices", "diff", "dump"));
     EXPECT_EQ(run({"fam"}).output, "families\tList the part families and their modes\n");
     EXPECT_THAT(offered({""}), Not(Contains("complete")));
-    EXPECT_THAT(offered({"help", "f"}), ElementsAre("families"));
+    EXPECT_THAT(offered({"help", "fa"}), ElementsAre("families"));
     EXPECT_THAT(offered({"--json", "vo"}), ElementsAre("vocabulary"));
 }
 

@@ -37,7 +37,7 @@ TEST(Lint, ShowsPlaceLevelTextCodeAndTheLineWithACaret) {
                   ":2:13: error: unknown operation \"VERFIY\"; did you mean \"VERIFY\"? [T101]\n"
                   "                VERFIY,Bscan,USB2\n"
                   "                ^~~~~~\n");
-    EXPECT_EQ(outcome.error, "tarvik: 1 error, 0 warnings\n");
+    EXPECT_EQ(outcome.error, "tarvik: 1 error, 0 warnings\nT101: 1\n");
     EXPECT_EQ(outcome.status, 1);
 }
 
@@ -92,11 +92,28 @@ TEST(Lint, EndsWithTwoWhenADirectoryIsMissing) {
 TEST(Lint, EndsWithTwoWhenThereIsNoBase) { EXPECT_EQ(lint(Files{{"kestrel.acd", "[KS50]\n"}}).status, 2); }
 
 TEST(Lint, EndsWithTwoAndNamesAFileThatCantBeRead) {
-    const DatabaseDirectory directory(cleanDatabase());
+    Files files = withFamily("OPERATION = VERFIY,Bscan,USB2\n[KS50]\n");
+    files["base.acd"] =
+        "DEVICE_SUPPORTED = base,kestrel,osprey\nPROGRAM_OPTION_PACKAGE = base,kestrel,osprey\n"
+        "IDCODE = KS50,0xX4104FB7:OS200,0xX4204FB7\n";
+    const DatabaseDirectory directory(files);
     std::filesystem::create_directory(directory.path("osprey.acd"));
     const ProcessResult outcome = runLint({directory.path()});
     EXPECT_EQ(outcome.status, 2);
-    EXPECT_THAT(outcome.error, HasSubstr("osprey.acd: can't be read"));
+    EXPECT_THAT(outcome.output, HasSubstr(directory.path("osprey.acd") +
+                                          ":1:1: error: the file cannot be read: not a regular file [L114]"));
+    // The findings of the other files are there; names are unknown perhaps only for the lack of the file.
+    EXPECT_THAT(codes(files), ElementsAre("B101", "B102", "D104", "T101"));
+    EXPECT_EQ(outcome.error, "tarvik: 2 errors, 0 warnings\nL114: 1, T101: 1\n");
+    EXPECT_EQ(runLint({directory.path(), "--select", "T2"}).status, 2);
+}
+
+TEST(Lint, EndsWithTwoWhenTheBaseCantBeRead) {
+    const DatabaseDirectory directory(Files{{"kestrel.acd", "[KS50]\n"}});
+    std::filesystem::create_directory(directory.path("base.acd"));
+    const ProcessResult outcome = runLint({directory.path()});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_THAT(outcome.error, HasSubstr("base.acd"));
 }
 
 TEST(Lint, MergesLayersAsTheReadersDo) {

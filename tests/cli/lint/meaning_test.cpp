@@ -196,6 +196,55 @@ TEST(Suggestions, AreNamesThatThePlaceLacks) {
                 HasSubstr("did you mean \"VERIFY\"?"));
 }
 
+TEST(Suggestions, AreOperationsThatTheModeLacks) {
+    EXPECT_THAT(lint(withFamily("OPERATION = VERIFY,Bscan,USB2:VERIFI,Bscan,USB2\n[KS50]\n")).output,
+                HasSubstr("unknown operation \"VERIFI\" [T101]"));
+    EXPECT_THAT(lint(withFamily("OPERATION = VERIFY,Bscan,USB2:VERIFI,Smap,USB2\n[KS50]\n")).output,
+                HasSubstr("did you mean \"VERIFY\"? [T101]"));
+    EXPECT_THAT(lint(withFamily("OPERATION = VERIFY,Bscan,USB2,USB\n[KS50]\n")).output,
+                HasSubstr("unknown output \"USB\" [T106]"));
+    EXPECT_THAT(lint(withFamily("PROGRAM_OPTION = ERASE,Bscan,USB2:ERAS,Bscan,USB2\n[KS50]\n")).output,
+                HasSubstr("unknown option \"ERAS\" [T102]"));
+}
+
+TEST(Suggestions, AreKeysThatTheSectionLacks) {
+    EXPECT_THAT(lint(withFamily("PROPERTYS = A,1\n[KS50]\nPROPERTY = A,1\n")).output,
+                HasSubstr("did you mean \"PROPERTY\"? [K102]"));
+    EXPECT_THAT(lint(withFamily("PROPERTYS = A,1\nPROPERTY = A,1\n[KS50]\n")).output,
+                HasSubstr("did you mean \"PROPERTIES\"? [K102]"));
+    EXPECT_THAT(lint(withFamily("[KS50]\nPROPERTYS = A,1\nPROPERTY = A,1\n")).output,
+                HasSubstr("did you mean \"PROPERTIES\"? [K102]"));
+}
+
+TEST(Suggestions, ArePropertiesOfOperationsThatTheSectionLacks) {
+    const std::string text = "PROPERTIES = PROGRAM,1,BS:OP_PROGRM,1,VERIFY";
+    EXPECT_THAT(lint(withFamily(text + "\n[KS50]\n")).output,
+                HasSubstr("did you mean \"OP_PROGRAM\"? [P203]"));
+    EXPECT_THAT(lint(withFamily(text + ":OP_PROGRAM,1,VERIFY\n[KS50]\n")).output,
+                testing::Not(HasSubstr("did you mean \"OP_PROGRAM\"? [P203]")));
+}
+
+TEST(Suggestions, ArePartsThatAreNotExcluded) {
+    Files files = withFamily("[KS50]\nPROPERTIES = PACKAGES,2,TQ144,TQ146\n");
+    files["base.acd"] += "SM = outputs,USB2:families,kestrel\nSS = outputs,USB2:families,kestrel\n";
+    const auto found = [&files](const std::string& parts) {
+        Files all = files;
+        all["base.acd"] += "NOT_SUPPORTED_PART_IN_MODE = " + parts + "\n";
+        return lint(all, {"--select", "M2"}).output;
+    };
+    EXPECT_THAT(found("SM_KS50_TQ14"), HasSubstr("did you mean \"TQ144\"? [M204]"));
+    EXPECT_THAT(found("SM_KS50_TQ14,SM_KS50_TQ144"), HasSubstr("did you mean \"TQ146\"? [M204]"));
+    EXPECT_THAT(found("SM_KS60_TQ144"), HasSubstr("did you mean \"KS50\"? [M203]"));
+    EXPECT_THAT(found("SM_KS60_TQ144,SM_KS50_TQ144"), HasSubstr("\"SM_KS60_TQ144\" [M203]"));
+    EXPECT_THAT(found("SN_KS50_TQ144,SM_KS50_TQ144"), HasSubstr("did you mean \"SS\"? [M202]"));
+}
+
+TEST(Suggestions, AreFlashesThatTheClassLacks) {
+    Files files = cleanDatabase();
+    files["spi.acd"] = "DEVICE_FAMILY = NV1\nNV1_DEVICES = MRS1M,MRS2M\nST1_DEVICES = MRS1M,MRS3M\n";
+    EXPECT_THAT(lint(files, {"--select", "S106"}).output, HasSubstr("did you mean \"MRS2M\"? [S106]"));
+}
+
 TEST(LintOptions, AFileIsLintedWithinItsDirectory) {
     const DatabaseDirectory directory(withFamily("NONSENSE = 1\nOPERATION = PROGRM,Bscan,USB2\n[KS60]\n"));
     const ProcessResult outcome = runLint({directory.path("kestrel.acd")});

@@ -18,6 +18,23 @@ def lint(tool, directory, form):
     return json.loads(run.stdout)
 
 
+def check_fixes(fixes, fix, path):
+    """Only safe fixes are in the log; they replace the same bytes by the same texts."""
+    if not fix or not fix["safe"]:
+        assert not fixes
+        return
+    ((change,),) = (each["artifactChanges"] for each in fixes)
+    assert unquote(urlparse(change["artifactLocation"]["uri"]).path) == path
+    for replacement, edit in zip(change["replacements"], fix["edits"], strict=True):
+        region = replacement["deletedRegion"]
+        source = Path(path).read_bytes().split(b"\n")[edit["line"] - 1]
+        assert region["startLine"] == region["endLine"] == edit["line"]
+        characters = source.decode()[region["startColumn"] - 1 : region["endColumn"] - 1]
+        assert characters.encode() == source[edit["column"] - 1 : edit["column"] - 1 + edit["length"]]
+        assert len(source.decode()[: region["startColumn"] - 1].encode()) == edit["column"] - 1
+        assert replacement["insertedContent"]["text"] == edit["text"]
+
+
 def check(tool, validator, directory):
     log = lint(tool, directory, "sarif")
     validator.validate(log)
@@ -41,6 +58,7 @@ def check(tool, validator, directory):
         characters = source.decode()[region["startColumn"] - 1 : region["endColumn"] - 1]
         begin = finding["column"] - 1
         assert characters.encode() == source[begin : begin + finding["length"]]
+        check_fixes(result.get("fixes", []), finding.get("fix"), path)
     return len(run["results"])
 
 

@@ -157,13 +157,21 @@ TEST(AcdLines, OfTheDatabaseAreReadFromDisk) {
     EXPECT_EQ(all[0].family(), "kestrel");
 }
 
-TEST(AcdLines, OfADatabaseThatCantBeReadRaise) {
-    const DatabaseDirectory directory(DatabaseDirectory::Files{{"kestrel.acd", ""}});
+TEST(AcdLines, OfAFileThatCantBeReadAreNoneAndHideNoOthers) {
+    const DatabaseDirectory directory(
+        DatabaseDirectory::Files{{"kestrel.acd", "A = 1\n"}, {"osprey.acd", "B = 1\n"}});
     useDirectories({directory.path()});
-    EXPECT_EQ(AcdStore::families().size(), 1U);
+    EXPECT_EQ(AcdStore::families().size(), 2U);
     std::filesystem::remove(directory.path("kestrel.acd"));
     MessageRecorder messages;
-    EXPECT_THROW(static_cast<void>(AcdLines::ofDatabase()), DataNotFoundException);
+    const std::vector<AcdLines> files = AcdLines::ofDatabase();
+    ASSERT_EQ(files.size(), 2U);
+    EXPECT_EQ(files[0].path(), directory.path("kestrel.acd"));
+    EXPECT_EQ(files[0].readError(), "No such file or directory");
+    EXPECT_THAT(files[0].lines(), testing::IsEmpty());
+    EXPECT_EQ(files[1].readError(), "");
+    ASSERT_EQ(files[1].lines().size(), 1U);
+    EXPECT_EQ(files[1].lines()[0].name, "B");
     const std::vector<IssuedMessage> issued = messages.take();
     ASSERT_EQ(issued.size(), 1U);
     EXPECT_EQ(issued[0].text, directory.path("kestrel.acd") + ": can't be read: No such file or directory\n");

@@ -2,7 +2,6 @@
 // libraries, without exceptions, and among macros that applications define.
 #include <tarvik/ltptstr.h>
 
-#include <AcdFamily.h>
 #include <AcdLines.h>
 #include <AcdReader.h>
 #include <AcdStore.h>

@@ -1,5 +1,5 @@
 // A reader never meets half a page, and a run that fails keeps the former one.
-#include "report/AtomicFile.h"
+#include "term/AtomicFile.h"
 
 #include "term/ExitCode.h"
 
@@ -11,8 +11,6 @@
 #include <filesystem>
 #include <sys/stat.h>
 #include <unistd.h>
-
-namespace report {
 
 namespace {
 
@@ -87,6 +85,11 @@ void writeFile(const std::string& path, std::string_view text) {
     if (descriptor < 0) {
         fault.raise(errno);
     }
+    struct stat former {};
+    if (::stat(target.c_str(), &former) == 0 && ::fchown(descriptor, former.st_uid, former.st_gid) != 0) {
+        // Only a privileged user can give files away; the text is the user's own.
+        [[maybe_unused]] const int ignored = ::fchown(descriptor, static_cast<uid_t>(-1), former.st_gid);
+    }
     int error = ::fchmod(descriptor, permissions(target)) == 0 ? 0 : errno;
     const int written = writeAndClose(descriptor, text);
     error = error == 0 ? written : error;
@@ -98,5 +101,3 @@ void writeFile(const std::string& path, std::string_view text) {
         fault.raise(error);
     }
 }
-
-} // namespace report

@@ -1,0 +1,87 @@
+// Shows what an edit does before it is done: the edited database is made beside, and both are asked everything.
+#include "edit/Proof.h"
+
+#include "diff/CompareDatabases.h"
+#include "term/ExitCode.h"
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
+
+#include <algorithm>
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <map>
+
+namespace edit {
+
+namespace {
+
+namespace fs = std::filesystem;
+
+/// A directory that exists as long as this object.
+class TemporaryDirectory {
+public:
+    TemporaryDirectory() : m_path((fs::temp_directory_path() / "tarvik-edit-XXXXXX").string()) {
+        if (::mkdtemp(m_path.data()) == nullptr) {
+            throw CommandError(ExitCode::FAULT, fmt::format("cannot make a directory: \"{}\"", m_path));
+        }
+    }
+    ~TemporaryDirectory() {
+        std::error_code ignored;
+        fs::remove_all(m_path, ignored);
+    }
+    TemporaryDirectory(const TemporaryDirectory&) = delete;
+    TemporaryDirectory& operator=(const TemporaryDirectory&) = delete;
+
+    [[nodiscard]] const std::string& path() const noexcept { return m_path; }
+
+private:
+    std::string m_path;
+};
+
+/// Makes a layer with the texts in place of some files; the others are links to those of the layer.
+void copyLayer(const fs::path& layer, const fs::path& copy,
+               const std::map<fs::path, const std::string*>& texts) {
+    fs::create_directory(copy);
+    for (const fs::directory_entry& entry : fs::directory_iterator(layer)) {
+        const fs::path target = copy / entry.path().filename();
+        if (const auto text = texts.find(fs::absolute(entry.path()).lexically_normal());
+            text == texts.end()) {
+            fs::create_symlink(fs::absolute(entry.path()), target);
+        } else {
+            std::ofstream file(target, std::ios::binary);
+            if (!(file << *text->second).flush()) {
+                throw CommandError(ExitCode::FAULT, fmt::format("cannot write \"{}\"", target.string()));
+            }
+        }
+    }
+}
+
+} // namespace
+
+std::optional<diff::Comparison> effectOf(const std::vector<std::string>& layers,
+                                         const std::vector<Rewrite>& rewrites) {
+    if (std::none_of(layers.begin(), layers.end(),
+                     [](const std::string& layer) { return fs::exists(fs::path(layer) / "base.acd"); })) {
+        return std::nullopt;
+    }
+    std::map<fs::path, const std::string*> texts;
+    for (const Rewrite& rewrite : rewrites) {
+        texts.emplace(fs::absolute(rewrite.path).lexically_normal(), &rewrite.text);
+    }
+    const TemporaryDirectory scratch;
+    std::vector<std::string> copies;
+    try {
+        for (const std::string& layer : layers) {
+            copies.push_back((fs::path(scratch.path()) / std::to_string(copies.size())).string());
+            copyLayer(layer, copies.back(), texts);
+        }
+    } catch (const fs::filesystem_error& error) {
+        throw CommandError(ExitCode::FAULT, error.what());
+    }
+    return diff::compareDatabases(fmt::format("{}", fmt::join(layers, ":")),
+                                  fmt::format("{}", fmt::join(copies, ":")));
+}
+
+} // namespace edit

@@ -1,0 +1,78 @@
+// Formatting random databases changes no answer. TARVIK_PROPERTY_DATABASES says how many, TARVIK_PROPERTY_SEED which.
+#include "cli/diff/DatabaseRewriter.h"
+#include "cli/support/OpenDatabase.h"
+#include "reference/DatabaseGenerator.h"
+
+#include "diff/Comparison.h"
+#include "edit/Format.h"
+
+#include <TarvikException.h>
+
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+#include <optional>
+
+namespace {
+
+using reference::Files;
+
+std::uint64_t setting(const char* name, std::uint64_t usual) {
+    const char* const text = std::getenv(name);
+    return text == nullptr ? usual : std::strtoull(text, nullptr, 10);
+}
+
+std::string familyOf(const std::string& file) { return file.substr(0, file.rfind('.')); }
+
+/// The files in their canonical form, each of which reads alike and is the form of itself.
+Files formatted(const Files& files) {
+    Files all;
+    for (const auto& [name, text] : files) {
+        const edit::SourceFile file(text, name, familyOf(name));
+        const std::string& form = all[name] = edit::joined(edit::formatted(file));
+        EXPECT_TRUE(edit::readsAlike(file.lines(), AcdLines(form))) << text << "\nbecomes\n" << form;
+        EXPECT_EQ(edit::joined(edit::formatted(edit::SourceFile(form, name, familyOf(name)))), form) << text;
+    }
+    return all;
+}
+
+/// All answers; nothing if a damaged database raises before there are any.
+std::optional<std::string> snapshot(const Files& files) {
+    const OpenDatabase open(files);
+    try {
+        return diff::takeSnapshot([](std::size_t, std::size_t) {});
+    } catch (const TarvikException&) {
+        return std::nullopt;
+    }
+}
+
+/// Do both databases answer everything alike?
+bool answersAlike(const Files& files, const Files& others) {
+    std::optional<std::string> before = snapshot(files);
+    std::optional<std::string> after = snapshot(others);
+    return before && after
+               ? diff::compare(diff::Snapshot(*std::move(before)), diff::Snapshot(*std::move(after)))
+                     .isEmpty()
+               : !before && !after;
+}
+
+} // namespace
+
+TEST(FormatOfRandomDatabases, ChangesNoAnswer) {
+    const std::uint64_t seed = setting("TARVIK_PROPERTY_SEED", 1);
+    const std::uint64_t count = setting("TARVIK_PROPERTY_DATABASES", 40);
+    reference::RandomSource pick{rc::Random(seed)};
+    for (std::uint64_t i = 0; i < count && !testing::Test::HasFailure(); ++i) {
+        const reference::Health health =
+            pick.chance(30) ? reference::Health::DAMAGED : reference::Health::SOUND;
+        const Files files = reference::makeDatabases(pick, health);
+        const Files forms = formatted(files);
+        EXPECT_TRUE(answersAlike(files, forms)) << "database " << i << " of seed " << seed;
+        if (health == reference::Health::SOUND) {
+            // Written in another way: continuations, odd blanks and line ends, layers.
+            for (const Files& layer : rewritten(pick, files)) {
+                static_cast<void>(formatted(layer));
+            }
+        }
+    }
+}
