@@ -3,7 +3,7 @@
 #include "ModeTables.h"
 #include "RecordReader.h"
 #include "StringViews.h"
-#include "Vocabulary.h"
+#include "WordTables.h"
 
 #include <array>
 #include <limits>
@@ -16,7 +16,7 @@
 const ConstraintsManager::Implementation::ModeTable*
 ConstraintsManager::Implementation::modeTable(MODE_TYPE mode) {
     using M = Implementation;
-    static constexpr std::array<ModeTable, vocabulary::MODES.size()> TABLES{{
+    static constexpr std::array<ModeTable, wordTables::MODES.size()> TABLES{{
         {&M::m_bsCables, &M::m_bsDevices},
         {&M::m_ssCables, &M::m_ssDevices},
         {&M::m_smCables, &M::m_smDevices},
@@ -27,7 +27,7 @@ ConstraintsManager::Implementation::modeTable(MODE_TYPE mode) {
         {&M::m_kiteMpmCables, &M::m_kiteMpmDevices},
         {&M::m_pffCables, &M::m_pffDevices},
     }};
-    return vocabulary::rowOf(TABLES, mode);
+    return wordTables::rowOf(TABLES, mode);
 }
 
 void ConstraintsManager::Implementation::loadSupportedLists() {
@@ -38,7 +38,7 @@ void ConstraintsManager::Implementation::loadSupportedLists() {
 // A mode's entry has two records: outputs, then families. The first field of each is a label that is not used.
 
 void ConstraintsManager::Implementation::loadModeOutputSets() {
-    for (const vocabulary::Mode& mode : vocabulary::MODES) {
+    for (const wordTables::Mode& mode : wordTables::MODES) {
         auto& outputs = this->*modeTable(mode.value)->outputs; // each mode of the vocabulary has a table
         Record(*m_devKey, mode.key, 0).forEachFieldFrom(1, [&](const char* name) {
             outputs.insert(cableString2Type(name));
@@ -47,7 +47,7 @@ void ConstraintsManager::Implementation::loadModeOutputSets() {
 }
 
 void ConstraintsManager::Implementation::loadModeDeviceSets() {
-    for (const vocabulary::Mode& mode : vocabulary::MODES) {
+    for (const wordTables::Mode& mode : wordTables::MODES) {
         std::vector<StringBase> families;
         Record(*m_devKey, mode.key, 1).forEachFieldFrom(1, [&](const char* name) {
             families.emplace_back(name);
@@ -57,9 +57,8 @@ void ConstraintsManager::Implementation::loadModeDeviceSets() {
 }
 
 void ConstraintsManager::Implementation::loadDeviceIdcodes() {
-    auto last = m_deviceIdcodes.end();
-    forEachRecord(*m_devKey, "IDCODE", [&](const Record& record, StringBase device) {
-        last = insertWithHint(m_deviceIdcodes, last, std::move(device), record.field(1));
+    forEachRecord(*m_devKey, "IDCODE", [&](const Record& record, const StringBase& device) {
+        m_deviceIdcodes.set(device, {}, view(record.field(1)));
     });
 }
 
@@ -68,8 +67,8 @@ void ConstraintsManager::Implementation::loadNotSupportedParts() {
 }
 
 // Each operation and option has a row in the tables, and a bit in the masks that questions are answered with.
-static_assert(tableDimensions::OPERATIONS == vocabulary::OPERATIONS.size());
-static_assert(tableDimensions::OPTIONS == vocabulary::OPTIONS.size());
+static_assert(tableDimensions::OPERATIONS == wordTables::OPERATIONS.size());
+static_assert(tableDimensions::OPTIONS == wordTables::OPTIONS.size());
 static_assert(tableDimensions::OPERATIONS <= std::numeric_limits<unsigned>::digits);
 static_assert(tableDimensions::OPTIONS <= std::numeric_limits<unsigned>::digits);
 static_assert(static_cast<int>(TARVIKNS::NO_OPERATION) == tableDimensions::OPERATIONS);

@@ -4,7 +4,7 @@
 #include "JoinedText.h"
 #include "ModeTables.h"
 #include "StringViews.h"
-#include "Vocabulary.h"
+#include "WordTables.h"
 
 // The five checks: may a mode use an output, may a device be configured in a mode, may an operation run. Except for
 // operations, a refusal is a message in the user's words and never an exception.
@@ -22,9 +22,9 @@ constexpr const char* OUTPUT_OUT_OF_RANGE = "Outstream(Cable or file type is out
 constexpr const char* OPERATION_OUT_OF_RANGE = "Opeartion is out of range -- %d.\n";
 
 void refuseOutput(OUTPUT_TYPE output, MODE_TYPE mode, int location) {
-    vocabulary::outputDisplayName(output);
-    vocabulary::modeDisplayName(mode);
-    diagnostics::message(location).issueInfo(REFUSAL, vocabulary::lastOutputName, vocabulary::lastModeName);
+    wordTables::outputDisplayName(output);
+    wordTables::modeDisplayName(mode);
+    diagnostics::message(location).issueInfo(REFUSAL, wordTables::lastOutputName, wordTables::lastModeName);
 }
 
 void refuseDevice(std::string_view device, const char* package, MODE_TYPE mode, int location) {
@@ -33,8 +33,8 @@ void refuseDevice(std::string_view device, const char* package, MODE_TYPE mode, 
         part += "_";
         part += package;
     }
-    vocabulary::modeDisplayName(mode);
-    diagnostics::message(location).issueInfo(REFUSAL, part.c_str(), vocabulary::lastModeName);
+    wordTables::modeDisplayName(mode);
+    diagnostics::message(location).issueInfo(REFUSAL, part.c_str(), wordTables::lastModeName);
 }
 
 } // namespace
@@ -69,7 +69,7 @@ bool ConstraintsManager::Implementation::modeAllowsOutput(MODE_TYPE mode, OUTPUT
 
 bool ConstraintsManager::Implementation::isPartAllowedInMode(MODE_TYPE mode, std::string_view device,
                                                              std::string_view package) const {
-    const JoinedText key{vocabulary::modeKey(mode), "_", device, "_", package};
+    const JoinedText key{wordTables::modeKey(mode), "_", device, "_", package};
     return !m_notSupportedPartInMode.contains(key.view());
 }
 
@@ -161,6 +161,6 @@ bool ConstraintsManager::Implementation::checkConstraints(MODE_TYPE mode, OUTPUT
 
 bool ConstraintsManager::Implementation::checkConstraints(std::string_view device, MODE_TYPE mode,
                                                           OP_TYPE operation) {
-    return hasDevicePropertyValue(baseName(device), vocabulary::operationKey(operation),
-                                  vocabulary::modeKey(mode));
+    return hasDevicePropertyValue(baseName(device), wordTables::operationKey(operation),
+                                  wordTables::modeKey(mode));
 }

@@ -95,8 +95,8 @@ bool ConstraintsManager::isKorvelDevice(const char* device) {
     return m_implementation->getPartFamily(view(device)) != familyNames::BASE;
 }
 
-const ConstraintsManager::Texts& ConstraintsManager::getAllDeviceIdcodes() const noexcept {
-    return m_implementation->m_deviceIdcodes;
+const ConstraintsManager::Texts& ConstraintsManager::getAllDeviceIdcodes() const {
+    return m_implementation->m_deviceIdcodes.get();
 }
 
 bool ConstraintsManager::isSpiDevice(StringBase device) const {

@@ -3,6 +3,7 @@
 // The manager itself, which the exported class only forwards to. Applications never see this file, so everything in it
 // is public.
 
+#include "LazyTexts.h"
 #include "LookupCache.h"
 #include "NameSequence.h"
 #include "NameSet.h"
@@ -153,7 +154,7 @@ public:
 
     NameSet m_programOptionPackages;
     NameSet m_notSupportedPartInMode;
-    Texts m_deviceIdcodes;
+    LazyTexts m_deviceIdcodes;
 
     TextSet m_loadedFamilies;            ///< owners whose properties are loaded
     NameSequence m_operationsLoaded;     ///< families whose operations are loaded
@@ -170,7 +171,7 @@ public:
     std::vector<OP_TYPE> m_operationOrders;
     std::vector<TARVIKNS::PROGRAM_OPTION> m_programOptionOrders;
 
-    Texts m_spiProperties; ///< name and property joined, to value
+    LazyTexts m_spiProperties; ///< name and property joined, to value
     NameSequence m_spiNames;
     std::vector<StringBase> m_spiFamilies; ///< no question reads it; it is part of what the manager holds
     std::vector<StringBase> m_at1Devices;

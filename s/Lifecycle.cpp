@@ -1,5 +1,5 @@
 #include "Implementation.h"
-#include "Vocabulary.h"
+#include "WordTables.h"
 
 #include <AcdReader.h>
 #include <TarvikException.h>
@@ -67,10 +67,10 @@ void ConstraintsManager::Implementation::initialise() {
         loadDeviceIdcodes();
         loadNotSupportedParts();
         allocateTables();
-        for (const vocabulary::Operation& operation : vocabulary::OPERATIONS) {
+        for (const wordTables::Operation& operation : wordTables::OPERATIONS) {
             m_operationOrders.push_back(operation.value);
         }
-        for (const vocabulary::Option& option : vocabulary::OPTIONS) {
+        for (const wordTables::Option& option : wordTables::OPTIONS) {
             m_programOptionOrders.push_back(option.value);
         }
         loadSpiCatalogue();

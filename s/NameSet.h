@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <cstdint>
 #include <string_view>
 #include <utility>
 #include <vector>
@@ -17,9 +18,19 @@ public:
 
     /// Sorts names.
     /// @param names in any order; repeated ones are stored once
-    explicit NameSet(std::vector<StringBase> names) : m_names(std::move(names)) {
-        std::sort(m_names.begin(), m_names.end(), ltptstr());
-        m_names.erase(std::unique(m_names.begin(), m_names.end()), m_names.end());
+    explicit NameSet(std::vector<StringBase> names) {
+        std::vector<Ranked> order;
+        order.reserve(names.size());
+        for (StringBase& name : names) {
+            order.push_back({prefixOf(name), &name});
+        }
+        std::sort(order.begin(), order.end());
+        m_names.reserve(names.size());
+        for (const Ranked& each : order) {
+            if (m_names.empty() || m_names.back() != *each.name) {
+                m_names.push_back(std::move(*each.name));
+            }
+        }
     }
 
     /// @return how many names there are
@@ -52,5 +63,23 @@ public:
     [[nodiscard]] bool contains(std::string_view name) const noexcept { return position(name) != size(); }
 
 private:
+    /// A name with its first bytes as a number of the same order: most comparisons need no more, and sorting moves little.
+    struct Ranked {
+        std::uint64_t prefix;
+        StringBase* name;
+
+        bool operator<(const Ranked& other) const noexcept {
+            return prefix != other.prefix ? prefix < other.prefix : ltptstr()(*name, *other.name);
+        }
+    };
+
+    [[nodiscard]] static std::uint64_t prefixOf(std::string_view name) noexcept {
+        std::uint64_t prefix = 0;
+        for (std::size_t byte = 0; byte != sizeof prefix; ++byte) {
+            prefix = prefix << 8 | (byte < name.size() ? static_cast<unsigned char>(name[byte]) : 0U);
+        }
+        return prefix;
+    }
+
     std::vector<StringBase> m_names;
 };

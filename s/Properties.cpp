@@ -2,7 +2,7 @@
 #include "Implementation.h"
 #include "JoinedText.h"
 #include "StringViews.h"
-#include "Vocabulary.h"
+#include "WordTables.h"
 
 // The named properties of a device: its own, or otherwise its family's.
 
@@ -81,7 +81,7 @@ bool ConstraintsManager::Implementation::hasDevicePropertyValue(std::string_view
 const ConstraintsManager::TextSet&
 ConstraintsManager::Implementation::getDeviceOperationOptions(std::string_view device,
                                                               std::string_view operation, MODE_TYPE mode) {
-    const char* const modeName = vocabulary::modeKey(mode);
+    const char* const modeName = wordTables::modeKey(mode);
     if (!hasDevicePropertyValue(device, operation, modeName)) {
         return m_operationOptions;
     }

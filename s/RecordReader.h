@@ -6,9 +6,7 @@
 #include <StringBase.h>
 
 #include <cstddef>
-#include <iterator>
 #include <limits>
-#include <utility>
 #include <vector>
 
 /// One record of a value whose records end at ":" and whose fields end at ",".
@@ -68,14 +66,4 @@ void forEachRecord(PM_DEVKEY& accessor, const char* key, Action action) {
         items.emplace_back(item);
     }
     return items;
-}
-
-/// Sets the value of a key in a map, with a hint: database lists are nearly sorted, so most keys belong right after
-/// `last`, the one that was set before.
-/// @return the entry
-template <typename Map>
-typename Map::iterator insertWithHint(Map& map, typename Map::iterator last, StringBase key,
-                                      const char* value) {
-    const auto place = last == map.end() ? last : std::next(last);
-    return map.insert_or_assign(place, std::move(key), value);
 }

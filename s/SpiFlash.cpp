@@ -93,7 +93,6 @@ void ConstraintsManager::Implementation::readMultibootDeviceLists(PM_DEVKEY* acc
 
 /// Stores properties under the name as written; they are looked up in upper case.
 void ConstraintsManager::Implementation::readSpiProperties(PM_DEVKEY* accessor) {
-    auto last = m_spiProperties.end();
     for (const StringBase& name : m_spiNames) {
         StringBase key = UT_STR::Upper(name.c_str());
         key += "_PROPERTY";
@@ -103,9 +102,7 @@ void ConstraintsManager::Implementation::readSpiProperties(PM_DEVKEY* accessor) 
                 diagnostics::raiseIf<DataMismatchException>(
                     m_exceptions, diagnostics::location::SPI_PROPERTY_WITHOUT_VALUE);
             }
-            StringBase joined = name;
-            joined += property;
-            last = insertWithHint(m_spiProperties, last, std::move(joined), value);
+            m_spiProperties.set(name, property, view(value));
         });
     }
 }
@@ -129,12 +126,13 @@ StringBase ConstraintsManager::Implementation::spiDeviceClass(const char* device
 const char* ConstraintsManager::Implementation::getSpiDeviceStringProperty(const char* device,
                                                                            std::string_view property) const {
     const StringBase key = upperCased(property);
+    const auto& properties = m_spiProperties.get();
     const auto find = [&](std::string_view owner) {
-        return m_spiProperties.find(JoinedText{view(upperCased(owner)), view(key)}.view());
+        return properties.find(JoinedText{view(upperCased(owner)), view(key)}.view());
     };
     auto found = find(view(device));
-    if (found == m_spiProperties.end()) {
+    if (found == properties.end()) {
         found = find(view(spiDeviceClass(device)));
     }
-    return found == m_spiProperties.end() ? "" : found->second.c_str();
+    return found == properties.end() ? "" : found->second.c_str();
 }

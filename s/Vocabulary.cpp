@@ -1,4 +1,4 @@
-#include "Vocabulary.h"
+#include "WordTables.h"
 
 #include "Diagnostics.h"
 
@@ -15,7 +15,7 @@ using TARVIKNS::MODE_TYPE;
 using TARVIKNS::OP_TYPE;
 using TARVIKNS::OUTPUT_TYPE;
 using TARVIKNS::PROGRAM_OPTION;
-using namespace vocabulary;
+using namespace wordTables;
 
 namespace {
 
@@ -45,14 +45,14 @@ const char* nameOf(OP_TYPE operation, const char* Operation::*name) {
 
 } // namespace
 
-const char* vocabulary::operationKey(OP_TYPE operation) { return nameOf(operation, &Operation::key); }
+const char* wordTables::operationKey(OP_TYPE operation) { return nameOf(operation, &Operation::key); }
 
-const char* vocabulary::modeDisplayName(MODE_TYPE mode) noexcept {
+const char* wordTables::modeDisplayName(MODE_TYPE mode) noexcept {
     const Mode* const row = rowOf(MODES, mode);
     return lastModeName = (row == nullptr ? MODES.back() : *row).display;
 }
 
-const char* vocabulary::outputDisplayName(OUTPUT_TYPE output) noexcept {
+const char* wordTables::outputDisplayName(OUTPUT_TYPE output) noexcept {
     const Output* const row = rowOf(OUTPUTS, output);
     return lastOutputName = (row == nullptr ? OUTPUTS.back() : *row).display;
 }

@@ -16,8 +16,8 @@
 
 namespace {
 
-using why::Question;
-using why::Verdict;
+using explanation::Conclusion;
+using explanation::Question;
 
 struct Arguments {
     std::optional<std::string> device;
@@ -116,13 +116,13 @@ Question read(const Arguments& arguments) {
     return question;
 }
 
-ExitCode status(Verdict verdict) {
+ExitCode status(Conclusion verdict) {
     switch (verdict) {
-    case Verdict::YES:
+    case Conclusion::YES:
         return ExitCode::YES;
-    case Verdict::NO:
+    case Conclusion::NO:
         return ExitCode::NO;
-    case Verdict::FAULT:
+    case Conclusion::FAULT:
         break;
     }
     return ExitCode::FAULT;
@@ -131,14 +131,14 @@ ExitCode status(Verdict verdict) {
 ExitCode run(Tool& tool, const Arguments& arguments) {
     const Question question = read(arguments);
     tool.openDatabase();
-    const why::Inquiry asked(question);
+    const explanation::Inquiry asked(question);
     const bool isKnown = !arguments.device || asked.manager->isKorvelDevice(question.device.c_str());
 
     // Further questions serve the explanation: what the manager reports about them is not about the user's question.
     const std::size_t issued = tool.messages().count();
-    why::Answer answer{question, asked.verdict, why::explain(question)};
-    if (asked.verdict == Verdict::NO) {
-        for (why::Step& step : why::alternatives(question)) {
+    explanation::Answer answer{question, asked.verdict, explanation::explain(question)};
+    if (asked.verdict == Conclusion::NO) {
+        for (explanation::Step& step : explanation::alternatives(question)) {
             answer.explanation.steps.push_back(std::move(step));
         }
     }

@@ -113,13 +113,13 @@ std::vector<Line> linesOf(const std::vector<Change>& changes) {
 }
 
 std::string asText(const Line& line, const Terminal& terminal) {
-    std::vector<std::string> words = wordsOf(terminal.shown(line.question));
+    std::vector<std::string> words = wordsOf(terminal.sanitised(line.question));
     words.back() += ':';
     for (const std::string& lost : line.lost) {
-        words.push_back(terminal.bad('-' + terminal.shown(lost)));
+        words.push_back(terminal.bad('-' + terminal.sanitised(lost)));
     }
     for (const std::string& gained : line.gained) {
-        words.push_back(terminal.good('+' + terminal.shown(gained)));
+        words.push_back(terminal.good('+' + terminal.sanitised(gained)));
     }
     constexpr std::size_t INDENT = 4;
     std::string text;
@@ -243,7 +243,7 @@ std::string markdownHeading(const Group& group) {
 std::string asText(const Comparison& comparison, const Terminal& terminal) {
     std::string text;
     const auto addHeading = [&](const std::string& heading) {
-        text += terminal.heading(terminal.shown(heading)) + '\n';
+        text += terminal.heading(terminal.sanitised(heading)) + '\n';
     };
     const auto addDevices = [&](const char* title, const Devices& devices) {
         if (!devices.empty()) {

@@ -15,7 +15,7 @@
 #include <algorithm>
 #include <utility>
 
-namespace why {
+namespace explanation {
 
 namespace {
 
@@ -71,7 +71,7 @@ public:
     }
 
 private:
-    [[nodiscard]] bool isYes() const { return askFreshManager(m_question) == Verdict::YES; }
+    [[nodiscard]] bool isYes() const { return askFreshManager(m_question) == Conclusion::YES; }
 
     /// In SPI mode the tables of all flashes answer for every device.
     [[nodiscard]] bool isAnsweredForAll() const {
@@ -126,7 +126,7 @@ private:
         for (int output = 0; output < outputCount; ++output) {
             with(&Question::output, static_cast<OUTPUT_TYPE>(output), [&] {
                 const Explanation explanation = explain(m_question);
-                if (explanation.verdict != Verdict::YES) {
+                if (explanation.verdict != Conclusion::YES) {
                     return;
                 }
                 // The mode tables name each output by itself: their places would fill the screen.
@@ -180,7 +180,7 @@ private:
         if (std::find(keys.begin(), keys.end(), m_question.property) != keys.end()) {
             return;
         }
-        if (const std::optional<std::string> meant = nearest(m_question.property, keys)) {
+        if (const std::optional<std::string> meant = suggest(m_question.property, keys)) {
             add("instead", fmt::format("there is a property {}", *meant));
         }
     }
@@ -252,4 +252,4 @@ private:
 
 std::vector<Step> alternatives(const Question& question) { return AlternativeFinder(question).run(); }
 
-} // namespace why
+} // namespace explanation

@@ -8,7 +8,7 @@
 #include <string>
 #include <vector>
 
-namespace why {
+namespace explanation {
 
 using catalogue::SourceText;
 
@@ -23,7 +23,7 @@ struct Step {
 };
 
 struct Explanation {
-    Verdict verdict = Verdict::NO; ///< that the steps come to
+    Conclusion verdict = Conclusion::NO; ///< that the steps come to
     std::vector<Step> steps;
 
     /// The last record that decides something; null when there is none.
@@ -39,7 +39,7 @@ struct Explanation {
 /// What is shown: the manager's verdict, and how the records lead there.
 struct Answer {
     Question question;
-    Verdict verdict;
+    Conclusion verdict;
     Explanation explanation;
 
     [[nodiscard]] bool agrees() const { return verdict == explanation.verdict; }
@@ -48,4 +48,4 @@ struct Answer {
 [[nodiscard]] std::string asText(const Answer& answer, const Terminal& terminal);
 [[nodiscard]] Json asJson(const Answer& answer);
 
-} // namespace why
+} // namespace explanation

@@ -11,7 +11,7 @@
 
 #include <fmt/format.h>
 
-namespace why {
+namespace explanation {
 
 Explanation explain(const Question& question) { return ExplanationBuilder(question).build(); }
 
@@ -29,17 +29,17 @@ Explanation ExplanationBuilder::build() {
     if (m_asked.startUp.values().empty()) {
         add("fault", "there is no base database, so the manager knows nothing");
     }
-    const Verdict verdict = this->verdict();
+    const Conclusion verdict = this->verdict();
     return {verdict, std::move(m_steps)};
 }
 
-Verdict ExplanationBuilder::verdict() {
-    if (m_asked.verdict != Verdict::FAULT) {
-        return isYes() ? Verdict::YES : Verdict::NO;
+Conclusion ExplanationBuilder::verdict() {
+    if (m_asked.verdict != Conclusion::FAULT) {
+        return isYes() ? Conclusion::YES : Conclusion::NO;
     }
     const Match culprit = m_asked.reads.last();
     if (!culprit) {
-        return Verdict::NO;
+        return Conclusion::NO;
     }
     add("fault",
         fmt::format("no database can name an option \"{}\": the manager raises when it reads the options of "
@@ -47,7 +47,7 @@ Verdict ExplanationBuilder::verdict() {
                     culprit.text->text,
                     culprit.value->fromSection ? culprit.value->device : culprit.value->family),
         culprit);
-    return Verdict::FAULT;
+    return Conclusion::FAULT;
 }
 
 bool ExplanationBuilder::isYes() {
@@ -75,7 +75,7 @@ bool ExplanationBuilder::isYes() {
 std::string withoutPackage(const std::string& device) {
     StringBase name(device.c_str());
     ConstraintsManager::removePackageName(name);
-    return plain(name);
+    return toStdString(name);
 }
 
 std::string ExplanationBuilder::addNameStep() {
@@ -89,7 +89,7 @@ std::string ExplanationBuilder::addNameStep() {
 
 /// Where spi.acd lists a flash or a family of flashes.
 ReadLog::Match ExplanationBuilder::flashListing(const std::string& name) const {
-    const std::string upper = plain(UT_STR::Upper(name.c_str()));
+    const std::string upper = toStdString(UT_STR::Upper(name.c_str()));
     Match found = m_asked.startUp.findItem(schema::DEVICE_FAMILY, upper);
     if (const ReadLog::Value* const families = m_asked.startUp.find(schema::DEVICE_FAMILY)) {
         for (auto family = families->items.begin(); !found && family != families->items.end(); ++family) {
@@ -131,4 +131,4 @@ void ExplanationBuilder::add(const char* topic, std::string text, const Match& p
     m_steps.push_back({topic, std::move(text), place.sourceText(), place.value->shadows()});
 }
 
-} // namespace why
+} // namespace explanation

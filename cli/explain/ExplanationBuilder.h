@@ -7,7 +7,7 @@
 #include <string>
 #include <vector>
 
-namespace why {
+namespace explanation {
 
 /// Finds what decides a question among the records that a manager read for it, and notes each step.
 class ExplanationBuilder {
@@ -19,7 +19,7 @@ public:
 private:
     using Match = ReadLog::Match;
 
-    [[nodiscard]] Verdict verdict();
+    [[nodiscard]] Conclusion verdict();
     [[nodiscard]] bool isYes();
 
     // Modes.
@@ -91,4 +91,4 @@ template <typename Keys>
     return text.empty() ? "nothing" : text;
 }
 
-} // namespace why
+} // namespace explanation

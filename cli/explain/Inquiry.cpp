@@ -3,9 +3,9 @@
 
 #include <tarvik/ConstraintsManager.h>
 
-namespace why {
+namespace explanation {
 
-Verdict askFreshManager(const Question& question) {
+Conclusion askFreshManager(const Question& question) {
     const ManagerFactory::Manager manager = ManagerFactory::make();
     manager->setExceptions(false);
     return ask(*manager, question);
@@ -18,7 +18,7 @@ Inquiry::Inquiry(const Question& question) {
 }
 
 std::string Inquiry::familyOf(const std::string& name) const {
-    return plain(manager->getPartFamily(name.c_str()));
+    return toStdString(manager->getPartFamily(name.c_str()));
 }
 
-} // namespace why
+} // namespace explanation

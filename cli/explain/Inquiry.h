@@ -5,10 +5,10 @@
 
 #include <ManagerFactory.h>
 
-namespace why {
+namespace explanation {
 
 /// The answer of a manager that was asked nothing before.
-[[nodiscard]] Verdict askFreshManager(const Question& question);
+[[nodiscard]] Conclusion askFreshManager(const Question& question);
 
 /// A question to a manager that was asked nothing before, its answer, and what the manager read on the way.
 struct Inquiry {
@@ -20,7 +20,7 @@ struct Inquiry {
     ReadLog startUp;                 ///< what the manager read before the question
     ReadLog reads;                   ///< what it read for the question
     ManagerFactory::Manager manager; ///< its exceptions are off
-    Verdict verdict = Verdict::NO;
+    Conclusion verdict = Conclusion::NO;
 };
 
-} // namespace why
+} // namespace explanation

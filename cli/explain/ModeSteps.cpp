@@ -8,7 +8,7 @@
 
 #include <fmt/format.h>
 
-namespace why {
+namespace explanation {
 
 using TARVIKNS::MODE_TYPE;
 using TARVIKNS::OUTPUT_TYPE;
@@ -131,4 +131,4 @@ bool ExplanationBuilder::isExcluded(const std::string& device) {
     return true;
 }
 
-} // namespace why
+} // namespace explanation

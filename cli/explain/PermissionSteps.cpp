@@ -12,7 +12,7 @@
 
 #include <algorithm>
 
-namespace why {
+namespace explanation {
 
 using TARVIKNS::MODE_TYPE;
 using TARVIKNS::OUTPUT_TYPE;
@@ -300,4 +300,4 @@ void ExplanationBuilder::addUnusedWords(const Permission& permission) {
     }
 }
 
-} // namespace why
+} // namespace explanation

@@ -8,7 +8,7 @@
 
 #include <algorithm>
 
-namespace why {
+namespace explanation {
 
 namespace {
 
@@ -22,7 +22,7 @@ std::string stepText(const Step& step, const Terminal& terminal) {
     const std::string separator = '\n' + std::string(INDENT, ' ');
     return "  " + terminal.heading(step.topic) +
            std::string(INDENT - std::min(INDENT, 2 + step.topic.size()), ' ') +
-           fmt::format("{}\n", fmt::join(lines(wordsOf(terminal.shown(step.text)), room, ""), separator));
+           fmt::format("{}\n", fmt::join(lines(wordsOf(terminal.sanitised(step.text)), room, ""), separator));
 }
 
 /// The text, or as much of it as fits; no character is cut in two.
@@ -44,17 +44,17 @@ std::string placeText(const char* lead, const SourceText& place, const Terminal&
     const std::string origin = lead + catalogue::asText(place.origin) + ':';
     const std::size_t needed = std::min(place.text.size(), LEAST_FRAGMENT);
     const bool fits = origin.size() + 1 + needed <= room;
-    return indent + terminal.aside(origin) + (fits ? " " : '\n' + indent) +
-           terminal.shown(clipped(place.text, fits ? room - origin.size() - 1 : room)) + '\n';
+    return indent + terminal.dim(origin) + (fits ? " " : '\n' + indent) +
+           terminal.sanitised(clipped(place.text, fits ? room - origin.size() - 1 : room)) + '\n';
 }
 
-std::string verdictText(Verdict verdict, const Terminal& terminal) {
+std::string verdictText(Conclusion verdict, const Terminal& terminal) {
     switch (verdict) {
-    case Verdict::YES:
+    case Conclusion::YES:
         return terminal.good("yes:");
-    case Verdict::NO:
+    case Conclusion::NO:
         return terminal.bad("no:");
-    case Verdict::FAULT:
+    case Conclusion::FAULT:
         break;
     }
     return terminal.bad("no answer:");
@@ -91,11 +91,11 @@ Json asJson(const Answer& answer) {
         steps.push_back(std::move(object));
     }
     Json object{
-        {"allowed", answer.verdict == Verdict::FAULT ? Json() : Json(answer.verdict == Verdict::YES)}};
+        {"allowed", answer.verdict == Conclusion::FAULT ? Json() : Json(answer.verdict == Conclusion::YES)}};
     object.update(inJson(answer.question));
     object["steps"] = std::move(steps);
     object["agrees"] = answer.agrees();
     return object;
 }
 
-} // namespace why
+} // namespace explanation

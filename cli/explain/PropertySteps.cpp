@@ -10,11 +10,11 @@
 
 #include <fmt/format.h>
 
-namespace why {
+namespace explanation {
 
 namespace {
 
-std::string upperCase(const std::string& text) { return plain(UT_STR::Upper(text.c_str())); }
+std::string upperCase(const std::string& text) { return toStdString(UT_STR::Upper(text.c_str())); }
 
 /// The values that were read of a record, a missing one being the empty text.
 std::set<std::string> valuesOf(const ReadLog::Item& record, int first) {
@@ -184,4 +184,4 @@ bool ExplanationBuilder::flashProperty() {
     return isYes;
 }
 
-} // namespace why
+} // namespace explanation

@@ -6,7 +6,7 @@
 #include <TarvikException.h>
 #include <tarvik/ConstraintsManager.h>
 
-namespace why {
+namespace explanation {
 
 namespace {
 
@@ -65,11 +65,11 @@ bool takesOutput(Kind kind) {
 
 } // namespace
 
-Verdict ask(ConstraintsManager& manager, const Question& question) {
+Conclusion ask(ConstraintsManager& manager, const Question& question) {
     try {
-        return answer(manager, question) ? Verdict::YES : Verdict::NO;
+        return answer(manager, question) ? Conclusion::YES : Conclusion::NO;
     } catch (const DataMismatchException&) {
-        return Verdict::FAULT;
+        return Conclusion::FAULT;
     }
 }
 
@@ -125,4 +125,4 @@ Json inJson(const Question& question) {
     return asked;
 }
 
-} // namespace why
+} // namespace explanation

@@ -9,7 +9,7 @@
 
 class ConstraintsManager;
 
-namespace why {
+namespace explanation {
 
 /// A question that is answered by yes or no. Members that its kind does not take are not read.
 struct Question {
@@ -35,16 +35,16 @@ struct Question {
     std::optional<std::string> value;
 };
 
-enum class Verdict {
+enum class Conclusion {
     YES,
     NO,
     FAULT, ///< the database has a fault at which the manager raises
 };
 
 /// The manager's answer.
-[[nodiscard]] Verdict ask(ConstraintsManager& manager, const Question& question);
+[[nodiscard]] Conclusion ask(ConstraintsManager& manager, const Question& question);
 
 [[nodiscard]] std::string inWords(const Question& question);
 [[nodiscard]] Json inJson(const Question& question);
 
-} // namespace why
+} // namespace explanation

@@ -106,7 +106,7 @@ std::string asText(const Report& report, const Terminal& terminal) {
         const std::string severityText = fmt::format("{}:", nameOf(severity));
         text += fmt::format("{} {} {} [{}]\n", terminal.heading(place),
                             severity == Severity::ERROR ? terminal.bad(severityText)
-                                                        : terminal.doubtful(severityText),
+                                                        : terminal.warning(severityText),
                             printable(finding.text), finding.rule->code);
         text += excerpt(finding, terminal);
     }

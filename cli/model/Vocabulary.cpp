@@ -6,7 +6,7 @@
 #include "text/Suggest.h"
 
 // The manager's own table: the class itself does not give the display names of modes and outputs.
-#include <Vocabulary.h>
+#include <WordTables.h>
 
 #include <fmt/format.h>
 
@@ -28,7 +28,7 @@ const char* nameOf(Kind kind) { return KIND_NAMES.at(static_cast<std::size_t>(ki
 
 std::vector<Word> modeWords() {
     std::vector<Word> words;
-    for (const Mode& mode : MODES) {
+    for (const wordTables::Mode& mode : wordTables::MODES) {
         words.push_back({mode.key, {}, mode.display});
         for (const char* const name : mode.names) {
             if (name != nullptr && words.back().key != name) {
@@ -51,8 +51,8 @@ std::vector<Word> wordsOf(const Rows& rows) {
 
 std::vector<Word> optionWords() {
     std::vector<Word> words;
-    words.reserve(OPTIONS.size());
-    for (const Option& option : OPTIONS) {
+    words.reserve(wordTables::OPTIONS.size());
+    for (const wordTables::Option& option : wordTables::OPTIONS) {
         words.push_back({option.key, {}, ""});
     }
     return words;
@@ -100,8 +100,8 @@ Type read(Kind kind, const std::string& text) {
 } // namespace
 
 const std::vector<Word>& words(Kind kind) {
-    static const std::array<std::vector<Word>, 4> all{modeWords(), wordsOf(OUTPUTS), wordsOf(OPERATIONS),
-                                                      optionWords()};
+    static const std::array<std::vector<Word>, 4> all{modeWords(), wordsOf(wordTables::OUTPUTS),
+                                                      wordsOf(wordTables::OPERATIONS), optionWords()};
     return all.at(static_cast<std::size_t>(kind));
 }
 

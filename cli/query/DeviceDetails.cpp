@@ -87,7 +87,7 @@ void DeviceFactsReader::addFacts(ConstraintsManager& manager, DeviceDetails& det
     };
     // No record has this key, so the manager loads all there is, and the family of the name, too.
     const char* const missing = ":";
-    const std::string family = plain(manager.getPartFamily(device.c_str()));
+    const std::string family = toStdString(manager.getPartFamily(device.c_str()));
     if (isOrderDependent) {
         // One name may have properties of its own although its family's data raise.
         const MutedMessages muted;
@@ -106,7 +106,7 @@ std::optional<DeviceDetails::Idcode> DeviceFactsReader::idcode(const std::string
         // A package does not change the IDCODE.
         StringBase bare(device.c_str());
         ConstraintsManager::removePackageName(bare);
-        found = m_idcodes.find(plain(bare));
+        found = m_idcodes.find(toStdString(bare));
     }
     if (!found) {
         return std::nullopt;

@@ -51,7 +51,7 @@ private:
     }
 
     [[nodiscard]] bool isFlash(const std::string& name) const {
-        return m_flashNames.count(plain(UT_STR::Upper(name.c_str()))) != 0;
+        return m_flashNames.count(toStdString(UT_STR::Upper(name.c_str()))) != 0;
     }
 
     std::vector<catalogue::Flash> m_flashes;
@@ -78,7 +78,7 @@ std::vector<ListedName> familyList(const std::vector<ListedName>& devices) {
         }
     };
     for (const std::string& family : catalogue::list("spi.acd", "DEVICE_FAMILY")) {
-        const bool isUnknown = plain(UT_STR::Upper(family.c_str())) != family;
+        const bool isUnknown = toStdString(UT_STR::Upper(family.c_str())) != family;
         add(family, "spi", isUnknown || dependent.contains(family));
     }
     for (const std::string& family : catalogue::families()) {

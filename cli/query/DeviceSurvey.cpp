@@ -266,7 +266,7 @@ void DeviceSurvey::askFacts(ConstraintsManager& manager, DeviceDetails& details,
     } catch (const TarvikException& fault) {
         details.fault = faultText(fault);
     }
-    details.family = plain(manager.getPartFamily(details.name.c_str()));
+    details.family = toStdString(manager.getPartFamily(details.name.c_str()));
 }
 
 /// Might the manager raise when it loads a device?

@@ -71,7 +71,7 @@ std::string flashClass(const std::string& device) {
 }
 
 Entries flashEntries(const std::string& name) {
-    return catalogue::entries("spi.acd", plain(UT_STR::Upper(name.c_str())) + "_PROPERTY");
+    return catalogue::entries("spi.acd", toStdString(UT_STR::Upper(name.c_str())) + "_PROPERTY");
 }
 
 } // namespace
@@ -122,14 +122,14 @@ std::vector<std::string> propertyValues(ConstraintsManager& manager, const std::
                                         const std::string& key) {
     std::vector<std::string> values;
     for (const StringBase& value : manager.getDeviceStringProperties(device.c_str(), key.c_str())) {
-        values.push_back(plain(value));
+        values.push_back(toStdString(value));
     }
     return values;
 }
 
 Properties deviceProperties(ConstraintsManager& manager, const std::string& device) {
     return PropertyReader().read(
-        device, plain(manager.getPartFamily(device.c_str())),
+        device, toStdString(manager.getPartFamily(device.c_str())),
         [&](const std::string& key) { return propertyValues(manager, device, key); });
 }
 
@@ -189,7 +189,7 @@ Json asJson(const Properties& properties) {
 std::string asText(const PropertyAnswer& answer, const Terminal& terminal) {
     std::string text;
     for (const std::string& value : answer.values) {
-        text += terminal.shown(value) + '\n';
+        text += terminal.sanitised(value) + '\n';
     }
     return text;
 }

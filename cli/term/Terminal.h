@@ -29,15 +29,12 @@ public:
 
     /// A text of the database or the command line: printable on a terminal, otherwise as it is.
     [[nodiscard]] std::string sanitised(std::string_view text) const;
-    [[nodiscard]] std::string shown(std::string_view text) const { return sanitised(text); }
 
     /// The text as one of these kinds of words; without colours as it is.
     [[nodiscard]] std::string heading(std::string_view text) const { return marked("1", text); }
     [[nodiscard]] std::string good(std::string_view text) const { return marked("32", text); }
     [[nodiscard]] std::string bad(std::string_view text) const { return marked("31", text); }
     [[nodiscard]] std::string warning(std::string_view text) const { return marked("33", text); }
-    [[nodiscard]] std::string aside(std::string_view text) const { return dim(text); }
-    [[nodiscard]] std::string doubtful(std::string_view text) const { return warning(text); }
     [[nodiscard]] std::string dim(std::string_view text) const { return marked("36", text); }
 
 private:

@@ -17,4 +17,3 @@ using Json = nlohmann::ordered_json;
 [[nodiscard]] inline std::string toStdString(const StringBase& text) {
     return {text.c_str(), text.GetLength()};
 }
-[[nodiscard]] inline std::string plain(const StringBase& text) { return toStdString(text); }

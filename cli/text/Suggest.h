@@ -9,11 +9,6 @@
 [[nodiscard]] std::optional<std::string> suggest(std::string_view text,
                                                  const std::vector<std::string>& candidates);
 
-[[nodiscard]] inline std::optional<std::string> nearest(std::string_view text,
-                                                        const std::vector<std::string>& candidates) {
-    return suggest(text, candidates);
-}
-
 /// `; did you mean "KS50"?`, or an empty text.
 [[nodiscard]] std::string didYouMean(std::string_view text, const std::vector<std::string>& candidates);
 

@@ -3,7 +3,9 @@
 #include "database/FileNames.h"
 
 #include <algorithm>
+#include <cstdlib>
 #include <filesystem>
+#include <iterator>
 #include <system_error>
 #include <utility>
 
@@ -23,6 +25,12 @@ namespace {
     return std::filesystem::current_path(error).string();
 }
 
+/// Indexes can be ignored, to compare answers with and without them.
+[[nodiscard]] bool isIndexEnabled() {
+    const char* const setting = secure_getenv("TARVIK_INDEX");
+    return setting == nullptr || std::string_view(setting) != "off";
+}
+
 /// Reads what is in a file, unless that failed before; the first failure is reported.
 template <typename Read>
 void tryRead(SourceFile& file, DeferredMessages& reports, Read read) {
@@ -40,17 +48,17 @@ void tryRead(SourceFile& file, DeferredMessages& reports, Read read) {
 } // namespace
 
 Catalogue::Catalogue(const std::vector<std::string>& directories, DeferredMessages& reports)
-    : m_workingDirectory(workingDirectory()) {
-    std::uint32_t layer = 0;
-    for (auto directory = directories.rbegin(); directory != directories.rend(); ++directory, ++layer) {
+    : m_workingDirectory(workingDirectory()), m_directories(directories.rbegin(), directories.rend()) {
+    for (std::uint32_t layer = 0; layer != m_directories.size(); ++layer) {
+        const std::string& directory = m_directories[layer];
         try {
-            std::vector<std::string> names = listDirectory(*directory);
+            std::vector<std::string> names = listDirectory(directory);
             std::sort(names.begin(), names.end());
             for (const std::string& name : names) {
-                addFile(name, {joinPath(*directory, name), layer, nullptr});
+                addFile(name, {joinPath(directory, name), layer, nullptr});
             }
         } catch (const ReadError& unreadable) {
-            reports.add(*directory, location::DIRECTORY_UNREADABLE, unreadable.what());
+            reports.add(directory, location::DIRECTORY_UNREADABLE, unreadable.what());
         }
     }
     sort();
@@ -108,15 +116,50 @@ Family* Catalogue::familyOfDevice(std::string_view device, DeferredMessages& rep
     return ordinal == DeviceIndex::NONE ? nullptr : m_families[ordinal].get();
 }
 
+/// The index of a layer's directory; nothing unless it describes the files that were found there as they are now.
+std::optional<DirectoryIndex> Catalogue::currentIndex(std::uint32_t layer) const {
+    const std::string directory = absolute(m_directories[layer]);
+    std::optional<DirectoryIndex> index = DirectoryIndex::read(directory);
+    if (!index) {
+        return std::nullopt;
+    }
+    std::vector<std::string_view> names;
+    for (const auto& family : m_families) {
+        for (const SourceFile& file : family->files) {
+            if (file.layer == layer) {
+                names.push_back(fileNameOf(file.path));
+                std::ranges::transform(file.caseCollisions, std::back_inserter(names), fileNameOf);
+            }
+        }
+    }
+    std::ranges::sort(names);
+    return index->isCurrent(directory, names) ? std::move(index) : std::nullopt;
+}
+
 DeviceIndex Catalogue::makeIndex(DeferredMessages& reports) const {
-    DeviceIndex index;
+    std::vector<std::optional<DirectoryIndex>> indexes(m_directories.size());
+    if (isIndexEnabled()) {
+        for (std::uint32_t layer = 0; layer != indexes.size(); ++layer) {
+            indexes[layer] = currentIndex(layer);
+        }
+    }
+    const auto indexedSections = [&indexes](const SourceFile& file) -> const PackedStrings* {
+        return file.text == nullptr && indexes[file.layer]
+                   ? indexes[file.layer]->sections(fileNameOf(file.path))
+                   : nullptr;
+    };
+    DeviceIndex devices;
     SectionScanner scan;
     for (std::uint32_t ordinal = 0; ordinal != m_families.size(); ++ordinal) {
         for (SourceFile& file : m_families[ordinal]->files) {
-            tryRead(file, reports, [&] { index.add(scan.names([&] { return open(file); }), ordinal); });
+            tryRead(file, reports, [&] {
+                const PackedStrings* const sections = indexedSections(file);
+                devices.add(sections != nullptr ? *sections : scan.names([&] { return open(file); }),
+                            ordinal);
+            });
         }
     }
-    return index;
+    return devices;
 }
 
 const Database* Catalogue::database(Family& family, DeferredMessages& reports) const {
@@ -145,8 +188,11 @@ std::unique_ptr<ByteSource> Catalogue::open(const SourceFile& file) const {
     if (file.text != nullptr) {
         return std::make_unique<MemorySource>(*file.text);
     }
-    return std::make_unique<FileSource>(file.path.starts_with('/') ? file.path
-                                                                   : joinPath(m_workingDirectory, file.path));
+    return std::make_unique<FileSource>(absolute(file.path));
+}
+
+std::string Catalogue::absolute(const std::string& path) const {
+    return path.starts_with('/') ? path : joinPath(m_workingDirectory, path);
 }
 
 } // namespace acd

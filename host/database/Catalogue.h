@@ -3,6 +3,7 @@
 #include "database/Database.h"
 #include "database/DeferredMessages.h"
 #include "database/DeviceIndex.h"
+#include "database/DirectoryIndex.h"
 #include "database/FileReading.h"
 
 #include <PM_DEVKEY.h>
@@ -57,8 +58,8 @@ public:
     /// The family whose file has that name; null when there is none.
     [[nodiscard]] Family* familyOfFile(std::string_view fileName) const noexcept;
 
-    /// The family that a device belongs to; null when none has it. The first call looks through all files,
-    /// and reports those that can't be read.
+    /// The family that a device belongs to; null when none has it. The first call looks through all files that no
+    /// index covers, and reports those that can't be read.
     [[nodiscard]] Family* familyOfDevice(std::string_view device, DeferredMessages& reports);
 
     /// The family's database, read when it is asked for first; null when a file of it can't be read. What is
@@ -72,9 +73,12 @@ public:
 private:
     void addFile(std::string_view fileName, SourceFile file);
     void sort();
+    [[nodiscard]] std::string absolute(const std::string& path) const;
+    [[nodiscard]] std::optional<DirectoryIndex> currentIndex(std::uint32_t layer) const;
     [[nodiscard]] DeviceIndex makeIndex(DeferredMessages& reports) const;
 
     std::string m_workingDirectory; ///< of the process when it listed the directories; hosts change it
+    std::vector<std::string> m_directories; ///< by layer
     std::shared_ptr<const MemoryFiles> m_memoryFiles;
     std::vector<std::unique_ptr<Family>> m_families;
     CaseInsensitiveNameSet m_names; ///< of the families, with the same ordinals

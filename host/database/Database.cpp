@@ -131,7 +131,10 @@ void DatabaseBuilder::merge() {
         m_database.m_values.push_back(join(standing, last));
         first = last;
     }
-    m_database.m_spans.shrink_to_fit();
+    // A copy is not worth it for less.
+    if (m_database.m_spans.capacity() > 2 * m_database.m_spans.size()) {
+        m_database.m_spans.shrink_to_fit();
+    }
 }
 
 /// Records the values of lower layers that an upper layer replaces.
@@ -210,6 +213,7 @@ Database::Database(std::vector<LayerText> layers, std::vector<LayerError>& error
     Line line;
     for (std::uint32_t layer = 0; layer != m_layers.size(); ++layer) {
         const Text& text = m_layers[layer].text;
+        m_spans.reserve(m_spans.size() + expectedLines(text.size));
         LineReader reader(text.bytes.get(), text.size);
         builder.openLayer(layer);
         while (reader.next(line)) {

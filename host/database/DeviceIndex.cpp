@@ -1,24 +1,48 @@
 #include "database/DeviceIndex.h"
 
-// The map from devices to families. It copies the names, since the files that contain them are mostly not
-// kept.
+#include <AcdText.h>
+
+#include <utility>
+
+// The map from devices to families. It keeps the names, since the files that contain them are mostly not kept.
 
 namespace acd {
 
-void DeviceIndex::add(const PackedStrings& names, std::uint32_t family) {
-    const std::vector<char>& text = m_texts.emplace_back(names.bytes());
-    std::uint32_t begin = 0;
-    for (const std::uint32_t end : names.ends()) {
-        if (m_devices.add({text.data() + begin, end - begin}) == m_families.size()) {
-            m_families.push_back(family);
-        }
-        begin = end;
-    }
+void DeviceIndex::add(PackedStrings names, std::uint32_t family) {
+    m_devices.push_back({std::move(names), family});
 }
 
-std::uint32_t DeviceIndex::family(std::string_view device) const noexcept {
-    const std::uint32_t ordinal = m_devices.find(device);
-    return ordinal == CaseInsensitiveNameSet::NONE ? NONE : m_families[ordinal];
+std::uint32_t DeviceIndex::family(std::string_view device) {
+    if (m_searches < SEARCHES) {
+        ++m_searches;
+        return search(device);
+    }
+    if (m_table.families.empty()) {
+        m_table = makeTable();
+    }
+    const std::uint32_t ordinal = m_table.devices.find(device);
+    return ordinal == CaseInsensitiveNameSet::NONE ? NONE : m_table.families[ordinal];
+}
+
+std::uint32_t DeviceIndex::search(std::string_view device) const noexcept {
+    for (const Devices& each : m_devices) {
+        if (each.names.containsIgnoreCase(device)) {
+            return each.family;
+        }
+    }
+    return NONE;
+}
+
+DeviceIndex::Table DeviceIndex::makeTable() const {
+    Table table;
+    for (const Devices& each : m_devices) {
+        each.names.forEach([&](std::string_view name) {
+            if (table.devices.add(name) == table.families.size()) {
+                table.families.push_back(each.family);
+            }
+        });
+    }
+    return table;
 }
 
 } // namespace acd

@@ -14,16 +14,33 @@ class DeviceIndex {
 public:
     static constexpr std::uint32_t NONE = CaseInsensitiveNameSet::NONE;
 
-    /// Adds the devices of a family; the names are copied.
-    void add(const PackedStrings& names, std::uint32_t family);
+    /// Adds the devices of a family.
+    void add(PackedStrings names, std::uint32_t family);
 
-    /// The family of a device, `NONE` when no family has it.
-    [[nodiscard]] std::uint32_t family(std::string_view device) const noexcept;
+    /// The family of a device, `NONE` when no family has it. The first look-ups go through all names: many processes ask
+    /// about one device and end, for which a table would take longer.
+    [[nodiscard]] std::uint32_t family(std::string_view device);
 
 private:
-    std::vector<std::vector<char>> m_texts; ///< what the table's names point into
-    CaseInsensitiveNameSet m_devices;
-    std::vector<std::uint32_t> m_families; ///< by the device's ordinal
+    struct Devices {
+        PackedStrings names;
+        std::uint32_t family;
+    };
+
+    /// A look-up in the table.
+    struct Table {
+        CaseInsensitiveNameSet devices;      ///< points into the names of `m_devices`
+        std::vector<std::uint32_t> families; ///< by the device's ordinal
+    };
+
+    static constexpr int SEARCHES = 6; ///< take about as long as making the table of a large database
+
+    [[nodiscard]] std::uint32_t search(std::string_view device) const noexcept;
+    [[nodiscard]] Table makeTable() const;
+
+    std::vector<Devices> m_devices;
+    int m_searches = 0;
+    Table m_table; ///< empty until there were so many searches
 };
 
 } // namespace acd

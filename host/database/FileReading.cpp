@@ -27,6 +27,15 @@ namespace {
 
 [[noreturn]] void raiseTooLarge() { throw ReadError("larger than 1 GiB"); }
 
+[[nodiscard]] FileTime toFileTime(const timespec& time) noexcept {
+    return {time.tv_sec, static_cast<std::uint32_t>(time.tv_nsec)};
+}
+
+[[nodiscard]] FileStatus toFileStatus(const struct stat& status) noexcept {
+    return {status.st_dev, status.st_ino, static_cast<std::uint64_t>(status.st_size),
+            toFileTime(status.st_mtim), toFileTime(status.st_ctim)};
+}
+
 } // namespace
 
 FileSource::FileSource(const std::string& path) : FileSource(path, ::read) {}
@@ -55,6 +64,7 @@ void FileSource::requireRegularFile() {
     if (!S_ISREG(status.st_mode)) {
         throw ReadError("not a regular file");
     }
+    m_status = toFileStatus(status);
     m_size = static_cast<std::size_t>(status.st_size);
     if (m_size > MAX_FILE_SIZE) {
         raiseTooLarge();
@@ -105,6 +115,25 @@ std::vector<std::string> listDirectory(const std::string& path) {
         raiseSystemError();
     }
     return names;
+}
+
+DirectoryStatus::DirectoryStatus(const std::string& path)
+    : m_descriptor(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_DIRECTORY)) {
+    if (m_descriptor == -1) {
+        raiseSystemError();
+    }
+}
+
+DirectoryStatus::~DirectoryStatus() { ::close(m_descriptor); }
+
+std::optional<FileStatus> DirectoryStatus::ofReadableFile(const std::string& name) const noexcept {
+    struct stat status {};
+    // The permissions of others than this process say nothing about what it may read, so the system is asked.
+    if (::fstatat(m_descriptor, name.c_str(), &status, 0) != 0 ||
+        ::faccessat(m_descriptor, name.c_str(), R_OK, AT_EACCESS) != 0) {
+        return std::nullopt;
+    }
+    return toFileStatus(status);
 }
 
 Text readAll(ByteSource& source) {

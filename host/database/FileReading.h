@@ -1,8 +1,11 @@
 #pragma once
 
+#include <compare>
 #include <cstddef>
+#include <cstdint>
 #include <exception>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -23,6 +26,26 @@ public:
 
 private:
     std::string m_reason;
+};
+
+/// A time as the file system records it.
+struct FileTime {
+    std::int64_t seconds = 0;
+    std::uint32_t nanoseconds = 0;
+
+    friend auto operator<=>(const FileTime&, const FileTime&) = default;
+};
+
+/// What identifies a file and one state of it: every change of the content changes the status, unless two changes
+/// happen within one tick of the file system's clock.
+struct FileStatus {
+    std::uint64_t device = 0;
+    std::uint64_t inode = 0;
+    std::uint64_t size = 0;
+    FileTime modified; ///< programs can set it to any value
+    FileTime changed;  ///< programs cannot set it
+
+    friend bool operator==(const FileStatus&, const FileStatus&) = default;
 };
 
 /// Bytes that come one portion after the other.
@@ -55,11 +78,15 @@ public:
     [[nodiscard]] std::size_t expectedSize() const noexcept override { return m_size; }
     [[nodiscard]] std::size_t read(char* buffer, std::size_t size) override;
 
+    /// The status that the file had when it was opened.
+    [[nodiscard]] const FileStatus& status() const noexcept { return m_status; }
+
 private:
     void requireRegularFile();
 
     int m_descriptor;
     ReadCall m_readCall;
+    FileStatus m_status;
     std::size_t m_size = 0;
     std::size_t m_readSoFar = 0;
 };
@@ -91,6 +118,23 @@ struct Text {
 /// The names of all entries of a directory, "." and ".." included, in no particular order.
 /// @throw ReadError
 [[nodiscard]] std::vector<std::string> listDirectory(const std::string& path);
+
+/// Looks at the files of one directory without opening them.
+class DirectoryStatus {
+public:
+    /// @throw ReadError
+    explicit DirectoryStatus(const std::string& path);
+    ~DirectoryStatus();
+    DirectoryStatus(const DirectoryStatus&) = delete;
+    DirectoryStatus& operator=(const DirectoryStatus&) = delete;
+
+    /// The status of a file.
+    /// @return nothing if there is no such file, or this process has no permission to read it
+    [[nodiscard]] std::optional<FileStatus> ofReadableFile(const std::string& name) const noexcept;
+
+private:
+    int m_descriptor;
+};
 
 /// Reads all that is left of a source.
 /// @throw ReadError

@@ -58,8 +58,9 @@ Header parseHeader(std::string_view line) noexcept {
     return {name, {}, {}, {}};
 }
 
-LineReader::LineReader(char* text, std::size_t size) noexcept
+LineReader::LineReader(char* text, std::size_t size)
     : m_next(text), m_end(text + size), m_holdsNul(size != 0 && std::memchr(text, 0, size) != nullptr) {
+    m_spans.reserve(expectedLines(size));
     if (between(m_next, m_end).substr(0, BYTE_ORDER_MARK.size()) == BYTE_ORDER_MARK) {
         m_next += BYTE_ORDER_MARK.size();
     }
@@ -197,6 +198,7 @@ void LineReader::locateValue(Line& line) const {
         line.spans.push_back({0, location});
         return;
     }
+    line.spans.reserve(m_spans.size());
     line.spans.push_back({0, locationOf(begin)});
     for (const SourceSpan& span : m_spans) {
         if (span.offset > begin && span.offset < begin + line.value.size()) {

@@ -26,6 +26,10 @@ inline constexpr std::string_view BYTE_ORDER_MARK = "\xEF\xBB\xBF";
 /// The text without the blanks at its end.
 [[nodiscard]] std::string_view withoutTrailingBlanks(std::string_view text) noexcept;
 
+/// How many lines to expect in a text. Memory is reserved by it, as one value may have tens of thousands of lines; what is
+/// reserved in vain is never touched.
+[[nodiscard]] constexpr std::size_t expectedLines(std::size_t size) noexcept { return size / 16 + 1; }
+
 /// What a header line says: a name, or what is wrong with it.
 struct Header {
     std::string_view name; ///< empty for a malformed header
@@ -72,7 +76,7 @@ public:
     /// The text is changed: continued lines are joined in place, so that a value is one view into it. It
     /// must outlive the lines.
     /// @param size at most 4 GiB
-    LineReader(char* text, std::size_t size) noexcept;
+    LineReader(char* text, std::size_t size);
 
     /// Reads the next line into `line`, whose memory is used again.
     /// @return false at the end of the text

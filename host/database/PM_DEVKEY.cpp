@@ -64,7 +64,9 @@ bool PM_DEVKEY::find(const char* key, const char* separator, const char* subSepa
         }
         part = m_field.part(part);
     }
-    m_result = part;
+    // Half as much work as an assignment, which allows for a text that overlaps.
+    m_result.clear();
+    m_result.append(part);
     return true;
 }
 

@@ -20,6 +20,24 @@ public:
     }
     void add(std::string_view name);
 
+    /// Takes names that are packed already.
+    /// @param ends as `ends()` gives them
+    /// @return whether they fit together, no name being empty; otherwise nothing changes
+    [[nodiscard]] bool assign(std::string_view bytes, std::vector<std::uint32_t> ends);
+
+    /// Calls `action` for each name, in order.
+    template <typename Action>
+    void forEach(Action action) const {
+        std::uint32_t begin = 0;
+        for (const std::uint32_t end : m_ends) {
+            action(std::string_view(m_bytes.data() + begin, end - begin));
+            begin = end;
+        }
+    }
+
+    /// Whether a name is among them, without regard to ASCII case.
+    [[nodiscard]] bool containsIgnoreCase(std::string_view name) const noexcept;
+
     [[nodiscard]] const std::vector<char>& bytes() const noexcept { return m_bytes; }
 
     /// How many of the bytes belong to the names up to and with each.

@@ -285,7 +285,7 @@ public:
 
     /// The IDCODE of each device.
     /// @return IDCODEs by device name, both as the database spells them
-    [[nodiscard]] const Texts& getAllDeviceIdcodes() const noexcept;
+    [[nodiscard]] const Texts& getAllDeviceIdcodes() const;
 
     // ---- SPI flash: read by the start-up, so nothing is loaded and nothing raised --------------------------
 

@@ -35,10 +35,10 @@ void expectComplete(ConstraintsManager* manager) {
     EXPECT_TRUE(members.m_exceptions);
     EXPECT_EQ(members.m_supportedDevices.size(), 2U);
     EXPECT_THAT(members.m_bsCables, SizeIs(2));
-    EXPECT_THAT(members.m_deviceIdcodes, SizeIs(1));
+    EXPECT_THAT(members.m_deviceIdcodes.get(), SizeIs(1));
     EXPECT_THAT(members.m_operationOrders, SizeIs(32));
     EXPECT_THAT(members.m_spiNames, SizeIs(4));
-    EXPECT_THAT(members.m_spiProperties, SizeIs(1));
+    EXPECT_THAT(members.m_spiProperties.get(), SizeIs(1));
     EXPECT_THAT(members.m_multibootTypes, SizeIs(12));
 }
 

@@ -144,7 +144,7 @@ TEST(Idcodes, AreHandedOutAsTheyStand) {
         {{"base.acd", "IDCODE = KS50,0x1\n"}, {"kestrel.acd", "[KS50]\nIDCODE = KS60,0x2\n"}});
     session->setExceptions(false);
     session.members().loadDeviceData("KS50", {});
-    EXPECT_EQ(&session->getAllDeviceIdcodes(), &session.members().m_deviceIdcodes);
+    EXPECT_EQ(&session->getAllDeviceIdcodes(), &session.members().m_deviceIdcodes.get());
     EXPECT_THAT(entries(session->getAllDeviceIdcodes()), ElementsAre(Pair("KS50", "0x1")));
 }
 

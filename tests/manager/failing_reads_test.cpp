@@ -101,7 +101,7 @@ void expectStepsBefore(Step end, TarvikTestPeer::Members& members) {
     EXPECT_THAT(members.m_pffCables, SizeIs(done(MODE_OUTPUTS)));
     EXPECT_EQ(members.m_bsDevices.size(), done(MODE_DEVICES));
     EXPECT_EQ(members.m_pffDevices.size(), done(MODE_DEVICES));
-    EXPECT_THAT(members.m_deviceIdcodes, SizeIs(done(IDCODES)));
+    EXPECT_THAT(members.m_deviceIdcodes.get(), SizeIs(done(IDCODES)));
     EXPECT_EQ(members.m_notSupportedPartInMode.size(), done(NOT_SUPPORTED));
     EXPECT_EQ(members.m_operationTable.blocks(), done(TABLES));
     EXPECT_EQ(members.m_bsdlOperationTable.blocks(), done(TABLES));
@@ -208,21 +208,21 @@ TEST(FailedStartUp, AtTheClassListsKeepsTheSpiNames) {
     FailedSession session("AT1_DEVICES");
     expectStepsBefore(ALL, session.members());
     EXPECT_THAT(session.members().m_spiNames, SizeIs(3));
-    EXPECT_THAT(session.members().m_spiProperties, IsEmpty());
+    EXPECT_THAT(session.members().m_spiProperties.get(), IsEmpty());
     expectUsableAfterOneReport(session);
 }
 
 TEST(FailedStartUp, AtTheSpiPropertiesKeepsTheClassLists) {
     FailedSession session("FLASHES_PROPERTY");
     EXPECT_THAT(session.members().m_at1Devices, SizeIs(1));
-    EXPECT_THAT(session.members().m_spiProperties, IsEmpty());
+    EXPECT_THAT(session.members().m_spiProperties.get(), IsEmpty());
     EXPECT_THAT(session.members().m_operationsLoaded, IsEmpty());
     expectUsableAfterOneReport(session);
 }
 
 TEST(FailedStartUp, AtTheSpiOperationsCountsThemAsNotLoaded) {
     FailedSession session("OPERATION");
-    EXPECT_THAT(session.members().m_spiProperties, SizeIs(1));
+    EXPECT_THAT(session.members().m_spiProperties.get(), SizeIs(1));
     EXPECT_THAT(session.members().m_operationsLoaded, IsEmpty());
     expectUsableAfterOneReport(session);
 }

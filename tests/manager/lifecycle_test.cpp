@@ -165,14 +165,14 @@ TEST(Members, WithoutDataAreEmpty) {
     EXPECT_EQ(members.m_supportedDevices.size(), 0U);
     EXPECT_EQ(members.m_programOptionPackages.size(), 0U);
     EXPECT_EQ(members.m_notSupportedPartInMode.size(), 0U);
-    EXPECT_THAT(members.m_deviceIdcodes, IsEmpty());
+    EXPECT_THAT(members.m_deviceIdcodes.get(), IsEmpty());
     EXPECT_THAT(members.m_loadedFamilies, IsEmpty());
     EXPECT_THAT(members.m_deviceProperties, IsEmpty());
     EXPECT_THAT(members.m_programOptionPackageIndex, IsEmpty());
     EXPECT_THAT(members.m_operationOptions, IsEmpty());
     EXPECT_THAT(members.m_spiNames, IsEmpty());
     EXPECT_THAT(members.m_spiFamilies, IsEmpty());
-    EXPECT_THAT(members.m_spiProperties, IsEmpty());
+    EXPECT_THAT(members.m_spiProperties.get(), IsEmpty());
     EXPECT_THAT(session.messages(), IsEmpty());
 }
 

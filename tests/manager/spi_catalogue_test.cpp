@@ -75,7 +75,7 @@ ALPHA_PROPERTY = VENDOR,any
 A1_PROPERTY = SIZE,4:WIDTH,8
 A2_PROPERTY = SIZE,16
 )");
-    EXPECT_THAT(entries(session.members().m_spiProperties),
+    EXPECT_THAT(entries(session.members().m_spiProperties.get()),
                 ElementsAre(Pair("A1SIZE", "4"), Pair("A1WIDTH", "8"), Pair("A2SIZE", "16"),
                             Pair("ALPHAVENDOR", "any")));
     EXPECT_THAT(session.messages(), IsEmpty());
@@ -90,34 +90,34 @@ Alpha_PROPERTY = Vendor,wrong
 A1_PROPERTY = size,4
 a1_PROPERTY = size,wrong
 )");
-    EXPECT_THAT(entries(session.members().m_spiProperties),
+    EXPECT_THAT(entries(session.members().m_spiProperties.get()),
                 ElementsAre(Pair("AlphaVendor", "Any"), Pair("a1size", "4")));
 }
 
 TEST(SpiProperties, LaterEntryOverwrites) {
     SpiSession session("DEVICE_FAMILY = A\nA_PROPERTY = SIZE,4:SIZE,8\n");
-    EXPECT_THAT(entries(session.members().m_spiProperties), ElementsAre(Pair("ASIZE", "8")));
+    EXPECT_THAT(entries(session.members().m_spiProperties.get()), ElementsAre(Pair("ASIZE", "8")));
 }
 
 TEST(SpiProperties, JoinedToTheSameKeyShareAnEntry) {
     SpiSession session("DEVICE_FAMILY = A,AB\nA_PROPERTY = BC,1\nAB_PROPERTY = C,2\n");
-    EXPECT_THAT(entries(session.members().m_spiProperties), ElementsAre(Pair("ABC", "2")));
+    EXPECT_THAT(entries(session.members().m_spiProperties.get()), ElementsAre(Pair("ABC", "2")));
 }
 
 TEST(SpiProperties, OfNamesThatAreNotListedAreNotRead) {
     SpiSession session("DEVICE_FAMILY = A\nB_PROPERTY = SIZE,4\n");
-    EXPECT_THAT(session.members().m_spiProperties, IsEmpty());
+    EXPECT_THAT(session.members().m_spiProperties.get(), IsEmpty());
 }
 
 TEST(SpiProperties, FieldsBehindTheValueAreNotRead) {
     SpiSession session("DEVICE_FAMILY = A\nA_PROPERTY = SIZE,4,8:EMPTY,\n");
-    EXPECT_THAT(entries(session.members().m_spiProperties),
+    EXPECT_THAT(entries(session.members().m_spiProperties.get()),
                 ElementsAre(Pair("AEMPTY", ""), Pair("ASIZE", "4")));
 }
 
 TEST(SpiProperties, MissingValueIsTheEmptyTextDuringTheStartUp) {
     SpiSession session("DEVICE_FAMILY = A,B\nA_PROPERTY = SIZE:WIDTH,8\nB_PROPERTY = SIZE,4\n");
-    EXPECT_THAT(entries(session.members().m_spiProperties),
+    EXPECT_THAT(entries(session.members().m_spiProperties.get()),
                 ElementsAre(Pair("ASIZE", ""), Pair("AWIDTH", "8"), Pair("BSIZE", "4")));
     EXPECT_TRUE(session.members().m_exceptions);
     EXPECT_THAT(session.messages(), IsEmpty());
@@ -125,18 +125,18 @@ TEST(SpiProperties, MissingValueIsTheEmptyTextDuringTheStartUp) {
 
 TEST(SpiProperties, MissingValueRaisesWhileExceptionsAreOn) {
     SpiSession session("DEVICE_FAMILY = A\nA_PROPERTY = WIDTH,8:SIZE:REST,1\n");
-    session.members().m_spiProperties.clear();
+    session.members().m_spiProperties = {};
     EXPECT_EQ(raisedLine<DataMismatchException>(
                   [&] { session.members().readSpiProperties(accessorOf("spi.acd")); }),
               2322);
-    EXPECT_EQ(session.members().m_spiProperties.count(StringBase("AREST")), 0U);
-    EXPECT_EQ(session.members().m_spiProperties.count(StringBase("AWIDTH")), 1U);
+    EXPECT_EQ(session.members().m_spiProperties.get().count(StringBase("AREST")), 0U);
+    EXPECT_EQ(session.members().m_spiProperties.get().count(StringBase("AWIDTH")), 1U);
     EXPECT_THAT(session.messages(), IsEmpty());
 }
 
 TEST(SpiProperties, EmptyEntryIsAPropertyWithoutNameAndValue) {
     SpiSession session("DEVICE_FAMILY = A\nA_PROPERTY = SIZE,4::WIDTH,8\n");
-    EXPECT_THAT(entries(session.members().m_spiProperties),
+    EXPECT_THAT(entries(session.members().m_spiProperties.get()),
                 ElementsAre(Pair("A", ""), Pair("ASIZE", "4"), Pair("AWIDTH", "8")));
 }
 

@@ -25,7 +25,7 @@ void expectBaseLoaded(TarvikTestPeer::Members& members) {
     EXPECT_THAT(texts(members.m_programOptionPackages), ElementsAre("kestrel", "spi"));
     EXPECT_THAT(members.m_bsCables, ElementsAre(TARVIKNS::OUTPUT_TYPE::USB2));
     EXPECT_THAT(texts(members.m_bsDevices), ElementsAre("kestrel"));
-    EXPECT_THAT(entries(members.m_deviceIdcodes), ElementsAre(Pair("KS50", "0x1")));
+    EXPECT_THAT(entries(members.m_deviceIdcodes.get()), ElementsAre(Pair("KS50", "0x1")));
     EXPECT_THAT(texts(members.m_notSupportedPartInMode), ElementsAre("SS_KS50_PQ"));
     EXPECT_EQ(members.m_operationTable.blocks(), 2U);
     EXPECT_EQ(members.m_bsdlOperationTable.blocks(), 2U);
@@ -73,7 +73,7 @@ TEST(StartUp, OptionThatCannotBeReadEndsItBeforeTheMultibootTypes) {
                                                 option + ",SPI,USB2:VERIFY,SPI,USB2\n"}});
         expectBaseLoaded(session.members());
         EXPECT_THAT(texts(session.members().m_spiNames), ElementsAre("FLASH1"));
-        EXPECT_THAT(entries(session.members().m_spiProperties), ElementsAre(Pair("FLASH1SIZE", "4")));
+        EXPECT_THAT(entries(session.members().m_spiProperties.get()), ElementsAre(Pair("FLASH1SIZE", "4")));
         EXPECT_THAT(texts(session.members().m_bpi3Devices), ElementsAre("F"));
         EXPECT_THAT(operationCells(session.members()), ElementsAre(Cell{1, 0, 5, 2}));
         EXPECT_THAT(bsdlOperationCells(session.members()), ElementsAre(Cell{1, 19, 0, 3}));

@@ -11,7 +11,7 @@ namespace reference {
 namespace {
 
 /// A number from 0 to `count` - 1, now and then another one.
-int number(Picker& pick, int count) {
+int number(RandomSource& pick, int count) {
     if (pick.chance(10)) {
         return pick.from(std::vector<int>{-1, count, count + 1, 32, 255, -2147483647 - 1,
                                           std::numeric_limits<int>::max()});
@@ -19,11 +19,11 @@ int number(Picker& pick, int count) {
     return pick.below(count);
 }
 
-std::string changedCase(Picker& pick, const std::string& text) {
+std::string changedCase(RandomSource& pick, const std::string& text) {
     return pick.chance(50) ? upper(text) : lower(text);
 }
 
-std::string device(Picker& pick) {
+std::string device(RandomSource& pick) {
     std::string name;
     switch (pick.below(20)) {
     case 0:
@@ -55,12 +55,12 @@ std::string device(Picker& pick) {
     return name;
 }
 
-std::string word(Picker& pick, const Words& words, const Words& others = words::NOISE) {
+std::string word(RandomSource& pick, const Words& words, const Words& others = words::NOISE) {
     std::string text = pick.chance(8) ? pick.from(others) : pick.from(words);
     return pick.chance(5) ? changedCase(pick, text) : text;
 }
 
-Argument orNull(Picker& pick, int percent, std::string text) {
+Argument orNull(RandomSource& pick, int percent, std::string text) {
     return pick.chance(percent) ? Argument(nullptr) : Argument(std::move(text));
 }
 
@@ -80,7 +80,7 @@ bool isText(Kind kind) {
     }
 }
 
-Argument makeArgument(Picker& pick, Kind kind) {
+Argument makeArgument(RandomSource& pick, Kind kind) {
     constexpr int RARELY = 2;
     if (isText(kind) && pick.chance(6)) {
         return HeldText{static_cast<std::size_t>(pick.below(1000))};
@@ -149,7 +149,7 @@ const std::vector<const Signature*>& weighted() {
 
 } // namespace
 
-Call makeCall(Picker& pick) {
+Call makeCall(RandomSource& pick) {
     const Signature& signature = *pick.from(weighted());
     Call call{signature.method, {}};
     for (const Kind kind : signature.arguments) {

@@ -1,10 +1,10 @@
 #pragma once
 
 #include "Call.h"
-#include "Picker.h"
+#include "RandomSource.h"
 
 namespace reference {
 
-[[nodiscard]] Call makeCall(Picker& pick);
+[[nodiscard]] Call makeCall(RandomSource& pick);
 
 } // namespace reference

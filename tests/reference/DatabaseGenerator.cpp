@@ -13,9 +13,9 @@ namespace {
 /// Writes the values of keys, sound or damaged.
 class ValueWriter {
 public:
-    ValueWriter(Picker& pick, Health health) : m_pick(pick), m_damaged(health == Health::DAMAGED) {}
+    ValueWriter(RandomSource& pick, Health health) : m_pick(pick), m_damaged(health == Health::DAMAGED) {}
 
-    Picker& pick() { return m_pick; }
+    RandomSource& pick() { return m_pick; }
     [[nodiscard]] bool damaged() const { return m_damaged; }
 
     /// A word, or in a damaged database now and then something else.
@@ -132,7 +132,7 @@ private:
         return std::to_string(count);
     }
 
-    Picker& m_pick;
+    RandomSource& m_pick;
     bool m_damaged;
 };
 
@@ -222,14 +222,14 @@ private:
     }
 
     ValueWriter& m_value;
-    Picker& m_pick;
+    RandomSource& m_pick;
     std::string m_text;
     std::string m_lineEnd;
 };
 
 std::string baseFile(ValueWriter& value) {
     FileWriter file(value);
-    Picker& pick = value.pick();
+    RandomSource& pick = value.pick();
     const bool complete = pick.chance(60);
     const std::string all =
         "Mir,kes,pct%%%d,quillfamilyname16,spi,zor_x" + std::string(pick.chance(50) ? ",base" : "");
@@ -313,7 +313,7 @@ std::string spiFile(ValueWriter& value) {
 
 } // namespace
 
-Files makeDatabases(Picker& pick, Health health) {
+Files makeDatabases(RandomSource& pick, Health health) {
     ValueWriter value(pick, health);
     const bool damaged = health == Health::DAMAGED;
     Files files;

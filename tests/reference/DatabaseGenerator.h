@@ -1,7 +1,7 @@
 #pragma once
 
 #include "Call.h"
-#include "Picker.h"
+#include "RandomSource.h"
 
 namespace reference {
 
@@ -11,6 +11,6 @@ enum class Health {
     DAMAGED, ///< unknown words, missing fields, malformed lines, missing files
 };
 
-[[nodiscard]] Files makeDatabases(Picker& pick, Health health);
+[[nodiscard]] Files makeDatabases(RandomSource& pick, Health health);
 
 } // namespace reference

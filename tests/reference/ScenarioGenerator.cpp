@@ -106,7 +106,7 @@ rc::Seq<Scenario> smallerScenarios(const Scenario& scenario) {
 
 rc::Gen<Scenario> scenarios(Health health, std::size_t calls) {
     return [=](const rc::Random& random, int /*size*/) {
-        Picker pick(random);
+        RandomSource pick(random);
         Scenario scenario{makeDatabases(pick, health), {}};
         for (std::size_t count = 0; count < calls; ++count) {
             scenario.calls.push_back(makeCall(pick));

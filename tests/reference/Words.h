@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Picker.h"
+#include "RandomSource.h"
 
 #include <string>
 

@@ -299,8 +299,9 @@ void checkFlashes(const Model& model, Findings& findings) {
         std::vector<Sibling> siblings;
         for (const Token& flash : family.devices) {
             const std::string key = schema::propertyKey(flash.text);
-            siblings.push_back(
-                {model.spiKeys().find(key), names(flash.text), reported.contains(numbers[key])});
+            const auto number = numbers.find(key);
+            siblings.push_back({model.spiKeys().find(key), names(flash.text),
+                                number != numbers.end() && reported.contains(number->second)});
         }
         const bool isClass = schema::isFlashClass(family.family.text);
         checkMissing(siblings, isClass ? names(family.family.text) : std::set<std::string_view>(),

@@ -106,6 +106,10 @@ std::vector<Endings> endings(const std::string& database) {
          {{database, database}},
          {{GOOD, database}},
          {{database}, {database, "/nowhere"}, {"/nowhere", database}}},
+        {"index",
+         {{database}, {"--show", database}},
+         {{"--show", GOOD}},
+         {{}, {"/nowhere"}, {"--show", "/nowhere"}, {"--show", database, database}}},
         {"report", {{"--file", "/dev/null"}}, {}, {{}, {"--file", "/nowhere/page.html"}}},
         {"batch", {{}}, {}, {{"zz"}}},
         {"help", {{}, {"check"}}, {}, {{"zz"}}},
@@ -146,7 +150,7 @@ TEST(ExitStatus, OfEveryCommandWithoutItsDatabase) {
     for (const Endings& each : endings(database.path())) {
         // Two are about the tool itself, and two name their databases.
         if (each.command == "vocabulary" || each.command == "help" || each.command == "diff" ||
-            each.command == "format") {
+            each.command == "format" || each.command == "index") {
             continue;
         }
         Words words = each.command == "lint" ? Words{} : each.yes.front();

@@ -101,6 +101,11 @@ report
 report --file page.html
 report --file -
 report --file nowhere/page.html
+index nowhere
+index --show nowhere
+index --show site
+index site
+index --show site
 --database site:database show KS50
 --database site:database why KS50 --property PINS
 families extra

@@ -12,7 +12,7 @@
 namespace {
 
 using reference::Files;
-using reference::Picker;
+using reference::RandomSource;
 using reference::Words;
 
 /// One line that sets a key, or adds to it.
@@ -33,7 +33,7 @@ bool isBlank(char byte) { return byte == ' ' || byte == '\t'; }
 /// Writes the file of one layer.
 class LayerWriter {
 public:
-    LayerWriter(Picker& pick, const std::vector<std::string>& sections, bool isBottom)
+    LayerWriter(RandomSource& pick, const std::vector<std::string>& sections, bool isBottom)
         : m_pick(pick), m_sections(sections), m_isBottom(isBottom),
           m_lineEnd(pick.chance(30) ? "\r\n" : "\n") {
         if (pick.chance(10)) {
@@ -103,7 +103,7 @@ private:
 
     void line(const std::string& text) { m_text += text + m_lineEnd; }
 
-    Picker& m_pick;
+    RandomSource& m_pick;
     const std::vector<std::string>& m_sections;
     bool m_isBottom;
     std::string m_lineEnd;
@@ -114,7 +114,7 @@ private:
 /// Spreads what one file says over layers.
 class FileRewriter {
 public:
-    FileRewriter(Picker& pick, std::size_t layers) : m_pick(pick), m_layers(layers) {}
+    FileRewriter(RandomSource& pick, std::size_t layers) : m_pick(pick), m_layers(layers) {}
 
     /// @return the texts of the layers, the bottom one first; empty where the layer has no such file
     [[nodiscard]] std::vector<std::string> rewrite(const std::string& text) {
@@ -196,14 +196,14 @@ private:
         return joined;
     }
 
-    Picker& m_pick;
+    RandomSource& m_pick;
     std::vector<std::string> m_sections{""};
     std::vector<std::vector<Queue>> m_layers;
 };
 
 } // namespace
 
-std::vector<Files> rewritten(Picker& pick, const Files& files) {
+std::vector<Files> rewritten(RandomSource& pick, const Files& files) {
     const auto count = static_cast<std::size_t>(1 + pick.below(3));
     std::vector<Files> layers(count);
     std::set<std::string> seen;

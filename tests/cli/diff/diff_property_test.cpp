@@ -17,7 +17,7 @@
 namespace {
 
 using reference::Files;
-using reference::Picker;
+using reference::RandomSource;
 
 /// The layers of a database in directories.
 class Layers {
@@ -44,7 +44,9 @@ void configure() {
     setenv("RC_PARAMS", parameters.c_str(), 1);
 }
 
-Picker anyPicker() { return Picker(rc::Random(*rc::gen::noShrink(rc::gen::arbitrary<std::uint64_t>()))); }
+RandomSource anyRandomSource() {
+    return RandomSource(rc::Random(*rc::gen::noShrink(rc::gen::arbitrary<std::uint64_t>())));
+}
 
 ProcessResult diff(const Layers& before, const Layers& after) {
     return runTool(std::vector<std::string>{"diff", before.path(), after.path()});
@@ -151,7 +153,7 @@ void apply(const Edit& edit, Files& files) {
 TEST(DiffProperty, TellsNothingOfWhatIsWrittenInAnotherWay) {
     configure();
     EXPECT_TRUE(rc::check([] {
-        Picker pick = anyPicker();
+        RandomSource pick = anyRandomSource();
         const Files files = makeDatabases(pick, reference::Health::SOUND);
         const std::vector<Files> layers = rewritten(pick, files);
         const ProcessResult outcome = diff(Layers({files}), Layers(layers));
@@ -164,7 +166,7 @@ TEST(DiffProperty, TellsNothingOfWhatIsWrittenInAnotherWay) {
 TEST(DiffProperty, TellsOneChangeAndNothingElse) {
     configure();
     EXPECT_TRUE(rc::check([] {
-        Picker pick = anyPicker();
+        RandomSource pick = anyRandomSource();
         Files before = makeDatabases(pick, reference::Health::SOUND);
         addProbe(before);
         const Edit& edit = pick.from(edits());

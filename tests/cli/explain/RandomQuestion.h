@@ -2,14 +2,14 @@
 
 #include "explain/Question.h"
 
-#include "reference/Picker.h"
+#include "reference/RandomSource.h"
 #include "reference/Words.h"
 
 #include <string>
 
 namespace reference {
 
-[[nodiscard]] inline std::string randomName(Picker& pick) {
+[[nodiscard]] inline std::string randomName(RandomSource& pick) {
     switch (pick.below(10)) {
     case 0:
         return pick.from(words::FAMILIES);
@@ -26,14 +26,14 @@ namespace reference {
 }
 
 template <typename Type>
-[[nodiscard]] Type below(Picker& pick, int count) {
+[[nodiscard]] Type below(RandomSource& pick, int count) {
     return static_cast<Type>(pick.below(count));
 }
 
 /// A question in words that random databases are made of.
-[[nodiscard]] inline why::Question randomQuestion(Picker& pick) {
-    using Kind = why::Question::Kind;
-    why::Question question;
+[[nodiscard]] inline explanation::Question randomQuestion(RandomSource& pick) {
+    using Kind = explanation::Question::Kind;
+    explanation::Question question;
     question.kind = below<Kind>(pick, 8);
     question.device = randomName(pick);
     // What has a cell comes more often.

@@ -51,19 +51,20 @@ private:
 }
 
 /// The verdict that the records lead to, and the steps there.
-[[nodiscard]] inline why::Explanation explained(const why::Question& question) {
-    return why::explain(question);
+[[nodiscard]] inline explanation::Explanation explained(const explanation::Question& question) {
+    return explanation::explain(question);
 }
 
 /// The answer without colours, in 80 columns.
-[[nodiscard]] inline std::string asPlainText(const why::Answer& answer) {
+[[nodiscard]] inline std::string asPlainText(const explanation::Answer& answer) {
     ::setenv("COLUMNS", "80", 1);
-    return why::asText(answer, Terminal(-1, Terminal::Colours::NEVER));
+    return explanation::asText(answer, Terminal(-1, Terminal::Colours::NEVER));
 }
 
 /// The first step about a topic; an empty one when there is none.
-[[nodiscard]] inline why::Step stepAbout(const std::vector<why::Step>& steps, const std::string& topic) {
-    for (const why::Step& step : steps) {
+[[nodiscard]] inline explanation::Step stepAbout(const std::vector<explanation::Step>& steps,
+                                                 const std::string& topic) {
+    for (const explanation::Step& step : steps) {
         if (step.topic == topic) {
             return step;
         }

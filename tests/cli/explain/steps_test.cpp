@@ -7,9 +7,9 @@
 namespace {
 
 using namespace TARVIKNS;
+using explanation::Conclusion;
+using explanation::Question;
 using testing::HasSubstr;
-using why::Question;
-using why::Verdict;
 using Kind = Question::Kind;
 
 Question about(Kind kind, const std::string& device) {
@@ -31,14 +31,14 @@ Files family(const std::string& keys, const std::string& base = "") {
             {"fam.acd", keys + "\n[D1]\n"}};
 }
 
-std::string place(const why::Step& step) {
+std::string place(const explanation::Step& step) {
     return step.place ? catalogue::asText(step.place->origin) + ": " + step.place->text : "nowhere";
 }
 
 TEST(WhySteps, TheDecidingRecordIsNamedWithItsPlace) {
     const Databases databases(family("# first\nOPERATION = ERASE,Bscan,SVF:PROGRAM,Bscan,SVF,USB2"));
-    const why::Explanation found = explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
-    EXPECT_EQ(found.verdict, Verdict::YES);
+    const explanation::Explanation found = explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
+    EXPECT_EQ(found.verdict, Conclusion::YES);
     EXPECT_EQ(place(stepAbout(found.steps, "record")), "fam.acd:2:29: PROGRAM,Bscan,SVF,USB2");
     EXPECT_EQ(place(stepAbout(found.steps, "table")), "base.acd:1:20: fam");
     EXPECT_EQ(stepAbout(found.steps, "family").text, "fam: section [D1] of fam.acd");
@@ -46,20 +46,20 @@ TEST(WhySteps, TheDecidingRecordIsNamedWithItsPlace) {
 
 TEST(WhySteps, APackageIsTakenOffTheName) {
     const Databases databases(family("OPERATION = PROGRAM,Bscan,USB2"));
-    const why::Explanation found = explained(programming("D1_PQ", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
+    const explanation::Explanation found = explained(programming("D1_PQ", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
     EXPECT_EQ(stepAbout(found.steps, "name").text, "\"D1_PQ\" counts as \"D1\", without its package");
 }
 
 TEST(WhySteps, AnUnknownModeTextCountsAsBoundaryScan) {
     const Databases databases(family("OPERATION = PROGRAM,Parallel,USB2"));
-    const why::Explanation found = explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
-    EXPECT_EQ(found.verdict, Verdict::YES);
+    const explanation::Explanation found = explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
+    EXPECT_EQ(found.verdict, Conclusion::YES);
     EXPECT_EQ(stepAbout(found.steps, "note").text, "\"Parallel\" is no mode, and counts as Boundary Scan");
 }
 
 TEST(WhySteps, BoundaryScanByItsKeyIsNoOddity) {
     const Databases databases(family("OPERATION = PROGRAM,BS,USB2"));
-    const why::Explanation found = explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
+    const explanation::Explanation found = explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
     EXPECT_EQ(stepAbout(found.steps, "note").text, "");
 }
 
@@ -68,21 +68,22 @@ TEST(WhySteps, PromFileFormatterAcceptsEveryOutput) {
     Question question = about(Kind::OUTPUT, "");
     question.mode = MODE_TYPE::PFF;
     question.output = OUTPUT_TYPE::NULLCABLE;
-    const why::Explanation found = explained(question);
-    EXPECT_EQ(found.verdict, Verdict::YES);
+    const explanation::Explanation found = explained(question);
+    EXPECT_EQ(found.verdict, Conclusion::YES);
     EXPECT_THAT(stepAbout(found.steps, "rule").text, HasSubstr("accepts every output"));
 }
 
 TEST(WhySteps, AnOutputWithoutACellAllowsNothing) {
     const Databases databases(family("OPERATION = PROGRAM,Bscan,EXPRESSSVF"));
-    const why::Explanation found = explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::EXPRESSSVF));
-    EXPECT_EQ(found.verdict, Verdict::NO);
+    const explanation::Explanation found =
+        explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::EXPRESSSVF));
+    EXPECT_EQ(found.verdict, Conclusion::NO);
     EXPECT_THAT(stepAbout(found.steps, "rule").text, HasSubstr("EXPRESSSVF has none"));
 }
 
 TEST(WhySteps, AWordWithoutACellIsNotedBesideANo) {
     const Databases databases(family("OPERATION = PROGRAM,Bscan,EXPRESSSVF,usb2"));
-    const why::Explanation found = explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
+    const explanation::Explanation found = explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
     ASSERT_EQ(found.steps.size(), 5U);
     EXPECT_EQ(found.steps[2].text, "the one record for PROGRAM does not allow it in mode BS through USB2");
     EXPECT_EQ(found.steps[3].text, "EXPRESSSVF has no cell in the tables, so its word allows nothing");
@@ -94,8 +95,8 @@ TEST(WhySteps, AnUnknownOutputWordCountsAsNone) {
     const Databases databases(family("", "BS = outs,usb2:fams,fam\n"));
     Question question = about(Kind::OUTPUT, "");
     question.output = OUTPUT_TYPE::NONE;
-    const why::Explanation found = explained(question);
-    EXPECT_EQ(found.verdict, Verdict::YES);
+    const explanation::Explanation found = explained(question);
+    EXPECT_EQ(found.verdict, Conclusion::YES);
     EXPECT_EQ(place(stepAbout(found.steps, "record")), "base.acd:3:11: usb2");
     EXPECT_THAT(stepAbout(found.steps, "note").text, HasSubstr("\"usb2\" is no output"));
 }
@@ -106,8 +107,8 @@ TEST(WhySteps, TheExcludedPartIsNamed) {
     Question question = about(Kind::DEVICE, "D1");
     question.mode = MODE_TYPE::SS;
     question.package = "PQ";
-    const why::Explanation found = explained(question);
-    EXPECT_EQ(found.verdict, Verdict::NO);
+    const explanation::Explanation found = explained(question);
+    EXPECT_EQ(found.verdict, Conclusion::NO);
     EXPECT_EQ(place(stepAbout(found.steps, "record")), "base.acd:4:39: SS_D1_PQ");
 }
 
@@ -115,7 +116,7 @@ TEST(WhySteps, AFamilyThatTheModeLacksIsToldWithThoseItHas) {
     const Databases databases(family("", "SS = outs:fams,one,two\n"));
     Question question = about(Kind::DEVICE, "D1");
     question.mode = MODE_TYPE::SS;
-    const why::Explanation found = explained(question);
+    const explanation::Explanation found = explained(question);
     EXPECT_EQ(stepAbout(found.steps, "absent").text, "mode SS takes the families one, two, not fam");
     EXPECT_EQ(place(stepAbout(found.steps, "absent")), "base.acd:3:11: fams,one,two");
 }
@@ -125,19 +126,19 @@ TEST(WhySteps, ATableOfItsOwnIsNotFoundByANameWithPackage) {
     files["base.acd"] = "DEVICE_SUPPORTED = D1,fam\n";
     files["fam.acd"] = "[D1]\nOPERATION = PROGRAM,Bscan,USB2\n";
     const Databases databases(std::move(files));
-    EXPECT_EQ(explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)).verdict, Verdict::YES);
-    const why::Explanation found = explained(programming("D1_PQ", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
-    EXPECT_EQ(found.verdict, Verdict::NO);
+    EXPECT_EQ(explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)).verdict, Conclusion::YES);
+    const explanation::Explanation found = explained(programming("D1_PQ", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
+    EXPECT_EQ(found.verdict, Conclusion::NO);
     EXPECT_THAT(stepAbout(found.steps, "absent").text, HasSubstr("the whole name \"D1_PQ\""));
 }
 
 TEST(WhySteps, AnUnknownOptionIsAFault) {
     const Databases databases(family("PROGRAM_OPTION = OTP,Bscan,USB2"));
     Question question = about(Kind::OPTION, "D1");
-    const why::Explanation found = explained(question);
-    EXPECT_EQ(found.verdict, Verdict::FAULT);
+    const explanation::Explanation found = explained(question);
+    EXPECT_EQ(found.verdict, Conclusion::FAULT);
     EXPECT_EQ(place(stepAbout(found.steps, "fault")), "fam.acd:1:18: OTP");
-    EXPECT_EQ(why::ask(Databases::freshManager(), question), Verdict::FAULT);
+    EXPECT_EQ(explanation::ask(Databases::freshManager(), question), Conclusion::FAULT);
 }
 
 TEST(WhySteps, AFlashGoesBeforeItsSection) {
@@ -146,8 +147,8 @@ TEST(WhySteps, AFlashGoesBeforeItsSection) {
     const Databases databases(std::move(files));
     Question question = about(Kind::PROPERTY, "D1");
     question.property = "VENDOR";
-    const why::Explanation found = explained(question);
-    EXPECT_EQ(found.verdict, Verdict::YES);
+    const explanation::Explanation found = explained(question);
+    EXPECT_EQ(found.verdict, Conclusion::YES);
     EXPECT_EQ(stepAbout(found.steps, "family").text,
               "\"D1\" is listed as a flash: family spi, before what fam.acd says");
     EXPECT_EQ(place(stepAbout(found.steps, "table")), "spi.acd:2:15: D1");
@@ -159,13 +160,13 @@ TEST(WhySteps, APropertyOfTheFamilyIsToldAsSuch) {
     Question question = about(Kind::PROPERTY, "D1");
     question.property = "COLOURS";
     question.value = "green";
-    const why::Explanation found = explained(question);
+    const explanation::Explanation found = explained(question);
     EXPECT_EQ(stepAbout(found.steps, "absent").text, "COLOURS of the family is blue, red, not green");
 }
 
 TEST(WhySteps, ANoLeadsToTheKeyThatWasConsulted) {
     const Databases databases(family("# first\nOPERATION = ERASE,Bscan,USB2:VERIFY,Bscan,USB2"));
-    const why::Step absent =
+    const explanation::Step absent =
         stepAbout(explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)).steps, "absent");
     EXPECT_EQ(absent.text, "no record of fam names PROGRAM");
     EXPECT_EQ(place(absent), "fam.acd:2:13: ERASE,Bscan,USB2");
@@ -190,8 +191,8 @@ TEST(WhySteps, ThePackageTableIsReadFromTheSectionOfTheDevice) {
     Question question = about(Kind::OPTION, "D1");
     question.option = PROGRAM_OPTION::VERIFY;
     question.package = "PQ";
-    const why::Explanation found = explained(question);
-    EXPECT_EQ(found.verdict, Verdict::YES);
+    const explanation::Explanation found = explained(question);
+    EXPECT_EQ(found.verdict, Conclusion::YES);
     EXPECT_EQ(stepAbout(found.steps, "table").text, "PROGRAM_OPTION of D1PQ, read from [D1]");
 }
 
@@ -202,11 +203,11 @@ TEST(WhySteps, AListedDeviceHidesTheOptionsOfItsPackage) {
     Question question = about(Kind::OPTION, "D1");
     question.option = PROGRAM_OPTION::VERIFY;
     question.package = "PQ";
-    const why::Explanation found = explained(question);
-    EXPECT_EQ(found.verdict, Verdict::NO);
+    const explanation::Explanation found = explained(question);
+    EXPECT_EQ(found.verdict, Conclusion::NO);
     EXPECT_EQ(stepAbout(found.steps, "rule").text,
               "DEVICE_SUPPORTED lists \"D1\", so options are read for \"D1\" alone, and \"D1PQ\" has none");
-    EXPECT_EQ(why::ask(Databases::freshManager(), question), Verdict::NO);
+    EXPECT_EQ(explanation::ask(Databases::freshManager(), question), Conclusion::NO);
 }
 
 TEST(WhySteps, ACountOfZeroHidesTheValuesOfTheFamily) {
@@ -218,9 +219,9 @@ TEST(WhySteps, ACountOfZeroHidesTheValuesOfTheFamily) {
     for (const std::optional<std::string>& value :
          {std::optional<std::string>(), std::optional<std::string>("BS")}) {
         question.value = value;
-        const why::Explanation found = explained(question);
-        EXPECT_EQ(found.verdict, Verdict::NO);
-        EXPECT_EQ(why::ask(Databases::freshManager(), question), Verdict::NO);
+        const explanation::Explanation found = explained(question);
+        EXPECT_EQ(found.verdict, Conclusion::NO);
+        EXPECT_EQ(explanation::ask(Databases::freshManager(), question), Conclusion::NO);
         EXPECT_EQ(place(stepAbout(found.steps, "absent")), "fam.acd:3:14: PROGRAM,0");
         EXPECT_EQ(stepAbout(found.steps, "note").text,
                   "getDeviceStringProperty answers \"BS\": it asks the family once more");
@@ -234,8 +235,8 @@ TEST(WhySteps, APropertyOfTheFamilyMayReplaceThatOfTheDevice) {
     Question question = about(Kind::PROPERTY, "zor_x");
     question.property = "PINS";
     question.value = "7";
-    const why::Explanation found = explained(question);
-    EXPECT_EQ(why::ask(Databases::freshManager(), question), Verdict::YES);
+    const explanation::Explanation found = explained(question);
+    EXPECT_EQ(explanation::ask(Databases::freshManager(), question), Conclusion::YES);
     EXPECT_EQ(place(stepAbout(found.steps, "record")), "zor.acd:1:12: x_PINS,7");
 }
 
@@ -245,14 +246,15 @@ TEST(WhyAlternatives, AllOtherDevicesOfTheFamilyAreCounted) {
               {"fam.acd", "OPERATION = PROGRAM,Bscan,USB2\n[D1]\nOPERATION = ERASE,Bscan,USB2\n"
                           "[D2]\n[D3]\n"}});
     EXPECT_EQ(
-        stepAbout(why::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "differs").text,
+        stepAbout(explanation::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "differs")
+            .text,
         "yes for the other 2 devices of fam");
 }
 
 TEST(WhyAlternatives, TheRecordsThatAllowItElsewhere) {
     const Databases databases(family("OPERATION = PROGRAM,Bscan,PARALLEL,USB2:PROGRAM,SS,SVF"));
-    const std::vector<why::Step> steps =
-        why::alternatives(programming("D1", MODE_TYPE::SM, OUTPUT_TYPE::USB2));
+    const std::vector<explanation::Step> steps =
+        explanation::alternatives(programming("D1", MODE_TYPE::SM, OUTPUT_TYPE::USB2));
     ASSERT_EQ(steps.size(), 2U);
     EXPECT_EQ(steps[0].text, "yes in mode BS through PARALLEL, USB2");
     EXPECT_EQ(place(steps[0]), "fam.acd:1:13: PROGRAM,Bscan,PARALLEL,USB2");
@@ -261,8 +263,8 @@ TEST(WhyAlternatives, TheRecordsThatAllowItElsewhere) {
 
 TEST(WhyAlternatives, WhatElseIsAllowedThere) {
     const Databases databases(family("OPERATION = VERIFY,Bscan,USB2:ERASE,Bscan,USB2"));
-    const std::vector<why::Step> steps =
-        why::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
+    const std::vector<explanation::Step> steps =
+        explanation::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
     ASSERT_EQ(steps.size(), 1U);
     EXPECT_EQ(steps[0].text, "allowed there: VERIFY, ERASE");
 }
@@ -273,7 +275,7 @@ TEST(WhyAlternatives, DevicesOfTheFamilyThatDiffer) {
     Question question = about(Kind::PROPERTY, "D1");
     question.property = "A";
     question.value = "2";
-    EXPECT_EQ(stepAbout(why::alternatives(question), "differs").text, "in family fam, yes for D2");
+    EXPECT_EQ(stepAbout(explanation::alternatives(question), "differs").text, "in family fam, yes for D2");
 }
 
 TEST(WhyAlternatives, ADeviceWithATableOfItsOwnDiffers) {
@@ -282,7 +284,8 @@ TEST(WhyAlternatives, ADeviceWithATableOfItsOwnDiffers) {
     files["fam.acd"] = "[D1]\n[D2]\nOPERATION = PROGRAM,Bscan,USB2\n";
     const Databases databases(std::move(files));
     EXPECT_EQ(
-        stepAbout(why::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "differs").text,
+        stepAbout(explanation::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "differs")
+            .text,
         "in family fam, yes for D2");
 }
 
@@ -294,8 +297,8 @@ TEST(WhyAlternatives, ThePackageThatHasTheOption) {
     Question question = about(Kind::OPTION, "D1");
     question.option = PROGRAM_OPTION::VERIFY;
     question.package = "VS20";
-    EXPECT_EQ(explained(question).verdict, Verdict::NO);
-    EXPECT_EQ(stepAbout(why::alternatives(question), "differs").text, "yes in package PQ");
+    EXPECT_EQ(explained(question).verdict, Conclusion::NO);
+    EXPECT_EQ(stepAbout(explanation::alternatives(question), "differs").text, "yes in package PQ");
 }
 
 TEST(WhyAlternatives, TheFamilyItselfMayDiffer) {
@@ -304,7 +307,8 @@ TEST(WhyAlternatives, TheFamilyItselfMayDiffer) {
     files["fam.acd"] = "OPERATION = PROGRAM,Bscan,USB2\n[D1]\nOPERATION = ERASE,Bscan,USB2\n";
     const Databases databases(std::move(files));
     EXPECT_EQ(
-        stepAbout(why::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "differs").text,
+        stepAbout(explanation::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "differs")
+            .text,
         "in family fam, yes for the family itself");
 }
 
@@ -314,7 +318,8 @@ TEST(WhyAlternatives, SpiModeAnswersWhateverTheDevice) {
     files["spi.acd"] = "OPERATION = PROGRAM,SPI,USB2\n";
     const Databases databases(std::move(files));
     EXPECT_EQ(
-        stepAbout(why::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "instead").text,
+        stepAbout(explanation::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "instead")
+            .text,
         "yes in mode SPI through USB2, whatever the device");
 }
 
@@ -322,13 +327,13 @@ TEST(WhyAlternatives, TheKeyThatWasMeant) {
     const Databases databases(family("PROPERTY = VENDOR,Korvel"));
     Question question = about(Kind::PROPERTY, "D1");
     question.property = "VENDER";
-    EXPECT_EQ(stepAbout(why::alternatives(question), "instead").text, "there is a property VENDOR");
+    EXPECT_EQ(stepAbout(explanation::alternatives(question), "instead").text, "there is a property VENDOR");
 }
 
 TEST(WhyPresentation, StepsReadAsATableWithPlaces) {
     const Databases databases(family("OPERATION = PROGRAM,Bscan,USB2"));
     const Question question = programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2);
-    EXPECT_EQ(asPlainText({question, Verdict::YES, explained(question)}),
+    EXPECT_EQ(asPlainText({question, Conclusion::YES, explained(question)}),
               "yes: PROGRAM of D1 in mode BS through USB2\n"
               "  family    fam: section [D1] of fam.acd\n"
               "  table     OPERATION of fam\n"
@@ -344,9 +349,10 @@ TEST(WhyPresentation, LongTextsAreBrokenAndLongFragmentsCut) {
         words += "word ";
     }
     const std::string fragment = std::string(66, 'x') + "\xC3\xBC" + std::string(9, 'y');
-    why::Explanation explanation{
-        Verdict::NO, {{"absent", words + "end", why::SourceText{fragment, {std::string(60, 'f'), 12, 3}}}}};
-    const std::string text = asPlainText({question, Verdict::NO, explanation});
+    explanation::Explanation explanation{
+        Conclusion::NO,
+        {{"absent", words + "end", explanation::SourceText{fragment, {std::string(60, 'f'), 12, 3}}}}};
+    const std::string text = asPlainText({question, Conclusion::NO, explanation});
     EXPECT_THAT(text, HasSubstr("\n            " + std::string(60, 'f') + ":12:3:\n            "));
     EXPECT_THAT(text, HasSubstr("xxx...\n"));
     EXPECT_THAT(text, testing::Not(HasSubstr("\xC3")));
@@ -355,7 +361,7 @@ TEST(WhyPresentation, LongTextsAreBrokenAndLongFragmentsCut) {
 TEST(WhyPresentation, JsonTellsPlacesAndWhetherTheStepsAgree) {
     const Databases databases(family("OPERATION = PROGRAM,Bscan,USB2"));
     const Question question = programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2);
-    const Json object = why::asJson({question, Verdict::NO, explained(question)});
+    const Json object = explanation::asJson({question, Conclusion::NO, explained(question)});
     EXPECT_EQ(object["allowed"], false);
     EXPECT_EQ(object["agrees"], false);
     EXPECT_EQ(object["steps"][2], (Json{{"topic", "record"},

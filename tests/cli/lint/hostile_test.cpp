@@ -41,7 +41,7 @@ TEST(LintOnHostileDatabases, EndsWithFindings) {
         }
         const ProcessResult outcome = lint(files, {"--format", "sarif"});
         ASSERT_EQ(outcome.status, 1) << outcome.error;
-        EXPECT_TRUE(nlohmann::json::accept(outcome.output));
+        EXPECT_TRUE(nlohmann::json::accept(outcome.output)) << outcome.error;
     }
 }
 

@@ -4,7 +4,7 @@
 #include "cli/support/ToolProcess.h"
 
 #include "reference/DatabaseGenerator.h"
-#include "reference/Picker.h"
+#include "reference/RandomSource.h"
 
 #include <gtest/gtest.h>
 
@@ -14,7 +14,7 @@ namespace {
 
 using nlohmann::json;
 using reference::Health;
-using reference::Picker;
+using reference::RandomSource;
 
 json sorted(json list) {
     std::sort(list.begin(), list.end());
@@ -73,7 +73,7 @@ TEST(ReportAgreement, OverTheDemonstration) {
 
 void expectAgreementOverRandomDatabases(Health health, std::uint64_t seed) {
     for (std::uint64_t number = 0; number < 20 && !testing::Test::HasFailure(); ++number) {
-        Picker pick(rc::Random(seed + number));
+        RandomSource pick(rc::Random(seed + number));
         const DatabaseDirectory directory(reference::makeDatabases(pick, health));
         expectAgreement({"--database", directory.path()});
     }

@@ -1,5 +1,7 @@
 #include "DatabaseFixtures.h"
 
+#include "support/Sanitizers.h"
+
 #include <algorithm>
 
 #include <sys/resource.h>
@@ -210,17 +212,6 @@ TEST_F(Files, OneOverAGibibyteIsUnreadable) {
     write("bad.acd", "KEY = a\n");
     std::filesystem::resize_file(directory.path("bad.acd"), (std::uintmax_t{1} << 30) + 1);
     expectUnreadable("bad.acd", "larger than 1 GiB");
-}
-
-/// Sanitizers need descriptors of their own to look at an object.
-constexpr bool isSanitized() {
-#if defined(__SANITIZE_ADDRESS__)
-    return true;
-#elif defined(__has_feature)
-    return __has_feature(address_sanitizer);
-#else
-    return false;
-#endif
 }
 
 TEST_F(Files, OneForWhichNoDescriptorIsLeftIsUnreadable) {

@@ -7,7 +7,7 @@
 #include <array>
 #include <cstddef>
 
-namespace vocabulary {
+namespace wordTables {
 
 struct Mode {
     TARVIKNS::MODE_TYPE value;
@@ -168,4 +168,4 @@ const char* outputDisplayName(TARVIKNS::OUTPUT_TYPE output) noexcept;
 inline const char* lastModeName = "";
 inline const char* lastOutputName = "";
 
-} // namespace vocabulary
+} // namespace wordTables

@@ -11,9 +11,9 @@ namespace reference {
 using Words = std::vector<std::string>;
 
 /// Makes choices from one stream of random numbers.
-class Picker {
+class RandomSource {
 public:
-    explicit Picker(const rc::Random& random) : m_random(random) {}
+    explicit RandomSource(const rc::Random& random) : m_random(random) {}
 
     /// From 0 to `count` - 1.
     [[nodiscard]] int below(int count) {

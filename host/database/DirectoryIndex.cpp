@@ -1,0 +1,74 @@
+#include "database/DirectoryIndex.h"
+
+#include <algorithm>
+#include <utility>
+
+// Reads the index of a directory and decides whether it can be trusted. Every doubt means that it is not used: a stale
+// index would give wrong answers, no index only costs time.
+
+namespace acd {
+
+namespace {
+
+/// The largest index that is read: ten times what the largest database needs.
+constexpr std::size_t MAX_INDEX_SIZE = std::size_t{256} << 20;
+
+} // namespace
+
+std::optional<DirectoryIndex> DirectoryIndex::read(const std::string& directory) {
+    try {
+        FileSource source(directory + '/' + indexFormat::FILE_NAME);
+        if (source.expectedSize() > MAX_INDEX_SIZE) {
+            return std::nullopt;
+        }
+        const Text text = readAll(source);
+        return decode({text.bytes.get(), text.size});
+    } catch (const ReadError&) {
+        return std::nullopt;
+    }
+}
+
+std::optional<DirectoryIndex> DirectoryIndex::decode(std::string_view bytes) {
+    std::uint32_t checksum = 0;
+    if (!bytes.starts_with(indexFormat::SIGNATURE) ||
+        bytes.size() < indexFormat::SIGNATURE.size() + sizeof checksum) {
+        return std::nullopt;
+    }
+    const std::string_view covered = bytes.substr(0, bytes.size() - sizeof checksum);
+    indexFormat::Reader(bytes.substr(covered.size())).number(checksum);
+    if (checksum != indexFormat::checksum(covered)) {
+        return std::nullopt;
+    }
+    DirectoryIndex index;
+    indexFormat::Reader reader(covered.substr(indexFormat::SIGNATURE.size()));
+    indexFormat::transfer(reader, index.m_contents);
+    if (!reader.isValid() || !reader.isAtEnd()) {
+        return std::nullopt;
+    }
+    return index;
+}
+
+bool DirectoryIndex::isCurrent(const std::string& directory, std::span<const std::string_view> names) const {
+    if (!std::ranges::equal(m_contents.files, names, {}, &IndexedFile::name)) {
+        return false;
+    }
+    try {
+        const DirectoryStatus status(directory);
+        return std::ranges::all_of(m_contents.files, [&status](const IndexedFile& file) {
+            return status.ofReadableFile(file.name) == file.status;
+        });
+    } catch (const ReadError&) {
+        return false;
+    }
+}
+
+const PackedStrings* DirectoryIndex::sections(std::string_view fileName) const noexcept {
+    const auto file = std::ranges::lower_bound(
+        m_contents.files, fileName, {}, [](const IndexedFile& each) { return std::string_view(each.name); });
+    if (file == m_contents.files.end() || file->name != fileName || !m_contents.isSettled(*file)) {
+        return nullptr;
+    }
+    return &file->sections;
+}
+
+} // namespace acd
