@@ -28,7 +28,7 @@ std::uint64_t setting(const char* name, std::uint64_t usual) {
 }
 
 /// Loses a piece of a line somewhere, or doubles one.
-void mutate(reference::Picker& pick, Files& files) {
+void mutate(reference::RandomSource& pick, Files& files) {
     auto file = std::next(files.begin(), pick.below(static_cast<int>(files.size())));
     std::string& text = file->second;
     const auto at = static_cast<std::size_t>(pick.below(static_cast<int>(text.size()) + 1));
@@ -86,7 +86,7 @@ bool loses(const Facts& before, const Facts& after) {
 
 TEST(Losses, AreAnswersThatTheNewDatabaseDoesNotGive) {
     const std::uint64_t seed = setting("TARVIK_PROPERTY_SEED", 1);
-    reference::Picker pick{rc::Random(seed)};
+    reference::RandomSource pick{rc::Random(seed)};
     std::size_t losing = 0;
     std::size_t gaining = 0;
     for (std::uint64_t i = setting("TARVIK_PROPERTY_DATABASES", 40); i > 0 && !HasFailure(); --i) {

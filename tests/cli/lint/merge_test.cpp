@@ -64,7 +64,7 @@ bool compare(const std::string& name, std::string_view key, const lint::Value& v
 } // namespace
 
 TEST(LintModel, HasTheValuesThatTheReadersGive) {
-    reference::Picker pick(rc::Random(7));
+    reference::RandomSource pick(rc::Random(7));
     std::size_t compared = 0;
     for (int round = 0; round < 60; ++round) {
         std::deque<DatabaseDirectory> layers;
