@@ -29,9 +29,11 @@ public:
         char* end = reserve(sizeof lengths + owner.size() + name.size() + value.size());
         std::memcpy(end, &lengths, sizeof lengths);
         end += sizeof lengths;
-        for (const std::string_view text : {owner, name, value}) {
-            end += text.copy(end, text.size());
+        end += owner.copy(end, owner.size());
+        if (!name.empty()) {
+            end += name.copy(end, name.size());
         }
+        value.copy(end, value.size());
     }
 
     /// Sorts the log into the map, unless that was done before. If memory runs out, the next call does it again.

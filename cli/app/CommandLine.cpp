@@ -40,6 +40,9 @@ CommandLine::CommandLine() {
         {.name = "--verbose",
          .description = "Show the manager's debug messages, too",
          .target = &settings.verbose},
+        {.name = "--literal",
+         .description = "Pass device and package names to the manager exactly as typed",
+         .target = &settings.literal},
         {.name = "--color",
          .value = "WHEN",
          .description = "Use colours (auto: on a terminal, unless NO_COLOR is set)",
@@ -48,8 +51,8 @@ CommandLine::CommandLine() {
          .target = &colours},
     };
     groups = {
-        {"Devices", declared({&command::DEVICES, &command::FAMILIES, &command::VOCABULARY, &command::SHOW,
-                              &command::SPI, &command::REPORT})},
+        {"Devices", declared({&command::DEVICES, &command::IDENTIFY, &command::FAMILIES, &command::VOCABULARY,
+                              &command::SHOW, &command::SPI, &command::REPORT})},
         {"Questions", declared({&command::CHECK, &command::OPERATIONS, &command::OPTIONS, &command::BSDL,
                                 &command::OPERATION_OPTIONS, &command::PROPERTY, &command::MULTIBOOT,
                                 &command::WHY, &command::WHICH})},

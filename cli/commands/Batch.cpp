@@ -20,8 +20,8 @@ std::string memberName(const Argument& argument) {
 Json description(const Command& command, const ArgumentList& list) {
     Json arguments = Json::array();
     for (const Argument& argument : list) {
-        arguments.push_back(
-            {{"name", memberName(argument)}, {"type", argument.required ? "text" : "text or null"}});
+        const char* const type = argument.isFlag() ? "boolean" : argument.required ? "text" : "text or null";
+        arguments.push_back({{"name", memberName(argument)}, {"type", type}});
     }
     return {{"call", command.name}, {"args", arguments}, {"result", "object"}};
 }
@@ -32,6 +32,10 @@ bool store(const Argument& argument, const Json& value) {
     const auto* const text = std::get_if<std::string*>(&argument.target);
     if (optional != nullptr && (value.is_null() || value.is_string())) {
         **optional = value.is_null() ? std::nullopt : std::optional(value.get<std::string>());
+        return true;
+    }
+    if (argument.isFlag() && value.is_boolean()) {
+        *std::get<bool*>(argument.target) = value.get<bool>();
         return true;
     }
     if (text != nullptr && value.is_string()) {

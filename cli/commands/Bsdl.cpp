@@ -3,6 +3,7 @@
 
 #include "commands/CommonArguments.h"
 #include "commands/MaskMembers.h"
+#include "query/AskedDevice.h"
 
 #include <tarvik/ConstraintsManager.h>
 
@@ -17,10 +18,12 @@ struct Arguments {
 
 ExitCode run(Tool& tool, const Arguments& arguments) {
     const TARVIKNS::OUTPUT_TYPE output = vocabulary::readOutput(arguments.output);
-    ConstraintsManager& manager = tool.manager();
-    const int mask = manager.getBsdlOperations(arguments.device.c_str(), output);
-    Json asked{{"device", arguments.device}, {"output", vocabulary::key(output)}};
-    return showMembers(tool, operationMembers(manager, arguments.device, std::move(asked), mask));
+    const std::string device = askedDevice(tool, arguments.device).name;
+    Json asked{{"device", device}, {"output", vocabulary::key(output)}};
+    const auto ask = [&](ConstraintsManager& manager) {
+        return manager.getBsdlOperations(device.c_str(), output);
+    };
+    return showMembers(tool, {device, std::move(asked), "operations", ask, addOperations});
 }
 
 Action declare(ArgumentList& list) {

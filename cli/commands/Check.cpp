@@ -1,132 +1,89 @@
-// `check`: may it be done? Answered by exactly the one check of the manager that takes what was given.
+// `check`: may it be done? Answered by exactly the check of the manager that takes what was given, or by several.
 #include "commands/Commands.h"
 
 #include "commands/CommonArguments.h"
-#include "model/Catalogue.h"
+#include "commands/QuestionArguments.h"
 #include "model/Vocabulary.h"
+#include "query/ApplicationFault.h"
+#include "query/ManagerQueries.h"
 #include "query/Tool.h"
 #include "term/Verdict.h"
 
 #include <tarvik/ConstraintsManager.h>
 
-#include <fmt/format.h>
-
 #include <memory>
-#include <optional>
 
 namespace {
 
-using TARVIKNS::MODE_TYPE;
-using TARVIKNS::OP_TYPE;
-using TARVIKNS::OUTPUT_TYPE;
+using explanation::Question;
 
-struct Arguments {
-    std::optional<std::string> device;
-    std::string mode;
-    std::optional<std::string> output;
-    std::optional<std::string> package;
-    std::optional<std::string> operation;
+/// The answer, with those to the parts of a complete question.
+struct Answer {
+    const AskedQuestion& asked;
+    bool isAllowed = true;
+    std::vector<Verdict> parts{};
 };
 
-/// The arguments, read.
-struct Question {
-    const std::optional<std::string>& device;
-    MODE_TYPE mode;
-    std::optional<OUTPUT_TYPE> output;
-    const std::optional<std::string>& package;
-    std::optional<OP_TYPE> operation;
-};
-
-Question read(const Arguments& arguments) {
-    Question question{arguments.device, vocabulary::readMode(arguments.mode), {}, arguments.package, {}};
-    if (arguments.output) {
-        question.output = vocabulary::readOutput(*arguments.output);
+std::string asText(const Answer& answer, const Terminal& terminal) {
+    std::string text =
+        asText(Verdict{answer.isAllowed, explanation::inWords(answer.asked.question), {}}, terminal);
+    for (const Verdict& part : answer.parts) {
+        text += "  " + asText(part, terminal);
     }
-    if (arguments.operation) {
-        question.operation = vocabulary::readOperation(*arguments.operation);
-    }
-    return question;
+    return text;
 }
 
-const char* textOrNull(const std::optional<std::string>& text) { return text ? text->c_str() : nullptr; }
-
-/// Is there a check that takes just these?
-void requireCheck(const Question& question) {
-    const bool possible = question.device ? !question.operation || !question.package
-                                          : question.output && !question.operation && !question.package;
-    if (possible) {
-        return;
+Json asJson(const Answer& answer) {
+    const Question& question = answer.asked.question;
+    const Json asked = explanation::inJson(question);
+    Json object{{"allowed", answer.isAllowed}};
+    for (const char* const member : {"device", "mode", "output", "package", "operation"}) {
+        object[member] = asked.value(member, Json());
     }
-    throw CommandError(ExitCode::FAULT, "check takes one of these:\n"
-                                        "  --mode M --output O\n"
-                                        "  DEVICE --mode M [--package P]\n"
-                                        "  DEVICE --mode M --output O [--package P]\n"
-                                        "  DEVICE --mode M --output O --operation OP\n"
-                                        "  DEVICE --mode M --operation OP");
+    if (!answer.parts.empty()) {
+        object["parts"] = Json::array();
+        for (const Verdict& part : answer.parts) {
+            object["parts"].push_back(asJson(part));
+        }
+    }
+    object["skipped"] = answer.asked.skipped;
+    return object;
 }
 
-/// The one check that takes what was given.
-bool ask(ConstraintsManager& manager, const Question& question) {
-    const auto& [device, mode, output, package, operation] = question;
-    if (!device) {
-        return manager.checkConstraints(mode, output.value());
+Answer ask(ConstraintsManager& manager, const AskedQuestion& asked) {
+    const std::vector<Question> parts = explanation::partsOf(asked.question);
+    if (parts.empty()) {
+        return {asked, explanation::isAllowed(manager, asked.question)};
     }
-    if (operation) {
-        return output ? manager.checkConstraints(mode, *output, device->c_str(), *operation, nullptr)
-                      : manager.checkConstraints(device->c_str(), mode, *operation, nullptr);
+    Answer answer{asked};
+    for (const Question& part : parts) {
+        const bool isAllowed = explanation::isAllowed(manager, part);
+        answer.isAllowed = answer.isAllowed && isAllowed;
+        answer.parts.push_back({isAllowed, explanation::inWords(part), explanation::inJson(part)});
     }
-    return output ? manager.checkConstraints(mode, *output, device->c_str(), textOrNull(package))
-                  : manager.checkConstraints(mode, device->c_str(), textOrNull(package));
+    return answer;
 }
 
-std::string inWords(const Question& question) {
-    std::string words;
-    if (question.operation) {
-        words += vocabulary::key(*question.operation) + " of ";
+ExitCode run(Tool& tool, const QuestionArguments& arguments) {
+    const AskedQuestion asked = readQuestion(tool, arguments, QuestionScope::CHECKS, "check");
+    const Answer answer = ask(tool.manager(), asked);
+    if (arguments.device) {
+        questions::requireKnown(tool, asked.question.device);
     }
-    if (question.device) {
-        words += *question.device;
-        words += question.package ? " in package " + *question.package : "";
-        words += " in ";
-    }
-    words += "mode " + vocabulary::key(question.mode);
-    if (question.output) {
-        words += " through " + vocabulary::key(*question.output);
-    }
-    return words;
-}
-
-template <typename Type>
-Json keyOrNull(const std::optional<Type>& value) {
-    return value ? Json(vocabulary::key(*value)) : Json();
-}
-
-Json jsonOrNull(const std::optional<std::string>& text) { return text ? Json(*text) : Json(); }
-
-Json inJson(const Question& question) {
-    return {{"device", jsonOrNull(question.device)},
-            {"mode", vocabulary::key(question.mode)},
-            {"output", keyOrNull(question.output)},
-            {"package", jsonOrNull(question.package)},
-            {"operation", keyOrNull(question.operation)}};
-}
-
-ExitCode run(Tool& tool, const Arguments& arguments) {
-    const Question question = read(arguments);
-    requireCheck(question);
-    ConstraintsManager& manager = tool.manager();
-    const bool allowed = ask(manager, question);
-    const bool known = !question.device || manager.isKorvelDevice(question.device->c_str());
-    const ExitCode status = tool.answer(Verdict{allowed, inWords(question), inJson(question)},
-                                        allowed ? ExitCode::YES : ExitCode::NO);
-    if (!known) {
-        tool.note(catalogue::unknownDevice(*question.device).what());
+    const auto inWords = [](bool isAllowed) { return isAllowed ? "yes" : "no"; };
+    noteApplicationFault(
+        tool,
+        [&](ConstraintsManager& manager) { return inWords(explanation::isAllowed(manager, asked.question)); },
+        inWords(answer.isAllowed));
+    const ExitCode status = tool.answer(answer, answer.isAllowed ? ExitCode::YES : ExitCode::NO);
+    for (const std::string& check : asked.skipped) {
+        tool.note(check);
     }
     return status;
 }
 
 Action declare(ArgumentList& list) {
-    auto arguments = std::make_shared<Arguments>();
+    auto arguments = std::make_shared<QuestionArguments>();
     list = {
         argument::device(&arguments->device, false),
         argument::mode(&arguments->mode),
@@ -142,9 +99,12 @@ Action declare(ArgumentList& list) {
 const Command command::CHECK{
     "check",
     "Check whether something is allowed",
-    "",
+    "With device, mode, output, package and operation, it checks all of it and shows the verdict of each "
+    "part. With "
+    "fewer of them it asks the one check that takes what is given, and notes what that check leaves out.",
     "tarvik check --mode BS --output USB2\n"
     "tarvik check KS50 --mode SS --package TQ144\n"
-    "tarvik check KS50 --mode BS --output USB2 --operation VERIFY",
+    "tarvik check KS50 --mode BS --output USB2 --operation VERIFY\n"
+    "tarvik check KS50 --mode BS --output USB2 --package TQ144 --operation VERIFY",
     declare,
 };

@@ -13,6 +13,7 @@ extern const Command DIFF;
 extern const Command DUMP;
 extern const Command FAMILIES;
 extern const Command FORMAT;
+extern const Command IDENTIFY;
 extern const Command INDEX;
 extern const Command LINT;
 extern const Command MULTIBOOT;

@@ -2,6 +2,7 @@
 #include "commands/Commands.h"
 
 #include "model/Catalogue.h"
+#include "model/IdcodePattern.h"
 #include "model/Idcodes.h"
 #include "query/Tool.h"
 #include "term/Table.h"
@@ -60,8 +61,20 @@ Json asJson(const Devices& devices) {
     return {{"devices", list}};
 }
 
-bool matches(const std::string& glob, const std::string& name) {
-    return glob.empty() || ::fnmatch(glob.c_str(), name.c_str(), FNM_CASEFOLD) == 0;
+/// Does the device have the name, or the IDCODE, that is searched for?
+bool matches(const std::string& glob, const Device& device) {
+    const auto isLike = [&](const std::string& text) {
+        return ::fnmatch(glob.c_str(), text.c_str(), FNM_CASEFOLD) == 0;
+    };
+    if (glob.empty() || isLike(device.name)) {
+        return true;
+    }
+    if (!device.idcode) {
+        return false;
+    }
+    const std::optional<IdcodePattern> wanted = readIdcode(glob);
+    const std::optional<IdcodePattern> own = readIdcode(device.idcode->value);
+    return wanted && own ? wanted->matches(*own) : isLike(device.idcode->value);
 }
 
 /// The names that the family filter leaves, each once: the first family that has a device is the one that
@@ -92,9 +105,10 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     const IdcodeFinder idcodes(manager);
     Devices devices{{}, arguments.namesOnly};
     for (const std::string& name : deviceNames(arguments.family)) {
-        if (matches(arguments.glob, name)) {
-            devices.all.push_back(
-                {name, toStdString(manager.getPartFamily(name.c_str())), idcodes.find(name)});
+        Device device{name, {}, idcodes.find(name)};
+        if (matches(arguments.glob, device)) {
+            device.family = toStdString(manager.getPartFamily(name.c_str()));
+            devices.all.push_back(std::move(device));
         }
     }
     if (devices.all.empty()) {
@@ -118,7 +132,8 @@ Action declare(ArgumentList& list) {
          .description = "Show only the names, one per line",
          .target = &arguments->namesOnly},
         {.name = "GLOB",
-         .description = "List only the devices whose name matches, in any case; *, ? and [...] are wildcards",
+         .description =
+             "List only the devices whose name or IDCODE matches, in any case; *, ? and [...] are wildcards",
          .kind = ValueKind::DEVICE,
          .target = &arguments->glob},
     };
@@ -132,6 +147,7 @@ const Command command::DEVICES{
     "List devices with family and IDCODE",
     "",
     "tarvik devices --family kestrel\n"
-    "tarvik devices 'ks*'",
+    "tarvik devices 'ks*'\n"
+    "tarvik devices 0x14104FB7",
     declare,
 };

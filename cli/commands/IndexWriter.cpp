@@ -2,7 +2,7 @@
 #include "commands/IndexWriter.h"
 
 #include "database/IndexMaintenance.h"
-#include "report/AtomicFile.h"
+#include "term/AtomicFile.h"
 #include "term/ExitCode.h"
 
 #include <fmt/format.h>
@@ -45,7 +45,7 @@ acd::IndexContents writeIndex(const std::string& directory) {
         // Before any file is read: what changes from here on is as young as the index.
         const acd::FileStatus now = probe(directory);
         acd::IndexContents contents = acd::describeDirectory(directory, now.device, now.changed);
-        report::writeFile(indexPath(directory), acd::indexFormat::encode(contents));
+        writeFile(indexPath(directory), acd::indexFormat::encode(contents));
         return contents;
     } catch (const acd::ReadError& unreadable) {
         throw CommandError(ExitCode::FAULT,

@@ -1,11 +1,15 @@
 #pragma once
 
 #include "model/Vocabulary.h"
+#include "query/ApplicationFault.h"
 #include "query/ManagerQueries.h"
 #include "query/Tool.h"
 #include "term/Table.h"
 
 #include <fmt/format.h>
+#include <fmt/ranges.h>
+
+#include <functional>
 
 /// The names of the members of a mask: the answer of `operations`, `options` and `bsdl`.
 struct MaskMembers {
@@ -37,15 +41,27 @@ struct MaskMembers {
 }
 
 /// The operations of a mask, by key and display name.
-[[nodiscard]] inline MaskMembers operationMembers(const ConstraintsManager& manager, std::string device,
-                                                  Json asked, int mask) {
-    MaskMembers members{std::move(device), std::move(asked), "operations", mask, {}, {}};
-    for (const TARVIKNS::OP_TYPE operation : questions::operations(manager, mask)) {
+inline void addOperations(const ConstraintsManager& manager, MaskMembers& members) {
+    for (const TARVIKNS::OP_TYPE operation : questions::operations(manager, members.mask)) {
         members.keys.push_back(vocabulary::key(operation));
         members.names.push_back(vocabulary::displayName(operation));
     }
-    return members;
 }
+
+inline void addOptions(const ConstraintsManager& manager, MaskMembers& members) {
+    for (const TARVIKNS::PROGRAM_OPTION option : questions::options(manager, members.mask)) {
+        members.keys.push_back(vocabulary::key(option));
+    }
+}
+
+/// A question that is answered by a mask.
+struct MaskQuestion {
+    std::string device;
+    Json asked;
+    const char* kind;
+    std::function<int(ConstraintsManager&)> ask;
+    void (*addMembers)(const ConstraintsManager& manager, MaskMembers& members);
+};
 
 /// " in mode SS through SVF"
 [[nodiscard]] inline std::string circumstances(const Json& asked) {
@@ -56,9 +72,21 @@ struct MaskMembers {
     return text + " through " + asked["output"].get<std::string>();
 }
 
-/// Shows the members. An empty answer is a no, with a note so that it is not taken for a failure.
-[[nodiscard]] inline ExitCode showMembers(Tool& tool, const MaskMembers& members) {
-    questions::requireKnown(tool.manager(), members.device);
+/// Asks the question, and shows the members. An empty answer is a no, with a note so that it is not taken for a
+/// failure.
+[[nodiscard]] inline ExitCode showMembers(Tool& tool, const MaskQuestion& question) {
+    const auto membersOf = [&](ConstraintsManager& manager) {
+        MaskMembers members{question.device, question.asked, question.kind, question.ask(manager), {}, {}};
+        question.addMembers(manager, members);
+        return members;
+    };
+    const auto inWords = [](const MaskMembers& members) {
+        return members.keys.empty() ? "nothing" : fmt::format("{}", fmt::join(members.keys, ", "));
+    };
+    const MaskMembers members = membersOf(tool.manager());
+    questions::requireKnown(tool, members.device);
+    noteApplicationFault(
+        tool, [&](ConstraintsManager& manager) { return inWords(membersOf(manager)); }, inWords(members));
     const ExitCode status = tool.answer(members, members.keys.empty() ? ExitCode::NO : ExitCode::YES);
     if (members.keys.empty()) {
         tool.note(

@@ -3,12 +3,15 @@
 
 #include "commands/CommonArguments.h"
 #include "model/Vocabulary.h"
+#include "query/ApplicationFault.h"
+#include "query/AskedDevice.h"
 #include "query/ManagerQueries.h"
 #include "query/Tool.h"
 
 #include <tarvik/ConstraintsManager.h>
 
 #include <fmt/format.h>
+#include <fmt/ranges.h>
 
 #include <memory>
 
@@ -46,17 +49,25 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     const TARVIKNS::MODE_TYPE mode = vocabulary::readMode(arguments.mode);
     // Properties are named by the key of an operation, not by the text that was given.
     const std::string& operation = vocabulary::key(vocabulary::readOperation(arguments.operation));
-    ConstraintsManager& manager = tool.manager();
-    OperationOptions answer{arguments.device, operation, vocabulary::key(mode), {}};
-    for (const StringBase& option :
-         manager.getDeviceOperationOptions(arguments.device.c_str(), operation.c_str(), mode)) {
-        answer.options.push_back(toStdString(option));
-    }
-    questions::requireKnown(manager, arguments.device);
+    const std::string device = askedDevice(tool, arguments.device).name;
+    const auto ask = [&](ConstraintsManager& manager) {
+        std::vector<std::string> options;
+        for (const StringBase& option :
+             manager.getDeviceOperationOptions(device.c_str(), operation.c_str(), mode)) {
+            options.push_back(toStdString(option));
+        }
+        return options;
+    };
+    const auto inWords = [](const std::vector<std::string>& options) {
+        return options.empty() ? "nothing" : fmt::format("{}", fmt::join(options, ", "));
+    };
+    const OperationOptions answer{device, operation, vocabulary::key(mode), ask(tool.manager())};
+    questions::requireKnown(tool, device);
+    noteApplicationFault(
+        tool, [&](ConstraintsManager& manager) { return inWords(ask(manager)); }, inWords(answer.options));
     const ExitCode status = tool.answer(answer, answer.options.empty() ? ExitCode::NO : ExitCode::YES);
     if (answer.options.empty()) {
-        tool.note(
-            fmt::format("{} of {} has no options in mode {}", operation, arguments.device, answer.mode));
+        tool.note(fmt::format("{} of {} has no options in mode {}", operation, device, answer.mode));
     }
     return status;
 }

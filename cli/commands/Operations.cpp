@@ -3,6 +3,7 @@
 
 #include "commands/CommonArguments.h"
 #include "commands/MaskMembers.h"
+#include "query/AskedDevice.h"
 
 #include <tarvik/ConstraintsManager.h>
 
@@ -19,11 +20,12 @@ struct Arguments {
 ExitCode run(Tool& tool, const Arguments& arguments) {
     const TARVIKNS::MODE_TYPE mode = vocabulary::readMode(arguments.mode);
     const TARVIKNS::OUTPUT_TYPE output = vocabulary::readOutput(arguments.output);
-    ConstraintsManager& manager = tool.manager();
-    const int mask = manager.getDeviceOperations(arguments.device.c_str(), mode, output);
-    Json asked{
-        {"device", arguments.device}, {"mode", vocabulary::key(mode)}, {"output", vocabulary::key(output)}};
-    return showMembers(tool, operationMembers(manager, arguments.device, std::move(asked), mask));
+    const std::string device = askedDevice(tool, arguments.device).name;
+    Json asked{{"device", device}, {"mode", vocabulary::key(mode)}, {"output", vocabulary::key(output)}};
+    const auto ask = [&](ConstraintsManager& manager) {
+        return manager.getDeviceOperations(device.c_str(), mode, output);
+    };
+    return showMembers(tool, {device, std::move(asked), "operations", ask, addOperations});
 }
 
 Action declare(ArgumentList& list) {

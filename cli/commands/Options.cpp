@@ -3,6 +3,7 @@
 
 #include "commands/CommonArguments.h"
 #include "commands/MaskMembers.h"
+#include "query/AskedDevice.h"
 
 #include <tarvik/ConstraintsManager.h>
 
@@ -20,18 +21,16 @@ struct Arguments {
 ExitCode run(Tool& tool, const Arguments& arguments) {
     const TARVIKNS::MODE_TYPE mode = vocabulary::readMode(arguments.mode);
     const TARVIKNS::OUTPUT_TYPE output = vocabulary::readOutput(arguments.output);
-    const char* const package = arguments.package ? arguments.package->c_str() : nullptr;
-    ConstraintsManager& manager = tool.manager();
-    const int mask = manager.getProgramOptions(arguments.device.c_str(), mode, output, package);
-    Json asked{{"device", arguments.device},
+    const AskedDevice device = askedDevice(tool, arguments.device, arguments.package, PackageUse::TAKEN);
+    const char* const package = device.package ? device.package->c_str() : nullptr;
+    Json asked{{"device", device.name},
                {"mode", vocabulary::key(mode)},
                {"output", vocabulary::key(output)},
-               {"package", arguments.package ? Json(*arguments.package) : Json()}};
-    MaskMembers members{arguments.device, std::move(asked), "options", mask, {}, {}};
-    for (const TARVIKNS::PROGRAM_OPTION option : questions::options(manager, mask)) {
-        members.keys.push_back(vocabulary::key(option));
-    }
-    return showMembers(tool, members);
+               {"package", device.package ? Json(*device.package) : Json()}};
+    const auto ask = [&](ConstraintsManager& manager) {
+        return manager.getProgramOptions(device.name.c_str(), mode, output, package);
+    };
+    return showMembers(tool, {device.name, std::move(asked), "options", ask, addOptions});
 }
 
 Action declare(ArgumentList& list) {

@@ -2,11 +2,16 @@
 #include "commands/Commands.h"
 
 #include "commands/CommonArguments.h"
+#include "query/ApplicationFault.h"
+#include "query/AskedDevice.h"
 #include "query/ManagerQueries.h"
 #include "query/Properties.h"
 #include "query/Tool.h"
 
 #include <tarvik/ConstraintsManager.h>
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
 
 #include <memory>
 
@@ -35,11 +40,20 @@ std::vector<std::string> values(ConstraintsManager& manager, const char* device,
 }
 
 ExitCode run(Tool& tool, const Arguments& arguments) {
+    const std::string device = askedDevice(tool, arguments.device).name;
     ConstraintsManager& manager = tool.manager();
-    const std::string& device = arguments.device;
     const PropertyAnswer answer{device, arguments.key,
                                 values(manager, device.c_str(), arguments.key.c_str())};
-    questions::requireKnown(manager, device);
+    questions::requireKnown(tool, device);
+    const auto inWords = [](const std::vector<std::string>& found) {
+        return found.empty() ? "nothing" : fmt::format("{}", fmt::join(found, ", "));
+    };
+    noteApplicationFault(
+        tool,
+        [&](ConstraintsManager& asked) {
+            return inWords(values(asked, device.c_str(), arguments.key.c_str()));
+        },
+        inWords(answer.values));
     return showProperty(tool, answer,
                         manager.isSpiDevice(device.c_str()) ? flashProperties(manager, device)
                                                             : deviceProperties(manager, device));

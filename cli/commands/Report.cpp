@@ -20,6 +20,7 @@ struct Written {
     std::string file;
     std::size_t devices;
     std::size_t families;
+    const std::vector<std::string>& faults; ///< devices at which the manager raises
 };
 
 std::string asText(const Written& written, const Terminal& /*any*/) {
@@ -27,7 +28,10 @@ std::string asText(const Written& written, const Terminal& /*any*/) {
 }
 
 Json asJson(const Written& written) {
-    return {{"file", written.file}, {"devices", written.devices}, {"families", written.families}};
+    return {{"file", written.file},
+            {"devices", written.devices},
+            {"families", written.families},
+            {"faults", written.faults}};
 }
 
 /// The page itself as the answer.
@@ -46,15 +50,28 @@ Json asJson(const Shown& /*shown*/) {
 ExitCode run(Tool& tool, const std::string& file) {
     tool.openDatabase();
     report::Page page;
+    std::vector<std::string> faults;
     Progress progress("asking about each device");
     DeviceSurvey({.operations = true, .options = true, .facts = true})
-        .run([&page](const DeviceDetails& details) { page.add(details); },
-             [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
+        .run(
+            [&](const DeviceDetails& details) {
+                page.add(details);
+                if (!details.whyIncomplete().empty()) {
+                    faults.push_back(details.name);
+                }
+            },
+            [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
     if (file == STANDARD_OUTPUT) {
-        return tool.answer(Shown{page});
+        static_cast<void>(tool.answer(Shown{page}));
+    } else {
+        writeFile(file, page.html());
+        static_cast<void>(tool.answer(Written{file, page.devices(), page.families(), faults}));
     }
-    writeFile(file, page.html());
-    return tool.answer(Written{file, page.devices(), page.families()});
+    if (faults.empty()) {
+        return ExitCode::YES;
+    }
+    tool.note(unansweredText(faults));
+    return ExitCode::FAULT;
 }
 
 Action declare(ArgumentList& list) {

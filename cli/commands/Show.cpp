@@ -3,9 +3,13 @@
 
 #include "commands/CommonArguments.h"
 #include "model/Vocabulary.h"
+#include "query/ApplicationFault.h"
+#include "query/AskedDevice.h"
 #include "query/DeviceDetails.h"
 #include "query/Tool.h"
 #include "term/Table.h"
+
+#include <tarvik/ConstraintsManager.h>
 
 #include <fmt/format.h>
 #include <fmt/ranges.h>
@@ -183,9 +187,22 @@ Json asJson(const Shown& shown) {
             {"options", asJson(details.options->rows)}};
 }
 
+/// Notes what an application gets that asks for a device's operations, then for its options. Both load all there is.
+void noteFault(Tool& tool, const std::string& device) {
+    const auto ask = [&](ConstraintsManager& manager) {
+        constexpr auto MODE = TARVIKNS::MODE_TYPE::BS;
+        constexpr auto OUTPUT = TARVIKNS::OUTPUT_TYPE::USB2;
+        static_cast<void>(manager.getDeviceOperations(device.c_str(), MODE, OUTPUT));
+        static_cast<void>(manager.getProgramOptions(device.c_str(), MODE, OUTPUT, nullptr));
+        return std::string();
+    };
+    noteApplicationFault(tool, ask, std::nullopt);
+}
+
 ExitCode run(Tool& tool, const std::string& device) {
-    tool.openDatabase();
-    return tool.answer(Shown{deviceDetails(device)});
+    const Shown shown{deviceDetails(askedDevice(tool, device).name)};
+    noteFault(tool, shown.details.name);
+    return tool.answer(shown);
 }
 
 Action declare(ArgumentList& list) {

@@ -1,6 +1,7 @@
 // `spi`: the SPI and BPI flashes, and their properties.
 #include "commands/Commands.h"
 
+#include "query/AskedDevice.h"
 #include "query/Properties.h"
 #include "query/Tool.h"
 #include "term/Table.h"
@@ -70,7 +71,7 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     if (!arguments.device) {
         return listFlashes(tool);
     }
-    const std::string& device = *arguments.device;
+    const std::string device = askedDevice(tool, *arguments.device).name;
     const ConstraintsManager& manager = tool.manager();
     const Properties properties = flashProperties(manager, device);
     const bool known = manager.isSpiDevice(device.c_str());

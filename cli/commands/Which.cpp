@@ -191,12 +191,14 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     const Filter filter = read(arguments);
     tool.openDatabase();
     const Matches matches = find(filter);
-    const ExitCode status = tool.answer(matches, matches.devices.empty() ? ExitCode::NO : ExitCode::YES);
+    const ExitCode status = !matches.faults.empty()   ? ExitCode::FAULT
+                            : matches.devices.empty() ? ExitCode::NO
+                                                      : ExitCode::YES;
+    static_cast<void>(tool.answer(matches));
     if (!matches.faults.empty()) {
-        tool.note(fmt::format("no answer for {} devices, the first \"{}\": see tarvik why",
-                              matches.faults.size(), matches.faults.front()));
+        tool.note(unansweredText(matches.faults));
     }
-    if (matches.devices.empty()) {
+    if (status == ExitCode::NO) {
         tool.note("no device matches");
     }
     return status;

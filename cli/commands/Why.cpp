@@ -1,120 +1,22 @@
-// `why`: the answer of `check`, `options`, `bsdl` or `property`, and the records that lead to it.
+// `why`: the answer of a command that answers yes or no, and the records that lead to it.
 #include "commands/Commands.h"
 
 #include "commands/CommonArguments.h"
+#include "commands/QuestionArguments.h"
 #include "explain/Explanation.h"
 #include "explain/Inquiry.h"
-#include "model/Catalogue.h"
-#include "model/Vocabulary.h"
+#include "query/ApplicationFault.h"
+#include "query/ManagerQueries.h"
 #include "query/Tool.h"
 
 #include <tarvik/ConstraintsManager.h>
 
 #include <algorithm>
 #include <memory>
-#include <optional>
 
 namespace {
 
 using explanation::Conclusion;
-using explanation::Question;
-
-struct Arguments {
-    std::optional<std::string> device;
-    std::optional<std::string> mode;
-    std::optional<std::string> output;
-    std::optional<std::string> package;
-    std::optional<std::string> operation;
-    std::optional<std::string> option;
-    std::optional<std::string> bsdl;
-    std::optional<std::string> property;
-    std::optional<std::string> value;
-};
-
-/// Which arguments a kind of question takes.
-struct Form {
-    Question::Kind kind;
-    std::vector<std::optional<std::string> Arguments::*> needed;
-    std::vector<std::optional<std::string> Arguments::*> possible;
-    const char* usage;
-};
-
-const std::vector<std::optional<std::string> Arguments::*> ALL{
-    &Arguments::device, &Arguments::mode, &Arguments::output,   &Arguments::package, &Arguments::operation,
-    &Arguments::option, &Arguments::bsdl, &Arguments::property, &Arguments::value};
-
-const std::vector<Form>& forms() {
-    using A = Arguments;
-    using Kind = Question::Kind;
-    static const std::vector<Form> all{
-        {Kind::OUTPUT, {&A::mode, &A::output}, {}, "--mode M --output O"},
-        {Kind::DEVICE, {&A::device, &A::mode}, {&A::package}, "DEVICE --mode M [--package P]"},
-        {Kind::DEVICE_THROUGH,
-         {&A::device, &A::mode, &A::output},
-         {&A::package},
-         "DEVICE --mode M --output O [--package P]"},
-        {Kind::OPERATION,
-         {&A::device, &A::mode, &A::output, &A::operation},
-         {},
-         "DEVICE --mode M --output O --operation OP"},
-        {Kind::OPERATION_IN_MODE,
-         {&A::device, &A::mode, &A::operation},
-         {},
-         "DEVICE --mode M --operation OP"},
-        {Kind::OPTION,
-         {&A::device, &A::mode, &A::output, &A::option},
-         {&A::package},
-         "DEVICE --mode M --output O --option X [--package P]"},
-        {Kind::BSDL, {&A::device, &A::output, &A::bsdl}, {}, "DEVICE --output O --bsdl OP"},
-        {Kind::PROPERTY, {&A::device, &A::property}, {&A::value}, "DEVICE --property KEY [--value V]"},
-    };
-    return all;
-}
-
-/// Are these arguments all that the form needs, and none that it does not take?
-bool fits(const Form& form, const Arguments& arguments) {
-    return std::all_of(ALL.begin(), ALL.end(), [&](auto member) {
-        const auto holds = [member](const auto& members) {
-            return std::find(members.begin(), members.end(), member) != members.end();
-        };
-        return (arguments.*member).has_value() ? holds(form.needed) || holds(form.possible)
-                                               : !holds(form.needed);
-    });
-}
-
-Question::Kind kindOf(const Arguments& arguments) {
-    std::string usage = "why takes one of";
-    for (const Form& form : forms()) {
-        if (fits(form, arguments)) {
-            return form.kind;
-        }
-        usage += std::string("\n  ") + form.usage;
-    }
-    throw CommandError(ExitCode::FAULT, usage);
-}
-
-Question read(const Arguments& arguments) {
-    Question question;
-    question.kind = kindOf(arguments);
-    question.device = arguments.device.value_or("");
-    question.package = arguments.package;
-    question.property = arguments.property.value_or("");
-    question.value = arguments.value;
-    if (arguments.mode) {
-        question.mode = vocabulary::readMode(*arguments.mode);
-    }
-    if (arguments.output) {
-        question.output = vocabulary::readOutput(*arguments.output);
-    }
-    if (arguments.operation || arguments.bsdl) {
-        question.operation =
-            vocabulary::readOperation(arguments.operation ? *arguments.operation : *arguments.bsdl);
-    }
-    if (arguments.option) {
-        question.option = vocabulary::readOption(*arguments.option);
-    }
-    return question;
-}
 
 ExitCode status(Conclusion verdict) {
     switch (verdict) {
@@ -128,25 +30,53 @@ ExitCode status(Conclusion verdict) {
     return ExitCode::FAULT;
 }
 
-ExitCode run(Tool& tool, const Arguments& arguments) {
-    const Question question = read(arguments);
-    tool.openDatabase();
-    const explanation::Inquiry asked(question);
-    const bool isKnown = !arguments.device || asked.manager->isKorvelDevice(question.device.c_str());
+/// Puts a step for each skipped check in front, unless the explanation itself names it.
+void addSkippedChecks(explanation::Answer& answer) {
+    std::vector<explanation::Step>& steps = answer.explanation.steps;
+    for (auto check = answer.skipped.rbegin(); check != answer.skipped.rend(); ++check) {
+        if (std::ranges::find(steps, *check, &explanation::Step::text) == steps.end()) {
+            steps.insert(steps.begin(), {"skipped", *check});
+        }
+    }
+}
+
+/// A step about what an application gets, if that is something else.
+void addApplicationFault(explanation::Answer& answer) {
+    const auto inWords = [](Conclusion verdict) { return verdict == Conclusion::YES ? "yes" : "no"; };
+    const std::optional<ApplicationFault> fault = findApplicationFault([&](ConstraintsManager& manager) {
+        return inWords(explanation::isAllowed(manager, answer.question) ? Conclusion::YES : Conclusion::NO);
+    });
+    if (fault) {
+        answer.explanation.steps.push_back(
+            {"fault",
+             (fault->record ? "" : reasonOf(*fault) + ": ") + effectOf(*fault, inWords(answer.verdict)),
+             fault->record});
+    }
+}
+
+ExitCode run(Tool& tool, const QuestionArguments& arguments) {
+    const AskedQuestion asked = readQuestion(tool, arguments, QuestionScope::ALL, "why");
+    const explanation::Question& question = asked.question;
+    const explanation::Inquiry inquiry(question);
+    if (arguments.device && !tool.isLiteral() && !inquiry.manager->isKorvelDevice(question.device.c_str())) {
+        throw catalogue::unknownDevice(question.device);
+    }
 
     // Further questions serve the explanation: what the manager reports about them is not about the user's question.
     const std::size_t issued = tool.messages().count();
-    explanation::Answer answer{question, asked.verdict, explanation::explain(question)};
-    if (asked.verdict == Conclusion::NO) {
+    explanation::Answer answer{question, inquiry.verdict, explanation::explain(question), asked.skipped};
+    addApplicationFault(answer);
+    if (inquiry.verdict == Conclusion::NO) {
         for (explanation::Step& step : explanation::alternatives(question)) {
             answer.explanation.steps.push_back(std::move(step));
         }
     }
-    tool.messages().truncate(issued);
-    const ExitCode result = tool.answer(answer, status(asked.verdict));
-    if (!isKnown) {
-        tool.note(catalogue::unknownDevice(question.device).what());
+    addSkippedChecks(answer);
+    if (!asked.reading.empty()) {
+        answer.explanation.steps.insert(answer.explanation.steps.begin(), {"name", asked.reading});
     }
+    tool.messages().truncate(issued);
+    const ExitCode result = tool.answer(answer, status(inquiry.verdict));
     if (!answer.agrees()) {
         tool.note("these steps lead to another answer than the manager gives: that is a bug of tarvik");
     }
@@ -154,7 +84,7 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
 }
 
 Action declare(ArgumentList& list) {
-    auto arguments = std::make_shared<Arguments>();
+    auto arguments = std::make_shared<QuestionArguments>();
     list = {
         argument::device(&arguments->device, false),
         argument::mode(&arguments->mode, false),
@@ -171,6 +101,11 @@ Action declare(ArgumentList& list) {
          .description = "The boundary-scan operation, as in the command bsdl",
          .kind = ValueKind::OPERATION,
          .target = &arguments->bsdl},
+        {.name = "--operation-options",
+         .value = "OPERATION",
+         .description = "The operation whose options are asked for, as in the command operation-options",
+         .kind = ValueKind::OPERATION,
+         .target = &arguments->operationOptions},
         {.name = "--property",
          .value = "KEY",
          .description = "The property, as in the command property",
@@ -178,9 +113,10 @@ Action declare(ArgumentList& list) {
          .target = &arguments->property},
         {.name = "--value",
          .value = "VALUE",
-         .description = "The value that the property may have",
+         .description = "A value of the property, or an option of the operation",
          .target = &arguments->value},
     };
+    declareMultiboot(list, *arguments, false);
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }
 
@@ -194,6 +130,8 @@ const Command command::WHY{
     "tarvik why KS50 --mode SM --package TQ144\n"
     "tarvik why KS50 --mode BS --output USB2 --option PROG --package PQ208\n"
     "tarvik why KS50 --output STAPL --bsdl DOPRELOAD\n"
-    "tarvik why KS50 --property FLASH --value TRUE",
+    "tarvik why KS50 --mode BS --operation-options PROGRAM\n"
+    "tarvik why KS50 --property FLASH --value TRUE\n"
+    "tarvik why OVD16 --multiboot MB_SPI --width NONE --lead",
     declare,
 };

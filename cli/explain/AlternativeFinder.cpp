@@ -4,6 +4,7 @@
 #include "explain/ExplanationBuilder.h"
 
 #include "model/Catalogue.h"
+#include "model/Multiboot.h"
 #include "model/Schema.h"
 #include "model/Vocabulary.h"
 #include "text/Suggest.h"
@@ -47,6 +48,8 @@ public:
         case Kind::OUTPUT:
         case Kind::DEVICE:
         case Kind::OPERATION_IN_MODE:
+        case Kind::OPERATION_OPTIONS:
+        case Kind::DEVICE_IN_MODE:
             modes();
             break;
         case Kind::DEVICE_THROUGH:
@@ -62,6 +65,13 @@ public:
         case Kind::PROPERTY:
             properties();
             break;
+        case Kind::MULTIBOOT:
+            arrangements();
+            break;
+        case Kind::COMPLETE:
+        case Kind::COMPLETE_IN_MODE:
+            // Each part has its own alternatives.
+            return {};
         }
         if (m_steps.empty() && (m_question.kind == Kind::OPERATION || m_question.kind == Kind::BSDL)) {
             otherOperations();
@@ -116,10 +126,10 @@ private:
     void outputs(const std::string& where, int outputCount) {
         std::vector<std::string> found;
         std::optional<SourceText> record;
-        const char* const whoever = isAnsweredForAll() ? ", whatever the device" : "";
+        const char* const scope = isAnsweredForAll() ? ", for every device" : "";
         const auto flush = [&] {
             if (!found.empty()) {
-                add("instead", fmt::format("yes{} through {}{}", where, listed(found), whoever), record);
+                add("instead", fmt::format("yes{} through {}{}", where, listed(found), scope), record);
             }
             found.clear();
         };
@@ -161,6 +171,23 @@ private:
         }
     }
 
+    /// The multiboot arrangements that the device supports.
+    void arrangements() {
+        std::vector<std::string> found;
+        multiboot::forEachArrangement([&](const std::string& type, const std::string& width, bool isLead) {
+            Question other = m_question;
+            other.multibootType = type;
+            other.width = width;
+            other.isLead = isLead;
+            if (askFreshManager(other) == Conclusion::YES) {
+                found.push_back(fmt::format("{} device of {} {}", isLead ? "lead" : "chain", type, width));
+            }
+        });
+        if (!found.empty()) {
+            add("instead", "yes as " + listed(found));
+        }
+    }
+
     /// The property that was meant, should the key be mistyped.
     void properties() {
         std::vector<std::string> keys;
@@ -188,7 +215,7 @@ private:
     /// The devices of the same family that have another answer.
     void siblingDevices() {
         if (m_question.kind == Kind::OUTPUT || m_question.kind == Kind::DEVICE ||
-            m_question.kind == Kind::DEVICE_THROUGH) {
+            m_question.kind == Kind::DEVICE_THROUGH || m_question.kind == Kind::DEVICE_IN_MODE) {
             return;
         }
         packages();
@@ -250,6 +277,20 @@ private:
 
 } // namespace
 
-std::vector<Step> alternatives(const Question& question) { return AlternativeFinder(question).run(); }
+std::vector<Step> alternatives(const Question& question) {
+    std::vector<Step> steps;
+    for (const Question& part : partsOf(question)) {
+        if (askFreshManager(part) == Conclusion::NO) {
+            const std::vector<Step> found = alternatives(part);
+            if (!found.empty()) {
+                steps.push_back({"part", "no: " + inWords(part)});
+            }
+            steps.insert(steps.end(), found.begin(), found.end());
+        }
+    }
+    const std::vector<Step> whole = AlternativeFinder(question).run();
+    steps.insert(steps.end(), whole.begin(), whole.end());
+    return steps;
+}
 
 } // namespace explanation

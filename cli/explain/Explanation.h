@@ -15,7 +15,8 @@ using catalogue::SourceText;
 /// One link of the chain that leads to an answer.
 struct Step {
     /// "name", "family", "table", "rule", "record" (which decides), "absent" (what decides is missing), "note" (an
-    /// oddity on the way), "fault", or after a no "instead" and "differs".
+    /// oddity on the way), "fault", "part" (of a complete question), "skipped" (a check that the form leaves out), or
+    /// after a no "instead" and "differs".
     std::string topic;
     std::string text;
     std::optional<SourceText> place{}; ///< the text of the database, and where it is written
@@ -41,6 +42,7 @@ struct Answer {
     Question question;
     Conclusion verdict;
     Explanation explanation;
+    std::vector<std::string> skipped{}; ///< as `skippedChecks`
 
     [[nodiscard]] bool agrees() const { return verdict == explanation.verdict; }
 };

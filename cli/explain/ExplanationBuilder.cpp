@@ -11,9 +11,35 @@
 
 #include <fmt/format.h>
 
+#include <algorithm>
+#include <iterator>
+
 namespace explanation {
 
-Explanation explain(const Question& question) { return ExplanationBuilder(question).build(); }
+namespace {
+
+/// Explains each part of a question by itself.
+Explanation explainParts(const std::vector<Question>& parts) {
+    Explanation whole{Conclusion::YES, {}};
+    for (const Question& part : parts) {
+        Explanation one = explain(part);
+        const char* const verdict = one.verdict == Conclusion::YES  ? "yes"
+                                    : one.verdict == Conclusion::NO ? "no"
+                                                                    : "no answer";
+        whole.steps.push_back({"part", fmt::format("{}: {}", verdict, inWords(part))});
+        std::move(one.steps.begin(), one.steps.end(), std::back_inserter(whole.steps));
+        // YES, NO and FAULT, in this order: the worst one is that of the whole.
+        whole.verdict = std::max(whole.verdict, one.verdict);
+    }
+    return whole;
+}
+
+} // namespace
+
+Explanation explain(const Question& question) {
+    const std::vector<Question> parts = partsOf(question);
+    return parts.empty() ? ExplanationBuilder(question).build() : explainParts(parts);
+}
 
 const SourceText* Explanation::decidingRecord() const {
     const SourceText* found = nullptr;
@@ -68,6 +94,16 @@ bool ExplanationBuilder::isYes() {
         return operationInMode();
     case Question::Kind::PROPERTY:
         return property();
+    case Question::Kind::OPERATION_OPTIONS:
+        return operationOptions();
+    case Question::Kind::MULTIBOOT:
+        return multiboot();
+    case Question::Kind::DEVICE_IN_MODE:
+        return modeAllowsDevice();
+    case Question::Kind::COMPLETE:
+    case Question::Kind::COMPLETE_IN_MODE:
+        // These are explained part by part.
+        break;
     }
     return false;
 }
@@ -112,7 +148,7 @@ std::string ExplanationBuilder::addFamilyStep(const std::string& name) {
                         hides ? fmt::format(", before what {}.acd says", module) : ""),
             listing);
     } else if (module == nullptr && sameWithoutCase(name, "spi")) {
-        add("family", fmt::format("\"{}\" stands for all flashes: family spi", name));
+        add("family", fmt::format("\"{}\" means all flashes: family spi", name));
     } else if (module == nullptr) {
         add("family", fmt::format("no file, section or flash is called \"{}\": family base", base));
     } else if (sameWithoutCase(base, family) || sameWithoutCase(base, family + ".acd")) {

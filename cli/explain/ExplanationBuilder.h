@@ -43,6 +43,7 @@ private:
     [[nodiscard]] bool isAllowedIn(const std::string& table);
     [[nodiscard]] std::vector<Permission> permissionsOf(const std::string& table) const;
     [[nodiscard]] bool isAllowedBy(const ReadLog::Item& record) const;
+    void addMisspelledRecords(const std::string& word);
     void addUnknownMode(const Permission& permission);
     void addUnusedWords(const Permission& permission);
     [[nodiscard]] const ReadLog::Value* consulted() const;
@@ -56,14 +57,20 @@ private:
         catalogue::Shadows shadows; ///< records of lower layers that it replaced
     };
     [[nodiscard]] bool operationInMode();
+    [[nodiscard]] bool operationOptions();
     [[nodiscard]] bool property();
     [[nodiscard]] bool flashProperty();
     [[nodiscard]] std::optional<Property> findProperty(const std::string& device, const std::string& key);
+    [[nodiscard]] std::optional<Property> storedOrInherited(const std::string& device,
+                                                            const std::string& key) const;
     [[nodiscard]] std::optional<Property> storedProperty(const std::string& device, const std::string& wanted,
                                                          const std::string& key) const;
     [[nodiscard]] std::optional<Property> storedFlashProperty(const std::string& wanted) const;
     [[nodiscard]] bool holds(const Property& found, const std::string& key,
                              const std::optional<std::string>& value);
+
+    // Multiboot.
+    [[nodiscard]] bool multiboot();
 
     // Names.
     std::string addNameStep();

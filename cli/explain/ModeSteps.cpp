@@ -54,7 +54,7 @@ bool ExplanationBuilder::output() {
     const std::string& mode = vocabulary::key(m_question.mode);
     const std::string& output = vocabulary::key(m_question.output);
     if (m_question.mode == MODE_TYPE::PFF) {
-        add("rule", "the PROM file formatter accepts every output, whatever the database lists for it");
+        add("rule", "PFF mode accepts every output");
         return true;
     }
     std::set<OUTPUT_TYPE> outputs;
@@ -62,8 +62,9 @@ bool ExplanationBuilder::output() {
         const OUTPUT_TYPE listed = ConstraintsManager::cableString2Type(word.text->text.c_str());
         if (listed == m_question.output) {
             if (listed == OUTPUT_TYPE::NONE) {
-                add("note", fmt::format("\"{}\" is no output that a database can name, and counts as NONE",
-                                        word.text->text));
+                add("note",
+                    fmt::format("\"{}\" is not an output that a database can name, and is read as NONE",
+                                word.text->text));
             }
             add("record", fmt::format("mode {} lists {}", mode, output), word);
             return true;
@@ -71,7 +72,7 @@ bool ExplanationBuilder::output() {
         outputs.insert(listed);
     }
     if (!isOutputWord(m_question.output)) {
-        add("note", fmt::format("no database can name {}: that word counts as NONE", output));
+        add("note", fmt::format("no database can name {}: that word is read as NONE", output));
     }
     std::vector<std::string> keys;
     keys.reserve(outputs.size());
@@ -85,8 +86,8 @@ bool ExplanationBuilder::output() {
 
 bool ExplanationBuilder::device() {
     if (m_question.mode == MODE_TYPE::PFF || m_question.mode == MODE_TYPE::SPI) {
-        add("rule", fmt::format("asked without an output, mode {} takes every device unseen",
-                                vocabulary::key(m_question.mode)));
+        add("rule",
+            fmt::format("without --output, {} mode accepts every device", vocabulary::key(m_question.mode)));
         return true;
     }
     return modeAllowsDevice();
@@ -97,7 +98,7 @@ bool ExplanationBuilder::modeAllowsDevice() {
     std::string name = addNameStep();
     if (m_question.mode == MODE_TYPE::SPI) {
         name = "spi";
-        add("name", "in mode SPI every device counts as \"spi\"");
+        add("name", "SPI mode treats every device as \"spi\"");
     }
     if (isExcluded(name)) {
         return false;
@@ -113,7 +114,7 @@ bool ExplanationBuilder::modeAllowsDevice() {
     }
     addAbsentFromMode(FAMILIES,
                       fmt::format("mode {} takes the families {}, not {}", mode, listed(families), family),
-                      fmt::format("base.acd lists none under {}", mode));
+                      fmt::format("base.acd lists no families under {}", mode));
     return false;
 }
 
@@ -124,7 +125,7 @@ bool ExplanationBuilder::isExcluded(const std::string& device) {
     const std::string part = vocabulary::key(m_question.mode) + "_" + device + "_" + *m_question.package;
     const Match excluded = m_asked.startUp.findItem(schema::NOT_SUPPORTED_PART_IN_MODE, part);
     if (!excluded) {
-        add("table", fmt::format("NOT_SUPPORTED_PART_IN_MODE does not hold {}", part));
+        add("table", fmt::format("NOT_SUPPORTED_PART_IN_MODE does not list {}", part));
         return false;
     }
     add("record", "NOT_SUPPORTED_PART_IN_MODE excludes the part from the mode", excluded);

@@ -71,7 +71,8 @@ bool ExplanationBuilder::permission() {
     const Table& table = tableOf(m_question.kind);
     std::string owner = "spi";
     if (table.hasModes && m_question.mode == MODE_TYPE::SPI) {
-        add("rule", fmt::format("in mode SPI the {} of \"spi\" answer, whatever the device", table.rows));
+        add("rule",
+            fmt::format("SPI mode treats every device as \"spi\": the {} of \"spi\" answer", table.rows));
     } else {
         owner = m_question.kind == Kind::OPTION ? optionOwner() : operationOwner();
     }
@@ -87,7 +88,7 @@ std::string ExplanationBuilder::operationOwner() {
         return device;
     }
     if (base != device) {
-        add("name", fmt::format("\"{}\" counts as \"{}\", without its package", device, base));
+        add("name", fmt::format("\"{}\" is treated as \"{}\", without its package", device, base));
     }
     return addFamilyStep(m_question.kind == Kind::OPERATION ? base : device);
 }
@@ -111,7 +112,8 @@ std::string ExplanationBuilder::optionOwner() {
     }
     if (joined != device) {
         add("name",
-            fmt::format("PROGRAM_OPTION_PACKAGE does not list \"{}\": the package has no say", joined));
+            fmt::format("PROGRAM_OPTION_PACKAGE does not list \"{}\": the package makes no difference",
+                        joined));
     }
     return !isFamily && isListed(device) ? device : addFamilyStep(device);
 }
@@ -228,6 +230,7 @@ bool ExplanationBuilder::isAllowedIn(const std::string& table) {
                 : fmt::format("none of the {} records for {} allows it{}", permissions.size(), word, where),
             {permissions.front().value, &permissions.front().record->whole});
     }
+    addMisspelledRecords(word);
     if (isOption && m_question.option > TARVIKNS::PROGRAM_OPTION::SECTOR_LOCKDOWN) {
         add("note", fmt::format("no database can name the option {}", word));
     }
@@ -274,11 +277,28 @@ void ExplanationBuilder::addShadowedRecords(const std::string& database, const s
     }
 }
 
+/// Notes the records that would be about the operation that is asked for if their word were not mistyped.
+void ExplanationBuilder::addMisspelledRecords(const std::string& word) {
+    const ReadLog::Value* const value = consulted();
+    if (m_question.kind == Kind::OPTION || value == nullptr) {
+        return;
+    }
+    for (const ReadLog::Item& record : value->items) {
+        const char* const text = textOf(record, 0);
+        const bool isUnknown =
+            text != nullptr && ConstraintsManager::operationString2Type(text) == TARVIKNS::NO_OPERATION;
+        if (isUnknown && suggest(text, vocabulary::operations()) == word) {
+            add("note", fmt::format("\"{}\" is not an operation; is {} meant?", text, word),
+                {value, &record.whole});
+        }
+    }
+}
+
 void ExplanationBuilder::addUnknownMode(const Permission& permission) {
     const char* const word = textOf(*permission.record, 1);
     if (tableOf(m_question.kind).hasModes && (word == nullptr || !isModeWord(word))) {
         add("note",
-            fmt::format("\"{}\" is no mode, and counts as Boundary Scan", word == nullptr ? "" : word),
+            fmt::format("\"{}\" is not a mode, and is read as Boundary Scan", word == nullptr ? "" : word),
             {permission.value, &permission.record->whole});
     }
 }
@@ -293,7 +313,7 @@ void ExplanationBuilder::addUnusedWords(const Permission& permission) {
         const OUTPUT_TYPE output = ConstraintsManager::cableString2Type(word.c_str());
         const Match place{permission.value, &*field.text};
         if (output == OUTPUT_TYPE::NONE) {
-            add("note", fmt::format("\"{}\" is no output, and allows nothing", word), place);
+            add("note", fmt::format("\"{}\" is not an output, and allows nothing", word), place);
         } else if (output > OUTPUT_TYPE::STAPL) {
             add("note", fmt::format("{} has no cell in the tables, so its word allows nothing", word), place);
         }

@@ -94,6 +94,7 @@ Json asJson(const Answer& answer) {
         {"allowed", answer.verdict == Conclusion::FAULT ? Json() : Json(answer.verdict == Conclusion::YES)}};
     object.update(inJson(answer.question));
     object["steps"] = std::move(steps);
+    object["skipped"] = answer.skipped;
     object["agrees"] = answer.agrees();
     return object;
 }

@@ -41,6 +41,35 @@ bool ExplanationBuilder::operationInMode() {
     return holds(*found, key, vocabulary::key(m_question.mode));
 }
 
+/// The options are those of the property OP_OPERATION or, if it is missing or empty, of OP_OPERATION_MODE; but only in
+/// modes that the property of the operation lists.
+bool ExplanationBuilder::operationOptions() {
+    const std::string& device = m_question.device;
+    const std::string& operation = vocabulary::key(m_question.operation);
+    const std::string& mode = vocabulary::key(m_question.mode);
+    const std::optional<Property> modes = findProperty(device, operation);
+    if (!modes) {
+        add("absent",
+            fmt::format("neither \"{}\" nor its family has a property {}, which lists the modes of the "
+                        "operation",
+                        device, operation));
+        return false;
+    }
+    if (!holds(*modes, operation, mode)) {
+        return false;
+    }
+    const std::string forAllModes = std::string(schema::OPTIONS_PREFIX) + operation;
+    for (const std::string& key : {forAllModes, forAllModes + '_' + mode}) {
+        const std::optional<Property> options = storedOrInherited(device, key);
+        if (options && !options->values.empty()) {
+            return holds(*options, key, m_question.value);
+        }
+    }
+    add("absent", fmt::format("neither \"{}\" nor its family has a property {} or {}_{} with a value", device,
+                              forAllModes, forAllModes, mode));
+    return false;
+}
+
 bool ExplanationBuilder::property() {
     const std::string& device = m_question.device;
     const std::string& key = m_question.property;
@@ -66,13 +95,17 @@ bool ExplanationBuilder::property() {
 }
 
 /// The values of the device itself, or else of its family.
-std::optional<ExplanationBuilder::Property> ExplanationBuilder::findProperty(const std::string& device,
-                                                                             const std::string& key) {
+std::optional<ExplanationBuilder::Property>
+ExplanationBuilder::storedOrInherited(const std::string& device, const std::string& key) const {
     std::optional<Property> found = storedProperty(device, device, key);
     const std::string family = m_asked.familyOf(device);
-    if (!found && family != device) {
-        found = storedProperty(device, family, key);
-    }
+    return found || family == device ? found : storedProperty(device, family, key);
+}
+
+/// The same, with a step that names the family.
+std::optional<ExplanationBuilder::Property> ExplanationBuilder::findProperty(const std::string& device,
+                                                                             const std::string& key) {
+    std::optional<Property> found = storedOrInherited(device, key);
     if (found) {
         addFamilyStep(device);
     }

@@ -6,6 +6,7 @@
 
 #include <optional>
 #include <string>
+#include <vector>
 
 class ConstraintsManager;
 
@@ -22,6 +23,11 @@ struct Question {
         OPTION,   ///< does the device, in its package, take the option in the mode through the output?
         BSDL,     ///< does the device offer the boundary-scan operation through the output?
         PROPERTY, ///< has the device the property, or the property this value?
+        OPERATION_OPTIONS, ///< has the operation options on the device in the mode, or this option?
+        MULTIBOOT,         ///< does the device support the multiboot arrangement?
+        DEVICE_IN_MODE,    ///< may the device, in its package, be configured in the mode through some output?
+        COMPLETE,          ///< OUTPUT, DEVICE_IN_MODE and OPERATION together
+        COMPLETE_IN_MODE,  ///< DEVICE and OPERATION_IN_MODE together
     };
 
     Kind kind{};
@@ -32,7 +38,12 @@ struct Question {
     TARVIKNS::OP_TYPE operation{};
     TARVIKNS::PROGRAM_OPTION option{};
     std::string property;
-    std::optional<std::string> value;
+    std::optional<std::string> value; ///< of the property, or an option of the operation
+    std::string multibootType;
+    std::string width;
+    bool isLead = false; ///< the first device of a multiboot chain
+
+    [[nodiscard]] bool takesPackage() const;
 };
 
 enum class Conclusion {
@@ -42,7 +53,18 @@ enum class Conclusion {
 };
 
 /// The manager's answer.
+/// @throw TarvikException if the manager raises
+[[nodiscard]] bool isAllowed(ConstraintsManager& manager, const Question& question);
+
+/// The same without an exception.
 [[nodiscard]] Conclusion ask(ConstraintsManager& manager, const Question& question);
+
+/// The questions that a question is composed of; empty for all but the complete ones.
+[[nodiscard]] std::vector<Question> partsOf(const Question& question);
+
+/// A line for each check that the manager leaves out because of the form of the question, so that a "yes" is not taken
+/// for more than it is.
+[[nodiscard]] std::vector<std::string> skippedChecks(const Question& question);
 
 [[nodiscard]] std::string inWords(const Question& question);
 [[nodiscard]] Json inJson(const Question& question);

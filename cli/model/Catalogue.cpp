@@ -141,8 +141,17 @@ std::vector<std::string> names() {
 }
 
 CommandError unknownDevice(const std::string& name) {
-    return {ExitCode::NO,
-            fmt::format("the database has no device \"{}\"{}", name, didYouMean(name, names()))};
+    const std::vector<std::string> known = names();
+    const std::string base = name.substr(0, name.find('_'));
+    if (base != name && std::ranges::find(known, name) != known.end()) {
+        return {ExitCode::NO,
+                fmt::format("the database has \"{}\", but \"_\" begins a package, so the manager "
+                            "looks for the device \"{}\"",
+                            name, base)};
+    }
+    const std::string suggestion = didYouMean(name, known);
+    return {ExitCode::NO, fmt::format("the database has no device \"{}\"{}", name,
+                                      suggestion.empty() ? didYouMean(base, known) : suggestion)};
 }
 
 } // namespace catalogue

@@ -10,6 +10,11 @@ inline constexpr const char* TYPE_PREFIX = "TYPE_";
 inline const std::vector<std::string> TYPES{"TYPE_BPI", "TYPE_MB_SPI", "TYPE_MB_BPI", "TYPE_MB_QPRM"};
 inline const std::vector<std::string> WIDTHS{"SERIAL", "PARALLEL", "NONE"};
 
+/// The type that a text names, in any case, with or without `TYPE_`; likewise the width.
+/// @throw CommandError (FAULT) that lists what is accepted
+[[nodiscard]] const std::string& readType(const std::string& text);
+[[nodiscard]] const std::string& readWidth(const std::string& text);
+
 /// The keys of the lists that a database can have.
 [[nodiscard]] inline const std::vector<std::string>& keys() {
     static const std::vector<std::string> all = [] {

@@ -49,6 +49,9 @@ inline constexpr const char* DEVICE_FAMILY = "DEVICE_FAMILY";
 /// The property that lists a device's packages. The manager gives it no meaning of its own.
 inline constexpr const char* PACKAGES = "PACKAGES";
 
+/// The property that gives a flash's package, likewise.
+inline constexpr const char* PACKAGE = "PACKAGE";
+
 /// Begins the properties that list the options of an operation.
 inline constexpr std::string_view OPTIONS_PREFIX = "OP_";
 

@@ -8,6 +8,8 @@
 #include <TarvikException.h>
 #include <tarvik/ConstraintsManager.h>
 
+#include <fmt/format.h>
+
 #include <algorithm>
 
 namespace {
@@ -21,6 +23,11 @@ std::unordered_set<std::string> setOf(const char* key) {
 }
 
 } // namespace
+
+std::string unansweredText(const std::vector<std::string>& devices) {
+    return fmt::format("no answer for {} device{}, the first {}: see tarvik show {}", devices.size(),
+                       devices.size() == 1 ? "" : "s", devices.front(), devices.front());
+}
 
 DeviceSurvey::DeviceSurvey(Topics topics)
     : m_topics(std::move(topics)), m_manager(freshManager()), m_supported(setOf("DEVICE_SUPPORTED")),

@@ -18,6 +18,10 @@ using ProgressCallback = std::function<void(std::size_t done, std::size_t total)
 /// Called with the details of each device, which live until it returns.
 using DeviceVisitor = std::function<void(const DeviceDetails&)>;
 
+/// "no answer for 10 devices, the first KS50: see tarvik show KS50".
+/// @param devices those at which the manager raises, at least one
+[[nodiscard]] std::string unansweredText(const std::vector<std::string>& devices);
+
 /// Asks about all devices of the database, flashes included.
 ///
 /// Each answer is that of a manager that was asked nothing before. Devices that read the same tables are asked for

@@ -80,8 +80,8 @@ std::vector<TARVIKNS::PROGRAM_OPTION> options(const ConstraintsManager& manager,
     return members(manager.getProgramOptionOrders(), mask);
 }
 
-void requireKnown(ConstraintsManager& manager, const std::string& device) {
-    if (!manager.isKorvelDevice(device.c_str())) {
+void requireKnown(Tool& tool, const std::string& device) {
+    if (!tool.isLiteral() && !tool.manager().isKorvelDevice(device.c_str())) {
         throw catalogue::unknownDevice(device);
     }
 }

@@ -30,7 +30,7 @@ namespace questions {
 
 /// Call it after the question proper: the manager remembers what a name resolved to, so whether it knows a device
 /// must not be asked first.
-/// @throw CommandError (NO) for a device that the manager does not know
-void requireKnown(ConstraintsManager& manager, const std::string& device);
+/// @throw CommandError (NO) for a device that the manager does not know, unless names are taken literally
+void requireKnown(Tool& tool, const std::string& device);
 
 } // namespace questions

@@ -81,8 +81,14 @@ const ReadLog::Value* ReadLog::findWithItem(const std::string& key, int index) c
 
 ReadLog::Match ReadLog::last() const { return m_last == nullptr ? Match() : Match{&m_values.back(), m_last}; }
 
+ReadLog::Match ReadLog::lastOrItsRecord() const {
+    const Match found = last();
+    return found || m_lastRecord == nullptr ? found : Match{&m_values.back(), m_lastRecord};
+}
+
 void ReadLog::add(const AcdStore::Read& read) {
     m_last = nullptr;
+    m_lastRecord = nullptr;
     if (m_values.empty() || m_values.back().key != read.key || m_values.back().family != read.family ||
         m_values.back().device != read.device) {
         m_values.push_back(
@@ -95,6 +101,7 @@ void ReadLog::add(const AcdStore::Read& read) {
     Item& item =
         findOrInsert(items, &Item::index, {read.item, {std::string(read.itemText), read.itemLocation}});
     m_last = &item.whole;
+    m_lastRecord = m_last;
     if (read.subSeparator != nullptr) {
         Field& field = findOrInsert(item.fields, &Field::number, {read.field, std::nullopt});
         if (read.text != nullptr) {

@@ -79,9 +79,13 @@ public:
     /// The text that was read last; no match when the last read found nothing.
     [[nodiscard]] Match last() const;
 
+    /// The text that was read last or, if its field was missing, the record that lacks it.
+    [[nodiscard]] Match lastOrItsRecord() const;
+
 private:
     void add(const AcdStore::Read& read);
 
     std::vector<Value> m_values;
     const Text* m_last = nullptr;
+    const Text* m_lastRecord = nullptr;
 };

@@ -36,10 +36,16 @@ void Tool::note(const std::string& text) const {
     }
 }
 
+void Tool::note(const std::string& text, const char* member, Json value) {
+    note(text);
+    m_remarks[member] = std::move(value);
+}
+
 Json Tool::answerOf(const std::function<ExitCode(Tool&)>& command) {
     Json answer;
     const bool json = std::exchange(m_settings.json, true);
     m_captured = &answer;
+    m_remarks = Json::object();
     const auto restore = [&] {
         m_captured = nullptr;
         m_settings.json = json;
@@ -85,6 +91,7 @@ void Tool::showJson(const Json& facts) {
 void Tool::writeJson(const Json& facts, const std::vector<Messages::Message>& messages) {
     Json document{{"version", 1}};
     document.update(facts);
+    document.update(m_remarks);
     document["messages"] = asJson(messages);
     if (m_captured != nullptr) {
         *m_captured = std::move(document);

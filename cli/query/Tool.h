@@ -19,6 +19,7 @@ public:
         std::vector<std::string> databases;
         bool json = false;
         bool verbose = false;
+        bool literal = false;
         Terminal::Colours colours = Terminal::Colours::AUTOMATIC;
     };
 
@@ -48,8 +49,14 @@ public:
         return status;
     }
 
+    /// Are names passed to the manager as they were typed?
+    [[nodiscard]] bool isLiteral() const noexcept { return m_settings.literal; }
+
     /// Shows the user something besides the answer, on standard error.
     void note(const std::string& text) const;
+
+    /// The same, and adds a member to the JSON object of the answer.
+    void note(const std::string& text, const char* member, Json value);
 
     /// Runs a command and returns the JSON object that it would write with `--json`, instead of writing it. Its notes
     /// are dropped.
@@ -74,5 +81,6 @@ private:
     Output m_output;
     Terminal m_terminal;
     bool m_opened = false;
-    Json* m_captured = nullptr; ///< takes the JSON object in place of standard output
+    Json m_remarks = Json::object(); ///< further members of the JSON object
+    Json* m_captured = nullptr;      ///< takes the JSON object in place of standard output
 };

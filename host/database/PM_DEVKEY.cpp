@@ -50,7 +50,9 @@ bool PM_DEVKEY::find(const char* key, const char* separator, const char* subSepa
         select(key, nullToEmpty(separator));
     }
     // A negative index becomes one that is larger than any list.
-    if (m_value.empty() || !moveToItem(static_cast<std::size_t>(m_request.index))) {
+    // Lists are read field by field, so the current item is asked for most.
+    const auto index = static_cast<std::size_t>(m_request.index);
+    if (m_value.empty() || (index != m_item.index() && !moveToItem(index))) {
         return false;
     }
     std::string_view part = m_item.part(m_value);
@@ -59,7 +61,8 @@ bool PM_DEVKEY::find(const char* key, const char* separator, const char* subSepa
             m_subSeparator = subSeparator;
             m_field.start(part, m_subSeparator);
         }
-        if (!m_field.moveTo(static_cast<std::size_t>(m_request.subIndex), part, m_subSeparator)) {
+        const auto subIndex = static_cast<std::size_t>(m_request.subIndex);
+        if (subIndex != m_field.index() && !m_field.moveTo(subIndex, part, m_subSeparator)) {
             return false;
         }
         part = m_field.part(part);

@@ -30,6 +30,7 @@ std::vector<Endings> endings(const std::string& database) {
          {{}, {"fn*"}, {"--family", "finch"}},
          {{"zz*"}, {"--family", "zz"}},
          {{"--family"}, {"a", "b"}}},
+        {"identify", {{"0x0010"}, {"0x10", "0x20"}}, {{"0x0011"}, {"0x10", "0x11"}}, {{}, {"FN10"}, {"0x"}}},
         {"families", {{}}, {}, {{"--zz"}, {"finch"}}},
         {"vocabulary", {{}}, {}, {{"--zz"}, {"modes"}}},
         {"show", {{"FN10"}, {"finch"}, {"FLA"}}, {{"ZZ"}}, {{}, {"FN10", "FN20"}}},

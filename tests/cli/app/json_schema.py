@@ -22,6 +22,9 @@ NOT_IN_JSON = {"batch", "help"}
 QUESTIONS = """
 devices
 devices 'zz*'
+identify 0x14104FB7 0x24104FB5
+identify 0x14104FX7
+identify zz
 families
 vocabulary
 show KS50
@@ -30,6 +33,17 @@ show kestrel
 show ZZ9
 operations KS50 --mode BS --output USB2
 operations KS50 --mode SPI --output NONE
+operations ks50 --mode BS --output USB2
+operations ks50_zz --mode BS --output USB2
+operations ZZ9 --literal --mode BS --output USB2
+options ks50_tq144 --mode BS --output USB2
+bsdl ks50_tq144 --output SVF
+operation-options ks50_tq144 PROGRAM --mode BS
+property ks50_tq144 VENDOR
+property ks50 ZZ
+spi ovd16
+multiboot ovd16 --type MB_SPI --width NONE --lead
+show ks50_tq144
 operations ZZ9 --mode BS --output USB2
 operations KS50 --mode ZZ --output USB2
 options KS50 --mode BS --output USB2
@@ -48,6 +62,10 @@ check KS50 --mode DP770
 check ZZ9 --mode BS --package TQ144
 check KS50 --mode BS --output USB2 --operation VERIFY
 check KS50 --mode BS --operation PROGRAM
+check KS50 --mode BS --output USB2 --package TQ144 --operation VERIFY
+check ks50_tq144 --mode BS --operation PROGRAM
+check KS50 --mode SPI
+check KS50 --mode BS --package ZZ
 check KS50 --mode ZZ
 check KS50
 why KS50
@@ -63,6 +81,12 @@ why KS50 --output SVF --bsdl HIGHZ
 why KS50 --property FLASH
 why KS50 --property FLASH --value FALSE
 why OVD16 --property DENSITY
+why OVD16 --multiboot MB_SPI --width NONE --lead
+why OVD16 --multiboot MB_SPI --width NONE --chain
+why ks50_tq144 --mode BS --operation-options PROGRAM
+why KS50 --mode SPI --operation-options PROGRAM --value VERIFY
+why KS50 --mode SM --output PARALLEL --package TQ144 --operation VERIFY
+why KS50 --mode SPI
 why ZZ9 --mode BS
 which --operation ERASE --mode BS --output USB2
 which --operation PROGRAM --mode BS

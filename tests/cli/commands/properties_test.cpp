@@ -90,10 +90,10 @@ TEST(Spi, UnknownPropertyIsANoWithASuggestion) {
 
 TEST(Spi, DeviceThatIsNoFlashIsANo) {
     const SmallDatabase database;
-    EXPECT_EQ(database.run({"spi", "FN10"}).status, 1);
+    EXPECT_EQ(database.run({"spi", "FN10"}).error, "tarvik: the database has no flash \"FN10\"\n");
     const ProcessResult outcome = database.run({"spi", "FLD", "PAGE"});
     EXPECT_EQ(outcome.status, 1);
-    EXPECT_EQ(outcome.error, "tarvik: the database has no flash \"FLD\"; did you mean \"FLA\"?\n");
+    EXPECT_EQ(outcome.error, "tarvik: the database has no device \"FLD\"; did you mean \"FLA\"?\n");
 }
 
 } // namespace

@@ -87,12 +87,12 @@ TEST(Show, WholeSheetInJson) {
     EXPECT_EQ(answer["messages"], json::array());
 }
 
-TEST(Show, NameInAnotherCaseIsShownInBoth) {
+TEST(Show, LiteralNameInAnotherCaseIsShownInBoth) {
     const SmallDatabase database;
-    const ProcessResult outcome = database.run({"show", "Fn20"});
+    const ProcessResult outcome = database.run({"--literal", "show", "Fn20"});
     EXPECT_THAT(outcome.output,
                 StartsWith("Device  Fn20 (in the database: FN20)\nFamily  finch\nIDCODE  0x0020"));
-    EXPECT_EQ(database.json({"show", "Fn20"})["spelling"], "FN20");
+    EXPECT_EQ(database.json({"--literal", "show", "Fn20"})["spelling"], "FN20");
 }
 
 TEST(Show, FamilyIsSpeltAsItsFile) {
@@ -177,7 +177,12 @@ TEST(Show, BadRecordsRaiseNothing) {
     const ProcessResult outcome = runTool({"--database", directory.path(), "show", "FN10"});
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.output, HasSubstr("PROGRAM  --U--"));
-    EXPECT_EQ(outcome.error, "Operation NOTHING is not defined.\n");
+    EXPECT_EQ(
+        outcome.error,
+        "tarvik: " + directory.path("finch.acd") +
+            ":1:13: \"NOTHING\" is faulty: an application gets OutOfRangeException (location 1631), and "
+            "afterwards answers without this record and those after it\n"
+            "Operation NOTHING is not defined.\n");
 }
 
 TEST(Show, NamesWhatLayersShadow) {

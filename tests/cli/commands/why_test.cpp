@@ -59,6 +59,9 @@ TEST(Why, AnswersEachFormOfQuestion) {
         {"FN20", "--mode", "BS", "--output", "USB2", "--option", "ERASE"},
         {"FN10", "--output", "SVF", "--bsdl", "HIGHZ"},
         {"FN10", "--property", "VENDOR", "--value", "Korvel"},
+        {"FN10", "--mode", "BS", "--operation-options", "PROGRAM", "--value", "ERASE"},
+        {"FN10", "--multiboot", "MB_SPI", "--width", "NONE", "--lead"},
+        {"FN10", "--mode", "BS", "--output", "USB2", "--package", "P48", "--operation", "PROGRAM"},
     };
     for (std::vector<std::string> question : questions) {
         question.insert(question.begin(), "why");
@@ -78,7 +81,7 @@ TEST(Why, SuggestsNamesThatAreNear) {
 TEST(Why, ListsTheFormsOfQuestionsWhenNoneFits) {
     const ProcessResult outcome = SmallDatabase().run({"why", "FN10"});
     EXPECT_EQ(outcome.status, 2);
-    EXPECT_THAT(outcome.error, StartsWith("tarvik: why takes one of\n  --mode M --output O\n"));
+    EXPECT_THAT(outcome.error, StartsWith("tarvik: why takes one of these:\n  --mode M --output O\n"));
 }
 
 TEST(Which, ListsTheDevicesThatAllowAnOperation) {
@@ -131,8 +134,8 @@ TEST(Which, NamesTheDevicesThatHaveNoAnswer) {
          {"spi.acd", "DEVICE_FAMILY = ST1\n"}});
     const ProcessResult outcome =
         runTool({"--database", database.path(), "which", "--property", "VENDOR=Korvel"});
-    EXPECT_EQ(outcome.status, 1);
-    EXPECT_THAT(outcome.error, HasSubstr("no answer for 2 devices, the first \"FN10\": see tarvik why"));
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_THAT(outcome.error, HasSubstr("no answer for 2 devices, the first FN10: see tarvik show FN10"));
     EXPECT_THAT(
         runTool({"--database", database.path(), "--json", "which", "--property", "VENDOR=Korvel"}).output,
         HasSubstr("\"faults\":[\"FN10\",\"FN20\"]"));

@@ -47,20 +47,93 @@ TEST(WhySteps, TheDecidingRecordIsNamedWithItsPlace) {
 TEST(WhySteps, APackageIsTakenOffTheName) {
     const Databases databases(family("OPERATION = PROGRAM,Bscan,USB2"));
     const explanation::Explanation found = explained(programming("D1_PQ", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
-    EXPECT_EQ(stepAbout(found.steps, "name").text, "\"D1_PQ\" counts as \"D1\", without its package");
+    EXPECT_EQ(stepAbout(found.steps, "name").text, "\"D1_PQ\" is treated as \"D1\", without its package");
 }
 
-TEST(WhySteps, AnUnknownModeTextCountsAsBoundaryScan) {
+TEST(WhySteps, UnknownModeTextIsReadAsBoundaryScan) {
     const Databases databases(family("OPERATION = PROGRAM,Parallel,USB2"));
     const explanation::Explanation found = explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
     EXPECT_EQ(found.verdict, Conclusion::YES);
-    EXPECT_EQ(stepAbout(found.steps, "note").text, "\"Parallel\" is no mode, and counts as Boundary Scan");
+    EXPECT_EQ(stepAbout(found.steps, "note").text,
+              "\"Parallel\" is not a mode, and is read as Boundary Scan");
 }
 
 TEST(WhySteps, BoundaryScanByItsKeyIsNoOddity) {
     const Databases databases(family("OPERATION = PROGRAM,BS,USB2"));
     const explanation::Explanation found = explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
     EXPECT_EQ(stepAbout(found.steps, "note").text, "");
+}
+
+Question optionsOf(const std::string& device, MODE_TYPE mode) {
+    Question question = about(Kind::OPERATION_OPTIONS, device);
+    question.mode = mode;
+    question.operation = OP_TYPE::PROGRAM;
+    return question;
+}
+
+// Options that the device or family has for all modes take precedence over those for one mode.
+TEST(WhySteps, OptionsOfAnOperation) {
+    const Databases databases(
+        Files{{"base.acd", "DEVICE_SUPPORTED = fam\n"},
+              {"fam.acd", "PROPERTIES = PROGRAM,2,BS,SM:OP_PROGRAM_BS,1,ERASE:OP_PROGRAM_SM,0\n"
+                          "[D1]\n"
+                          "[D2]\n"
+                          "PROPERTIES = OP_PROGRAM,1,VERIFY\n"}});
+    const explanation::Explanation forMode = explained(optionsOf("D1", MODE_TYPE::BS));
+    EXPECT_EQ(forMode.verdict, Conclusion::YES);
+    EXPECT_EQ(catalogue::asText(forMode.decidingRecord()->origin), "fam.acd:1:30");
+    EXPECT_EQ(forMode.steps.back().text, "OP_PROGRAM_BS of the family is ERASE");
+    const explanation::Explanation forAll = explained(optionsOf("D2", MODE_TYPE::BS));
+    EXPECT_EQ(forAll.steps.back().text, "OP_PROGRAM of the device is VERIFY");
+    const explanation::Explanation empty = explained(optionsOf("D1", MODE_TYPE::SM));
+    EXPECT_EQ(empty.verdict, Conclusion::NO);
+    EXPECT_EQ(empty.steps.back().text,
+              "neither \"D1\" nor its family has a property OP_PROGRAM or OP_PROGRAM_SM with a value");
+    const explanation::Explanation unlisted = explained(optionsOf("D1", MODE_TYPE::SS));
+    EXPECT_EQ(unlisted.steps.back().text, "PROGRAM of the family is BS, SM, not SS");
+    Question other = optionsOf("D2", MODE_TYPE::BS);
+    other.value = "ERASE";
+    EXPECT_EQ(explained(other).steps.back().text, "OP_PROGRAM of the device is VERIFY, not ERASE");
+}
+
+TEST(WhySteps, MultibootArrangement) {
+    const Databases databases(
+        Files{{"base.acd", "DEVICE_SUPPORTED = spi\n"},
+              {"spi.acd", "DEVICE_FAMILY = ST1\nST1_DEVICES = FLA,FLB\nTYPE_MB_SPI_NONE_LEAD = FLB,FLA\n"}});
+    Question question = about(Kind::MULTIBOOT, "FLA");
+    question.multibootType = "TYPE_MB_SPI";
+    question.width = "NONE";
+    question.isLead = true;
+    const explanation::Explanation yes = explained(question);
+    EXPECT_EQ(yes.verdict, Conclusion::YES);
+    EXPECT_EQ(place(stepAbout(yes.steps, "record")), "spi.acd:3:29: FLA");
+    question.isLead = false;
+    EXPECT_EQ(explained(question).steps.back().text, "spi.acd has no list TYPE_MB_SPI_NONE_CHAIN");
+    EXPECT_EQ(explanation::alternatives(question).front().text, "yes as lead device of TYPE_MB_SPI NONE");
+    question.width = "SERIAL";
+    EXPECT_EQ(explained(question).steps.back().text, "there is no arrangement TYPE_MB_SPI_SERIAL_CHAIN");
+    question = about(Kind::MULTIBOOT, "D1");
+    question.multibootType = "TYPE_MB_SPI";
+    question.width = "NONE";
+    question.isLead = true;
+    EXPECT_EQ(place(explained(question).steps.back()), "spi.acd:3:25: FLB");
+}
+
+TEST(WhySteps, CompleteQuestionIsExplainedPartByPart) {
+    const Databases databases(family("OPERATION = PROGRAM,Bscan,USB2", "BS = outs,USB2:fams,other\n"));
+    Question question = programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2);
+    question.kind = Kind::COMPLETE;
+    question.package = "PQ";
+    const explanation::Explanation found = explained(question);
+    EXPECT_EQ(found.verdict, Conclusion::NO);
+    std::vector<std::string> parts;
+    for (const explanation::Step& step : found.steps) {
+        if (step.topic == "part") {
+            parts.push_back(step.text);
+        }
+    }
+    EXPECT_EQ(parts, (std::vector<std::string>{"yes: mode BS through USB2", "no: D1 in package PQ in mode BS",
+                                               "yes: PROGRAM of D1 in mode BS through USB2"}));
 }
 
 TEST(WhySteps, PromFileFormatterAcceptsEveryOutput) {
@@ -87,18 +160,18 @@ TEST(WhySteps, AWordWithoutACellIsNotedBesideANo) {
     ASSERT_EQ(found.steps.size(), 5U);
     EXPECT_EQ(found.steps[2].text, "the one record for PROGRAM does not allow it in mode BS through USB2");
     EXPECT_EQ(found.steps[3].text, "EXPRESSSVF has no cell in the tables, so its word allows nothing");
-    EXPECT_EQ(found.steps[4].text, "\"usb2\" is no output, and allows nothing");
+    EXPECT_EQ(found.steps[4].text, "\"usb2\" is not an output, and allows nothing");
     EXPECT_EQ(place(found.steps[4]), "fam.acd:1:38: usb2");
 }
 
-TEST(WhySteps, AnUnknownOutputWordCountsAsNone) {
+TEST(WhySteps, UnknownOutputWordIsReadAsNone) {
     const Databases databases(family("", "BS = outs,usb2:fams,fam\n"));
     Question question = about(Kind::OUTPUT, "");
     question.output = OUTPUT_TYPE::NONE;
     const explanation::Explanation found = explained(question);
     EXPECT_EQ(found.verdict, Conclusion::YES);
     EXPECT_EQ(place(stepAbout(found.steps, "record")), "base.acd:3:11: usb2");
-    EXPECT_THAT(stepAbout(found.steps, "note").text, HasSubstr("\"usb2\" is no output"));
+    EXPECT_THAT(stepAbout(found.steps, "note").text, HasSubstr("\"usb2\" is not an output"));
 }
 
 TEST(WhySteps, TheExcludedPartIsNamed) {
@@ -312,7 +385,7 @@ TEST(WhyAlternatives, TheFamilyItselfMayDiffer) {
         "in family fam, yes for the family itself");
 }
 
-TEST(WhyAlternatives, SpiModeAnswersWhateverTheDevice) {
+TEST(WhyAlternatives, SpiModeAnswersForEveryDevice) {
     Files files = family("");
     files["base.acd"] = "DEVICE_SUPPORTED = fam,spi\n";
     files["spi.acd"] = "OPERATION = PROGRAM,SPI,USB2\n";
@@ -320,7 +393,7 @@ TEST(WhyAlternatives, SpiModeAnswersWhateverTheDevice) {
     EXPECT_EQ(
         stepAbout(explanation::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "instead")
             .text,
-        "yes in mode SPI through USB2, whatever the device");
+        "yes in mode SPI through USB2, for every device");
 }
 
 TEST(WhyAlternatives, TheKeyThatWasMeant) {

@@ -1,0 +1,93 @@
+// Finds the faults of a database that the tool survives and an application meets.
+#include "query/ApplicationFault.h"
+
+#include "query/FreshManager.h"
+#include "query/ReadLog.h"
+#include "query/Tool.h"
+
+// The manager's own table of the locations that raise.
+#include <Diagnostics.h>
+
+#include <TarvikException.h>
+#include <tarvik/ConstraintsManager.h>
+
+#include <fmt/format.h>
+
+namespace {
+
+namespace location = diagnostics::location;
+
+/// Is it a location that raises because of a record, so that what was read last is at fault?
+bool isAboutRecord(int line) {
+    return line != location::SUPPORTED_DEVICE_UNKNOWN && line != location::PROGRAM_OPTION_PACKAGE_UNKNOWN;
+}
+
+std::string exceptionText(const TarvikException& fault) {
+    return fmt::format("{} (location {})", fault.typeName(), fault.line());
+}
+
+std::string askAgain(ConstraintsManager& manager, const AnswerInWords& ask) {
+    try {
+        return ask(manager);
+    } catch (const TarvikException& fault) {
+        return exceptionText(fault);
+    }
+}
+
+} // namespace
+
+std::optional<ApplicationFault> findApplicationFault(const AnswerInWords& ask) {
+    const MutedMessages muted;
+    const ManagerFactory::Manager manager = ManagerFactory::make();
+    ReadLog reads;
+    try {
+        reads.record([&] { static_cast<void>(ask(*manager)); });
+    } catch (const TarvikException& fault) {
+        if (fault.line() == location::PROPERTY_NOT_FOUND) {
+            return std::nullopt;
+        }
+        ApplicationFault found{fault.typeName(), fault.line()};
+        if (const ReadLog::Match record = reads.lastOrItsRecord(); record && isAboutRecord(fault.line())) {
+            found.record = record.sourceText();
+        }
+        found.again = askAgain(*manager, ask);
+        return found;
+    }
+    return std::nullopt;
+}
+
+std::string reasonOf(const ApplicationFault& fault) {
+    if (fault.record) {
+        return fmt::format("{}: \"{}\" is faulty", catalogue::asText(fault.record->origin),
+                           fault.record->text);
+    }
+    return fault.location == location::SUPPORTED_DEVICE_UNKNOWN
+               ? "DEVICE_SUPPORTED lists neither the device nor its family"
+               : "PROGRAM_OPTION_PACKAGE lists neither the device nor its family";
+}
+
+std::string effectOf(const ApplicationFault& fault, const std::optional<std::string>& answer) {
+    const std::string first =
+        fmt::format("an application gets {} (location {})", fault.exception, fault.location);
+    if (!answer) {
+        return first + ", and afterwards answers without this record and those after it";
+    }
+    return first + (fault.again == *answer ? ", and the same answer when it asks again"
+                                           : fmt::format(", and \"{}\" when it asks again", fault.again));
+}
+
+void noteApplicationFault(Tool& tool, const AnswerInWords& ask, const std::optional<std::string>& answer) {
+    const std::optional<ApplicationFault> fault = findApplicationFault(ask);
+    if (!fault) {
+        return;
+    }
+    Json object{{"exception", fault->exception}, {"location", fault->location}};
+    if (answer) {
+        object["again"] = fault->again;
+    }
+    if (fault->record) {
+        object.update(catalogue::asJson(fault->record->origin));
+        object["fragment"] = fault->record->text;
+    }
+    tool.note(reasonOf(*fault) + ": " + effectOf(*fault, answer), "fault", std::move(object));
+}

@@ -1,0 +1,37 @@
+#pragma once
+
+#include "model/Records.h"
+
+#include <functional>
+#include <optional>
+#include <string>
+
+class ConstraintsManager;
+class Tool;
+
+/// Asks a question. @return the answer in words
+using AnswerInWords = std::function<std::string(ConstraintsManager&)>;
+
+/// What an application gets that leaves exceptions on, as they are by default, where the tool, which turns them off,
+/// gets an answer: an exception, and after it an answer without the record that raised and those after it.
+struct ApplicationFault {
+    std::string exception;                         ///< its type
+    int location;                                  ///< its location number
+    std::optional<catalogue::SourceText> record{}; ///< what raised; nothing if no record is at fault
+    std::string again{};                           ///< the answer to the same question, asked once more
+};
+
+/// Asks a fresh manager with exceptions on, twice.
+/// @return nothing if it does not raise, or raises only because a property is missing
+[[nodiscard]] std::optional<ApplicationFault> findApplicationFault(const AnswerInWords& ask);
+
+/// `database/kestrel.acd:26:18: "VERFY" is faulty`, or what else is the reason.
+[[nodiscard]] std::string reasonOf(const ApplicationFault& fault);
+
+/// `an application gets OutOfRangeException (location 1631), and "no" when it asks again`.
+/// @param answer the tool's own; nothing if it has no short form, so that the two cannot be compared
+[[nodiscard]] std::string effectOf(const ApplicationFault& fault, const std::optional<std::string>& answer);
+
+/// Tells the user, in a note and as the member "fault" of the JSON object, if an application gets something else.
+/// @param answer as for `effectOf`
+void noteApplicationFault(Tool& tool, const AnswerInWords& ask, const std::optional<std::string>& answer);

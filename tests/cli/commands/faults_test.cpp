@@ -1,0 +1,166 @@
+// Databases with faulty records: what the commands say about answers that an application would not get.
+#include "cli/support/DatabaseDirectory.h"
+#include "cli/support/ToolProcess.h"
+
+#include <gmock/gmock.h>
+#include <nlohmann/json.hpp>
+
+namespace {
+
+using nlohmann::json;
+using testing::HasSubstr;
+using testing::Not;
+using Words = std::vector<std::string>;
+
+/// A database of one family with the devices FN10 and FN20.
+class FaultyDatabase {
+public:
+    explicit FaultyDatabase(const std::string& family)
+        : m_directory({{"base.acd", "DEVICE_SUPPORTED = finch\n"
+                                    "PROGRAM_OPTION_PACKAGE = finch\n"
+                                    "BS = outputs,USB2:families,finch\n"},
+                       {"finch.acd", family + "[FN10]\n[FN20]\n"}}) {}
+
+    [[nodiscard]] std::string path(const std::string& name) const { return m_directory.path(name); }
+
+    [[nodiscard]] ProcessResult run(Words words) const {
+        words.insert(words.begin(), {"--database", m_directory.path()});
+        return runTool(words);
+    }
+
+    [[nodiscard]] json answer(Words words) const {
+        words.emplace_back("--json");
+        return json::parse(run(words).output);
+    }
+
+private:
+    DatabaseDirectory m_directory;
+};
+
+/// VERIFY is mistyped in the second of three records.
+constexpr const char* TYPO = "OPERATION = PROGRAM,Bscan,USB2:VERFY,Bscan,USB2:ERASE,Bscan,USB2\n"
+                             "PROPERTY = VENDOR,Korvel\n";
+const Words OPERATIONS{"operations", "FN10", "--mode", "BS", "--output", "USB2"};
+const Words VERIFY{"check", "FN10", "--mode", "BS", "--output", "USB2", "--operation", "VERIFY"};
+const Words ERASE{"check", "FN10", "--mode", "BS", "--output", "USB2", "--operation", "ERASE"};
+
+TEST(Faults, NoteSaysWhatAnApplicationGets) {
+    const FaultyDatabase database(TYPO);
+    const std::string place = database.path("finch.acd") + ":1:32: \"VERFY\" is faulty: ";
+    const std::string effect = "an application gets OutOfRangeException (location 1631), and ";
+    const ProcessResult operations = database.run(OPERATIONS);
+    EXPECT_EQ(operations.status, 0);
+    EXPECT_EQ(operations.output, "PROGRAM  Program\nERASE    Erase\n");
+    EXPECT_THAT(operations.error,
+                HasSubstr("tarvik: " + place + effect + "\"PROGRAM\" when it asks again\n"));
+    EXPECT_THAT(database.run(ERASE).error, HasSubstr(place + effect + "\"no\" when it asks again\n"));
+    EXPECT_THAT(database.run(VERIFY).error,
+                HasSubstr(place + effect + "the same answer when it asks again\n"));
+    EXPECT_THAT(database.run({"property", "FN10", "VENDOR"}).error,
+                HasSubstr(place + effect + "the same answer"));
+    EXPECT_THAT(database.run({"bsdl", "FN10", "--output", "SVF"}).error, HasSubstr(place));
+    EXPECT_THAT(database.run({"options", "FN10", "--mode", "BS", "--output", "USB2"}).error,
+                HasSubstr(place));
+    EXPECT_THAT(database.run({"operation-options", "FN10", "PROGRAM", "--mode", "BS"}).error,
+                HasSubstr(place));
+    EXPECT_THAT(database.run({"show", "FN10"}).error,
+                HasSubstr(place + effect.substr(0, effect.size() - 4) +
+                          "and afterwards answers without this record and those after it\n"));
+}
+
+TEST(Faults, AnswerInJsonHasTheFault) {
+    const FaultyDatabase database(TYPO);
+    EXPECT_EQ(database.answer(OPERATIONS)["fault"], (json{{"exception", "OutOfRangeException"},
+                                                          {"location", 1631},
+                                                          {"again", "PROGRAM"},
+                                                          {"file", database.path("finch.acd")},
+                                                          {"line", 1},
+                                                          {"column", 32},
+                                                          {"fragment", "VERFY"}}));
+}
+
+TEST(Faults, AnswersThatReadNoFaultyRecordHaveNoNote) {
+    const FaultyDatabase database(TYPO);
+    EXPECT_EQ(database.run({"check", "FN10", "--mode", "BS"}).error, "");
+    EXPECT_FALSE(database.answer({"check", "FN10", "--mode", "BS"}).contains("fault"));
+    const FaultyDatabase sound("OPERATION = PROGRAM,Bscan,USB2\nPROPERTY = VENDOR,Korvel\n");
+    EXPECT_EQ(sound.run(OPERATIONS).error, "");
+    // An application gets an exception for a missing property in every database.
+    EXPECT_FALSE(sound.answer({"property", "FN10", "PINS"}).contains("fault"));
+}
+
+TEST(Faults, WhyNamesTheRecordThatIsMistyped) {
+    const FaultyDatabase database(TYPO);
+    Words question = VERIFY;
+    question.front() = "why";
+    const ProcessResult outcome = database.run(question);
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_THAT(outcome.output, HasSubstr("  note      \"VERFY\" is not an operation; is VERIFY meant?\n"));
+    EXPECT_THAT(outcome.output,
+                HasSubstr("  fault     an application gets OutOfRangeException (location 1631)"));
+    question.back() = "ERASE";
+    EXPECT_THAT(database.run(question).output, Not(HasSubstr("meant?")));
+    EXPECT_THAT(database.run(question).output, HasSubstr("and \"no\" when it asks again\n"));
+}
+
+TEST(Faults, RecordThatLacksAFieldIsNamedWhole) {
+    const FaultyDatabase database("OPERATION = PROGRAM,Bscan:ERASE,Bscan,USB2\n");
+    EXPECT_THAT(
+        database.run(ERASE).error,
+        HasSubstr("finch.acd:1:13: \"PROGRAM,Bscan\" is faulty: an application gets DataMismatchException "
+                  "(location 1649), and \"no\" when it asks again\n"));
+}
+
+TEST(Faults, FamilyWithoutATable) {
+    const DatabaseDirectory database(
+        {{"base.acd",
+          "DEVICE_SUPPORTED = other\nPROGRAM_OPTION_PACKAGE = finch\nBS = outputs,USB2:families,finch\n"},
+         {"finch.acd", "OPERATION = ERASE,Bscan,USB2\n[FN10]\n"}});
+    Words words = ERASE;
+    words.insert(words.begin(), {"--database", database.path()});
+    EXPECT_THAT(runTool(words).error,
+                HasSubstr("DEVICE_SUPPORTED lists neither the device nor its family: an application gets "
+                          "OutOfRangeException (location 1999), and"));
+}
+
+/// The manager raises at an unknown option, even with exceptions off.
+constexpr const char* UNKNOWN_OPTION = "OPERATION = ERASE,Bscan,USB2\nPROGRAM_OPTION = NONSENSE,Bscan,USB2\n";
+
+TEST(Faults, CommandsThatHaveNoAnswerGiveThePlace) {
+    const FaultyDatabase database(UNKNOWN_OPTION);
+    for (const Words& words :
+         {OPERATIONS, ERASE, Words{"show", "FN10"}, Words{"property", "FN10", "VENDOR"}}) {
+        const ProcessResult outcome = database.run(words);
+        EXPECT_EQ(outcome.status, 2);
+        EXPECT_EQ(outcome.output, "");
+        EXPECT_THAT(outcome.error, HasSubstr(database.path("finch.acd") + ":2:18: "));
+    }
+    Words question = ERASE;
+    question.front() = "why";
+    EXPECT_THAT(database.run(question).output, HasSubstr(database.path("finch.acd") + ":2:18: NONSENSE\n"));
+}
+
+TEST(Faults, SurveysSayHowManyDevicesHaveNoAnswer) {
+    const FaultyDatabase database(UNKNOWN_OPTION);
+    const std::string note = "tarvik: no answer for 2 devices, the first FN10: see tarvik show FN10\n";
+    for (const Words& words :
+         {Words{"which", "--operation", "ERASE"}, Words{"which", "--property", "VENDOR=Korvel"},
+          Words{"report", "--file", "-"}, Words{"report", "--file", database.path("report.html")}}) {
+        const ProcessResult outcome = database.run(words);
+        EXPECT_EQ(outcome.status, 2);
+        EXPECT_EQ(outcome.error, note);
+    }
+    EXPECT_EQ(database.answer({"report", "--file", database.path("report.html")})["faults"],
+              (json{"FN10", "FN20"}));
+    EXPECT_EQ(database.answer({"which", "--operation", "ERASE"})["faults"], (json{"FN10", "FN20"}));
+}
+
+TEST(Faults, SurveysOfASoundDatabase) {
+    const FaultyDatabase database("OPERATION = ERASE,Bscan,USB2\n");
+    const ProcessResult report = database.run({"report", "--file", database.path("report.html")});
+    EXPECT_EQ(report.status, 0);
+    EXPECT_EQ(report.error, "");
+    EXPECT_EQ(database.run({"which", "--operation", "ERASE"}).status, 0);
+}
+
+} // namespace
