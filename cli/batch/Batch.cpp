@@ -31,11 +31,29 @@ public:
     RequestHandler(Messages& messages, const std::vector<batch::Handler>& handlers)
         : m_messages(messages), m_handlers(handlers) {}
 
+    /// The answer on one line.
+    [[nodiscard]] std::string answerText(const InputLines::Line& line) {
+        m_idText.clear();
+        const Json object = answer(line);
+        std::string text = oneLine(object);
+        if (!m_idText.empty()) {
+            // The id is the first member.
+            constexpr std::size_t START = std::string_view(R"({"id":)").size();
+            text.replace(START, oneLine(object["id"]).size(), m_idText);
+        }
+        return text;
+    }
+
+    /// Has the manager been removed?
+    [[nodiscard]] bool ended() const noexcept { return m_ended; }
+
+private:
     [[nodiscard]] Json answer(const InputLines::Line& line) {
         if (line.tooLong) {
             return error({}, fmt::format("a line longer than {} bytes", InputLines::MAX_LENGTH));
         }
         Request request = readRequest(line.text);
+        m_idText = request.idText;
         if (!request.fault.empty()) {
             return error(std::move(request.id), request.fault);
         }
@@ -54,10 +72,6 @@ public:
         return answer;
     }
 
-    /// Has the manager been removed?
-    [[nodiscard]] bool ended() const noexcept { return m_ended; }
-
-private:
     /// Answers what is no method of the interface.
     [[nodiscard]] Json answerBesides(Request request) {
         std::vector<std::string> names = callNames();
@@ -112,6 +126,7 @@ private:
 
     Messages& m_messages;
     const std::vector<batch::Handler>& m_handlers;
+    std::string m_idText; ///< of the request, as it was written
     bool m_ended = false;
 };
 
@@ -130,7 +145,7 @@ ExitCode run(Tool& tool, const std::vector<Handler>& handlers) {
             break;
         }
         if (line->tooLong || !isBlank(line->text)) {
-            output.write(oneLine(handler.answer(*line)) + '\n');
+            output.write(handler.answerText(*line) + '\n');
         }
     }
     output.flush();

@@ -3,6 +3,7 @@
 
 #include <fmt/format.h>
 
+#include <algorithm>
 #include <vector>
 
 namespace {
@@ -95,6 +96,48 @@ private:
     std::string m_fault;
 };
 
+/// The end of the string that begins at this offset of a JSON text.
+std::size_t endOfString(std::string_view text, std::size_t start) {
+    std::size_t end = start + 1;
+    while (end < text.size() && text[end] != '"') {
+        end += text[end] == '\\' ? 2U : 1U;
+    }
+    return std::min(end + 1, text.size());
+}
+
+std::string_view trimmed(std::string_view text) {
+    constexpr std::string_view BLANKS = " \t\r\n";
+    const std::size_t first = std::min(text.find_first_not_of(BLANKS), text.size());
+    text.remove_prefix(first);
+    return text.substr(0, text.find_last_not_of(BLANKS) + 1);
+}
+
+/// The value of "id" as a request writes it: numbers have more digits there than a double keeps.
+/// @param line a JSON object, valid up to the end of that member
+std::string_view idTextOf(std::string_view line) {
+    constexpr std::size_t NONE = std::string_view::npos;
+    std::size_t depth = 0;
+    std::string_view text;
+    std::size_t start = NONE;
+    for (std::size_t i = 0; i < line.size(); ++i) {
+        const char byte = line[i];
+        if (byte == '"') {
+            const std::size_t end = endOfString(line, i);
+            text = line.substr(i, end - i);
+            i = end - 1;
+        } else if (depth == 1 && byte == ':' && Json::parse(text, nullptr, false) == "id") {
+            start = i + 1;
+        } else if (depth == 1 && (byte == ',' || byte == '}') && start != NONE) {
+            return trimmed(line.substr(start, i - start));
+        } else if (byte == '{' || byte == '[') {
+            ++depth;
+        } else if (byte == '}' || byte == ']') {
+            --depth;
+        }
+    }
+    return {};
+}
+
 /// Takes the members of a request; @return what is wrong with them.
 std::string takeMembers(Json& object, Request& request) {
     if (!object.is_object()) {
@@ -137,6 +180,9 @@ Request readRequest(std::string_view line) {
     } else {
         request.fault = reader.fault();
         request.id = reader.takeId();
+    }
+    if (!request.id.is_null()) {
+        request.idText = idTextOf(line);
     }
     return request;
 }

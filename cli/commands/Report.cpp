@@ -61,7 +61,7 @@ ExitCode run(Tool& tool, const std::string& file) {
                 }
             },
             [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
-    if (file == STANDARD_OUTPUT) {
+    if (file == STANDARD_OUTPUT || isStandardOutput(file)) {
         static_cast<void>(tool.answer(Shown{page}));
     } else {
         writeFile(file, page.html());

@@ -15,6 +15,7 @@
 #include <fmt/ranges.h>
 
 #include <memory>
+#include <utility>
 
 namespace {
 
@@ -45,7 +46,7 @@ std::string legend(const std::string& letters) {
 }
 
 /// Rows by modes; the cells show the outputs.
-std::string matrix(const char* title, const std::vector<DeviceTable::Row>& rows, bool withBsdl,
+std::string matrix(const std::string& title, const std::vector<DeviceTable::Row>& rows, bool withBsdl,
                    const Terminal& terminal) {
     if (rows.empty()) {
         return {};
@@ -90,6 +91,42 @@ std::string multibootText(const std::vector<DeviceDetails::Arrangement>& arrange
     return fmt::format("\n{}\n{}", terminal.heading("Multiboot"), table.text(terminal, 2));
 }
 
+/// A row for each mode from which a package is excluded.
+std::string packagesText(const DeviceDetails& details, const Terminal& terminal) {
+    if (details.packages.empty()) {
+        return {};
+    }
+    Table table({"PACKAGE", "NOT IN MODE", "WHERE"});
+    for (const auto& [package, changes] : details.packages) {
+        std::string name = package;
+        for (const DeviceDetails::Exclusion& exclusion : changes.exclusions) {
+            table.add({std::exchange(name, ""), exclusion.mode, catalogue::asText(exclusion.origin)});
+        }
+        if (changes.exclusions.empty()) {
+            table.add({name, "-", ""});
+        }
+    }
+    return fmt::format("\n{}\n{}", terminal.heading("Packages"), table.text(terminal, 2));
+}
+
+bool hasOwnOptions(const DeviceDetails::Package& package, const DeviceDetails& details) {
+    return package.options && package.options->rows != details.options->rows;
+}
+
+/// The options in the packages that have their own.
+std::string packageMatrices(const DeviceDetails& details, const Terminal& terminal) {
+    std::string text;
+    for (const auto& [package, changes] : details.packages) {
+        if (hasOwnOptions(changes, details)) {
+            const std::string title = "Programming options in package " + terminal.sanitised(package) +
+                                      (changes.options->rows.empty() ? ": none" : "");
+            text += changes.options->rows.empty() ? fmt::format("\n{}\n", terminal.heading(title))
+                                                  : matrix(title, changes.options->rows, false, terminal);
+        }
+    }
+    return text;
+}
+
 std::string heading(const DeviceDetails& details, const Terminal& terminal) {
     Table table;
     const bool asWritten = details.name == details.spelling;
@@ -97,6 +134,9 @@ std::string heading(const DeviceDetails& details, const Terminal& terminal) {
                              ? details.name
                              : fmt::format("{} (in the database: {})", details.name, details.spelling)});
     table.add({"Family", details.flash ? details.family + " (a flash)" : details.family});
+    if (!details.flashClass.empty()) {
+        table.add({"Class", details.flashClass});
+    }
     if (details.idcode) {
         table.add({"IDCODE", details.idcode->value + "  " + catalogue::asText(details.idcode->origin)});
         for (const catalogue::Shadow& shadow : details.idcode->shadows) {
@@ -109,11 +149,12 @@ std::string heading(const DeviceDetails& details, const Terminal& terminal) {
 
 std::string asText(const Shown& shown, const Terminal& terminal) {
     const DeviceDetails& details = shown.details;
-    return heading(details, terminal) + section("Properties", details.properties, terminal) +
-           section("Flash properties", details.flashProperties, terminal) +
+    return heading(details, terminal) + section("Properties", details.shownProperties(), terminal) +
+           section("Flash properties", details.flashProperties, terminal) + packagesText(details, terminal) +
            multibootText(details.multiboot, terminal) +
            matrix("Operations", details.operations->rows, true, terminal) +
-           matrix("Programming options", details.options->rows, false, terminal);
+           matrix("Programming options", details.options->rows, false, terminal) +
+           packageMatrices(details, terminal);
 }
 
 Json outputKeys(DeviceTable::Outputs outputs) {
@@ -171,6 +212,23 @@ Json asJson(const std::vector<DeviceDetails::Arrangement>& arrangements) {
     return list;
 }
 
+/// All packages, with the modes that do not take them and the options that they change.
+Json packagesJson(const DeviceDetails& details) {
+    Json list = Json::array();
+    for (const auto& [package, changes] : details.packages) {
+        Json excluded = Json::array();
+        for (const DeviceDetails::Exclusion& exclusion : changes.exclusions) {
+            excluded.push_back({{"mode", exclusion.mode}});
+            excluded.back().update(catalogue::asJson(exclusion.origin));
+        }
+        list.push_back(
+            {{"name", package},
+             {"excluded", std::move(excluded)},
+             {"options", hasOwnOptions(changes, details) ? asJson(changes.options->rows) : Json()}});
+    }
+    return list;
+}
+
 Json asJson(const Shown& shown) {
     const DeviceDetails& details = shown.details;
     return {{"device", details.name},
@@ -178,9 +236,11 @@ Json asJson(const Shown& shown) {
             {"family", details.family},
             {"idcode", details.idcode ? asJson(*details.idcode) : Json()},
             {"modes", details.modes},
-            {"properties", asJson(details.properties)},
+            {"properties", asJson(details.shownProperties())},
             {"flash", details.flash},
+            {"flashClass", details.flashClass.empty() ? Json() : Json(details.flashClass)},
             {"flashProperties", asJson(details.flashProperties)},
+            {"packages", packagesJson(details)},
             {"multiboot", asJson(details.multiboot)},
             {"operations", asJson(details.operations->rows)},
             {"bsdl", bsdlJson(details.operations->rows)},

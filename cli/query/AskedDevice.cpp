@@ -69,24 +69,6 @@ void requireReadableFamilies(const std::string& device) {
     }
 }
 
-/// The packages that the database gives a device.
-Names packagesOf(const std::string& device) {
-    // Opened first, so that what the host layer reports about the file is heard.
-    static_cast<void>(AcdStore::value(device.c_str(), ""));
-    const MutedMessages muted;
-    try {
-        const ManagerFactory::Manager manager = freshManager();
-        if (!manager->isSpiDevice(device.c_str())) {
-            return propertyValues(*manager, device, schema::PACKAGES);
-        }
-        const std::string package = manager->getSpiDeviceStringProperty(device.c_str(), schema::PACKAGE);
-        return package.empty() ? Names() : Names{package};
-    } catch (const TarvikException&) {
-        // The question itself meets the same fault.
-        return {};
-    }
-}
-
 std::string readPackage(const std::string& device, const std::string& text) {
     const Names packages = packagesOf(device);
     const std::optional<std::string> package = findIn(packages, text);
@@ -103,6 +85,28 @@ std::string inPackage(const std::optional<std::string>& package) {
 }
 
 } // namespace
+
+std::optional<std::string> deviceNamed(const std::string& text) {
+    const std::optional<std::string> whole = findDevice(text);
+    return whole ? whole : findDevice(text.substr(0, text.find('_')));
+}
+
+std::vector<std::string> packagesOf(const std::string& device) {
+    // Opened first, so that what the host layer reports about the file is heard.
+    static_cast<void>(AcdStore::value(device.c_str(), ""));
+    const MutedMessages muted;
+    try {
+        const ManagerFactory::Manager manager = freshManager();
+        if (!manager->isSpiDevice(device.c_str())) {
+            return propertyValues(*manager, device, schema::PACKAGES);
+        }
+        const std::string package = manager->getSpiDeviceStringProperty(device.c_str(), schema::PACKAGE);
+        return package.empty() ? Names() : Names{package};
+    } catch (const TarvikException&) {
+        // The question itself meets the same fault.
+        return {};
+    }
+}
 
 AskedDevice askedDevice(Tool& tool, const std::string& device, const std::optional<std::string>& package,
                         PackageUse use) {

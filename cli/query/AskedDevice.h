@@ -4,6 +4,7 @@
 
 #include <optional>
 #include <string>
+#include <vector>
 
 class Tool;
 
@@ -19,6 +20,14 @@ struct AskedDevice {
 
 /// Whether a command asks about the package.
 enum class PackageUse { TAKEN, IGNORED };
+
+/// The device, family or flash that a text means: its name in any case, maybe with "_" and a package.
+/// @return its name as the database spells it; nothing if there is none
+/// @throw DataNotFoundException if its family cannot be read
+[[nodiscard]] std::optional<std::string> deviceNamed(const std::string& text);
+
+/// The packages that the database gives a device; none if it does not say, or the device cannot be loaded.
+[[nodiscard]] std::vector<std::string> packagesOf(const std::string& device);
 
 /// Opens the database, and finds the device that a text means: its name in any case, maybe with "_" and a package. If
 /// that is not the text itself, the user is told in a note, and the JSON object has a member "asked".

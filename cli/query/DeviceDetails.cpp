@@ -2,11 +2,17 @@
 #include "query/DeviceDetails.h"
 
 #include "model/Multiboot.h"
+#include "model/Records.h"
+#include "model/Schema.h"
+#include "model/Vocabulary.h"
+#include "query/AskedDevice.h"
 #include "query/DeviceSurvey.h"
 #include "text/Suggest.h"
 
 #include <TarvikException.h>
 #include <tarvik/ConstraintsManager.h>
+
+#include <algorithm>
 
 namespace {
 
@@ -45,7 +51,33 @@ std::vector<DeviceDetails::Arrangement> arrangements(const ConstraintsManager& m
     return found;
 }
 
+/// Adds the packages that change nothing, and where each package is excluded from a mode.
+void completePackages(DeviceDetails& details) {
+    for (const std::string& package : packagesOf(details.name)) {
+        details.packages.try_emplace(package);
+    }
+    const std::vector<catalogue::SourceText> excluded =
+        catalogue::readList(schema::BASE, schema::NOT_SUPPORTED_PART_IN_MODE);
+    for (auto& [package, changes] : details.packages) {
+        for (std::size_t mode = 0; mode < vocabulary::modes().size(); ++mode) {
+            // In SPI mode the manager treats every device as "spi".
+            const bool isSpi = mode == static_cast<std::size_t>(TARVIKNS::MODE_TYPE::SPI);
+            const std::string part =
+                vocabulary::modes()[mode] + '_' + (isSpi ? "spi" : details.name) + '_' + package;
+            const auto found = std::ranges::find(excluded, part, &catalogue::SourceText::text);
+            if (found != excluded.end()) {
+                changes.exclusions.push_back({vocabulary::modes()[mode], found->origin});
+            }
+        }
+    }
+}
+
 } // namespace
+
+const Properties& DeviceDetails::shownProperties() const {
+    static const Properties none;
+    return flash ? none : properties;
+}
 
 std::string DeviceDetails::whyIncomplete() const {
     if (!isKnown()) {
@@ -71,6 +103,7 @@ void DeviceFactsReader::addFacts(ConstraintsManager& manager, DeviceDetails& det
         details.multiboot = arrangements(manager, device);
     }
     if (details.flash) {
+        details.flashClass = flashClass(device);
         details.flashProperties = flashProperties(manager, device);
     }
     if (!details.fault.empty()) {
@@ -118,10 +151,12 @@ std::optional<DeviceDetails::Idcode> DeviceFactsReader::idcode(const std::string
 DeviceDetails deviceDetails(const std::string& device) {
     // Read first, so that what the host layer reports about the files is heard.
     static_cast<void>(AcdStore::value(device.c_str(), ""));
-    DeviceDetails details = DeviceSurvey({.operations = true, .options = true, .facts = true}).ask(device);
+    DeviceDetails details =
+        DeviceSurvey({.operations = true, .options = true, .packages = true, .facts = true}).ask(device);
     if (const std::string reason = details.whyIncomplete(); !reason.empty()) {
         throw CommandError(details.isKnown() ? ExitCode::FAULT : ExitCode::NO, reason);
     }
     details.spelling = spelling(device, details.family);
+    completePackages(details);
     return details;
 }

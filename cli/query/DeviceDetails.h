@@ -28,11 +28,18 @@ struct DeviceDetails {
         std::string position; ///< "lead" or "chain"
     };
 
+    /// An entry of the list of parts that a mode does not take.
+    struct Exclusion {
+        std::string mode;
+        catalogue::Origin origin;
+    };
+
     /// What a package changes.
     struct Package {
         std::vector<std::string> modes; ///< in which the device may be configured in this package
         std::vector<std::string> modesWithoutOutput;
-        SharedTable options; ///< null: those of the device without a package
+        SharedTable options;                 ///< null: those of the device without a package
+        std::vector<Exclusion> exclusions{}; ///< filled in for a single device only
     };
 
     std::string name;
@@ -44,16 +51,22 @@ struct DeviceDetails {
     std::vector<std::string> modesWithoutOutput; ///< others that are allowed as long as no output is given
     Properties properties;
     bool flash = false;
+    std::string flashClass; ///< whose properties the flash has where it has none itself; may be empty
     Properties flashProperties;
     std::vector<Arrangement> multiboot;
     SharedTable operations;
-    SharedTable options;                     ///< without a package
-    std::map<std::string, Package> packages; ///< those that change an answer
-    bool answer = false;                     ///< to the question that a survey asks besides
-    std::string fault; ///< why the properties, or that answer, are missing; empty if they are not
+    SharedTable options; ///< without a package
+    std::map<std::string, Package>
+        packages;        ///< those that change an answer; for a single device all that are known
+    bool answer = false; ///< to the question that a survey asks besides
+    std::string fault;   ///< why the properties, or that answer, are missing; empty if they are not
 
     /// Does the manager know the device?
     [[nodiscard]] bool isKnown() const { return family != "base"; }
+
+    /// The properties under the device's name. None for a flash: what spi.acd has for all flashes together is not found
+    /// by the name of one.
+    [[nodiscard]] const Properties& shownProperties() const;
 
     /// Why some answer is missing: the manager raises, or does not know the device. Empty if none is.
     [[nodiscard]] std::string whyIncomplete() const;

@@ -23,6 +23,8 @@ struct DeviceTable {
         std::string key;
         std::array<Outputs, MODES> outputs; ///< by mode
         Outputs bsdl;                       ///< as a boundary-scan operation; none for options
+
+        bool operator==(const Row&) const = default;
     };
 
     std::vector<Row> rows;

@@ -57,7 +57,12 @@ Entries entriesUnder(const std::string& name, const std::string& owner, const En
     return found;
 }
 
-/// The class whose properties stand in for those that the flash lacks; of several the last one. Empty: none.
+Entries flashEntries(const std::string& name) {
+    return catalogue::entries("spi.acd", toStdString(UT_STR::Upper(name.c_str())) + "_PROPERTY");
+}
+
+} // namespace
+
 std::string flashClass(const std::string& device) {
     std::string found;
     for (const char* const name : {"AT1", "ST1", "ST2", "BPI1", "BPI2", "BPI3"}) {
@@ -69,12 +74,6 @@ std::string flashClass(const std::string& device) {
     }
     return found;
 }
-
-Entries flashEntries(const std::string& name) {
-    return catalogue::entries("spi.acd", toStdString(UT_STR::Upper(name.c_str())) + "_PROPERTY");
-}
-
-} // namespace
 
 const PropertyReader::Entries& PropertyReader::entriesOfFamily(const std::string& family) {
     const auto [known, isNew] = m_families.try_emplace(family);
@@ -136,11 +135,10 @@ Properties deviceProperties(ConstraintsManager& manager, const std::string& devi
 Properties flashProperties(const ConstraintsManager& manager, const std::string& device) {
     Properties properties;
     const auto add = [&](const std::string& key, const std::string& from, const catalogue::Entry& entry) {
-        properties.push_back({key,
-                              {manager.getSpiDeviceStringProperty(device.c_str(), key.c_str())},
-                              from,
-                              entry.origin,
-                              entry.shadows});
+        const std::string value = manager.getSpiDeviceStringProperty(device.c_str(), key.c_str());
+        if (!value.empty()) {
+            properties.push_back({key, {value}, from, entry.origin, entry.shadows});
+        }
     };
     const Entries own = flashEntries(device);
     for (const auto& [key, entry] : own) {

@@ -49,7 +49,11 @@ private:
 /// @throw TarvikException if the manager raises
 [[nodiscard]] Properties deviceProperties(ConstraintsManager& manager, const std::string& device);
 
-/// The properties of an SPI flash and of its class.
+/// The class whose properties stand in for those that a flash lacks; of several that list it the last one. Empty if there
+/// is none.
+[[nodiscard]] std::string flashClass(const std::string& device);
+
+/// The properties of an SPI flash and of its class that have a value.
 [[nodiscard]] Properties flashProperties(const ConstraintsManager& manager, const std::string& device);
 
 /// A table of properties, behind `indent` blanks.

@@ -135,7 +135,7 @@ std::string bodyOf(const DeviceDetails& details) {
     }
     return facts(details) + matrix("Operations", details.operations->rows, true, details.name) +
            matrix("Programming options", details.options->rows, false, details.name) +
-           propertyTable("Properties", details.properties, details.name) +
+           propertyTable("Properties", details.shownProperties(), details.name) +
            propertyTable("Properties of the flash", details.flashProperties, details.name);
 }
 

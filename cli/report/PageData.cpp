@@ -153,7 +153,7 @@ void PageData::add(const DeviceDetails& details) {
         encoder.append(idcodeOrigin, details.idcode->origin);
     }
     std::string fields = details.idcode ? '[' + idcodeOrigin + ']' : "0";
-    appendItem(fields, encoder.properties(details.properties));
+    appendItem(fields, encoder.properties(details.shownProperties()));
     appendItem(fields, encoder.properties(details.flashProperties));
     appendItem(own.devices, '[' + fields + ']');
     ++m_count;

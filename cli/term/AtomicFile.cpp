@@ -1,4 +1,4 @@
-// A reader never meets half a page, and a run that fails keeps the former one.
+// Replaces a file as a whole, so that a reader never finds half a file and a run that fails keeps the former one.
 #include "term/AtomicFile.h"
 
 #include "term/ExitCode.h"
@@ -45,8 +45,9 @@ int writeAndClose(int descriptor, std::string_view text) {
     return error;
 }
 
+/// Writes to what is there, which keeps its owner, its permissions and its other names.
 void writeInPlace(const std::string& path, std::string_view text, const Fault& fault) {
-    const int descriptor = ::open(path.c_str(), O_WRONLY | O_CLOEXEC);
+    const int descriptor = ::open(path.c_str(), O_WRONLY | O_TRUNC | O_CLOEXEC);
     if (descriptor < 0) {
         fault.raise(errno);
     }
@@ -55,42 +56,62 @@ void writeInPlace(const std::string& path, std::string_view text, const Fault& f
     }
 }
 
-/// What a new file of this process may be, or what the former one was.
-mode_t permissions(const std::filesystem::path& path) {
-    struct stat former {};
-    if (::stat(path.c_str(), &former) == 0) {
-        return former.st_mode & (S_IRWXU | S_IRWXG | S_IRWXO);
+/// Where a path leads: through all links, also to a file that is not there yet.
+std::filesystem::path targetOf(const std::filesystem::path& path) {
+    constexpr int MAX_LINKS = 40;
+    std::filesystem::path target = path;
+    std::error_code none;
+    for (int links = 0; links < MAX_LINKS && std::filesystem::is_symlink(target, none); ++links) {
+        target = target.parent_path() / std::filesystem::read_symlink(target, none);
     }
+    return target;
+}
+
+/// Would another file in the place of this one differ in more than its text?
+bool isUnique(const struct stat& former) {
+    return former.st_nlink == 1 && former.st_uid == ::geteuid() && former.st_gid == ::getegid();
+}
+
+/// The permissions of a new file of this process.
+mode_t usualPermissions() {
     const mode_t mask = ::umask(0);
     ::umask(mask);
     return (S_IRUSR | S_IWUSR | S_IRGRP | S_IWGRP | S_IROTH | S_IWOTH) & ~mask;
+}
+
+/// Creates a file next to the target. Its name does not depend on the target's, which may be as long as names can be.
+/// @return its descriptor; -1 if it cannot be created
+int createBeside(const std::filesystem::path& target, std::string& name) {
+    name = (target.parent_path() / ".tarvik.XXXXXX").string();
+    return ::mkostemp(name.data(), O_CLOEXEC);
 }
 
 } // namespace
 
 void writeFile(const std::string& path, std::string_view text) {
     const Fault fault(path);
-    std::error_code none;
-    // Behind a link, the file that it leads to is the one to replace.
-    const std::filesystem::path target = std::filesystem::is_symlink(path, none)
-                                             ? std::filesystem::weakly_canonical(path, none)
-                                             : std::filesystem::path(path);
-    const std::filesystem::file_status status = std::filesystem::status(target, none);
-    if (std::filesystem::exists(status) && !std::filesystem::is_regular_file(status)) {
+    struct stat former {};
+    const bool exists = ::stat(path.c_str(), &former) == 0;
+    if (!exists && errno != ENOENT) {
+        fault.raise(errno);
+    }
+    if (exists && (!S_ISREG(former.st_mode) || !isUnique(former))) {
         writeInPlace(path, text, fault);
         return;
     }
-    std::string beside = target.string() + ".XXXXXX";
-    const int descriptor = ::mkostemp(beside.data(), O_CLOEXEC);
+    const std::filesystem::path target = targetOf(path);
+    std::string beside;
+    const int descriptor = createBeside(target, beside);
     if (descriptor < 0) {
-        fault.raise(errno);
+        if (!exists) {
+            fault.raise(errno);
+        }
+        // The directory takes no new file, but the file itself may be writable.
+        writeInPlace(path, text, fault);
+        return;
     }
-    struct stat former {};
-    if (::stat(target.c_str(), &former) == 0 && ::fchown(descriptor, former.st_uid, former.st_gid) != 0) {
-        // Only a privileged user can give files away; the text is the user's own.
-        [[maybe_unused]] const int ignored = ::fchown(descriptor, static_cast<uid_t>(-1), former.st_gid);
-    }
-    int error = ::fchmod(descriptor, permissions(target)) == 0 ? 0 : errno;
+    const mode_t permissions = exists ? former.st_mode & (S_IRWXU | S_IRWXG | S_IRWXO) : usualPermissions();
+    int error = ::fchmod(descriptor, permissions) == 0 ? 0 : errno;
     const int written = writeAndClose(descriptor, text);
     error = error == 0 ? written : error;
     if (error == 0 && ::rename(beside.c_str(), target.c_str()) != 0) {
@@ -100,4 +121,11 @@ void writeFile(const std::string& path, std::string_view text) {
         ::unlink(beside.c_str());
         fault.raise(error);
     }
+}
+
+bool isStandardOutput(const std::string& path) {
+    struct stat file {};
+    struct stat output {};
+    return ::stat(path.c_str(), &file) == 0 && ::fstat(STDOUT_FILENO, &output) == 0 &&
+           file.st_dev == output.st_dev && file.st_ino == output.st_ino;
 }

@@ -5,14 +5,15 @@
 #include "lint/Rule.h"
 #include "model/Catalogue.h"
 #include "model/Vocabulary.h"
+#include "query/AskedDevice.h"
 #include "query/Demonstration.h"
+#include "query/Properties.h"
 #include "term/Messages.h"
 #include "term/Output.h"
 #include "text/Json.h"
 #include "text/Suggest.h"
 
 #include <TarvikException.h>
-#include <UT_STR.h>
 #include <tarvik/ConstraintsManager.h>
 
 #include <algorithm>
@@ -37,33 +38,36 @@ Words modes() {
     return all;
 }
 
-std::string device(const PartialCommandLine& line) {
-    return line.operands.empty() ? std::string() : line.operands.front();
-}
-
-void addKeys(std::set<std::string>& keys, const std::string& owner, const std::string& list) {
-    for (const auto& [key, entry] : catalogue::entries(owner, list)) {
-        keys.insert(key);
-    }
-}
-
 ConstraintsManager& manager() {
     ConstraintsManager& made = *ConstraintsManager::getConstraintsManager();
     made.setExceptions(false);
     return made;
 }
 
-/// The properties of a device and its family, or of all families when there is no device.
+/// The device that the line is about, as the database spells it; an empty text if there is none.
+std::string device(const PartialCommandLine& line) {
+    return line.operands.empty() ? std::string() : deviceNamed(line.operands.front()).value_or("");
+}
+
+/// The properties of a device that have a value.
+void addKeys(std::set<std::string>& keys, const std::string& name) {
+    for (const Property& property : manager().isSpiDevice(name.c_str()) ? flashProperties(manager(), name)
+                                                                        : deviceProperties(manager(), name)) {
+        if (!property.values.empty()) {
+            keys.insert(property.key);
+        }
+    }
+}
+
+/// The properties of the line's device, or those that any device has.
 Words properties(const PartialCommandLine& line) {
-    const Words owners =
-        line.operands.empty()
-            ? catalogue::families()
-            : Words{device(line), toStdString(manager().getPartFamily(device(line).c_str()))};
     std::set<std::string> keys;
-    for (const std::string& owner : owners) {
-        addKeys(keys, owner, "PROPERTY");
-        addKeys(keys, owner, "PROPERTIES");
-        addKeys(keys, "spi.acd", toStdString(UT_STR::Upper(owner.c_str())) + "_PROPERTY");
+    if (const std::string name = device(line); !name.empty()) {
+        addKeys(keys, name);
+    } else if (line.operands.empty()) {
+        for (const std::string& any : catalogue::names()) {
+            addKeys(keys, any);
+        }
     }
     return {keys.begin(), keys.end()};
 }
@@ -71,12 +75,13 @@ Words properties(const PartialCommandLine& line) {
 /// The values that any device has for a property.
 std::set<std::string> valuesOfProperty(const std::string& key) {
     std::set<std::string> values;
-    for (const std::string& device : catalogue::names()) {
-        for (const StringBase& value : manager().getDeviceStringProperties(device.c_str(), key.c_str())) {
-            values.insert(toStdString(value));
-        }
-        if (manager().isSpiDevice(device.c_str())) {
-            values.insert(manager().getSpiDeviceStringProperty(device.c_str(), key.c_str()));
+    for (const std::string& any : catalogue::names()) {
+        if (manager().isSpiDevice(any.c_str())) {
+            values.insert(manager().getSpiDeviceStringProperty(any.c_str(), key.c_str()));
+        } else {
+            for (std::string& value : propertyValues(manager(), any, key)) {
+                values.insert(std::move(value));
+            }
         }
     }
     values.erase("");
@@ -98,14 +103,6 @@ Words assignments(const PartialCommandLine& line) {
         key += '=';
     }
     return keys;
-}
-
-Words packages(const PartialCommandLine& line) {
-    Words all;
-    for (const StringBase& package : manager().getDeviceStringProperties(device(line).c_str(), "PACKAGES")) {
-        all.push_back(toStdString(package));
-    }
-    return all;
 }
 
 Words flashes() {
@@ -139,7 +136,7 @@ Words valuesOf(const CommandLine& all, const PartialCommandLine& line, const Arg
     case ValueKind::FAMILY:
         return catalogue::families();
     case ValueKind::PACKAGE:
-        return packages(line);
+        return packagesOf(device(line));
     case ValueKind::MODE:
         return modes();
     case ValueKind::OUTPUT:

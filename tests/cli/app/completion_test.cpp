@@ -75,9 +75,12 @@ TEST_F(Completion, OffersTheVocabulary) {
 TEST_F(Completion, OffersWhatTheDeviceHas) {
     EXPECT_THAT(offered({"property", "FN10", ""}),
                 ElementsAre("CORE", "OP_PROGRAM", "PINS", "PROGRAM", "VENDOR"));
-    EXPECT_THAT(offered({"property", "FLA", ""}), ElementsAre("DENSITY", "PAGE"));
+    EXPECT_THAT(offered({"property", "FLA", ""}), ElementsAre("BUS", "DENSITY", "PAGE"));
+    EXPECT_THAT(offered({"property", "fn10_p48", "P"}), ElementsAre("PINS", "PROGRAM"));
+    EXPECT_THAT(offered({"property", "ZZ", ""}), IsEmpty());
     EXPECT_THAT(offered({"why", "FN10", "--property", "V"}), ElementsAre("VENDOR"));
-    EXPECT_THAT(offered({"which", "--property", "V"}), ElementsAre("VENDOR="));
+    EXPECT_THAT(offered({"which", "--property", ""}), ElementsAre("BUS=", "CORE=", "DENSITY=", "OP_PROGRAM=",
+                                                                  "PAGE=", "PINS=", "PROGRAM=", "VENDOR="));
     EXPECT_THAT(offered({"which", "--property", "VENDOR="}), ElementsAre("VENDOR=Korvel"));
     EXPECT_THAT(offered({"which", "--property=VENDOR=k"}), ElementsAre("--property=VENDOR=Korvel"));
     EXPECT_THAT(offered({"which", "--property", "NO="}), IsEmpty());

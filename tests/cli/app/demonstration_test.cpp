@@ -37,6 +37,11 @@ TEST(Demonstration, IsTheDatabaseFolder) {
         for (json& property : carried["properties"]) {
             property["file"] = DATABASE + "/" + property["file"].get<std::string>();
         }
+        for (json& package : carried["packages"]) {
+            for (json& exclusion : package["excluded"]) {
+                exclusion["file"] = DATABASE + "/base.acd";
+            }
+        }
         carried["idcode"]["file"] = DATABASE + "/base.acd";
         EXPECT_EQ(carried, asked({"show", device["name"]}, DATABASE));
     }

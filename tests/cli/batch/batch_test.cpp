@@ -225,6 +225,25 @@ TEST(Batch, ManyRequestsAreAnsweredInOrder) {
     }
 }
 
+// A double would not give these back.
+TEST(Batch, IdIsGivenBackAsItWasWritten) {
+    const SmallDatabase database;
+    const std::string call = R"("call": "getPartFamily", "args": ["FN10"])";
+    for (const std::string id :
+         {"1.0", "1e3", "-0", "123456789012345678901234567890", "0.1000", R"("\u00e9 \"a\": }")",
+          R"([1, 2.50, {"id": 7.0}])", R"({"call": 1.10, "b": [  ]})", "true", "null"}) {
+        ProcessOptions options = database.start({"batch"});
+        options.input = "{\"id\": " + id + " , " + call + "}\n{" + call + ", \"id\":" + id +
+                        "}\n{\"i\\u0064\": " + id + ", " + call + "}\n{\"id\": " + id +
+                        ", \"call\": \"zz\"}\n{\"id\": " + id + ", \"call\": 1 2}\n";
+        const std::string start = "{\"id\":" + id + ",\"";
+        const std::string answer = start + "result\":\"finch\",\"messages\":[]}\n";
+        const std::string output = runTool(options).output;
+        EXPECT_THAT(output, testing::StartsWith(answer + answer + answer + start + "error\":"));
+        EXPECT_THAT(output, HasSubstr('\n' + start + "error\":\"not JSON"));
+    }
+}
+
 TEST(Batch, DatabaseIsOpenedBeforeTheFirstRequest) {
     ProcessOptions start{{"--database", "/nowhere", "batch"}, "{\"call\": \"getOperationOrders\"}\n", {}, ""};
     const ProcessResult outcome = runTool(start);

@@ -3,6 +3,8 @@
 
 #include <gmock/gmock.h>
 
+#include <algorithm>
+
 namespace {
 
 using nlohmann::json;
@@ -41,6 +43,12 @@ TEST(Show, WholeSheetOfADevice) {
                                   family +
                                   ":5:12\n"
                                   "\n"
+                                  "Packages\n"
+                                  "  PACKAGE  NOT IN MODE  WHERE\n"
+                                  "  P48      SS           " +
+                                  database.path("base.acd") +
+                                  ":6:30\n"
+                                  "\n"
                                   "Multiboot\n"
                                   "  TYPE_MB_SPI  NONE  lead\n"
                                   "\n"
@@ -55,7 +63,12 @@ TEST(Show, WholeSheetOfADevice) {
                                   "Programming options\n"
                                   "  through  P PARALLEL  Z ZORVA  U USB2  S SVF  T STAPL\n"
                                   "         BS     SS  SM  BSFILE  DP770  SPI\n"
-                                  "  ERASE  --U--  -   -   -       -      -\n");
+                                  "  ERASE  --U--  -   -   -       -      -\n"
+                                  "\n"
+                                  "Programming options in package P48\n"
+                                  "  through  P PARALLEL  Z ZORVA  U USB2  S SVF  T STAPL\n"
+                                  "          BS     SS  SM  BSFILE  DP770  SPI\n"
+                                  "  VERIFY  P----  -   -   -       -      -\n");
 }
 
 TEST(Show, WholeSheetInJson) {
@@ -84,6 +97,13 @@ TEST(Show, WholeSheetInJson) {
                                                     "ERASE": {"SPI": ["USB2"]}})"));
     EXPECT_EQ(answer["bsdl"], json::parse(R"({"HIGHZ": ["USB2", "SVF"]})"));
     EXPECT_EQ(answer["options"], json::parse(R"({"ERASE": {"BS": ["USB2"]}})"));
+    EXPECT_EQ(
+        answer["packages"],
+        (json::array({{{"name", "P48"},
+                       {"excluded",
+                        {{{"mode", "SS"}, {"file", database.path("base.acd")}, {"line", 6}, {"column", 30}}}},
+                       {"options", {{"VERIFY", {{"BS", {"PARALLEL"}}}}}}}})));
+    EXPECT_EQ(answer["flashClass"], nullptr);
     EXPECT_EQ(answer["messages"], json::array());
 }
 
@@ -108,10 +128,61 @@ TEST(Show, PackageDoesNotChangeTheIdcode) {
 TEST(Show, FlashHasFlashProperties) {
     const SmallDatabase database;
     const ProcessResult outcome = database.run({"show", "FLB"});
-    EXPECT_THAT(outcome.output, StartsWith("Device  FLB\nFamily  spi (a flash)\nModes   SPI\n"));
+    EXPECT_THAT(outcome.output, StartsWith("Device  FLB\nFamily  spi (a flash)\nClass   ST1\nModes   SPI\n"));
     EXPECT_THAT(outcome.output,
                 HasSubstr("\nFlash properties\n  PROPERTY  VALUE  FROM  WHERE\n  BUS       SPI    ST1 "));
     EXPECT_THAT(outcome.output, Not(HasSubstr("IDCODE")));
+}
+
+// The properties that `show`, `spi` and completion list are those that `property` and `which` find.
+TEST(Show, PropertiesOfFlashesAreThoseThatPropertyFinds) {
+    for (const char* const flash : {"OVD16", "BNP16M"}) {
+        const json answer = json::parse(runTool({"show", flash, "--json"}).output);
+        EXPECT_EQ(answer["properties"], json::array());
+        std::vector<std::string> shown;
+        for (const json& property : answer["flashProperties"]) {
+            const std::string key = property["key"];
+            const std::string value = property["values"][0];
+            EXPECT_EQ(runTool({"property", flash, key}).output, value + "\n");
+            EXPECT_THAT(runTool({"which", "--property", key + '=' + value}).output, HasSubstr(flash));
+            shown.push_back(key);
+        }
+        std::sort(shown.begin(), shown.end());
+        std::string listed;
+        for (const std::string& key : shown) {
+            listed += key + '\n';
+        }
+        EXPECT_EQ(runTool({"complete", "property", flash, ""}).output, listed);
+    }
+}
+
+TEST(Show, EmptyPropertyOfAFlashIsLeftOut) {
+    const DatabaseDirectory directory(
+        {{"base.acd", "DEVICE_SUPPORTED = spi\n"},
+         {"spi.acd", "DEVICE_FAMILY = ST1\nST1_DEVICES = FLA\nFLA_PROPERTY = PAGE,:BUS,SPI\n"}});
+    const json answer =
+        json::parse(runTool({"--database", directory.path(), "show", "FLA", "--json"}).output);
+    ASSERT_EQ(answer["flashProperties"].size(), 1U);
+    EXPECT_EQ(answer["flashProperties"][0]["key"], "BUS");
+    EXPECT_EQ(runTool({"--database", directory.path(), "property", "FLA", "PAGE"}).status, 1);
+}
+
+TEST(Show, PackagesOfTheDevice) {
+    const ProcessResult outcome = runTool({"show", "KS50"});
+    EXPECT_THAT(outcome.output, HasSubstr("\nPackages\n"
+                                          "  PACKAGE  NOT IN MODE  WHERE\n"
+                                          "  PQ208    -\n"
+                                          "  TQ100    SM           base.acd:"));
+    const json answer = json::parse(runTool({"show", "KS50", "--json"}).output);
+    for (const json& package : answer["packages"]) {
+        for (const char* const mode : {"BS", "SS", "SM", "BSFILE", "KITECF", "KITEMPM"}) {
+            const bool isExcluded =
+                std::any_of(package["excluded"].begin(), package["excluded"].end(),
+                            [&](const json& exclusion) { return exclusion["mode"] == mode; });
+            EXPECT_EQ(runTool({"check", "KS50", "--mode", mode, "--package", package["name"]}).status,
+                      isExcluded ? 1 : 0);
+        }
+    }
 }
 
 TEST(Show, PropertyWithoutValuesSaysSo) {

@@ -44,14 +44,15 @@ std::size_t expectAgreement(const std::vector<std::string>& database) {
     std::vector<std::string> arguments = database;
     arguments.insert(arguments.end(), {"report", "--file", "-"});
     const ProcessResult outcome = runTool(arguments);
-    EXPECT_EQ(outcome.status, 0) << outcome;
     const PageData page(outcome.output);
+    bool hasFaults = false;
     for (std::size_t device = 0; device < page.size(); ++device) {
+        hasFaults = hasFaults || page.fault(device) != json();
         if (page.name(device).find("\uFFFD") != std::string::npos) {
             continue; // its bytes are no UTF-8, so what the page shows can't be asked for
         }
         arguments = database;
-        arguments.insert(arguments.end(), {"show", page.name(device), "--json"});
+        arguments.insert(arguments.end(), {"--literal", "show", page.name(device), "--json"});
         const json answer = json::parse(runTool(arguments).output);
         if (answer.contains("error")) {
             EXPECT_EQ(page.fault(device), answer.at("error")) << page.name(device);
@@ -64,6 +65,7 @@ std::size_t expectAgreement(const std::vector<std::string>& database) {
         }
         EXPECT_EQ(sheet, shown(answer)) << page.name(device);
     }
+    EXPECT_EQ(outcome.status, hasFaults ? 2 : 0) << outcome.error;
     return page.size();
 }
 
