@@ -1,6 +1,6 @@
 // Where a report goes, and that it goes there whole or not at all.
 #include "cli/support/SmallDatabase.h"
-#include "report/AtomicFile.h"
+#include "term/AtomicFile.h"
 #include "term/ExitCode.h"
 
 #include <gmock/gmock.h>
@@ -215,8 +215,8 @@ TEST(ReportFiles, WritableFileInADirectoryThatIsNot) {
     }
     ASSERT_EQ(::chmod(place.path().c_str(), 0555), 0);
     ASSERT_EQ(isRoot ? ::seteuid(NOBODY) : 0, 0);
-    EXPECT_NO_THROW(report::writeFile(place.path("page.html"), "page"));
-    EXPECT_THROW(report::writeFile(place.path("other.html"), "page"), CommandError);
+    EXPECT_NO_THROW(writeFile(place.path("page.html"), "page"));
+    EXPECT_THROW(writeFile(place.path("other.html"), "page"), CommandError);
     ASSERT_EQ(isRoot ? ::seteuid(0) : 0, 0);
     ASSERT_EQ(::chmod(place.path().c_str(), 0755), 0);
     EXPECT_EQ(textOf(place.path("page.html")), "page");
