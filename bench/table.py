@@ -67,7 +67,11 @@ def figures(results):
         nothing = results["nothing", size]["process"]
         if size in ("S", "L"):
             first = results["first question", size]["process"] - nothing
-            yield "first question, ms", size, first, 1.5 if size == "S" else 12
+            yield "first question, ms", size, first, 1.1 if size == "S" else 18
+            indexed = results["first question, with an index", size]["process"] - nothing
+            yield "first question with an index, ms", size, indexed, 1.1 if size == "S" else 8
+            start = results["start-up", size]["process"] - nothing
+            yield "start-up, ms", size, start, 1.1 if size == "S" else 5
         for kind in ("operations", "property"):
             row = results[f"call, {kind}", size]
             yield f"{kind} through C: ns above 1.3 times C++", size, row["C"] - 1.3 * row["C++"], 20

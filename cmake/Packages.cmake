@@ -55,6 +55,11 @@ a pkg-config file, guides and an example.")
 set(CPACK_DEBIAN_TOOLS_PACKAGE_SECTION devel)
 set(CPACK_DEBIAN_TOOLS_PACKAGE_SHLIBDEPS ON)
 set(CPACK_DEBIAN_TOOLS_PACKAGE_RECOMMENDS ${database_package})
+# A trigger keeps the index of the installed database current.
+set(CPACK_DEBIAN_TOOLS_PACKAGE_CONTROL_EXTRA
+  ${PROJECT_SOURCE_DIR}/cmake/debian/tools/postinst
+  ${PROJECT_SOURCE_DIR}/cmake/debian/tools/postrm
+  ${PROJECT_SOURCE_DIR}/cmake/debian/tools/triggers)
 set(CPACK_DEBIAN_TOOLS_DESCRIPTION "device-programming constraints - command-line tool
 The command tarvik asks a device database what a device-programming
 application may offer for a device, explains each answer by the record that

@@ -27,6 +27,8 @@ void use(const acd::DirectoryIndex& index) {
     acd::DeviceIndex devices;
     for (const acd::IndexedFile& file : index.contents().files) {
         devices.add(file.sections, 0);
+    }
+    for (const acd::IndexedFile& file : index.contents().files) {
         file.sections.forEach([&devices](std::string_view name) {
             if (devices.family(name) != 0) {
                 fuzz::fail("a section is not found");

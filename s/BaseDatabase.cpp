@@ -58,7 +58,7 @@ void ConstraintsManager::Implementation::loadModeDeviceSets() {
 
 void ConstraintsManager::Implementation::loadDeviceIdcodes() {
     forEachRecord(*m_devKey, "IDCODE", [&](const Record& record, const StringBase& device) {
-        m_deviceIdcodes.set(device, {}, view(record.field(1)));
+        m_deviceIdcodes.set(view(device), {}, view(record.field(1)));
     });
 }
 

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "StringViews.h"
+
 #include <tarvik/ltptstr.h>
 
 #include <algorithm>
@@ -22,7 +24,7 @@ public:
         std::vector<Ranked> order;
         order.reserve(names.size());
         for (StringBase& name : names) {
-            order.push_back({prefixOf(name), &name});
+            order.push_back({prefixOf(view(name)), &name});
         }
         std::sort(order.begin(), order.end());
         m_names.reserve(names.size());

@@ -102,7 +102,7 @@ void ConstraintsManager::Implementation::readSpiProperties(PM_DEVKEY* accessor) 
                 diagnostics::raiseIf<DataMismatchException>(
                     m_exceptions, diagnostics::location::SPI_PROPERTY_WITHOUT_VALUE);
             }
-            m_spiProperties.set(name, property, view(value));
+            m_spiProperties.set(view(name), view(property), view(value));
         });
     }
 }

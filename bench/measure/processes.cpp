@@ -5,6 +5,8 @@
 #include <chrono>
 #include <cstdio>
 #include <cstdlib>
+#include <filesystem>
+#include <fstream>
 #include <stdexcept>
 #include <string>
 #include <vector>
@@ -75,6 +77,15 @@ void compare(std::string_view size, const std::vector<Program>& programs, int ro
     }
 }
 
+/// A copy of a database with an index of its own, beside it.
+std::string copyWithIndex(const std::string& tool, const std::string& database, const std::string& name) {
+    std::string copy = database + "-" + name;
+    std::filesystem::remove_all(copy);
+    std::filesystem::copy(database, copy);
+    run({"index", {tool, "index", copy}});
+    return copy;
+}
+
 /// What works through a whole database: its time by the clock, and its memory.
 void measureWhole(std::string_view size, const Program& program) {
     std::vector<double> elapsed;
@@ -101,11 +112,23 @@ int main(int argumentCount, char** arguments) {
     const std::string tool = arguments[4];
     const std::string device = makeFacts(*size, USUAL_SEED).families.back().devices.back().name;
     try {
+        // A copy with an index, and one whose index is not current any more.
+        const std::string indexed = copyWithIndex(tool, database, "indexed");
+        const std::string stale = copyWithIndex(tool, database, "stale");
+        std::ofstream(stale + "/base.acd", std::ios::app) << "# changed\n";
+        const std::string question = programs + "/tarvik_bench_first_question";
+        const auto check = [&](const std::string& directory) -> std::vector<std::string> {
+            return {tool, "--database", directory, "check", device, "--mode", "BS"};
+        };
         // Short ones, so many rounds.
         compare(size->name,
                 {{"nothing", {programs + "/tarvik_bench_nothing"}},
                  {"start-up", {programs + "/tarvik_bench_start_up", database}},
-                 {"first question", {programs + "/tarvik_bench_first_question", database, device}}},
+                 {"first question", {question, database, device}},
+                 {"first question, with an index", {question, indexed, device}},
+                 {"first question, with a stale index", {question, stale, device}},
+                 {"tarvik check", check(database)},
+                 {"tarvik check, with an index", check(indexed)}},
                 4 * ROUNDS);
         compare(size->name, {{"dump operations", {tool, "--database", database, "dump", "operations"}}},
                 ROUNDS);

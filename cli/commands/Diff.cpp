@@ -3,12 +3,14 @@
 
 #include "diff/CompareDatabases.h"
 #include "diff/Presentation.h"
+#include "diff/Revision.h"
 #include "query/Database.h"
 #include "query/DeviceTables.h"
 #include "query/Tool.h"
 #include "term/Progress.h"
 
 #include <fmt/format.h>
+#include <fmt/ranges.h>
 
 #include <exception>
 #include <memory>
@@ -17,8 +19,9 @@
 namespace {
 
 struct Arguments {
-    std::string oldDatabase;
-    std::string newDatabase;
+    std::vector<std::string> databases;
+    std::string against;
+    std::string failOn = "any";
     std::string format = "text";
 };
 
@@ -73,16 +76,31 @@ std::string snapshotOrFault(Tool& tool, const std::string& database) {
     }
 }
 
+diff::Comparison compare(const Arguments& arguments) {
+    const std::size_t wanted = arguments.against.empty() ? 2 : 1;
+    if (arguments.databases.size() != wanted) {
+        throw CommandError(ExitCode::FAULT, wanted == 2 ? "diff needs two databases: tarvik diff OLD NEW"
+                                                        : "diff --against REVISION needs one database");
+    }
+    if (wanted == 2) {
+        return diff::compareDatabases(arguments.databases[0], arguments.databases[1]);
+    }
+    const diff::Revision revision(arguments.against, layers(arguments.databases[0]));
+    return diff::compareDatabases(fmt::format("{}", fmt::join(revision.directories(), ":")),
+                                  arguments.databases[0]);
+}
+
 ExitCode run(Tool& tool, const Arguments& arguments) {
     if (arguments.format == diff::SNAPSHOT_FORMAT) {
-        return tool.answer(Written{snapshotOrFault(tool, arguments.oldDatabase)});
+        return tool.answer(Written{snapshotOrFault(tool, arguments.databases.front())});
     }
     if (arguments.format != "text" && arguments.format != "markdown") {
         throw CommandError(ExitCode::FAULT,
                            fmt::format("unknown format \"{}\"\nformats: text, markdown", arguments.format));
     }
-    const diff::Comparison comparison = diff::compareDatabases(arguments.oldDatabase, arguments.newDatabase);
-    ExitCode status = comparison.isEmpty() ? ExitCode::YES : ExitCode::NO;
+    const diff::Comparison comparison = compare(arguments);
+    const bool isRefused = arguments.failOn == "lost" ? comparison.hasLosses() : !comparison.isEmpty();
+    ExitCode status = isRefused ? ExitCode::NO : ExitCode::YES;
     if (!comparison.unanswered.empty()) {
         tool.note(fmt::format(
             "answers about {} devices are missing in both databases, the first \"{}\": see tarvik why",
@@ -96,16 +114,21 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
 Action declare(ArgumentList& list) {
     auto arguments = std::make_shared<Arguments>();
     list = {
-        {.name = "OLD",
-         .description = "The old database: its directory, or its layers separated by \":\"",
+        {.name = "DATABASE",
+         .description = "The old database and the new one; with --against the new one only",
          .kind = ValueKind::PATH,
          .required = true,
-         .target = &arguments->oldDatabase},
-        {.name = "NEW",
-         .description = "The new database",
-         .kind = ValueKind::PATH,
-         .required = true,
-         .target = &arguments->newDatabase},
+         .target = &arguments->databases},
+        {.name = "--against",
+         .value = "REVISION",
+         .description = "Take the old database from this revision of its git repository",
+         .target = &arguments->against},
+        {.name = "--fail-on",
+         .value = "CHANGES",
+         .description = "Which differences give exit status 1: any, or only answers that are lost",
+         .kind = ValueKind::CHOICE,
+         .choices = {"lost", "any"},
+         .target = &arguments->failOn},
         {.name = "--format",
          .value = "FORMAT",
          .description = "The form of the result; markdown is for release notes",
@@ -120,9 +143,12 @@ Action declare(ArgumentList& list) {
 const Command command::DIFF{
     "diff",
     "Compare the answers of two databases",
-    "Lists the answers that differ. The layers of a database are separated by \":\".",
+    "Lists the answers that differ. The layers of a database are separated by \":\". With --against, the old "
+    "database is "
+    "taken from git; the work tree is not touched.",
     "tarvik diff database changed\n"
     "tarvik diff company site:company --json\n"
+    "tarvik diff --against HEAD --fail-on lost database\n"
     "tarvik diff released database --format markdown",
     declare,
 };

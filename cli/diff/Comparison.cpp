@@ -242,6 +242,16 @@ private:
 
 } // namespace
 
+bool Comparison::hasLosses() const {
+    const auto isLoss = [](const Change& change) {
+        return change.question.topic == FAULTS ? !change.gained.empty() : !change.lost.empty();
+    };
+    return !onlyInOld.empty() || std::any_of(general.begin(), general.end(), isLoss) ||
+           std::any_of(groups.begin(), groups.end(), [&isLoss](const Group& group) {
+               return std::any_of(group.changes.begin(), group.changes.end(), isLoss);
+           });
+}
+
 bool Comparison::isEmpty() const {
     return onlyInOld.empty() && onlyInNew.empty() && general.empty() && groups.empty();
 }

@@ -44,6 +44,10 @@ struct Comparison {
     std::vector<std::string> unanswered;
 
     [[nodiscard]] bool isEmpty() const;
+
+    /// Does the new database lack an answer that the old one gives? A value that becomes another one is lost, and so
+    /// are answers that only the new database fails to give.
+    [[nodiscard]] bool hasLosses() const;
 };
 
 [[nodiscard]] Comparison compare(const Snapshot& before, const Snapshot& after);

@@ -38,11 +38,32 @@ std::string readAll(int input) {
 } // namespace
 
 Subprocess::Subprocess(const std::vector<std::string>& arguments, bool isSilent) {
-    std::vector<char*> words{const_cast<char*>("tarvik")};
-    for (const std::string& argument : arguments) {
-        words.push_back(const_cast<char*>(argument.c_str()));
+    std::vector<std::string> command{"tarvik"};
+    command.insert(command.end(), arguments.begin(), arguments.end());
+    std::vector<std::string> environment;
+    for (char** variable = environ; *variable != nullptr; ++variable) {
+        environment.emplace_back(*variable);
     }
-    words.push_back(nullptr);
+    start("/proc/self/exe", command, environment, isSilent);
+}
+
+Subprocess::Subprocess(const std::vector<std::string>& command, const std::vector<std::string>& environment,
+                       bool isSilent) {
+    start(command.front().c_str(), command, environment, isSilent);
+}
+
+void Subprocess::start(const char* program, const std::vector<std::string>& command,
+                       const std::vector<std::string>& environment, bool isSilent) {
+    const auto pointers = [](const std::vector<std::string>& texts) {
+        std::vector<char*> all;
+        for (const std::string& text : texts) {
+            all.push_back(const_cast<char*>(text.c_str()));
+        }
+        all.push_back(nullptr);
+        return all;
+    };
+    const std::vector<char*> words = pointers(command);
+    const std::vector<char*> variables = pointers(environment);
     std::array<int, 2> ends{};
     if (::pipe2(ends.data(), O_CLOEXEC) != 0) {
         fail("can't make a pipe", errno);
@@ -53,14 +74,15 @@ Subprocess::Subprocess(const std::vector<std::string>& arguments, bool isSilent)
     if (isSilent) {
         ::posix_spawn_file_actions_addopen(&actions, STDERR_FILENO, "/dev/null", O_WRONLY, 0);
     }
-    const int error = ::posix_spawn(&m_process, "/proc/self/exe", &actions, nullptr, words.data(), environ);
+    const int error = ::posix_spawnp(&m_process, program, &actions, nullptr, words.data(), variables.data());
     ::posix_spawn_file_actions_destroy(&actions);
     ::close(ends[1]);
-    m_output = ends[0];
     if (error != 0) {
-        ::close(m_output);
-        fail("can't start a process", error);
+        ::close(m_output = ends[0]);
+        m_process = -1;
+        fail(("can't start " + command.front()).c_str(), error);
     }
+    m_output = ends[0];
 }
 
 Subprocess::~Subprocess() {
@@ -70,12 +92,17 @@ Subprocess::~Subprocess() {
 }
 
 std::string Subprocess::output() {
-    std::string text = readAll(m_output);
-    const int status = wait();
-    if (!WIFEXITED(status) || WEXITSTATUS(status) != EXIT_SUCCESS) {
+    std::string text;
+    if (!succeeds(text)) {
         throw CommandError(ExitCode::FAULT, "a process that reads a database failed");
     }
     return text;
+}
+
+bool Subprocess::succeeds(std::string& text) {
+    text = readAll(m_output);
+    const int status = wait();
+    return WIFEXITED(status) && WEXITSTATUS(status) == EXIT_SUCCESS;
 }
 
 /// Stops reading and waits. @return the status with which the process ended

@@ -3,12 +3,12 @@
 
 #include "diff/CompareDatabases.h"
 #include "term/ExitCode.h"
+#include "term/TemporaryDirectory.h"
 
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
 #include <algorithm>
-#include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <map>
@@ -18,27 +18,6 @@ namespace edit {
 namespace {
 
 namespace fs = std::filesystem;
-
-/// A directory that exists as long as this object.
-class TemporaryDirectory {
-public:
-    TemporaryDirectory() : m_path((fs::temp_directory_path() / "tarvik-edit-XXXXXX").string()) {
-        if (::mkdtemp(m_path.data()) == nullptr) {
-            throw CommandError(ExitCode::FAULT, fmt::format("cannot make a directory: \"{}\"", m_path));
-        }
-    }
-    ~TemporaryDirectory() {
-        std::error_code ignored;
-        fs::remove_all(m_path, ignored);
-    }
-    TemporaryDirectory(const TemporaryDirectory&) = delete;
-    TemporaryDirectory& operator=(const TemporaryDirectory&) = delete;
-
-    [[nodiscard]] const std::string& path() const noexcept { return m_path; }
-
-private:
-    std::string m_path;
-};
 
 /// Makes a layer with the texts in place of some files; the others are links to those of the layer.
 void copyLayer(const fs::path& layer, const fs::path& copy,

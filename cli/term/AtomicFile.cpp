@@ -1,4 +1,4 @@
-// Replaces a file as a whole, so that a reader never finds half a page and a run that fails keeps the former one.
+// Replaces a file as a whole, so that a reader never finds half a file and a run that fails keeps the former one.
 #include "term/AtomicFile.h"
 
 #include "term/ExitCode.h"

@@ -128,11 +128,12 @@ std::optional<DirectoryIndex> Catalogue::currentIndex(std::uint32_t layer) const
         for (const SourceFile& file : family->files) {
             if (file.layer == layer) {
                 names.push_back(fileNameOf(file.path));
-                std::ranges::transform(file.caseCollisions, std::back_inserter(names), fileNameOf);
+                std::transform(file.caseCollisions.begin(), file.caseCollisions.end(),
+                               std::back_inserter(names), fileNameOf);
             }
         }
     }
-    std::ranges::sort(names);
+    std::sort(names.begin(), names.end());
     return index->isCurrent(directory, names) ? std::move(index) : std::nullopt;
 }
 

@@ -49,22 +49,26 @@ std::optional<DirectoryIndex> DirectoryIndex::decode(std::string_view bytes) {
 }
 
 bool DirectoryIndex::isCurrent(const std::string& directory, std::span<const std::string_view> names) const {
-    if (!std::ranges::equal(m_contents.files, names, {}, &IndexedFile::name)) {
+    const bool isListed =
+        std::equal(m_contents.files.begin(), m_contents.files.end(), names.begin(), names.end(),
+                   [](const IndexedFile& file, std::string_view name) { return file.name == name; });
+    if (!isListed) {
         return false;
     }
     try {
         const DirectoryStatus status(directory);
-        return std::ranges::all_of(m_contents.files, [&status](const IndexedFile& file) {
-            return status.ofReadableFile(file.name) == file.status;
-        });
+        return std::all_of(
+            m_contents.files.begin(), m_contents.files.end(),
+            [&status](const IndexedFile& file) { return status.ofReadableFile(file.name) == file.status; });
     } catch (const ReadError&) {
         return false;
     }
 }
 
 const PackedStrings* DirectoryIndex::sections(std::string_view fileName) const noexcept {
-    const auto file = std::ranges::lower_bound(
-        m_contents.files, fileName, {}, [](const IndexedFile& each) { return std::string_view(each.name); });
+    const auto file =
+        std::lower_bound(m_contents.files.begin(), m_contents.files.end(), fileName,
+                         [](const IndexedFile& each, std::string_view name) { return each.name < name; });
     if (file == m_contents.files.end() || file->name != fileName || !m_contents.isSettled(*file)) {
         return nullptr;
     }

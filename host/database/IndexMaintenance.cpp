@@ -13,7 +13,7 @@ namespace acd {
 std::vector<std::string> databaseFiles(const std::string& directory) {
     std::vector<std::string> names = listDirectory(directory);
     std::erase_if(names, [](const std::string& name) { return familyName(name).empty(); });
-    std::ranges::sort(names);
+    std::sort(names.begin(), names.end());
     return names;
 }
 
@@ -40,7 +40,7 @@ IndexContents describeDirectory(const std::string& directory, std::uint64_t devi
 IndexState indexState(const std::string& directory) {
     const std::vector<std::string> files = databaseFiles(directory);
     const std::vector<std::string> all = listDirectory(directory);
-    if (std::ranges::find(all, indexFormat::FILE_NAME) == all.end()) {
+    if (std::find(all.begin(), all.end(), indexFormat::FILE_NAME) == all.end()) {
         return IndexState::MISSING;
     }
     const std::optional<DirectoryIndex> index = DirectoryIndex::read(directory);

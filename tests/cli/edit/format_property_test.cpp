@@ -1,4 +1,5 @@
-// Formatting random databases changes no answer. TARVIK_PROPERTY_DATABASES says how many, TARVIK_PROPERTY_SEED which.
+// Formatting random databases changes no answer. TARVIK_PROPERTY_DATABASES says how many, TARVIK_PROPERTY_SEED which. All
+// must read alike, from which it follows; every one, or every TARVIK_PROPERTY_ANSWERS_EVERY-th, is asked everything as well.
 #include "cli/diff/DatabaseRewriter.h"
 #include "cli/support/OpenDatabase.h"
 #include "reference/DatabaseGenerator.h"
@@ -61,13 +62,16 @@ bool answersAlike(const Files& files, const Files& others) {
 TEST(FormatOfRandomDatabases, ChangesNoAnswer) {
     const std::uint64_t seed = setting("TARVIK_PROPERTY_SEED", 1);
     const std::uint64_t count = setting("TARVIK_PROPERTY_DATABASES", 40);
+    const std::uint64_t every = setting("TARVIK_PROPERTY_ANSWERS_EVERY", 1);
     reference::RandomSource pick{rc::Random(seed)};
     for (std::uint64_t i = 0; i < count && !testing::Test::HasFailure(); ++i) {
         const reference::Health health =
             pick.chance(30) ? reference::Health::DAMAGED : reference::Health::SOUND;
         const Files files = reference::makeDatabases(pick, health);
         const Files forms = formatted(files);
-        EXPECT_TRUE(answersAlike(files, forms)) << "database " << i << " of seed " << seed;
+        if (i % every == 0) {
+            EXPECT_TRUE(answersAlike(files, forms)) << "database " << i << " of seed " << seed;
+        }
         if (health == reference::Health::SOUND) {
             // Written in another way: continuations, odd blanks and line ends, layers.
             for (const Files& layer : rewritten(pick, files)) {

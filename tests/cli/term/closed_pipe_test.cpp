@@ -52,7 +52,7 @@ TEST(ClosedPipe, EndsQuietlyWithMoreThanAnyPipeHolds) {
 
 TEST(ClosedPipe, KeepsTheAnswerInTheExitStatus) {
     EXPECT_EQ(heard(TARVIK_SOURCE_DIRECTORY "/tests/data/bad/T101", "lint"),
-              "tarvik: 1 error, 0 warnings\n1\n");
+              "tarvik: 1 error, 0 warnings\nT101: 1\n1\n");
 }
 
 } // namespace

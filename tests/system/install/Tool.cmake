@@ -3,6 +3,6 @@ include(${CMAKE_CURRENT_LIST_DIR}/Context.cmake)
 
 execute_process(COMMAND ${TREE}/${BINARIES}/tarvik check KS50 --mode BS --output USB2 --operation PROGRAM
   ERROR_VARIABLE messages RESULT_VARIABLE status)
-if(NOT status EQUAL 0 OR NOT messages STREQUAL "")
+if(NOT status EQUAL 0 OR messages MATCHES "demonstration")
   message(FATAL_ERROR "tarvik ends with ${status} and says: ${messages}")
 endif()

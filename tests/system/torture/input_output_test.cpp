@@ -118,9 +118,15 @@ protected:
             SCOPED_TRACE(call.path + ", call " + std::to_string(number));
             const Outcome disturbed =
                 run(static_cast<long>(number), [error](const SystemCalls::Call&) { return error; });
-            EXPECT_THAT(disturbed.messages,
-                        Contains(call.path + ": can't be read: " + std::strerror(error) + "\n").Times(1));
-            expectNothingElseLost(disturbed, call.path);
+            if (call.path.ends_with("/index.acx")) {
+                // Without it the files are scanned; it can be made at any time.
+                EXPECT_EQ(disturbed.answers, m_undisturbed.answers);
+                EXPECT_EQ(disturbed.messages, m_undisturbed.messages);
+            } else {
+                EXPECT_THAT(disturbed.messages,
+                            Contains(call.path + ": can't be read: " + std::strerror(error) + "\n").Times(1));
+                expectNothingElseLost(disturbed, call.path);
+            }
             ++failed;
         }
         EXPECT_GE(failed, 2);

@@ -1,0 +1,146 @@
+// Which differences are losses, on random pairs of databases against a plain definition; and the statuses of the command.
+// TARVIK_PROPERTY_DATABASES says how many pairs, TARVIK_PROPERTY_SEED which.
+#include "cli/support/DatabaseDirectory.h"
+#include "cli/support/OpenDatabase.h"
+#include "cli/support/SmallDatabase.h"
+#include "cli/support/ToolProcess.h"
+#include "reference/DatabaseGenerator.h"
+
+#include "diff/Comparison.h"
+
+#include <TarvikException.h>
+
+#include <gmock/gmock.h>
+
+#include <cstdlib>
+#include <optional>
+
+using testing::HasSubstr;
+
+namespace {
+
+using reference::Files;
+using Facts = std::set<std::tuple<std::string, diff::Question, std::string>>;
+
+std::uint64_t setting(const char* name, std::uint64_t usual) {
+    const char* const text = std::getenv(name);
+    return text == nullptr ? usual : std::strtoull(text, nullptr, 10);
+}
+
+/// Loses a piece of a line somewhere, or doubles one.
+void mutate(reference::RandomSource& pick, Files& files) {
+    auto file = std::next(files.begin(), pick.below(static_cast<int>(files.size())));
+    std::string& text = file->second;
+    const auto at = static_cast<std::size_t>(pick.below(static_cast<int>(text.size()) + 1));
+    const std::size_t begin = text.find_first_of(",:\n", at);
+    const std::size_t end = begin == text.npos ? begin : text.find_first_of(",:\n", begin + 1);
+    if (end != text.npos && pick.chance(70)) {
+        text.erase(begin, end - begin);
+    } else if (end != text.npos) {
+        text.insert(begin, text.substr(begin, end - begin) + "X");
+    }
+}
+
+std::optional<std::string> snapshot(const Files& files) {
+    const OpenDatabase open(files);
+    try {
+        return diff::takeSnapshot([](std::size_t, std::size_t) {});
+    } catch (const TarvikException&) {
+        return std::nullopt;
+    }
+}
+
+/// All answers of a database one by one; the device of general ones is empty.
+Facts factsOf(const diff::Snapshot& database) {
+    Facts facts;
+    const auto add = [&facts](const std::string& device, const diff::Answers& answers) {
+        for (const auto& [question, all] : answers) {
+            for (const std::string& answer : all) {
+                facts.emplace(device, question, answer);
+            }
+        }
+    };
+    add({}, database.general());
+    for (const auto& [name, device] : database.devices()) {
+        const std::string key = (device.isFamily ? "family " : "device ") + std::string(name);
+        facts.emplace(key, diff::Question{"", "is there"}, "yes");
+        if (device.shared != nullptr) {
+            add(key, *device.shared);
+        }
+        add(key, diff::deserialized(device.own));
+    }
+    return facts;
+}
+
+bool isFault(const Facts::value_type& fact) { return std::get<1>(fact).topic == diff::FAULTS; }
+
+/// Is there an answer that only the old database gives, or a fault that only the new one has?
+bool loses(const Facts& before, const Facts& after) {
+    return std::any_of(before.begin(), before.end(),
+                       [&after](const auto& fact) { return !isFault(fact) && !after.contains(fact); }) ||
+           std::any_of(after.begin(), after.end(),
+                       [&before](const auto& fact) { return isFault(fact) && !before.contains(fact); });
+}
+
+} // namespace
+
+TEST(Losses, AreAnswersThatTheNewDatabaseDoesNotGive) {
+    const std::uint64_t seed = setting("TARVIK_PROPERTY_SEED", 1);
+    reference::RandomSource pick{rc::Random(seed)};
+    std::size_t losing = 0;
+    std::size_t gaining = 0;
+    for (std::uint64_t i = setting("TARVIK_PROPERTY_DATABASES", 40); i > 0 && !HasFailure(); --i) {
+        const Files before =
+            makeDatabases(pick, pick.chance(20) ? reference::Health::DAMAGED : reference::Health::SOUND);
+        Files after = before;
+        for (int changes = pick.below(3); changes >= 0; --changes) {
+            mutate(pick, after);
+        }
+        const bool isSwapped = pick.chance(50);
+        std::optional<std::string> first = snapshot(isSwapped ? after : before);
+        std::optional<std::string> second = snapshot(isSwapped ? before : after);
+        if (!first || !second) {
+            continue;
+        }
+        const diff::Snapshot old(*std::move(first));
+        const diff::Snapshot recent(*std::move(second));
+        const diff::Comparison comparison = diff::compare(old, recent);
+        const bool isLoss = loses(factsOf(old), factsOf(recent));
+        EXPECT_EQ(comparison.hasLosses(), isLoss) << i << " pairs before the end of seed " << seed;
+        losing += isLoss ? 1U : 0U;
+        gaining += !isLoss && !comparison.isEmpty() ? 1U : 0U;
+    }
+    EXPECT_GT(losing, 0U);
+    EXPECT_GT(gaining, 0U);
+}
+
+TEST(DiffFailOn, LostIgnoresWhatIsNew) {
+    const DatabaseDirectory::Files files{{"base.acd", "DEVICE_SUPPORTED = base,kestrel\n"
+                                                      "PROGRAM_OPTION_PACKAGE = base,kestrel\n"
+                                                      "IDCODE = KS50,0xX4104FB7\n"},
+                                         {"kestrel.acd", "PROPERTY = VENDOR,Korvel\n[KS50]\n"}};
+    DatabaseDirectory::Files more = files;
+    more["kestrel.acd"] += "PROPERTY = PINS,140\n[KS75]\n";
+    const DatabaseDirectory less(files);
+    const DatabaseDirectory recent(more);
+    const auto status = [](const DatabaseDirectory& before, const DatabaseDirectory& after,
+                           const char* failOn) {
+        return runTool(std::vector<std::string>{"diff", "--fail-on", failOn, before.path(), after.path()})
+            .status;
+    };
+    EXPECT_EQ(status(less, recent, "lost"), 0);
+    EXPECT_EQ(status(less, recent, "any"), 1);
+    EXPECT_EQ(status(recent, less, "lost"), 1);
+    EXPECT_EQ(status(less, less, "any"), 0);
+    EXPECT_EQ(status(less, less, "none"), 2);
+}
+
+TEST(DiffAgainst, NeedsARepository) {
+    const SmallDatabase database;
+    const ProcessResult outcome =
+        runTool(std::vector<std::string>{"diff", "--against", "HEAD", database.path()});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_THAT(outcome.error, HasSubstr("is not in a git repository"));
+    EXPECT_EQ(runTool(std::vector<std::string>{"diff", "--against", "HEAD", database.path(), "more"}).status,
+              2);
+}
