@@ -37,7 +37,7 @@ struct Snapshot {
                  {"KITECF families", text(members.m_kiteCfDevices)},
                  {"KITEMPM families", text(members.m_kiteMpmDevices)},
                  {"PFF families", text(members.m_pffDevices)},
-                 {"idcodes", text(members.m_deviceIdcodes)},
+                 {"idcodes", text(members.m_deviceIdcodes.get())},
                  {"excluded parts", text(members.m_notSupportedPartInMode)},
                  {"orders", text(manager.getOperationOrders()) + text(manager.getProgramOptionOrders())},
                  {"SPI names", text(members.m_spiNames) + text(members.m_spiFamilies)},
@@ -47,7 +47,7 @@ struct Snapshot {
                  {"BPI1", text(members.m_bpi1Devices)},
                  {"BPI2", text(members.m_bpi2Devices)},
                  {"BPI3", text(members.m_bpi3Devices)},
-                 {"SPI properties", text(members.m_spiProperties)},
+                 {"SPI properties", text(members.m_spiProperties.get())},
                  {"SPI operations", masks(manager,
                                           [&](auto output) {
                                               return manager.getDeviceOperations("", TARVIKNS::MODE_TYPE::SPI,
