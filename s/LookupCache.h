@@ -3,6 +3,8 @@
 #include "StringViews.h"
 
 #include <cstddef>
+#include <cstdint>
+#include <cstring>
 #include <functional>
 #include <string_view>
 #include <vector>
@@ -51,8 +53,25 @@ private:
     };
     static constexpr std::size_t FREE = 0;
 
+    /// Mixes the first and the last bytes of a short name, which are all of it, without a call: the hash of the standard
+    /// library is a fifth of the work of a look-up.
     [[nodiscard]] static std::size_t hashOf(std::string_view device) noexcept {
-        const std::size_t hash = std::hash<std::string_view>()(device);
+        constexpr std::uint64_t FACTOR = 0x9E3779B97F4A7C15;
+        constexpr std::size_t WORD = sizeof(std::uint64_t);
+        std::uint64_t first = device.size();
+        std::uint64_t last = 0;
+        if (device.size() > 2 * WORD) {
+            first = std::hash<std::string_view>()(device);
+        } else if (device.size() >= WORD) {
+            std::memcpy(&first, device.data(), WORD);
+            std::memcpy(&last, device.data() + device.size() - WORD, WORD);
+        } else {
+            for (const char byte : device) {
+                last = last << 8 | static_cast<unsigned char>(byte);
+            }
+        }
+        const std::uint64_t mixed = (first * FACTOR ^ last) * FACTOR;
+        const auto hash = static_cast<std::size_t>(mixed ^ mixed >> 32);
         return hash == FREE ? 1 : hash;
     }
     static Slot& slotFor(std::vector<Slot>& slots, std::size_t hash) noexcept;

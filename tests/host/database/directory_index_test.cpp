@@ -1,5 +1,7 @@
 #include "DirectoryIndexes.h"
 
+#include "database/DeviceIndex.h"
+
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -377,4 +379,23 @@ TEST(PackedStrings, TakesOnlyNamesThatFitTogether) {
     EXPECT_THAT(strings.ends(), ElementsAre(1, 3));
     EXPECT_TRUE(strings.assign("", {}));
     EXPECT_THAT(strings.bytes(), IsEmpty());
+}
+
+TEST(DeviceIndex, AnswersTheFirstLookUpsAsAllOthers) {
+    acd::PackedStrings first;
+    first.add("KS50");
+    first.add("ks100");
+    acd::PackedStrings second;
+    second.add("KS100");
+    second.add("ML1");
+    acd::DeviceIndex index;
+    index.add(first, 3);
+    index.add(second, 5);
+    for (int round = 0; round != 4; ++round) {
+        EXPECT_EQ(index.family("ks50"), 3U) << round;
+        EXPECT_EQ(index.family("KS100"), 3U) << round;
+        EXPECT_EQ(index.family("ml1"), 5U) << round;
+        EXPECT_EQ(index.family("ML2"), acd::DeviceIndex::NONE) << round;
+        EXPECT_EQ(index.family(""), acd::DeviceIndex::NONE) << round;
+    }
 }
