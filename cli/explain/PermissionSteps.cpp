@@ -143,12 +143,15 @@ bool ExplanationBuilder::hasTable(std::string& owner) {
     if (const Match listing = m_asked.startUp.findItem(table.list, name)) {
         std::string text = fmt::format("{} of {}", table.key, name);
         const ReadLog::Value* const records = consulted();
-        if (records != nullptr && !records->items.empty() &&
-            (records->fromSection ? records->device : records->family) != name) {
-            text += records->fromSection ? fmt::format(", read from [{}]", records->device)
-                                         : ", read from " + records->family;
+        if (records == nullptr || records->items.empty()) {
+            add("table", std::move(text), listing);
+        } else {
+            if ((records->fromSection ? records->device : records->family) != name) {
+                text += records->fromSection ? fmt::format(", read from [{}]", records->device)
+                                             : ", read from " + records->family;
+            }
+            add("table", std::move(text), {records, &records->items.front().whole});
         }
-        add("table", std::move(text), listing);
         owner = name;
         return true;
     }

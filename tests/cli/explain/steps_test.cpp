@@ -40,7 +40,7 @@ TEST(WhySteps, TheDecidingRecordIsNamedWithItsPlace) {
     const explanation::Explanation found = explained(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
     EXPECT_EQ(found.verdict, Conclusion::YES);
     EXPECT_EQ(place(stepAbout(found.steps, "record")), "fam.acd:2:29: PROGRAM,Bscan,SVF,USB2");
-    EXPECT_EQ(place(stepAbout(found.steps, "table")), "base.acd:1:20: fam");
+    EXPECT_EQ(place(stepAbout(found.steps, "table")), "fam.acd:2:13: ERASE,Bscan,SVF");
     EXPECT_EQ(stepAbout(found.steps, "family").text, "fam: section [D1] of fam.acd");
 }
 
@@ -410,7 +410,7 @@ TEST(WhyPresentation, StepsReadAsATableWithPlaces) {
               "yes: PROGRAM of D1 in mode BS through USB2\n"
               "  family    fam: section [D1] of fam.acd\n"
               "  table     OPERATION of fam\n"
-              "            base.acd:1:20: fam\n"
+              "            fam.acd:1:13: PROGRAM,Bscan,USB2\n"
               "  record    PROGRAM is allowed in mode BS through USB2\n"
               "            fam.acd:1:13: PROGRAM,Bscan,USB2\n");
 }
