@@ -56,6 +56,7 @@ void Subprocess::start(const char* program, const std::vector<std::string>& comm
                        const std::vector<std::string>& environment, bool isSilent) {
     const auto pointers = [](const std::vector<std::string>& texts) {
         std::vector<char*> all;
+        all.reserve(texts.size() + 1);
         for (const std::string& text : texts) {
             all.push_back(const_cast<char*>(text.c_str()));
         }

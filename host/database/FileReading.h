@@ -1,6 +1,5 @@
 #pragma once
 
-#include <compare>
 #include <cstddef>
 #include <cstdint>
 #include <exception>
@@ -8,6 +7,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <tuple>
 #include <utility>
 #include <vector>
 
@@ -33,7 +33,10 @@ struct FileTime {
     std::int64_t seconds = 0;
     std::uint32_t nanoseconds = 0;
 
-    friend auto operator<=>(const FileTime&, const FileTime&) = default;
+    friend bool operator==(const FileTime&, const FileTime&) = default;
+    friend bool operator<(const FileTime& left, const FileTime& right) noexcept {
+        return std::tie(left.seconds, left.nanoseconds) < std::tie(right.seconds, right.nanoseconds);
+    }
 };
 
 /// What identifies a file and one state of it: every change of the content changes the status, unless two changes
