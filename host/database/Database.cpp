@@ -248,11 +248,6 @@ std::string_view Database::family() const noexcept {
     return m_layers.empty() ? std::string_view() : familyName(fileNameOf(m_layers.front().path));
 }
 
-std::span<const Value> Database::values(const Section* section) const noexcept {
-    const Section& wanted = section == nullptr ? m_sections.front() : *section;
-    return {m_values.data() + wanted.m_first, wanted.m_count};
-}
-
 const Value* Database::find(const Section* section, std::string_view key) const noexcept {
     const Value* const value = section == nullptr ? nullptr : findIn(*section, key);
     return value != nullptr ? value : findIn(m_sections.front(), key);

@@ -94,9 +94,6 @@ public:
     /// The place of a section among all, the family's own (null) being 0.
     [[nodiscard]] std::size_t ordinal(const Section* section) const noexcept;
 
-    /// The values of a section itself, or of the family's own keys (null), in byte order of their keys.
-    [[nodiscard]] std::span<const Value> values(const Section* section) const noexcept;
-
     /// The value of a key: the section's, else the family's own. Null for `section` asks the family alone.
     [[nodiscard]] const Value* find(const Section* section, std::string_view key) const noexcept;
 

@@ -158,3 +158,24 @@ TEST_F(FileReading, RefusesATextOverAGibibyte) {
               }),
               "larger than 1 GiB");
 }
+
+TEST(FileStatus, DiffersIfOneFieldDoes) {
+    const acd::FileStatus status{1, 2, 3, {4, 5}, {6, 7}};
+    const acd::FileStatus same = status;
+    EXPECT_TRUE(status == same);
+    EXPECT_FALSE((status == acd::FileStatus{0, 2, 3, {4, 5}, {6, 7}}));
+    EXPECT_FALSE((status == acd::FileStatus{1, 0, 3, {4, 5}, {6, 7}}));
+    EXPECT_FALSE((status == acd::FileStatus{1, 2, 0, {4, 5}, {6, 7}}));
+    EXPECT_FALSE((status == acd::FileStatus{1, 2, 3, {0, 5}, {6, 7}}));
+    EXPECT_FALSE((status == acd::FileStatus{1, 2, 3, {4, 0}, {6, 7}}));
+    EXPECT_FALSE((status == acd::FileStatus{1, 2, 3, {4, 5}, {0, 7}}));
+    EXPECT_FALSE((status == acd::FileStatus{1, 2, 3, {4, 5}, {6, 0}}));
+}
+
+TEST(DirectoryStatus, AFileThatIsGoneHasNone) {
+    const TemporaryDirectory directory;
+    directory.write("a.acd", "KEY = a\n");
+    const acd::DirectoryStatus status(directory.path());
+    EXPECT_TRUE(status.ofReadableFile("a.acd").has_value());
+    EXPECT_FALSE(status.ofReadableFile("b.acd").has_value());
+}
