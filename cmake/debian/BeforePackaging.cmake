@@ -11,3 +11,9 @@ foreach(binary ${binaries})
     execute_process(COMMAND strip --remove-section=.comment --remove-section=.note ${binary} COMMAND_ERROR_IS_FATAL ANY)
   endif()
 endforeach()
+
+# The licence is in each package's copyright file.
+file(GLOB licences ${installed}/share/doc/*/LICENSE)
+if(licences)
+  file(REMOVE ${licences})
+endif()
