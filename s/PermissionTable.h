@@ -29,14 +29,13 @@ public:
           m_masks(blocks * static_cast<std::size_t>(modes) * static_cast<std::size_t>(outputs)) {}
 
     void allow(std::size_t block, int row, int mode, int output) {
-        // The width of a mask is checked here, next to the shift that depends on it.
-        if (isCell(block, mode, output) && isWithin(row, m_rows) && row < MAX_ROWS) {
-            m_masks[position(block, mode, output)] |= std::uint32_t{1} << row;
+        if (isCell(block, mode, output)) {
+            m_masks[position(block, mode, output)] |= bit(row);
         }
     }
 
     [[nodiscard]] bool allows(std::size_t block, int row, int mode, int output) const noexcept {
-        return isWithin(row, m_rows) && row < MAX_ROWS && (mask(block, mode, output) >> row & 1U) != 0;
+        return (mask(block, mode, output) & bit(row)) != 0;
     }
 
     /// Bit i is set when row i is allowed.
@@ -50,6 +49,11 @@ private:
     static constexpr int MAX_ROWS = 32;
 
     [[nodiscard]] static bool isWithin(int value, int bound) noexcept { return value >= 0 && value < bound; }
+
+    /// The bit of a row in a mask; none for a row outside the table.
+    [[nodiscard]] std::uint32_t bit(int row) const noexcept {
+        return isWithin(row, m_rows) && row < MAX_ROWS ? std::uint32_t{1} << row : 0;
+    }
 
     [[nodiscard]] bool isCell(std::size_t block, int mode, int output) const noexcept {
         return block < m_blocks && isWithin(mode, m_modes) && isWithin(output, m_outputs);
