@@ -2,7 +2,6 @@
 #include "commands/Commands.h"
 
 #include "commands/IndexWriter.h"
-#include "database/DirectoryIndex.h"
 #include "database/IndexMaintenance.h"
 #include "query/Tool.h"
 #include "term/Table.h"
@@ -44,11 +43,9 @@ Json asJson(const AllWritten& indexes) {
     return {{"written", list}};
 }
 
-/// An index as it is, and whether its directory is still as it says.
 struct Shown {
     std::string path;
-    acd::IndexState state;
-    acd::IndexContents contents; ///< without files if there is no valid index
+    acd::CheckedIndex index;
 };
 
 struct StateName {
@@ -59,7 +56,7 @@ struct StateName {
 StateName nameOf(acd::IndexState state) {
     switch (state) {
     case acd::IndexState::MISSING:
-        return {"missing", "there is none"};
+        return {"missing", "the directory has no index"};
     case acd::IndexState::INVALID:
         return {"invalid", "not used: it can't be read, is damaged or of another version"};
     case acd::IndexState::STALE:
@@ -81,16 +78,17 @@ std::string asText(const acd::FileTime& time) {
 }
 
 std::string asText(const Shown& shown, const Terminal& terminal) {
-    std::string text = fmt::format("{}: {}\n", terminal.sanitised(shown.path), nameOf(shown.state).text);
-    if (shown.contents.files.empty()) {
+    std::string text =
+        fmt::format("{}: {}\n", terminal.sanitised(shown.path), nameOf(shown.index.state).text);
+    if (shown.index.contents.files.empty()) {
         return text;
     }
-    text += fmt::format("made {}\n", asText(shown.contents.created));
+    text += fmt::format("made {}\n", asText(shown.index.contents.created));
     Table table({"FILE", "SIZE", "CHANGED", "SECTIONS", ""});
-    for (const acd::IndexedFile& file : shown.contents.files) {
+    for (const acd::IndexedFile& file : shown.index.contents.files) {
         table.add({terminal.sanitised(file.name), std::to_string(file.status.size),
                    asText(file.status.changed), std::to_string(file.sections.ends().size()),
-                   shown.contents.isSettled(file) ? "" : "read each time: as young as the index"});
+                   shown.index.contents.isSettled(file) ? "" : "read each time: as young as the index"});
     }
     return text + table.text(terminal);
 }
@@ -103,32 +101,29 @@ Json asJson(const acd::PackedStrings& strings) {
 
 Json asJson(const Shown& shown) {
     Json files = Json::array();
-    for (const acd::IndexedFile& file : shown.contents.files) {
+    for (const acd::IndexedFile& file : shown.index.contents.files) {
         files.push_back({{"name", file.name},
                          {"size", file.status.size},
                          {"changed", asText(file.status.changed)},
-                         {"settled", shown.contents.isSettled(file)},
+                         {"settled", shown.index.contents.isSettled(file)},
                          {"sections", asJson(file.sections)}});
     }
-    const bool isValid = !shown.contents.files.empty();
+    const bool isValid = !shown.index.contents.files.empty();
     return {{"path", shown.path},
-            {"state", nameOf(shown.state).word},
-            {"created", isValid ? Json(asText(shown.contents.created)) : Json()},
+            {"state", nameOf(shown.index.state).word},
+            {"created", isValid ? Json(asText(shown.index.contents.created)) : Json()},
             {"files", files}};
 }
 
 ExitCode show(Tool& tool, const std::string& directory) {
-    Shown shown{indexPath(directory), {}, {}};
     try {
-        shown.state = acd::indexState(directory);
+        const Shown shown{indexPath(directory), acd::checkIndex(directory)};
+        return tool.answer(shown,
+                           shown.index.state == acd::IndexState::CURRENT ? ExitCode::YES : ExitCode::NO);
     } catch (const acd::ReadError& unreadable) {
         throw CommandError(ExitCode::FAULT,
                            fmt::format("can't read \"{}\": {}", directory, unreadable.what()));
     }
-    if (const auto index = acd::DirectoryIndex::read(directory)) {
-        shown.contents = index->contents();
-    }
-    return tool.answer(shown, shown.state == acd::IndexState::CURRENT ? ExitCode::YES : ExitCode::NO);
 }
 
 ExitCode run(Tool& tool, const Arguments& arguments) {

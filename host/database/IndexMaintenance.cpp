@@ -10,11 +10,18 @@
 
 namespace acd {
 
-std::vector<std::string> databaseFiles(const std::string& directory) {
-    std::vector<std::string> names = listDirectory(directory);
+namespace {
+
+[[nodiscard]] std::vector<std::string> databaseFilesAmong(std::vector<std::string> names) {
     std::erase_if(names, [](const std::string& name) { return familyName(name).empty(); });
     std::sort(names.begin(), names.end());
     return names;
+}
+
+} // namespace
+
+std::vector<std::string> databaseFiles(const std::string& directory) {
+    return databaseFilesAmong(listDirectory(directory));
 }
 
 IndexContents describeDirectory(const std::string& directory, std::uint64_t device, FileTime created) {
@@ -37,18 +44,18 @@ IndexContents describeDirectory(const std::string& directory, std::uint64_t devi
     return contents;
 }
 
-IndexState indexState(const std::string& directory) {
-    const std::vector<std::string> files = databaseFiles(directory);
+CheckedIndex checkIndex(const std::string& directory) {
     const std::vector<std::string> all = listDirectory(directory);
     if (std::find(all.begin(), all.end(), indexFormat::FILE_NAME) == all.end()) {
-        return IndexState::MISSING;
+        return {IndexState::MISSING, {}};
     }
     const std::optional<DirectoryIndex> index = DirectoryIndex::read(directory);
     if (!index) {
-        return IndexState::INVALID;
+        return {IndexState::INVALID, {}};
     }
+    const std::vector<std::string> files = databaseFilesAmong(all);
     const std::vector<std::string_view> names(files.begin(), files.end());
-    return index->isCurrent(directory, names) ? IndexState::CURRENT : IndexState::STALE;
+    return {index->isCurrent(directory, names) ? IndexState::CURRENT : IndexState::STALE, index->contents()};
 }
 
 } // namespace acd

@@ -20,16 +20,21 @@ namespace acd {
 [[nodiscard]] IndexContents describeDirectory(const std::string& directory, std::uint64_t device,
                                               FileTime created);
 
-/// What the index of a directory is worth.
+/// Whether the index of a directory can be used.
 enum class IndexState {
-    MISSING, ///< there is none
-    INVALID, ///< it can't be read, is damaged or of another version
+    MISSING, ///< the directory has no index
+    INVALID, ///< it cannot be read, is damaged or of another version
     STALE,   ///< the files have changed since it was made
     CURRENT,
 };
 
+struct CheckedIndex {
+    IndexState state;
+    IndexContents contents; ///< without files if there is no valid index
+};
+
 /// Compares the index of a directory with its files.
-/// @throw ReadError if the directory can't be listed
-[[nodiscard]] IndexState indexState(const std::string& directory);
+/// @throw ReadError if the directory cannot be listed
+[[nodiscard]] CheckedIndex checkIndex(const std::string& directory);
 
 } // namespace acd

@@ -90,7 +90,7 @@ TEST_F(DirectoryIndexes, AreNotUsedIfAnyPartOfAStatusDiffers) {
         changes[change](contents.files.back().status);
         writeIndex(contents);
         EXPECT_FALSE(isUsed()) << "change " << change;
-        EXPECT_EQ(acd::indexState(directory.path()), IndexState::STALE) << "change " << change;
+        EXPECT_EQ(acd::checkIndex(directory.path()).state, IndexState::STALE) << "change " << change;
     }
     EXPECT_THAT(messages.take(), IsEmpty());
 }
@@ -177,7 +177,7 @@ TEST_F(DirectoryIndexes, LeaveFilesToBeReadThatAreOnAnotherDevice) {
     ++contents.device;
     writeIndex(contents);
     EXPECT_FALSE(isUsed());
-    EXPECT_EQ(acd::indexState(directory.path()), IndexState::CURRENT);
+    EXPECT_EQ(acd::checkIndex(directory.path()).state, IndexState::CURRENT);
 }
 
 TEST_F(DirectoryIndexes, BelongToALayerEach) {
@@ -247,7 +247,7 @@ TEST_F(DirectoryIndexes, AreNotUsedIfTheyCannotBeRead) {
     const std::string index = directory.path("index.acx");
     std::filesystem::create_directory(index);
     EXPECT_FALSE(isUsed());
-    EXPECT_EQ(acd::indexState(directory.path()), IndexState::INVALID);
+    EXPECT_EQ(acd::checkIndex(directory.path()).state, IndexState::INVALID);
     std::filesystem::remove(index);
     ASSERT_EQ(::mkfifo(index.c_str(), 0600), 0);
     EXPECT_FALSE(isUsed());
@@ -293,13 +293,13 @@ TEST_F(DirectoryIndexes, AreNotMadeOfFilesThatCannotBeRead) {
 }
 
 TEST_F(DirectoryIndexes, HaveAState) {
-    EXPECT_EQ(acd::indexState(directory.path()), IndexState::MISSING);
+    EXPECT_EQ(acd::checkIndex(directory.path()).state, IndexState::MISSING);
     directory.write("index.acx", "no index");
-    EXPECT_EQ(acd::indexState(directory.path()), IndexState::INVALID);
+    EXPECT_EQ(acd::checkIndex(directory.path()).state, IndexState::INVALID);
     writeIndex(describe(directory));
-    EXPECT_EQ(acd::indexState(directory.path()), IndexState::CURRENT);
+    EXPECT_EQ(acd::checkIndex(directory.path()).state, IndexState::CURRENT);
     directory.write("osprey.acd", "");
-    EXPECT_EQ(acd::indexState(directory.path()), IndexState::STALE);
+    EXPECT_EQ(acd::checkIndex(directory.path()).state, IndexState::STALE);
 }
 
 namespace {

@@ -328,7 +328,7 @@ private:
 
     void count(const std::string& directory) {
         const std::optional<acd::DirectoryIndex> index = acd::DirectoryIndex::read(directory);
-        if (index && acd::indexState(directory) == acd::IndexState::CURRENT) {
+        if (index && acd::checkIndex(directory).state == acd::IndexState::CURRENT) {
             for (const acd::IndexedFile& file : index->contents().files) {
                 m_indexedFiles += index->contents().isSettled(file) ? 1 : 0;
             }
