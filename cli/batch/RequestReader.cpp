@@ -1,6 +1,8 @@
 // Reads requests strictly: a name that is unknown or given twice is an error of the caller, which must be reported.
 #include "batch/RequestReader.h"
 
+#include "text/Trimmed.h"
+
 #include <fmt/format.h>
 
 #include <algorithm>
@@ -105,13 +107,6 @@ std::size_t endOfString(std::string_view text, std::size_t start) {
     return std::min(end + 1, text.size());
 }
 
-std::string_view trimmed(std::string_view text) {
-    constexpr std::string_view BLANKS = " \t\r\n";
-    const std::size_t first = std::min(text.find_first_not_of(BLANKS), text.size());
-    text.remove_prefix(first);
-    return text.substr(0, text.find_last_not_of(BLANKS) + 1);
-}
-
 /// The value of "id" as a request writes it: numbers have more digits there than a double keeps.
 /// @param line a JSON object, valid up to the end of that member
 std::string_view idTextOf(std::string_view line) {
@@ -128,7 +123,7 @@ std::string_view idTextOf(std::string_view line) {
         } else if (depth == 1 && byte == ':' && Json::parse(text, nullptr, false) == "id") {
             start = i + 1;
         } else if (depth == 1 && (byte == ',' || byte == '}') && start != NONE) {
-            return trimmed(line.substr(start, i - start));
+            return trimmed(line.substr(start, i - start), " \t\r\n");
         } else if (byte == '{' || byte == '[') {
             ++depth;
         } else if (byte == '}' || byte == ']') {

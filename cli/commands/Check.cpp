@@ -70,7 +70,6 @@ ExitCode run(Tool& tool, const QuestionArguments& arguments) {
     if (arguments.device) {
         questions::requireKnown(tool, asked.question.device);
     }
-    const auto inWords = [](bool isAllowed) { return isAllowed ? "yes" : "no"; };
     noteApplicationFault(
         tool,
         [&](ConstraintsManager& manager) { return inWords(explanation::isAllowed(manager, asked.question)); },

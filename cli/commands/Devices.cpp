@@ -62,7 +62,8 @@ Json asJson(const Devices& devices) {
 }
 
 /// Does the device have the name, or the IDCODE, that is searched for?
-bool matches(const std::string& glob, const Device& device) {
+/// @param code the pattern as an IDCODE, if it is one
+bool matches(const std::string& glob, const std::optional<IdcodePattern>& code, const Device& device) {
     const auto isLike = [&](const std::string& text) {
         return ::fnmatch(glob.c_str(), text.c_str(), FNM_CASEFOLD) == 0;
     };
@@ -72,9 +73,8 @@ bool matches(const std::string& glob, const Device& device) {
     if (!device.idcode) {
         return false;
     }
-    const std::optional<IdcodePattern> wanted = readIdcode(glob);
     const std::optional<IdcodePattern> own = readIdcode(device.idcode->value);
-    return wanted && own ? wanted->matches(*own) : isLike(device.idcode->value);
+    return code && own ? code->matches(*own) : isLike(device.idcode->value);
 }
 
 /// The names that the family filter leaves, each once: the first family that has a device is the one that
@@ -103,10 +103,11 @@ std::vector<std::string> deviceNames(const std::string& wantedFamily) {
 ExitCode run(Tool& tool, const Arguments& arguments) {
     ConstraintsManager& manager = tool.manager();
     const IdcodeFinder idcodes(manager);
+    const std::optional<IdcodePattern> code = readIdcode(arguments.glob);
     Devices devices{{}, arguments.namesOnly};
     for (const std::string& name : deviceNames(arguments.family)) {
         Device device{name, {}, idcodes.find(name)};
-        if (matches(arguments.glob, device)) {
+        if (matches(arguments.glob, code, device)) {
             device.family = toStdString(manager.getPartFamily(name.c_str()));
             devices.all.push_back(std::move(device));
         }

@@ -80,13 +80,11 @@ struct MaskQuestion {
         question.addMembers(manager, members);
         return members;
     };
-    const auto inWords = [](const MaskMembers& members) {
-        return members.keys.empty() ? "nothing" : fmt::format("{}", fmt::join(members.keys, ", "));
-    };
     const MaskMembers members = membersOf(tool.manager());
     questions::requireKnown(tool, members.device);
     noteApplicationFault(
-        tool, [&](ConstraintsManager& manager) { return inWords(membersOf(manager)); }, inWords(members));
+        tool, [&](ConstraintsManager& manager) { return inWords(membersOf(manager).keys); },
+        inWords(members.keys));
     const ExitCode status = tool.answer(members, members.keys.empty() ? ExitCode::NO : ExitCode::YES);
     if (members.keys.empty()) {
         tool.note(

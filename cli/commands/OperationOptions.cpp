@@ -58,9 +58,6 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
         }
         return options;
     };
-    const auto inWords = [](const std::vector<std::string>& options) {
-        return options.empty() ? "nothing" : fmt::format("{}", fmt::join(options, ", "));
-    };
     const OperationOptions answer{device, operation, vocabulary::key(mode), ask(tool.manager())};
     questions::requireKnown(tool, device);
     noteApplicationFault(

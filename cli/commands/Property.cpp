@@ -24,7 +24,7 @@ struct Arguments {
 
 /// All values. The single value is asked for first: only that question finds a property of an SPI flash and issues
 /// the messages about a missing one.
-std::vector<std::string> values(ConstraintsManager& manager, const char* device, const char* key) {
+std::vector<std::string> propertyValues(ConstraintsManager& manager, const char* device, const char* key) {
     const char* const value = manager.getDeviceStringProperty(device, key);
     const bool flash = manager.isSpiDevice(device);
     if (value == nullptr || (flash && *value == '\0')) {
@@ -43,15 +43,12 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     const std::string device = askedDevice(tool, arguments.device).name;
     ConstraintsManager& manager = tool.manager();
     const PropertyAnswer answer{device, arguments.key,
-                                values(manager, device.c_str(), arguments.key.c_str())};
+                                propertyValues(manager, device.c_str(), arguments.key.c_str())};
     questions::requireKnown(tool, device);
-    const auto inWords = [](const std::vector<std::string>& found) {
-        return found.empty() ? "nothing" : fmt::format("{}", fmt::join(found, ", "));
-    };
     noteApplicationFault(
         tool,
         [&](ConstraintsManager& asked) {
-            return inWords(values(asked, device.c_str(), arguments.key.c_str()));
+            return inWords(propertyValues(asked, device.c_str(), arguments.key.c_str()));
         },
         inWords(answer.values));
     return showProperty(tool, answer,

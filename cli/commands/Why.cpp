@@ -42,15 +42,14 @@ void addSkippedChecks(explanation::Answer& answer) {
 
 /// A step about what an application gets, if that is something else.
 void addApplicationFault(explanation::Answer& answer) {
-    const auto inWords = [](Conclusion verdict) { return verdict == Conclusion::YES ? "yes" : "no"; };
     const std::optional<ApplicationFault> fault = findApplicationFault([&](ConstraintsManager& manager) {
-        return inWords(explanation::isAllowed(manager, answer.question) ? Conclusion::YES : Conclusion::NO);
+        return inWords(explanation::isAllowed(manager, answer.question));
     });
     if (fault) {
-        answer.explanation.steps.push_back(
-            {"fault",
-             (fault->record ? "" : reasonOf(*fault) + ": ") + effectOf(*fault, inWords(answer.verdict)),
-             fault->record});
+        answer.explanation.steps.push_back({"fault",
+                                            (fault->record ? "" : reasonOf(*fault) + ": ") +
+                                                effectOf(*fault, inWords(answer.verdict == Conclusion::YES)),
+                                            fault->record});
     }
 }
 

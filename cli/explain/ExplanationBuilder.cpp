@@ -6,7 +6,6 @@
 
 #include <PicConfig.h>
 #include <TarvikException.h>
-#include <UT_STR.h>
 #include <tarvik/ConstraintsManager.h>
 
 #include <fmt/format.h>
@@ -125,7 +124,7 @@ std::string ExplanationBuilder::addNameStep() {
 
 /// Where spi.acd lists a flash or a family of flashes.
 ReadLog::Match ExplanationBuilder::flashListing(const std::string& name) const {
-    const std::string upper = toStdString(UT_STR::Upper(name.c_str()));
+    const std::string upper = upperCase(name);
     Match found = m_asked.startUp.findItem(schema::DEVICE_FAMILY, upper);
     if (const ReadLog::Value* const families = m_asked.startUp.find(schema::DEVICE_FAMILY)) {
         for (auto family = families->items.begin(); !found && family != families->items.end(); ++family) {

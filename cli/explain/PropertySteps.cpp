@@ -5,7 +5,6 @@
 #include "model/Vocabulary.h"
 #include "text/Suggest.h"
 
-#include <UT_STR.h>
 #include <tarvik/ConstraintsManager.h>
 
 #include <fmt/format.h>
@@ -13,8 +12,6 @@
 namespace explanation {
 
 namespace {
-
-std::string upperCase(const std::string& text) { return toStdString(UT_STR::Upper(text.c_str())); }
 
 /// The values that were read of a record, a missing one being the empty text.
 std::set<std::string> valuesOf(const ReadLog::Item& record, int first) {

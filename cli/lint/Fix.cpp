@@ -1,11 +1,7 @@
 // Builds the edits that remove a finding.
 #include "lint/Fix.h"
 
-#include <AcdText.h>
-
 #include <fmt/format.h>
-
-#include <algorithm>
 
 namespace lint {
 
@@ -69,12 +65,6 @@ Token partOf(const Token& token, std::size_t offset, std::size_t length) {
     Token part{token.text.substr(offset, length), token.location};
     part.location.column += static_cast<unsigned>(offset);
     return part;
-}
-
-std::string upperCase(std::string_view text) {
-    std::string upper(text);
-    std::transform(upper.begin(), upper.end(), upper.begin(), AcdText::toUpper);
-    return upper;
 }
 
 } // namespace lint

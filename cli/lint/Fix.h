@@ -49,6 +49,4 @@ struct Suggestion {
 /// The part of a token, with its location.
 [[nodiscard]] Token partOf(const Token& token, std::size_t offset, std::size_t length);
 
-[[nodiscard]] std::string upperCase(std::string_view text);
-
 } // namespace lint

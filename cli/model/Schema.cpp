@@ -5,8 +5,6 @@
 #include "model/Vocabulary.h"
 #include "text/Suggest.h"
 
-#include <UT_STR.h>
-
 #include <algorithm>
 
 using TARVIKNS::OUTPUT_TYPE;
@@ -43,9 +41,7 @@ bool isFlashClass(std::string_view name) { return contains(FLASH_CLASSES, name);
 
 std::string devicesKey(std::string_view family) { return std::string(family).append(DEVICES_SUFFIX); }
 
-std::string propertyKey(std::string_view name) {
-    return UT_STR::Upper(std::string(name).c_str()).c_str() + std::string(PROPERTY_SUFFIX);
-}
+std::string propertyKey(std::string_view name) { return upperCase(name).append(PROPERTY_SUFFIX); }
 
 Shape shapeInSection(std::string_view key) {
     return contains(FAMILY_KEYS, key) ? Shape::RECORDS : Shape::NONE;

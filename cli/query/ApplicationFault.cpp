@@ -12,6 +12,7 @@
 #include <tarvik/ConstraintsManager.h>
 
 #include <fmt/format.h>
+#include <fmt/ranges.h>
 
 namespace {
 
@@ -54,6 +55,12 @@ std::optional<ApplicationFault> findApplicationFault(const AnswerInWords& ask) {
         return found;
     }
     return std::nullopt;
+}
+
+std::string inWords(bool answer) { return answer ? "yes" : "no"; }
+
+std::string inWords(const std::vector<std::string>& answer) {
+    return answer.empty() ? "nothing" : fmt::format("{}", fmt::join(answer, ", "));
 }
 
 std::string reasonOf(const ApplicationFault& fault) {

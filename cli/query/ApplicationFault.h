@@ -5,12 +5,19 @@
 #include <functional>
 #include <optional>
 #include <string>
+#include <vector>
 
 class ConstraintsManager;
 class Tool;
 
 /// Asks a question. @return the answer in words
 using AnswerInWords = std::function<std::string(ConstraintsManager&)>;
+
+/// "yes" or "no"
+[[nodiscard]] std::string inWords(bool answer);
+
+/// `PROGRAM, ERASE`, or "nothing".
+[[nodiscard]] std::string inWords(const std::vector<std::string>& answer);
 
 /// What an application gets that leaves exceptions on, as they are by default, where the tool, which turns them off,
 /// gets an answer: an exception, and after it an answer without the record that raised and those after it.

@@ -6,7 +6,6 @@
 #include "text/Suggest.h"
 
 #include <AcdStore.h>
-#include <UT_STR.h>
 
 #include <unordered_set>
 
@@ -51,7 +50,7 @@ private:
     }
 
     [[nodiscard]] bool isFlash(const std::string& name) const {
-        return m_flashNames.count(toStdString(UT_STR::Upper(name.c_str()))) != 0;
+        return m_flashNames.count(upperCase(name)) != 0;
     }
 
     std::vector<catalogue::Flash> m_flashes;
@@ -78,7 +77,7 @@ std::vector<ListedName> familyList(const std::vector<ListedName>& devices) {
         }
     };
     for (const std::string& family : catalogue::list("spi.acd", "DEVICE_FAMILY")) {
-        const bool isUnknown = toStdString(UT_STR::Upper(family.c_str())) != family;
+        const bool isUnknown = upperCase(family) != family;
         add(family, "spi", isUnknown || dependent.contains(family));
     }
     for (const std::string& family : catalogue::families()) {

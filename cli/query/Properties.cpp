@@ -1,11 +1,11 @@
 // Lists properties: the names come from the database, the values from the manager.
 #include "query/Properties.h"
 
+#include "model/Schema.h"
 #include "query/Tool.h"
 #include "term/Table.h"
 #include "text/Suggest.h"
 
-#include <UT_STR.h>
 #include <tarvik/ConstraintsManager.h>
 
 #include <fmt/format.h>
@@ -58,15 +58,15 @@ Entries entriesUnder(const std::string& name, const std::string& owner, const En
 }
 
 Entries flashEntries(const std::string& name) {
-    return catalogue::entries("spi.acd", toStdString(UT_STR::Upper(name.c_str())) + "_PROPERTY");
+    return catalogue::entries(schema::SPI, schema::propertyKey(name));
 }
 
 } // namespace
 
 std::string flashClass(const std::string& device) {
     std::string found;
-    for (const char* const name : {"AT1", "ST1", "ST2", "BPI1", "BPI2", "BPI3"}) {
-        const std::vector<std::string> members = catalogue::list("spi.acd", std::string(name) + "_DEVICES");
+    for (const char* const name : schema::FLASH_CLASSES) {
+        const std::vector<std::string> members = catalogue::list(schema::SPI, schema::devicesKey(name));
         if (std::any_of(members.begin(), members.end(),
                         [&](const std::string& member) { return sameWithoutCase(member, device); })) {
             found = name;

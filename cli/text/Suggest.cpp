@@ -42,6 +42,12 @@ bool sameWithoutCase(std::string_view left, std::string_view right) {
 
 std::string lowerCase(std::string_view text) { return AcdText::lowerCase(text); }
 
+std::string upperCase(std::string_view text) {
+    std::string upper(text);
+    std::transform(upper.begin(), upper.end(), upper.begin(), AcdText::toUpper);
+    return upper;
+}
+
 std::optional<std::string> suggest(std::string_view text, const std::vector<std::string>& candidates) {
     // A name of this length is not mistyped, and the distance costs the product of both lengths.
     constexpr std::size_t LONGEST = 100;

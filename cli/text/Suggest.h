@@ -17,3 +17,6 @@
 
 /// The text in ASCII lower case.
 [[nodiscard]] std::string lowerCase(std::string_view text);
+
+/// The text in ASCII upper case.
+[[nodiscard]] std::string upperCase(std::string_view text);

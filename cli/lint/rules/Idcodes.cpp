@@ -2,6 +2,9 @@
 #include "lint/Findings.h"
 #include "lint/rules/RuleSets.h"
 
+#include "model/IdcodePattern.h"
+#include "text/Suggest.h"
+
 #include <algorithm>
 #include <cstdint>
 #include <map>
@@ -66,35 +69,12 @@ constexpr Rule MALFORMED_ENTRY{
 one, and fields after the code are not read.)",
     "IDCODE = KS50,0xX4104FB7,KS100,0xX4108FB7"};
 
-/// A code; `mask` has the bits that are fixed.
-struct Pattern {
-    std::uint32_t bits = 0;
-    std::uint32_t mask = 0;
-};
-
-std::optional<unsigned> digit(char byte) {
-    if (byte >= '0' && byte <= '9') {
-        return static_cast<unsigned>(byte - '0');
-    }
-    const char upper = byte >= 'a' && byte <= 'f' ? static_cast<char>(byte - 'a' + 'A') : byte;
-    return upper >= 'A' && upper <= 'F' ? std::optional(static_cast<unsigned>(upper - 'A') + 10U)
-                                        : std::nullopt;
-}
-
-std::optional<Pattern> patternOf(std::string_view text) {
-    if (text.size() != 10 || !text.starts_with("0x")) {
-        return std::nullopt;
-    }
-    Pattern pattern;
-    for (const char byte : text.substr(2)) {
-        const std::optional<unsigned> value = digit(byte);
-        if (!value && byte != 'X') {
-            return std::nullopt;
-        }
-        pattern.bits = (pattern.bits << 4U) | value.value_or(0);
-        pattern.mask = (pattern.mask << 4U) | (value ? 0xFU : 0U);
-    }
-    return pattern;
+/// The pattern of a code in the form that the manager expects: "0x" and eight digits, any digit as "X".
+std::optional<IdcodePattern> patternOf(std::string_view text) {
+    constexpr std::size_t LENGTH = 10;
+    const bool isComplete = text.size() == LENGTH && text.starts_with("0x");
+    const bool hasOtherX = text.find('x', 2) != std::string_view::npos;
+    return isComplete && !hasOtherX ? readIdcode(text) : std::nullopt;
 }
 
 /// With "0x" and "X" as they must be.
@@ -110,12 +90,12 @@ std::string inUsualCase(std::string_view text) {
 class IdcodeIndex {
 public:
     struct Known {
-        Pattern pattern;
+        IdcodePattern pattern;
         const Token* device;
     };
 
     /// A device whose pattern matches a code that this one matches, too; null when there is none.
-    const Token* find(const Pattern& pattern) {
+    const Token* find(const IdcodePattern& pattern) {
         for (const std::uint32_t mask : m_masks) {
             const std::uint32_t common = mask & pattern.mask;
             const auto& known = index(mask, common);
@@ -156,7 +136,7 @@ private:
 };
 
 void checkCode(const Token& device, const Token& code, bool counts, IdcodeIndex& codes, Findings& findings) {
-    const std::optional<Pattern> pattern = patternOf(code.text);
+    const std::optional<IdcodePattern> pattern = patternOf(code.text);
     if (!pattern) {
         findings
             .add(MALFORMED_CODE, code, "{} is not 0x and eight hexadecimal digits or X", inQuotes(code.text))

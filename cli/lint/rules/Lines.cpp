@@ -2,6 +2,7 @@
 #include "lint/rules/RuleSets.h"
 
 #include "lint/Findings.h"
+#include "text/Trimmed.h"
 
 #include <algorithm>
 
@@ -158,10 +159,6 @@ std::optional<Fix> fixOfHeader(const AcdLines& file, const AcdLines::Line& line)
     }
     const std::string_view whole = source.substr(open);
     const std::size_t close = std::min(whole.find(']'), whole.size());
-    const auto trimmed = [](std::string_view text) {
-        const std::size_t begin = std::min(text.find_first_not_of(" \t"), text.size());
-        return text.substr(begin, text.find_last_not_of(" \t") + 1 - begin);
-    };
     const std::string_view name = trimmed(whole.substr(1, close - 1));
     const std::string_view rest = trimmed(whole.substr(std::min(close + 1, whole.size())));
     if (!isOneWord(name) || (!rest.empty() && !rest.starts_with('#'))) {

@@ -1,6 +1,7 @@
 // Rules about the items and fields of values: nothing is trimmed and nothing is skipped when they are read.
 #include "lint/Findings.h"
 #include "lint/rules/RuleSets.h"
+#include "text/Trimmed.h"
 
 #include <algorithm>
 #include <optional>
@@ -66,11 +67,6 @@ constexpr Rule DOUBLED_OPERATOR{
 
 bool isBlank(char byte) { return byte == ' ' || byte == '\t'; }
 
-std::string withoutBlanks(std::string_view text) {
-    const std::size_t begin = std::min(text.find_first_not_of(" \t"), text.size());
-    return std::string(text.substr(begin, text.find_last_not_of(" \t") + 1 - begin));
-}
-
 /// "=" in place of "==", and "+=" in place of "=+".
 std::optional<Fix> withOneOperator(const Token& value) {
     const Token second = partOf(value, 0, 1);
@@ -114,7 +110,7 @@ void checkTexts(const std::vector<Token>& tokens, Findings& findings) {
         } else if (!text.empty() && (isBlank(text.front()) || isBlank(text.back()))) {
             findings
                 .add(BLANK_AROUND_SEPARATOR, token, "the blanks of {} are part of the text", inQuotes(text))
-                .fix = replacing(token, withoutBlanks(text));
+                .fix = replacing(token, std::string(trimmed(text)));
         }
         // A "#" at the start of a continuation line is found as such.
         const std::string_view line = token.location.file->source(token.location.line);

@@ -6,8 +6,6 @@
 #include "text/Json.h"
 #include "text/Suggest.h"
 
-#include <UT_STR.h>
-
 #include <algorithm>
 #include <charconv>
 #include <map>
@@ -179,7 +177,7 @@ void checkMeaning(const Item& item, std::size_t firstValue, const std::set<std::
                   Findings& findings) {
     const Token& name = item.fields.front();
     const bool isOption = name.text.starts_with(schema::OPTIONS_PREFIX);
-    const std::string upper = toStdString(UT_STR::Upper(std::string(name.text).c_str()));
+    const std::string upper = upperCase(name.text);
     const bool isUpperOption = upper.starts_with(schema::OPTIONS_PREFIX) &&
                                namesOperation(std::string_view(upper).substr(schema::OPTIONS_PREFIX.size()));
     if (isOption ? name.text != upper || !isUpperOption : isUpperOption) {

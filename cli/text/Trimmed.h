@@ -1,0 +1,11 @@
+#pragma once
+
+#include <algorithm>
+#include <string_view>
+
+/// The text without the blanks at its start and its end.
+[[nodiscard]] constexpr std::string_view trimmed(std::string_view text,
+                                                 std::string_view blanks = " \t") noexcept {
+    text.remove_prefix(std::min(text.find_first_not_of(blanks), text.size()));
+    return text.substr(0, text.find_last_not_of(blanks) + 1);
+}
