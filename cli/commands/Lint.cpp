@@ -235,7 +235,7 @@ std::vector<AcdLines> fixed(Tool& tool, std::vector<AcdLines> files, const lint:
 }
 
 ExitCode run(Tool& tool, const Arguments& arguments) {
-    const lint::Selection selection{rulesOf(arguments.selected), rulesOf(arguments.ignored)};
+    lint::Selection selection{rulesOf(arguments.selected), rulesOf(arguments.ignored)};
     if (!arguments.explained.empty()) {
         return explain(tool, arguments);
     }
@@ -249,15 +249,15 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     if (arguments.fix || arguments.unsafeFixes || arguments.diff) {
         files = fixed(tool, std::move(files), selection, arguments, database);
     }
+    selection.isMeant = [&database](const lint::Finding& finding) {
+        return database.isMeant(finding.location.file->path());
+    };
     const lint::Model model(std::move(files));
     // The rules report the readers' faults, too, with a code.
     static_cast<void>(tool.messages().take());
     Progress progress("looking for findings");
     lint::Report report{check(
         model, selection, [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); })};
-    std::erase_if(report.findings, [&database](const lint::Finding& finding) {
-        return !database.isMeant(finding.location.file->path());
-    });
     if (!arguments.baseline.empty()) {
         dropKnown(report, arguments.baseline);
     }

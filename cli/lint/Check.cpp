@@ -22,8 +22,12 @@ std::vector<Finding> check(const Model& model, const Selection& selection,
     std::erase_if(all, [&](const Finding& finding) {
         return (!selection.selected.empty() && !selection.selected.contains(finding.rule)) ||
                selection.ignored.contains(finding.rule) ||
+               (selection.isMeant && !selection.isMeant(finding)) ||
                (finding.rule->needsAllFiles && !model.isComplete());
     });
+    if (!selection.withConsequences) {
+        all = withoutConsequences(all);
+    }
     return sorted(std::move(all), model);
 }
 

@@ -11,8 +11,10 @@ namespace lint {
 
 /// Which findings are wanted.
 struct Selection {
-    std::set<const Rule*> selected; ///< none: all
-    std::set<const Rule*> ignored;
+    std::set<const Rule*> selected{}; ///< none: all
+    std::set<const Rule*> ignored{};
+    std::function<bool(const Finding&)> isMeant{}; ///< none: all
+    bool withConsequences = false;                 ///< of other findings, too
 };
 
 /// All findings of a database that no comment suppresses, in the order of files and locations.

@@ -48,6 +48,34 @@ std::uint64_t hash(std::string_view text) {
     return value;
 }
 
+/// Tells whether a finding has a cause among all.
+class Causes {
+public:
+    explicit Causes(const std::vector<Finding>& findings) {
+        for (const Finding& finding : findings) {
+            if (!finding.reports.empty()) {
+                m_first.emplace(finding.reports, &finding);
+            }
+            if (finding.rule->spoilsLine) {
+                m_spoilt.emplace(finding.location.file, finding.location.line);
+            }
+        }
+    }
+
+    [[nodiscard]] bool haveCaused(const Finding& finding) const {
+        if (!finding.rule->spoilsLine && m_spoilt.contains({finding.location.file, finding.location.line})) {
+            return true;
+        }
+        // No circle: a finding rests on what is wrong, and reports the same or what is right.
+        const auto cause = m_first.find(finding.restsOn);
+        return cause != m_first.end() && cause->second != &finding;
+    }
+
+private:
+    std::map<std::string_view, const Finding*> m_first; ///< by what they report
+    std::set<std::pair<const AcdLines*, unsigned>> m_spoilt;
+};
+
 } // namespace
 
 Finding& Findings::addText(const Rule& rule, const Token& token, std::string text) {
@@ -84,6 +112,14 @@ Suggestion Findings::suggest(std::string_view text, const std::vector<std::strin
     std::optional<std::string> name = ::suggest(text, unused);
     const bool isOtherCase = name && sameWithoutCase(*name, text);
     return {std::move(name), isOtherCase};
+}
+
+std::vector<Finding> withoutConsequences(const std::vector<Finding>& findings) {
+    const Causes causes(findings);
+    std::vector<Finding> kept;
+    std::copy_if(findings.begin(), findings.end(), std::back_inserter(kept),
+                 [&causes](const Finding& finding) { return !causes.haveCaused(finding); });
+    return kept;
 }
 
 std::vector<Finding> sorted(std::vector<Finding> findings, const Model& model) {

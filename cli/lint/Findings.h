@@ -22,7 +22,34 @@ struct Finding {
     std::size_t length; ///< in bytes, on the line of the location; 0 for a place between two bytes
     std::string text;
     std::optional<Fix> fix{};
+
+    // What connects a finding with its consequences: facts, such as "kestrel under SS", or names.
+    std::string reports{}; ///< the fact that it reports, or the name that it takes for the right one
+    std::string restsOn{}; ///< the fact whose report makes it a consequence
 };
+
+/// The names of the facts that findings report and rest on.
+namespace fact {
+
+/// A name belongs to a mode, or does not.
+[[nodiscard]] inline std::string inMode(std::string_view name, std::string_view mode) {
+    return fmt::format("{} under {}", name, mode);
+}
+
+/// A name belongs to a list, or does not.
+[[nodiscard]] inline std::string inList(std::string_view name, std::string_view key) {
+    return fmt::format("{} in {}", name, key);
+}
+
+/// A name of a property is wrong.
+[[nodiscard]] inline std::string name(std::string_view property) {
+    return fmt::format("the name {}", property);
+}
+
+/// A key exists, or does not.
+[[nodiscard]] inline std::string key(std::string_view name) { return fmt::format("key {}", name); }
+
+} // namespace fact
 
 /// What was found so far. Adding never fails, so that no finding hides the next.
 class Findings {
@@ -36,12 +63,15 @@ public:
 
     /// Adds a finding about an unknown name; its text ends with the suggestion, which is its fix, too.
     /// @param name the part of the token that the suggestion replaces
+    /// @return the finding, until the next one is added
     template <typename... Arguments>
-    void addUnknown(const Rule& rule, const Token& token, const Token& name, const Suggestion& suggestion,
-                    fmt::format_string<Arguments...> format, Arguments&&... arguments) {
-        addText(rule, token,
-                fmt::format(format, std::forward<Arguments>(arguments)...) + suggestion.question())
-            .fix = replacing(name, suggestion);
+    Finding& addUnknown(const Rule& rule, const Token& token, const Token& name, const Suggestion& suggestion,
+                        fmt::format_string<Arguments...> format, Arguments&&... arguments) {
+        Finding& finding = addText(
+            rule, token, fmt::format(format, std::forward<Arguments>(arguments)...) + suggestion.question());
+        finding.fix = replacing(name, suggestion);
+        finding.restsOn = name.text;
+        return finding;
     }
 
     /// @return the finding, for its fix; until the next one is added
@@ -65,6 +95,10 @@ private:
     /// Limits the comparisons for suggestions: a file full of unknown names must not take forever.
     std::size_t m_comparisonsLeft = 2'000'000;
 };
+
+/// The findings without those that are consequences of others: of findings that rest on the same fact the first one
+/// that reports it is left.
+[[nodiscard]] std::vector<Finding> withoutConsequences(const std::vector<Finding>& findings);
 
 /// The same findings in the order of files and locations.
 [[nodiscard]] std::vector<Finding> sorted(std::vector<Finding> findings, const Model& model);

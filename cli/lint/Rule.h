@@ -23,6 +23,7 @@ struct Rule {
     std::string_view detail;    ///< why it matters, and what to write instead; a line break is a blank
     std::string_view example;   ///< lines that are found
     bool needsAllFiles = false; ///< it finds what is nowhere: a file that cannot be read may have it
+    bool spoilsLine = false;    ///< other findings on its line are its consequences
 
     /// The detail on one line.
     [[nodiscard]] std::string explanation() const;

@@ -235,17 +235,19 @@ private:
             checkOptions(name, values, offered, options);
         }
         if (hasOperationProperties) {
-            checkRecords(section, operations, offered);
+            checkRecords(section, operations, properties, offered);
         }
     }
 
     /// Reports a finding once, even if several devices share its line.
+    /// @param fact that the finding reports and rests on, if it has consequences
     template <typename... Arguments>
-    void report(const Rule& rule, const Token& token, fmt::format_string<Arguments...> format,
-                Arguments&&... arguments) {
+    void report(const Rule& rule, const Token& token, const std::string& fact,
+                fmt::format_string<Arguments...> format, Arguments&&... arguments) {
         if (m_reported.insert({&rule, token.location.file, token.location.line, token.location.column})
                 .second) {
-            m_findings.add(rule, token, format, std::forward<Arguments>(arguments)...);
+            Finding& finding = m_findings.add(rule, token, format, std::forward<Arguments>(arguments)...);
+            finding.reports = finding.restsOn = fact;
         }
     }
 
@@ -269,22 +271,35 @@ private:
             m_used.set(*mode);
             if (m_family.kind != schema::File::BASE && m_modes[*mode] &&
                 !m_modes[*mode]->contains(m_family.name)) {
-                report(OFFERED_OUT_OF_MODE, value, "{} of base.acd does not list the family {}", value.text,
-                       inQuotes(m_family.name));
+                report(OFFERED_OUT_OF_MODE, value, fact::inMode(m_family.name, value.text),
+                       "{} of base.acd does not list the family {}", value.text, inQuotes(m_family.name));
             } else if (hasRecords(*mode) && !operations.modes.empty() && !operations.of(name).test(*mode)) {
-                report(PROPERTY_WITHOUT_RECORD, value, "OPERATION of {} has no record for {} in mode {}",
+                report(PROPERTY_WITHOUT_RECORD, value, {}, "OPERATION of {} has no record for {} in mode {}",
                        owner(section), name, value.text);
             }
         }
     }
 
-    void checkRecords(const Section& section, const Table& operations,
+    /// Identifies the property: that of the family may contradict several tables.
+    [[nodiscard]] std::string origin(const Section& section, const PropertyValues& properties,
+                                     const std::string& name) const {
+        const auto found = properties.values.find(name);
+        if (found == properties.values.end() || found->second.empty()) {
+            return name + " of " + owner(section);
+        }
+        const SourceLocation& location = found->second.front().location;
+        return fmt::format("{}:{}:{}", location.file->path(), location.line, location.column);
+    }
+
+    void checkRecords(const Section& section, const Table& operations, const PropertyValues& properties,
                       std::map<std::string, Modes>& offered) {
         for (const auto& [place, token] : operations.locations) {
             const auto& [name, mode] = place;
             if (hasRecords(mode) && isOperation(name) && !offered[name].test(mode)) {
-                report(RECORD_WITHOUT_PROPERTY, token, "the property {} of {} does not list the mode {}",
-                       name, owner(section), vocabulary::modes()[mode]);
+                report(RECORD_WITHOUT_PROPERTY, token,
+                       fact::inMode(origin(section, properties, name), vocabulary::modes()[mode]),
+                       "the property {} of {} does not list the mode {}", name, owner(section),
+                       vocabulary::modes()[mode]);
             }
         }
     }
@@ -312,7 +327,7 @@ private:
         const auto found = offered.find(operation);
         const Modes reached = found == offered.end() ? Modes() : found->second & wanted;
         if (reached.none()) {
-            report(UNREACHABLE_OPTIONS, values.front(),
+            report(UNREACHABLE_OPTIONS, values.front(), {},
                    "{} is never given: the property {} does not list the mode", inQuotes(name), operation);
             return;
         }
@@ -322,8 +337,9 @@ private:
             const std::string text(value.text);
             if (hasCells && !options.modes.empty() && position(vocabulary::options(), text) &&
                 (options.of(text) & reached).none()) {
-                report(OPTION_WITHOUT_RECORD, value, "PROGRAM_OPTION has no record for {} in the mode of {}",
-                       inQuotes(text), inQuotes(name));
+                report(OPTION_WITHOUT_RECORD, value, {},
+                       "PROGRAM_OPTION has no record for {} in the mode of {}", inQuotes(text),
+                       inQuotes(name));
             }
         }
     }
@@ -349,9 +365,10 @@ void checkModes(const Model& model, const std::map<std::string_view, Modes>& use
                                        [mode](const auto& entry) { return entry.second.test(mode); });
         // A base.acd without any mode key is a fragment.
         if (hasModes && base.find(modes[mode]) == nullptr && user != used.end()) {
-            findings.add(NO_MODE_KEY, model.base()->start(),
-                         "there is no key {}, though family {} uses the mode", modes[mode],
-                         inQuotes(user->first));
+            findings
+                .add(NO_MODE_KEY, model.base()->start(), "there is no key {}, though family {} uses the mode",
+                     modes[mode], inQuotes(user->first))
+                .restsOn = fact::key(modes[mode]);
         }
         const std::vector<Item>& items = base.items(modes[mode]);
         for (std::size_t i = 1; items.size() > 1 && i < items[1].fields.size(); ++i) {
@@ -382,9 +399,11 @@ void checkParts(const Model& model, const std::vector<std::optional<std::set<std
                                         : device != nullptr                       ? device->family->name
                                                                                   : std::string_view();
         if (!family.empty() && !modes[*mode]->contains(family)) {
-            findings.add(PART_OUT_OF_MODE, part,
-                         "{} does not list the family {} of {}, so it refuses the part anyway",
-                         vocabulary::modes()[*mode], inQuotes(family), inQuotes(name));
+            findings
+                .add(PART_OUT_OF_MODE, part,
+                     "{} does not list the family {} of {}, so it refuses the part anyway",
+                     vocabulary::modes()[*mode], inQuotes(family), inQuotes(name))
+                .restsOn = fact::inMode(family, vocabulary::modes()[*mode]);
         }
     }
 }

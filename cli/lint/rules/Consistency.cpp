@@ -6,10 +6,8 @@
 #include "text/Suggest.h"
 
 #include <algorithm>
-#include <array>
 #include <map>
 #include <set>
-#include <unordered_map>
 
 namespace lint {
 
@@ -48,14 +46,6 @@ constexpr Rule CONFUSABLE_PACKAGE{
     "package that looks like a common one",
     R"(The name differs from a more common package only in O and 0, I and 1, S and 5 or B and 8.)",
     "PROPERTIES = PACKAGES,1,TQI00"};
-constexpr Rule CONFUSABLE_LETTER{
-    "C105",
-    "confusable-letter",
-    Severity::WARNING,
-    "letter that looks like an ASCII letter or a blank",
-    R"(A word mixes ASCII characters with letters of another script that look like ASCII, or it contains a no-break or
-zero-width space. It equals no name that is typed on a keyboard. Words of another script alone are not reported.)",
-    "PROPERTY = VENDOR,K<U+043E>rvel"};
 
 /// A name is common if that many sections use it, and rare up to the second number.
 constexpr std::size_t MIN_COMMON = 5;
@@ -159,10 +149,12 @@ std::set<std::size_t> checkRareNames(const Domain& domain, Findings& findings) {
     for (const Use& use : domain.uses) {
         if (const auto meant = rare.find(use.name->text); meant != rare.end()) {
             found.insert(use.section);
-            findings.add(RARE_NAME, *use.name, "{} is used {}, {} in {} {}; did you mean {}?",
-                         inQuotes(use.name->text), sections[use.name->text].size() == 1 ? "once" : "twice",
-                         inQuotes(meant->second), sections[meant->second].size(), domain.owners,
-                         inQuotes(meant->second));
+            findings
+                .add(RARE_NAME, *use.name, "{} is used {}, {} in {} {}; did you mean {}?",
+                     inQuotes(use.name->text), sections[use.name->text].size() == 1 ? "once" : "twice",
+                     inQuotes(meant->second), sections[meant->second].size(), domain.owners,
+                     inQuotes(meant->second))
+                .restsOn = fact::name(use.name->text);
         }
     }
     return found;
@@ -346,62 +338,16 @@ void checkPackages(const Model& model, Findings& findings) {
         for (const auto& spelling : spellings) {
             for (const Token* use : spelling.second) {
                 if (rank(spelling) < rank(*common) && spelling.second.size() <= MAX_RARE) {
-                    findings.add(CONFUSABLE_PACKAGE, *use,
-                                 "{} looks like {}, which is listed {}; did you mean that?",
-                                 inQuotes(spelling.first), inQuotes(common->first),
-                                 common->second.size() == 1 ? std::string("once")
-                                                            : fmt::format("{} times", common->second.size()));
+                    findings
+                        .add(CONFUSABLE_PACKAGE, *use,
+                             "{} looks like {}, which is listed {}; did you mean that?",
+                             inQuotes(spelling.first), inQuotes(common->first),
+                             common->second.size() == 1 ? std::string("once")
+                                                        : fmt::format("{} times", common->second.size()))
+                        .reports = common->first;
                 }
             }
         }
-    }
-}
-
-/// The name of a character in a word that looks like another; empty when the word has none.
-std::string confusableIn(std::string_view word) {
-    static const std::unordered_map<std::string_view, char> LETTERS{
-        {"\u0410", 'A'}, {"\u0412", 'B'}, {"\u0415", 'E'}, {"\u041a", 'K'}, {"\u041c", 'M'}, {"\u041d", 'H'},
-        {"\u041e", 'O'}, {"\u0420", 'P'}, {"\u0421", 'C'}, {"\u0422", 'T'}, {"\u0423", 'Y'}, {"\u0425", 'X'},
-        {"\u0405", 'S'}, {"\u0406", 'I'}, {"\u0408", 'J'}, {"\u0430", 'a'}, {"\u0435", 'e'}, {"\u043e", 'o'},
-        {"\u0440", 'p'}, {"\u0441", 'c'}, {"\u0443", 'y'}, {"\u0445", 'x'}, {"\u0455", 's'}, {"\u0456", 'i'},
-        {"\u0458", 'j'}, {"\u0391", 'A'}, {"\u0392", 'B'}, {"\u0395", 'E'}, {"\u0396", 'Z'}, {"\u0397", 'H'},
-        {"\u0399", 'I'}, {"\u039a", 'K'}, {"\u039c", 'M'}, {"\u039d", 'N'}, {"\u039f", 'O'}, {"\u03a1", 'P'},
-        {"\u03a4", 'T'}, {"\u03a5", 'Y'}, {"\u03a7", 'X'}, {"\u03bf", 'o'}, {"\u03bd", 'v'}};
-    static const std::array<std::string_view, 6> SPACES{"\u00a0", "\u200b", "\u200c",
-                                                        "\u200d", "\u202f", "\ufeff"};
-    bool hasAscii = false;
-    char looksLike = 0;
-    for (std::size_t i = 0; i < word.size(); ++i) {
-        hasAscii = hasAscii || static_cast<unsigned char>(word[i]) < 0x80U;
-        if (std::any_of(SPACES.begin(), SPACES.end(),
-                        [&](std::string_view space) { return word.substr(i).starts_with(space); })) {
-            return "a no-break or zero-width space";
-        }
-        const auto letter = LETTERS.find(word.substr(i, 2));
-        looksLike = letter == LETTERS.end() ? looksLike : letter->second;
-    }
-    return hasAscii && looksLike != 0
-               ? fmt::format("a letter of another script that looks like \"{}\"", looksLike)
-               : std::string();
-}
-
-void checkLetters(const AcdLines& file, unsigned line, Findings& findings) {
-    const std::string_view text = file.source(line);
-    if (std::all_of(text.begin(), text.end(),
-                    [](char byte) { return static_cast<unsigned char>(byte) < 0x80U; })) {
-        return;
-    }
-    constexpr std::string_view SEPARATORS = " \t,:=+[]\\";
-    for (std::size_t begin = 0; begin < text.size();) {
-        const std::size_t end = std::min(text.find_first_of(SEPARATORS, begin), text.size());
-        const std::string_view word = text.substr(begin, end - begin);
-        // A byte-order mark at the start of the file is skipped by the readers.
-        const bool isMark = line == 1 && begin == 0 && word.starts_with("\ufeff");
-        if (const std::string what = confusableIn(isMark ? word.substr(3) : word); !what.empty()) {
-            findings.add(CONFUSABLE_LETTER, {word, {&file, line, static_cast<unsigned>(begin + 1)}},
-                         "{} contains {}", inQuotes(word), what);
-        }
-        begin = end + 1;
     }
 }
 
@@ -409,20 +355,13 @@ void check(const Model& model, Findings& findings) {
     checkFamilies(model, findings);
     checkFlashes(model, findings);
     checkPackages(model, findings);
-    for (const AcdLines& file : model.files()) {
-        for (const AcdLines::Line& line : file.lines()) {
-            for (unsigned number = line.firstLine; number <= line.lastLine; ++number) {
-                checkLetters(file, number, findings);
-            }
-        }
-    }
 }
 
 } // namespace
 
 RuleSet consistencyRules() {
     return {"names and values unlike all others",
-            {&RARE_NAME, &MISSING_PROPERTY, &UNUSUAL_VALUE, &CONFUSABLE_PACKAGE, &CONFUSABLE_LETTER},
+            {&RARE_NAME, &MISSING_PROPERTY, &UNUSUAL_VALUE, &CONFUSABLE_PACKAGE},
             check};
 }
 

@@ -161,8 +161,10 @@ void checkUnclassed(const Model& model, Findings& findings) {
         for (const Token& flash : list.devices) {
             if (!flash.text.empty() && !classed.contains(lowerCase(flash.text)) &&
                 model.spiKeys().find(schema::propertyKey(flash.text)) == nullptr) {
-                findings.add(NO_PROPERTIES, flash, "{} is in no class and has no {}", inQuotes(flash.text),
-                             schema::propertyKey(flash.text));
+                const std::string key = schema::propertyKey(flash.text);
+                findings
+                    .add(NO_PROPERTIES, flash, "{} is in no class and has no {}", inQuotes(flash.text), key)
+                    .restsOn = fact::key(key);
             }
         }
     }

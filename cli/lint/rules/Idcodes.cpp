@@ -165,9 +165,11 @@ void checkDevice(const Model& model, const Token& device, const std::vector<Toke
         findings.add(UNKNOWN_DEVICE, device, "{} is not a device of a family, so it has no IDCODE",
                      inQuotes(device.text));
     } else {
-        findings.addUnknown(UNKNOWN_DEVICE, device, device,
-                            findings.suggest(device.text, model.deviceNames(), used), "unknown device {}",
-                            inQuotes(device.text));
+        const Suggestion suggestion = findings.suggest(device.text, model.deviceNames(), used);
+        findings
+            .addUnknown(UNKNOWN_DEVICE, device, device, suggestion, "unknown device {}",
+                        inQuotes(device.text))
+            .reports = fact::inList(suggestion.name.value_or(""), schema::IDCODE);
     }
 }
 
@@ -208,8 +210,9 @@ void check(const Model& model, Findings& findings) {
     }
     for (const auto& [name, device] : model.devices()) {
         if (!withCode.contains(name)) {
-            findings.add(NO_CODE, device.section->name, "IDCODE of base.acd lacks the device {}",
-                         inQuotes(name));
+            findings
+                .add(NO_CODE, device.section->name, "IDCODE of base.acd lacks the device {}", inQuotes(name))
+                .restsOn = fact::inList(name, schema::IDCODE);
         }
     }
 }

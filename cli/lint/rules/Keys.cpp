@@ -163,8 +163,12 @@ private:
 
     void add(const AcdLines::Line& line, const Suggestion& suggestion, const std::string& hint = {}) {
         const Token key{line.name, {m_file, line.line, line.column}};
-        m_findings.addUnknown(UNKNOWN_KEY, key, key, suggestion, "the key {} is not read here{}",
-                              inQuotes(line.name), hint);
+        Finding& finding = m_findings.addUnknown(UNKNOWN_KEY, key, key, suggestion,
+                                                 "the key {} is not read here{}", inQuotes(line.name), hint);
+        finding.reports = suggestion.name ? fact::key(*suggestion.name) : std::string();
+        if (key.text.ends_with(schema::PROPERTY_SUFFIX)) {
+            finding.restsOn = key.text.substr(0, key.text.size() - schema::PROPERTY_SUFFIX.size());
+        }
     }
 
     schema::File m_kind;

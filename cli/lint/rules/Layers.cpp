@@ -14,6 +14,7 @@ constexpr Rule APPEND_WITHOUT_VALUE{
     R"(In a section "+=" adds to the section's own value, not to that of the family. Without one the appended text is the
 whole value of the device and hides the family's records. Write out all records with "=".)",
     "OPERATION = PROGRAM,Bscan,USB2\n[KS50]\nOPERATION += :VERIFY,Bscan,USB2",
+    true,
     true};
 constexpr Rule HIDDEN_NAMES{
     "R102",
@@ -39,7 +40,9 @@ constexpr Rule JOINED_APPEND{
     R"("+=" without a separator)",
     R"("+=" puts nothing between the former value and the new text, so the last item and the first one are joined to one.
 Begin with "," in lists and with ":" between records.)",
-    "DEVICE_SUPPORTED += sparrow"};
+    "DEVICE_SUPPORTED += sparrow",
+    false,
+    true};
 
 void checkHidings(std::string_view key, const Value& value, Findings& findings) {
     for (const Value::Hiding& hiding : value.hidings) {

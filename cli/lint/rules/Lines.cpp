@@ -110,7 +110,9 @@ constexpr Rule LONE_CR{
     "carriage return inside a line",
     R"(Lines end in LF or CRLF; a CR anywhere else is part of the text. A file whose lines end in CR alone is a single
 line.)",
-    "PROPERTY = PINS,140<CR>PROPERTIES = PACKAGES,1,TQ100"};
+    "PROPERTY = PINS,140<CR>PROPERTIES = PACKAGES,1,TQ100",
+    false,
+    true};
 constexpr Rule UNREADABLE_FILE{
     "L114",
     "unreadable-file",

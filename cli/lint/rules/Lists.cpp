@@ -55,7 +55,9 @@ constexpr Rule COMMENT_AFTER_VALUE{
     Severity::WARNING,
     "comment after a value",
     "A comment needs a line of its own. After a value it is part of the value.",
-    "PROPERTY = PINS,140 # in the largest package"};
+    "PROPERTY = PINS,140 # in the largest package",
+    false,
+    true};
 
 constexpr Rule DOUBLED_OPERATOR{
     "F107",
@@ -63,7 +65,9 @@ constexpr Rule DOUBLED_OPERATOR{
     Severity::WARNING,
     R"("==" or "=+")",
     R"(A line is split at its first "=", so what follows is part of the value. Appending is written "+=".)",
-    "PROPERTY == VENDOR,Korvel"};
+    "PROPERTY == VENDOR,Korvel",
+    false,
+    true};
 
 bool isBlank(char byte) { return byte == ' ' || byte == '\t'; }
 

@@ -97,19 +97,22 @@ void checkLabel(const Token& label, bool isEntry, Findings& findings) {
     }
 }
 
-void checkOutputs(const std::vector<Token>& outputs, Findings& findings) {
+void checkOutputs(std::string_view mode, const std::vector<Token>& outputs, Findings& findings) {
     checkLabel(outputs.front(), contains(schema::modeOutputs(), outputs.front().text), findings);
     for (std::size_t i = 1; i < outputs.size(); ++i) {
         const std::string_view text = outputs[i].text;
         if (!text.empty() && !contains(schema::modeOutputs(), text)) {
-            findings.addUnknown(UNKNOWN_MODE_OUTPUT, outputs[i], outputs[i],
-                                findings.suggest(text, schema::modeOutputs(), outputs), "unknown output {}",
-                                inQuotes(text));
+            const Suggestion suggestion = findings.suggest(text, schema::modeOutputs(), outputs);
+            findings
+                .addUnknown(UNKNOWN_MODE_OUTPUT, outputs[i], outputs[i], suggestion, "unknown output {}",
+                            inQuotes(text))
+                .reports = fact::inMode(suggestion.name.value_or(""), mode);
         }
     }
 }
 
-void checkFamilies(const Model& model, const std::vector<Token>& families, Findings& findings) {
+void checkFamilies(const Model& model, std::string_view mode, const std::vector<Token>& families,
+                   Findings& findings) {
     checkLabel(families.front(), model.isFamily(families.front().text), findings);
     for (std::size_t i = 1; i < families.size(); ++i) {
         const std::string_view text = families[i].text;
@@ -121,9 +124,11 @@ void checkFamilies(const Model& model, const std::vector<Token>& families, Findi
                          "{} is a device; only its family {} can be listed here", inQuotes(text),
                          inQuotes(device->family->name));
         } else {
-            findings.addUnknown(UNKNOWN_MODE_FAMILY, families[i], families[i],
-                                findings.suggest(text, model.familyNames(), families), "unknown family {}",
-                                inQuotes(text));
+            const Suggestion suggestion = findings.suggest(text, model.familyNames(), families);
+            findings
+                .addUnknown(UNKNOWN_MODE_FAMILY, families[i], families[i], suggestion, "unknown family {}",
+                            inQuotes(text))
+                .reports = fact::inMode(suggestion.name.value_or(""), mode);
         }
     }
 }
@@ -139,10 +144,10 @@ void checkMode(const Model& model, const Value& value, Findings& findings) {
         findings.addText(NOT_TWO_ITEMS, value.key, "no list of families after the outputs");
     }
     if (!items.empty()) {
-        checkOutputs(items[0].fields, findings);
+        checkOutputs(value.key.text, items[0].fields, findings);
     }
     if (items.size() > 1) {
-        checkFamilies(model, items[1].fields, findings);
+        checkFamilies(model, value.key.text, items[1].fields, findings);
     }
 }
 

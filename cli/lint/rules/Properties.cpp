@@ -181,11 +181,13 @@ void checkMeaning(const Item& item, std::size_t firstValue, const std::set<std::
     const bool isUpperOption = upper.starts_with(schema::OPTIONS_PREFIX) &&
                                namesOperation(std::string_view(upper).substr(schema::OPTIONS_PREFIX.size()));
     if (isOption ? name.text != upper || !isUpperOption : isUpperOption) {
-        findings.addUnknown(
-            UNKNOWN_OPERATION_NAME, name, name,
-            findings.suggest(name.text, optionPropertyNames(),
-                             [&names](const std::string& other) { return names.contains(other); }),
-            "{} belongs to no operation", inQuotes(name.text));
+        findings
+            .addUnknown(
+                UNKNOWN_OPERATION_NAME, name, name,
+                findings.suggest(name.text, optionPropertyNames(),
+                                 [&names](const std::string& other) { return names.contains(other); }),
+                "{} belongs to no operation", inQuotes(name.text))
+            .reports = fact::name(name.text);
     }
     if (!isOption && !contains(vocabulary::operations(), name.text)) {
         return;

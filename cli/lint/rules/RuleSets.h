@@ -11,6 +11,7 @@ namespace lint {
 [[nodiscard]] RuleSet idcodeRules();
 [[nodiscard]] RuleSet keyRules();
 [[nodiscard]] RuleSet layerRules();
+[[nodiscard]] RuleSet letterRules();
 [[nodiscard]] RuleSet lineRules();
 [[nodiscard]] RuleSet listRules();
 [[nodiscard]] RuleSet modeRules();

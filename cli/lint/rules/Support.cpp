@@ -91,20 +91,28 @@ std::vector<std::string> familiesAndDevices(const Model& model) {
     return all;
 }
 
+bool hasOwnTables(const Device& device) {
+    return device.section->find(schema::OPERATION) != nullptr ||
+           device.section->find(schema::BSDL_OPERATION) != nullptr;
+}
+
 void checkSupported(const Model& model, Findings& findings) {
     const std::vector<std::string> candidates = familiesAndDevices(model);
     const std::vector<Token>& listed = model.baseKeys().list(schema::DEVICE_SUPPORTED);
     for (const Token& name : listed) {
         if (!name.text.empty() && !isKnown(model, name.text)) {
-            findings.addUnknown(UNKNOWN_SUPPORTED, name, name,
-                                findings.suggest(name.text, candidates, listed),
-                                "{} is neither a family nor a device", inQuotes(name.text));
+            const Suggestion suggestion = findings.suggest(name.text, candidates, listed);
+            findings
+                .addUnknown(UNKNOWN_SUPPORTED, name, name, suggestion, "{} is neither a family nor a device",
+                            inQuotes(name.text))
+                .reports = fact::inList(suggestion.name.value_or(""), schema::DEVICE_SUPPORTED);
         }
         const Device* const device = model.device(name.text);
-        if (device != nullptr && device->section->find(schema::OPERATION) == nullptr &&
-            device->section->find(schema::BSDL_OPERATION) == nullptr) {
-            findings.add(NO_TABLES, name, "the section of {} has neither OPERATION nor BSDL_OPERATION",
-                         inQuotes(name.text));
+        if (device != nullptr && !hasOwnTables(*device)) {
+            findings
+                .add(NO_TABLES, name, "the section of {} has neither OPERATION nor BSDL_OPERATION",
+                     inQuotes(name.text))
+                .reports = fact::inList(name.text, schema::DEVICE_SUPPORTED);
         }
     }
 }
@@ -150,11 +158,15 @@ void checkOptionOwners(const Model& model, Findings& findings) {
         }
         std::vector<std::string> packages;
         std::string device;
+        Suggestion suggestion;
         switch (partOf(model, name.text, packages, device)) {
         case Part::UNKNOWN:
-            findings.addUnknown(
-                UNKNOWN_OPTION_OWNER, name, name, findings.suggest(name.text, candidates, listed),
-                "{} is neither a family nor a device, nor a device with a package", inQuotes(name.text));
+            suggestion = findings.suggest(name.text, candidates, listed);
+            findings
+                .addUnknown(UNKNOWN_OPTION_OWNER, name, name, suggestion,
+                            "{} is neither a family nor a device, nor a device with a package",
+                            inQuotes(name.text))
+                .reports = fact::inList(suggestion.name.value_or(""), schema::PROGRAM_OPTION_PACKAGE);
             break;
         case Part::OTHER_PACKAGE:
             packages.insert(packages.end(), candidates.begin(), candidates.end());
@@ -163,9 +175,10 @@ void checkOptionOwners(const Model& model, Findings& findings) {
             break;
         case Part::KNOWN:
             if (model.supported().contains(device)) {
-                findings.add(PACKAGE_OF_SUPPORTED, name,
-                             "the table of {} stays empty: DEVICE_SUPPORTED lists {}", inQuotes(name.text),
-                             inQuotes(device));
+                findings
+                    .add(PACKAGE_OF_SUPPORTED, name, "the table of {} stays empty: DEVICE_SUPPORTED lists {}",
+                         inQuotes(name.text), inQuotes(device))
+                    .restsOn = fact::inList(device, schema::DEVICE_SUPPORTED);
             }
             break;
         }
@@ -189,12 +202,16 @@ Token listKey(const Model& model, std::string_view key) {
 
 void checkTables(const Model& model, const std::string& family, Findings& findings) {
     if (!model.supported().contains(family)) {
-        findings.add(UNSUPPORTED_FAMILY, listKey(model, schema::DEVICE_SUPPORTED),
-                     "DEVICE_SUPPORTED lacks the family {}", inQuotes(family));
+        findings
+            .add(UNSUPPORTED_FAMILY, listKey(model, schema::DEVICE_SUPPORTED),
+                 "DEVICE_SUPPORTED lacks the family {}", inQuotes(family))
+            .restsOn = fact::inList(family, schema::DEVICE_SUPPORTED);
     }
     if (!model.optionPackages().contains(family)) {
-        findings.add(NO_OPTION_TABLE, listKey(model, schema::PROGRAM_OPTION_PACKAGE),
-                     "PROGRAM_OPTION_PACKAGE lacks the family {}", inQuotes(family));
+        findings
+            .add(NO_OPTION_TABLE, listKey(model, schema::PROGRAM_OPTION_PACKAGE),
+                 "PROGRAM_OPTION_PACKAGE lacks the family {}", inQuotes(family))
+            .restsOn = fact::inList(family, schema::PROGRAM_OPTION_PACKAGE);
     }
 }
 
@@ -213,9 +230,13 @@ void checkFamilies(const Model& model, Findings& findings) {
         checkTables(model, std::string(schema::SPI_FAMILY), findings);
     }
     for (const std::string_view name : model.supported()) {
-        if (model.device(name) != nullptr && !model.optionPackages().contains(name)) {
-            findings.add(NO_OPTION_TABLE, listKey(model, schema::PROGRAM_OPTION_PACKAGE),
-                         "PROGRAM_OPTION_PACKAGE lacks {}, a device of DEVICE_SUPPORTED", inQuotes(name));
+        const Device* const device = model.device(name);
+        // A device without tables of its own does not belong into the list in the first place.
+        if (device != nullptr && hasOwnTables(*device) && !model.optionPackages().contains(name)) {
+            Finding& finding =
+                findings.add(NO_OPTION_TABLE, listKey(model, schema::PROGRAM_OPTION_PACKAGE),
+                             "PROGRAM_OPTION_PACKAGE lacks {}, a device of DEVICE_SUPPORTED", inQuotes(name));
+            finding.restsOn = fact::inList(name, schema::PROGRAM_OPTION_PACKAGE);
         }
     }
 }

@@ -281,8 +281,10 @@ private:
         const bool isMissing =
             families && m_family.kind != schema::File::BASE && !families->contains(m_family.name);
         if (isMissing) {
-            m_findings.add(MODE_WITHOUT_FAMILY, token, "{} of base.acd does not list the family {}",
-                           vocabulary::modes()[mode], inQuotes(m_family.name));
+            Finding& finding =
+                m_findings.add(MODE_WITHOUT_FAMILY, token, "{} of base.acd does not list the family {}",
+                               vocabulary::modes()[mode], inQuotes(m_family.name));
+            finding.reports = finding.restsOn = fact::inMode(m_family.name, vocabulary::modes()[mode]);
         }
         return !isMissing;
     }
@@ -290,8 +292,10 @@ private:
     void checkModeOutput(std::size_t mode, const Token& token) {
         const auto& outputs = m_modes[mode].outputs;
         if (outputs && !outputs->contains(token.text)) {
-            m_findings.add(MODE_WITHOUT_OUTPUT, token, "{} of base.acd does not list the output {}",
-                           vocabulary::modes()[mode], inQuotes(token.text));
+            m_findings
+                .add(MODE_WITHOUT_OUTPUT, token, "{} of base.acd does not list the output {}",
+                     vocabulary::modes()[mode], inQuotes(token.text))
+                .restsOn = fact::inMode(token.text, vocabulary::modes()[mode]);
         }
     }
 

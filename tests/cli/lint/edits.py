@@ -1,5 +1,5 @@
 """Applies single edits to the demonstration database, as people make them, and checks that the linter finds each at
-the expected line. Then applies edits that are right, and checks that the linter stays silent.
+the expected line, and nothing else. Then applies edits that are right, and checks that the linter stays silent.
 
 usage: edits.py TOOL DATABASE [LEAST]
 LEAST is how many of the edits must be found at least, by default all of them.
@@ -14,10 +14,11 @@ import tempfile
 
 class Edit:
     """Replaces `old` by `new` in a file; without `old` the file is written into a layer on top. The finding is
-    expected at the line where `at` begins, by default the first line that the edit changed."""
+    expected at the line where `at` begins, by default the first line that the edit changed; findings of the codes
+    `also` may come with it."""
 
-    def __init__(self, what, code, file, old, new, at=None, at_file=None):
-        self.what, self.code, self.file, self.old, self.new = what, code, file, old, new
+    def __init__(self, what, code, file, old, new, at=None, at_file=None, also=()):
+        self.what, self.code, self.file, self.old, self.new, self.also = what, code, file, old, new, also
         self.at, self.at_file = at, at_file or file
 
     def apply(self, base, site):
@@ -64,10 +65,10 @@ TABLES_AND_LISTS = [
     Edit("a device excluded from SPI", "M206", *excluded("SPI_KS50_TQ144,SS_BZ2_PL84")),
     Edit("SPI in upper case excluded from SPI", "M206", *excluded("SPI_SPI_SO8,SS_BZ2_PL84")),
     Edit("a package that only other devices have", "M204", *excluded("SS_BZ2_FB900,SS_BZ2_PL84")),
-    Edit("SS renamed", "M105", "base.acd", "SS      = outputs", "SSER    = outputs", at="DEVICE_SUPPORTED       ="),
-    Edit("KITECF renamed", "M105", "base.acd", "KITECF  = outputs", "KITE_CF = outputs", at="DEVICE_SUPPORTED       ="),
-    Edit("PFF renamed", "M105", "base.acd", "PFF     = outputs", "PROMFF  = outputs", at="DEVICE_SUPPORTED       ="),
-    Edit("DP770 renamed", "M105", "base.acd", "DP770   = outputs", "DP700   = outputs", at="DEVICE_SUPPORTED       ="),
+    Edit("SS renamed", "K102", "base.acd", "SS      = outputs", "SSER    = outputs", also=["M105"]),
+    Edit("KITECF renamed", "K102", "base.acd", "KITECF  = outputs", "KITE_CF = outputs"),
+    Edit("PFF renamed", "K102", "base.acd", "PFF     = outputs", "PROMFF  = outputs", also=["M105"]),
+    Edit("DP770 renamed", "K102", "base.acd", "DP770   = outputs", "DP700   = outputs"),
     Edit("a CPLD under Slave Serial", "M106", "base.acd", "families,buzzard,goshawk,harrier,kestrel,merlin,osprey\n",
          "families,buzzard,goshawk,harrier,kestrel,merlin,osprey,pipit\n"),
     Edit("a PROM under Select Map", "M106", "base.acd", "families,buzzard,goshawk,harrier,kestrel,osprey\n",
@@ -100,7 +101,7 @@ TABLES_AND_LISTS = [
          "DEVICE_SUPPORTED       = HR4,DN1,OS2000E"),
     Edit("another one", "B108", "base.acd", "DEVICE_SUPPORTED       = HR4,OS2000E", "DEVICE_SUPPORTED       = HR4,KS50,OS2000E"),
     Edit("a flash of NV1 without properties", "S110", "spi.acd", "MRS256K,MRS1M,MRS4M\n", "MRS256K,MRS1M,MRS4M,MRS8M\n"),
-    Edit("a property key of NV1 with a typo", "S110", "spi.acd", "MRS1M_PROPERTY", "MRS1_PROPERTY", at="NV1_DEVICES"),
+    Edit("a property key of NV1 with a typo", "K102", "spi.acd", "MRS1M_PROPERTY", "MRS1_PROPERTY"),
     Edit("properties of a family that is no class", "S111", "spi.acd", "\nMRS256K_PROPERTY", "\nNV1_PROPERTY = VENDOR,Quillan\nMRS256K_PROPERTY",
          at="NV1_PROPERTY"),
 ]
@@ -184,7 +185,7 @@ OVERLAYS_AND_SECTIONS = [
     *[Edit(f"{file}: {text!r} drops properties", "R103", file, None, text, at="PROPERT")
       for file, text in [
           ("kestrel.acd", "PROPERTY = VENDOR,Site\n"), ("kestrel.acd", "[KS100]\nPROPERTY = CELLS,2305\n"),
-          ("osprey.acd", "PROPERTIES = PROGRAM,1,BS\n"), ("pipit.acd", "[PT48A]\nPROPERTY = PINS,34\n"),
+          ("osprey.acd", "PROPERTIES = PROGRAM,7,BS,SS,SM,BSFILE,KITECF,KITEMPM,PFF\n"), ("pipit.acd", "[PT48A]\nPROPERTY = PINS,34\n"),
           ("spi.acd", "OVD1_PROPERTY = PAGE,256\n"), ("spi.acd", "AT1_PROPERTY = CLOCK,1\n")]],
 ]
 
@@ -287,14 +288,14 @@ def main(tool, database, least=None):
             place = (edit.code, directory / edit.at_file, edit.line(base, site, changed))
             if place not in found:
                 missed.append(f"{edit.what}: no {place[0]} {place[1].name}:{place[2]}, but {shown[:5]}")
-            elif len(found) > 1:
+            elif len([code for code, _, _ in found if code not in edit.also]) > 1:
                 noisy.append(f"{edit.what}: {len(found)} findings: {shown[:5]}")
     print(f"{len(EDITS) - len(missed)} of {len(EDITS)} edits found at their line, {len(noisy)} of them not alone; "
           f"{len(wrong)} of {len(LEGITIMATE)} legitimate edits have findings")
     for kind, texts in (("missed", missed), ("not alone", noisy), ("false alarm", wrong)):
         for text in texts:
             print(f"{kind}: {text}")
-    return 1 if len(EDITS) - len(missed) < int(least or len(EDITS)) or wrong else 0
+    return 1 if len(EDITS) - len(missed) < int(least or len(EDITS)) or noisy or wrong else 0
 
 
 if __name__ == "__main__":

@@ -279,3 +279,45 @@ TEST(LintOptions, GithubShowsFindingsAsCommands) {
               "::error file=" + directory.path("kestrel.acd") +
                   ",line=1,col=13,title=T101::unknown operation \"PROGRM%25\"; did you mean \"PROGRAM\"?\n");
 }
+
+TEST(Consequences, ANameThatIsMisspeltWhereItIsDefinedIsReportedThereOnly) {
+    Files files = withFamily("[\u041aS50]\n");
+    EXPECT_THAT(codes(files), ElementsAre("C105"));
+    files["kestrel.acd"] = "[KS500]\n";
+    EXPECT_THAT(codes(files), ElementsAre("D104")) << "and not that KS500 has no IDCODE";
+}
+
+TEST(Consequences, OfASelectedFindingAreLeftOutOnly) {
+    const Files files = withModes("BS = outputs,USB2:families,spi\n",
+                                  "OPERATION = PROGRAM,Bscan,USB2:VERIFY,Bscan,USB2\n[KS50]\n");
+    EXPECT_THAT(codes(files, {"--select", "T112,M2"}), ElementsAre("T112"))
+        << "the second record follows from it";
+    const Files excluded =
+        withModes("BS = outputs,USB2:families,spi\nNOT_SUPPORTED_PART_IN_MODE = BS_KS50_TQ144\n",
+                  "OPERATION = PROGRAM,Bscan,USB2\n[KS50]\n");
+    EXPECT_THAT(codes(excluded, {"--select", "T112,M205"}), ElementsAre("T112"));
+    EXPECT_THAT(codes(excluded, {"--select", "M205"}), ElementsAre("M205"));
+    EXPECT_THAT(codes(excluded, {"--ignore", "T112"}), testing::Contains("M205"));
+}
+
+TEST(Consequences, OfOneLineAreReportedWithoutTheOther) {
+    const DatabaseDirectory directory(
+        withModes("BS = outputs,USB2:families,spi\nNOT_SUPPORTED_PART_IN_MODE = BS_KS50_TQ144\n",
+                  "OPERATION = PROGRAM,Bscan,USB2\n[KS50]\n"));
+    EXPECT_THAT(runLint({directory.path("base.acd")}).output, HasSubstr("[M205]"));
+    EXPECT_THAT(runLint({directory.path("base.acd")}).output, testing::Not(HasSubstr("[T112]")));
+}
+
+TEST(Consequences, ACommentThatIgnoresTheCauseShowsThem) {
+    Files files = withModes("BS = outputs,USB2:families,spi\nNOT_SUPPORTED_PART_IN_MODE = BS_KS50_TQ144\n",
+                            "# lint: ignore T112\nOPERATION = PROGRAM,Bscan,USB2\n[KS50]\n");
+    EXPECT_THAT(codes(files, {"--select", "T112,M205"}), ElementsAre("M205"));
+}
+
+TEST(Consequences, OfAMisspeltNameInAListAreNotReported) {
+    Files files = withFamily("[KS50]\n[KS51]\n");
+    files["base.acd"] =
+        "DEVICE_SUPPORTED = base,kestrel\nPROGRAM_OPTION_PACKAGE = base,kestrel\n"
+        "IDCODE = KS5O,0xX4104FB7:KS51,0x14204FB7\nNOT_SUPPORTED_PART_IN_MODE = BS_KS50_TQ144\n";
+    EXPECT_THAT(codes(files), ElementsAre("D104"));
+}
