@@ -88,8 +88,8 @@ Suggestion Findings::suggest(std::string_view text, const std::vector<std::strin
 
 std::vector<Finding> sorted(std::vector<Finding> findings, const Model& model) {
     std::map<const AcdLines*, std::size_t> order;
-    for (const AcdLines& file : model.files()) {
-        order.emplace(&file, order.size());
+    for (const AcdLines* file : model.files()) {
+        order.emplace(file, order.size());
     }
     const auto location = [&order](const Finding& finding) {
         return std::tuple(order.at(finding.location.file), finding.location.line, finding.location.column,

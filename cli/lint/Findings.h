@@ -27,6 +27,9 @@ struct Finding {
 /// What was found so far. Adding never fails, so that no finding hides the next.
 class Findings {
 public:
+    /// @param comparisons for suggestions: a file full of unknown names must not take forever
+    explicit Findings(std::size_t comparisons = 2'000'000) : m_comparisonsLeft(comparisons) {}
+
     /// Adds a finding; its text is `format` with the arguments put in.
     template <typename... Arguments>
     Finding& add(const Rule& rule, const Token& token, fmt::format_string<Arguments...> format,
@@ -61,9 +64,7 @@ public:
 
 private:
     std::vector<Finding> m_findings;
-
-    /// Limits the comparisons for suggestions: a file full of unknown names must not take forever.
-    std::size_t m_comparisonsLeft = 2'000'000;
+    std::size_t m_comparisonsLeft;
 };
 
 /// The same findings in the order of files and locations.

@@ -18,9 +18,9 @@ std::string Rule::explanation() const {
 
 const std::vector<RuleSet>& ruleSets() {
     static const std::vector<RuleSet> all{
-        supportRules(), consistencyRules(), idcodeRules(), listRules(),     keyRules(),
-        lineRules(),    modeRules(),        nameRules(),   propertyRules(), layerRules(),
-        flashRules(),   agreementRules(),   tableRules(),  commentRules()};
+        supportRules(), consistencyRules(), confusableRules(), idcodeRules(), listRules(),
+        keyRules(),     lineRules(),        modeRules(),       nameRules(),   propertyRules(),
+        layerRules(),   flashRules(),       agreementRules(),  tableRules(),  commentRules()};
     return all;
 }
 

@@ -6,6 +6,7 @@ namespace lint {
 
 [[nodiscard]] RuleSet agreementRules();
 [[nodiscard]] RuleSet commentRules(); ///< checked last, by `Suppressions`
+[[nodiscard]] RuleSet confusableRules();
 [[nodiscard]] RuleSet consistencyRules();
 [[nodiscard]] RuleSet flashRules();
 [[nodiscard]] RuleSet idcodeRules();
