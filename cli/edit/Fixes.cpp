@@ -107,6 +107,7 @@ private:
     /// The fixes of the findings that are meant.
     [[nodiscard]] std::vector<Candidate> candidates() const {
         const lint::Model current = model(texts());
+        const std::vector<const AcdLines*> files = current.files();
         std::map<std::size_t, SourceFile> sources;
         std::vector<Candidate> all;
         for (const lint::Finding& finding : check(current, m_request.selection)) {
@@ -117,7 +118,8 @@ private:
             }
             Candidate& candidate = all.emplace_back(Candidate{identityOf(finding), {}});
             for (const lint::TextEdit& edit : finding.fix->edits) {
-                const auto file = static_cast<std::size_t>(edit.location.file - current.files().data());
+                const auto file = static_cast<std::size_t>(
+                    std::find(files.begin(), files.end(), edit.location.file) - files.begin());
                 const auto source =
                     sources.try_emplace(file, m_files[file].text, m_files[file].path, m_files[file].family)
                         .first;

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "lint/Findings.h"
+#include "lint/FamilyResult.h"
 
 #include <cstddef>
 #include <functional>
@@ -17,9 +17,25 @@ struct Selection {
     bool withConsequences = false;                 ///< of other findings, too
 };
 
-/// All findings of a database that no comment suppresses, in the order of files and locations.
-/// @param progress is called with the number of rule sets that are done, and of all
+/// Checks models one after the other. What was found in a family is kept for the next model that shares it.
+class Checker {
+public:
+    /// Is called with the number of families and rule sets that are done, and of all.
+    using Progress = std::function<void(std::size_t, std::size_t)>;
+
+    /// All findings that no comment suppresses, in the order of files and locations. They refer to the model.
+    [[nodiscard]] std::vector<Finding> check(const Model& model, const Selection& selection,
+                                             const Progress& progress = {});
+
+private:
+    void checkFamilies(const Model& model, const std::function<void()>& advance);
+
+    FamilyContext m_context;
+    FamilyResults m_results;
+};
+
+/// Checks one model.
 [[nodiscard]] std::vector<Finding> check(const Model& model, const Selection& selection,
-                                         const std::function<void(std::size_t, std::size_t)>& progress = {});
+                                         const Checker::Progress& progress = {});
 
 } // namespace lint

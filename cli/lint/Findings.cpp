@@ -124,8 +124,8 @@ std::vector<Finding> withoutConsequences(const std::vector<Finding>& findings) {
 
 std::vector<Finding> sorted(std::vector<Finding> findings, const Model& model) {
     std::map<const AcdLines*, std::size_t> order;
-    for (const AcdLines& file : model.files()) {
-        order.emplace(&file, order.size());
+    for (const AcdLines* file : model.files()) {
+        order.emplace(file, order.size());
     }
     const auto location = [&order](const Finding& finding) {
         return std::tuple(order.at(finding.location.file), finding.location.line, finding.location.column,

@@ -54,6 +54,9 @@ namespace fact {
 /// What was found so far. Adding never fails, so that no finding hides the next.
 class Findings {
 public:
+    /// @param comparisons for suggestions: a file full of unknown names must not take forever
+    explicit Findings(std::size_t comparisons = 2'000'000) : m_comparisonsLeft(comparisons) {}
+
     /// Adds a finding; its text is `format` with the arguments put in.
     template <typename... Arguments>
     Finding& add(const Rule& rule, const Token& token, fmt::format_string<Arguments...> format,
@@ -91,9 +94,7 @@ public:
 
 private:
     std::vector<Finding> m_findings;
-
-    /// Limits the comparisons for suggestions: a file full of unknown names must not take forever.
-    std::size_t m_comparisonsLeft = 2'000'000;
+    std::size_t m_comparisonsLeft;
 };
 
 /// The findings without those that are consequences of others: of findings that rest on the same fact the first one

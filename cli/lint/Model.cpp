@@ -49,6 +49,14 @@ const std::vector<Token>& Value::list() const {
     return items.empty() ? none : items.front().fields;
 }
 
+std::vector<Token> Value::replaced() const {
+    std::vector<Token> all;
+    for (auto source = m_replaced.rbegin(); source != m_replaced.rend(); ++source) {
+        all.push_back({source->text, source->key.location});
+    }
+    return all;
+}
+
 void Value::assign(const AcdLines& file, const AcdLines::Line& line, char separator) {
     const AcdLines::SourceSpan& first = line.spans.front();
     const Token value{line.value, {&file, first.line, first.column}};
@@ -194,7 +202,7 @@ const std::vector<Token>& Section::list(std::string_view key) const {
     return value == nullptr ? none : value->list();
 }
 
-Token FamilyData::start() const { return startOf(*files.front()); }
+Token FamilyData::start() const { return startOf(files.front()); }
 
 Token startOf(const AcdLines& file) {
     if (file.lines().empty()) {
@@ -204,106 +212,134 @@ Token startOf(const AcdLines& file) {
     return {line.name, {&file, line.line, line.column}};
 }
 
-Model::Model(std::vector<AcdLines> files) : m_files(std::move(files)) {
-    for (const AcdLines& file : m_files) {
+FamilyData::FamilyData(std::vector<AcdLines> family)
+    : files(std::move(family)), name(files.front().family()), kind(schema::fileOf(name)) {
+    for (const AcdLines& file : files) {
         addFile(file);
     }
-    for (const FamilyData& family : m_families) {
-        m_base = family.kind == schema::File::BASE ? &family : m_base;
-        m_spi = family.kind == schema::File::SPI ? &family : m_spi;
-        m_familyNames.push_back(family.name);
-        m_lowerFamilies.insert(lowerCase(family.name));
-    }
-    // spi is a family even without a file.
-    if (m_spi == nullptr) {
-        m_familyNames.emplace_back(schema::SPI_FAMILY);
-        m_lowerFamilies.emplace(schema::SPI_FAMILY);
-    }
     splitValues();
-    m_supported = texts(baseKeys().list(schema::DEVICE_SUPPORTED));
-    m_optionPackages = texts(baseKeys().list(schema::PROGRAM_OPTION_PACKAGE));
-    findDevices();
-    findFlashes();
 }
 
-void Model::addFile(const AcdLines& file) {
-    // The files of a family follow each other.
-    if (m_families.empty() || m_families.back().name != file.family()) {
-        FamilyData& added = m_families.emplace_back();
-        added.name = file.family();
-        added.kind = schema::fileOf(added.name);
-    }
-    FamilyData& family = m_families.back();
-    family.files.push_back(&file);
-
+void FamilyData::addFile(const AcdLines& file) {
     std::map<std::string, Section*> sections;
-    for (Section& device : family.devices) {
+    for (Section& device : devices) {
         sections.emplace(lowerCase(device.name.text), &device);
     }
-    Section* open = &family.own;
+    Section* open = &own;
     for (const AcdLines::Line& line : file.lines()) {
         if (line.kind == AcdLines::Kind::INVALID) {
             open = line.closesSection ? nullptr : open;
         } else if (line.kind == AcdLines::Kind::HEADER) {
             Section*& section = sections[lowerCase(line.name)];
             if (section == nullptr) {
-                section = &family.devices.emplace_back();
+                section = &devices.emplace_back();
                 section->name = {line.name, {&file, line.line, line.column}};
             }
             open = section;
         } else if (open != nullptr) {
-            const bool isList = schema::firstListed(family.kind, line.name) <= 1;
+            const bool isList = schema::firstListed(kind, line.name) <= 1;
             open->values[line.name].assign(file, line, isList ? splitter::FIELDS : splitter::RECORDS);
         }
     }
 }
 
-void Model::splitValues() {
-    for (FamilyData& family : m_families) {
-        for (auto& [key, value] : family.own.values) {
-            value.split(family.kind, key, schema::shapeOf(family.kind, key));
-        }
-        for (Section& device : family.devices) {
-            for (auto& [key, value] : device.values) {
-                value.split(schema::File::FAMILY, key, schema::shapeInSection(key));
-            }
+void FamilyData::splitValues() {
+    for (auto& [key, value] : own.values) {
+        value.split(kind, key, schema::shapeOf(kind, key));
+    }
+    for (Section& device : devices) {
+        for (auto& [key, value] : device.values) {
+            value.split(schema::File::FAMILY, key, schema::shapeInSection(key));
         }
     }
 }
 
+Families familiesOf(std::vector<AcdLines> files) {
+    Families families;
+    for (auto first = files.begin(); first != files.end();) {
+        const auto last = std::find_if(
+            first, files.end(), [&first](const AcdLines& file) { return file.family() != first->family(); });
+        families.push_back(std::make_shared<const FamilyData>(
+            std::vector<AcdLines>(std::make_move_iterator(first), std::make_move_iterator(last))));
+        first = last;
+    }
+    return families;
+}
+
+std::vector<FlashList> flashLists(const Section& spiKeys) {
+    std::vector<FlashList> all;
+    for (const Token& family : spiKeys.list(schema::DEVICE_FAMILY)) {
+        all.push_back({family, spiKeys.list(schema::devicesKey(family.text))});
+    }
+    return all;
+}
+
+std::vector<std::string> namesOf(const std::vector<FlashList>& flashes) {
+    std::vector<std::string> names;
+    for (const FlashList& list : flashes) {
+        names.emplace_back(list.family.text);
+        for (const Token& flash : list.devices) {
+            names.emplace_back(flash.text);
+        }
+    }
+    return names;
+}
+
+Model::Model(Families families) : m_families(std::move(families)) {
+    for (const auto& family : m_families) {
+        m_base = family->kind == schema::File::BASE ? family.get() : m_base;
+        m_spi = family->kind == schema::File::SPI ? family.get() : m_spi;
+        m_familyNames.push_back(family->name);
+    }
+    // spi is a family even without a file.
+    if (m_spi == nullptr) {
+        m_familyNames.emplace_back(schema::SPI_FAMILY);
+    }
+    m_sortedFamilyNames.insert(m_familyNames.begin(), m_familyNames.end());
+    for (const std::string& name : m_familyNames) {
+        m_lowerFamilies.insert(lowerCase(name));
+    }
+    m_supported = texts(baseKeys().list(schema::DEVICE_SUPPORTED));
+    m_optionPackages = texts(baseKeys().list(schema::PROGRAM_OPTION_PACKAGE));
+    m_flashFamilies = flashLists(spiKeys());
+    m_flashNames = namesOf(m_flashFamilies);
+    for (const std::string& name : m_flashNames) {
+        m_lowerFlashes.insert(lowerCase(name));
+    }
+    findDevices();
+}
+
+std::vector<const AcdLines*> Model::files() const {
+    std::vector<const AcdLines*> all;
+    for (const auto& family : m_families) {
+        for (const AcdLines& file : family->files) {
+            all.push_back(&file);
+        }
+    }
+    return all;
+}
+
 void Model::findDevices() {
-    for (const FamilyData& family : m_families) {
-        if (family.kind != schema::File::FAMILY) {
+    for (const auto& family : m_families) {
+        if (family->kind != schema::File::FAMILY) {
             continue;
         }
-        for (const Section& section : family.devices) {
+        for (const Section& section : family->devices) {
             // Of several families the first one has the device.
             const auto [known, isNew] = m_lowerDevices.try_emplace(lowerCase(section.name.text));
             if (isNew) {
                 known->second =
-                    &m_devices.emplace(section.name.text, Device{&family, &section}).first->second;
+                    &m_devices.emplace(section.name.text, Device{family.get(), &section}).first->second;
                 m_deviceNames.emplace_back(section.name.text);
             }
         }
     }
 }
 
-void Model::findFlashes() {
-    for (const Token& family : spiKeys().list(schema::DEVICE_FAMILY)) {
-        m_flashFamilies.push_back({family, spiKeys().list(schema::devicesKey(family.text))});
-        m_flashNames.emplace_back(family.text);
-        for (const Token& flash : m_flashFamilies.back().devices) {
-            m_flashNames.emplace_back(flash.text);
-        }
-    }
-    for (const std::string& name : m_flashNames) {
-        m_lowerFlashes.insert(lowerCase(name));
-    }
-}
-
 bool Model::isComplete() const {
-    return std::all_of(m_files.begin(), m_files.end(),
-                       [](const AcdLines& file) { return file.readError().empty(); });
+    const std::vector<const AcdLines*> all = files();
+    return std::all_of(all.begin(), all.end(),
+                       [](const AcdLines* file) { return file->readError().empty(); });
 }
 
 const Section& Model::baseKeys() const {
@@ -321,9 +357,7 @@ const Device* Model::device(std::string_view name) const {
     return found == m_devices.end() ? nullptr : &found->second;
 }
 
-bool Model::isFamily(std::string_view name) const {
-    return std::find(m_familyNames.begin(), m_familyNames.end(), name) != m_familyNames.end();
-}
+bool Model::isFamily(std::string_view name) const { return m_sortedFamilyNames.contains(name); }
 
 const Device* Model::deviceInAnyCase(const std::string& name) const {
     const auto found = m_lowerDevices.find(lowerCase(name));

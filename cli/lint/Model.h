@@ -6,9 +6,12 @@
 
 #include <deque>
 #include <map>
+#include <memory>
 #include <set>
 #include <string>
 #include <string_view>
+#include <unordered_map>
+#include <utility>
 #include <vector>
 
 namespace lint {
@@ -62,6 +65,12 @@ public:
     /// The items of a flat list.
     [[nodiscard]] const std::vector<Token>& list() const;
 
+    /// The whole text, as the readers give it.
+    [[nodiscard]] const std::string& text() const noexcept { return m_source.text; }
+
+    /// The whole values of lower layers that "=" on top replaces, each at its key; the upper ones first.
+    [[nodiscard]] std::vector<Token> replaced() const;
+
     /// @param separator between what the value has and what is appended
     void assign(const AcdLines& file, const AcdLines::Line& line, char separator);
     void split(schema::File file, std::string_view name, schema::Shape wanted);
@@ -103,13 +112,18 @@ struct Section {
     [[nodiscard]] const std::vector<Token>& list(std::string_view key) const;
 };
 
-/// The files of one family, merged.
+/// The files of one family, merged. Immutable.
 struct FamilyData {
+    std::vector<AcdLines> files; ///< the bottom layer first; one at least
     std::string name;
-    schema::File kind = schema::File::FAMILY;
-    std::vector<const AcdLines*> files; ///< the bottom layer first
+    schema::File kind;
     Section own;
     std::deque<Section> devices; ///< in the order in which they open first
+
+    /// @param family its files, the bottom layer first; one at least
+    explicit FamilyData(std::vector<AcdLines> family);
+    FamilyData(const FamilyData&) = delete;
+    FamilyData& operator=(const FamilyData&) = delete;
 
     /// Where to report something that the family's files lack.
     [[nodiscard]] Token start() const;
@@ -122,7 +136,18 @@ struct FamilyData {
             use(device);
         }
     }
+
+private:
+    void addFile(const AcdLines& file);
+    void splitValues();
 };
+
+/// Families by the order of their files. Models share those that do not differ.
+using Families = std::vector<std::shared_ptr<const FamilyData>>;
+
+/// Takes the files of a database apart into families.
+/// @param files those of a family follow each other, the bottom layer first
+[[nodiscard]] Families familiesOf(std::vector<AcdLines> files);
 
 /// Where to report something that no line of a file says.
 [[nodiscard]] Token startOf(const AcdLines& file);
@@ -139,15 +164,24 @@ struct FlashList {
     std::vector<Token> devices; ///< none when there is no list
 };
 
+/// The flashes of spi.acd: the families of `DEVICE_FAMILY`, each with its devices.
+[[nodiscard]] std::vector<FlashList> flashLists(const Section& spiKeys);
+
+/// Their names, those of the families among them.
+[[nodiscard]] std::vector<std::string> namesOf(const std::vector<FlashList>& flashes);
+
 /// A database as the rules see it. Immutable.
 class Model {
 public:
-    explicit Model(std::vector<AcdLines> files);
+    explicit Model(Families families);
+    explicit Model(std::vector<AcdLines> files) : Model(familiesOf(std::move(files))) {}
     Model(const Model&) = delete;
     Model& operator=(const Model&) = delete;
 
-    [[nodiscard]] const std::vector<AcdLines>& files() const noexcept { return m_files; }
-    [[nodiscard]] const std::deque<FamilyData>& families() const noexcept { return m_families; }
+    [[nodiscard]] const Families& families() const noexcept { return m_families; }
+
+    /// The files of all families, in their order.
+    [[nodiscard]] std::vector<const AcdLines*> files() const;
 
     /// Could all files be read?
     [[nodiscard]] bool isComplete() const;
@@ -188,13 +222,9 @@ public:
     [[nodiscard]] const std::vector<std::string>& flashNames() const noexcept { return m_flashNames; }
 
 private:
-    void addFile(const AcdLines& file);
-    void splitValues();
     void findDevices();
-    void findFlashes();
 
-    std::vector<AcdLines> m_files;
-    std::deque<FamilyData> m_families;
+    Families m_families;
     const FamilyData* m_base = nullptr;
     const FamilyData* m_spi = nullptr;
     std::map<std::string_view, Device> m_devices;
@@ -204,8 +234,9 @@ private:
     std::vector<std::string> m_familyNames;
     std::vector<std::string> m_deviceNames;
     std::vector<std::string> m_flashNames;
+    std::set<std::string_view> m_sortedFamilyNames;
     std::set<std::string> m_lowerFamilies;
-    std::map<std::string, const Device*> m_lowerDevices;
+    std::unordered_map<std::string, const Device*> m_lowerDevices;
     std::set<std::string> m_lowerFlashes;
 };
 

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <map>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -8,6 +10,9 @@ namespace lint {
 
 class Findings;
 class Model;
+struct FamilyContext;
+struct FamilyData;
+struct FamilyResult;
 
 enum class Severity {
     WARNING, ///< without effect, or right only by accident
@@ -29,12 +34,19 @@ struct Rule {
     [[nodiscard]] std::string explanation() const;
 };
 
-/// Rules about one subject, and the function that checks them.
+/// Rules about one subject, and the functions that check them.
 struct RuleSet {
     std::string_view
         subject; ///< what the rules of its letter are about; empty if the set has rules of several letters
     std::vector<const Rule*> rules;
-    void (*check)(const Model& model, Findings& findings);
+
+    /// Finds what depends on one family and the context alone; null if nothing does.
+    void (*checkFamily)(const FamilyData& family, const FamilyContext& context, FamilyResult& result);
+
+    /// Finds what depends on several families; null if nothing does.
+    void (*check)(const Model& model,
+                  const std::map<std::shared_ptr<const FamilyData>, FamilyResult>& families,
+                  Findings& findings);
 };
 
 /// All rule sets, in the order of the codes' letters.

@@ -17,10 +17,10 @@ std::string Rule::explanation() const {
 }
 
 const std::vector<RuleSet>& ruleSets() {
-    static const std::vector<RuleSet> all{supportRules(), consistencyRules(), letterRules(), idcodeRules(),
-                                          listRules(),    keyRules(),         lineRules(),   modeRules(),
-                                          nameRules(),    propertyRules(),    layerRules(),  flashRules(),
-                                          tableRules(),   agreementRules(),   commentRules()};
+    static const std::vector<RuleSet> all{
+        supportRules(), consistencyRules(), confusableRules(), idcodeRules(),    listRules(),
+        keyRules(),     lineRules(),        modeRules(),       nameRules(),      propertyRules(),
+        layerRules(),   flashRules(),       tableRules(),      agreementRules(), commentRules()};
     return all;
 }
 

@@ -1,6 +1,8 @@
 // Prints findings in SARIF 2.1.0, the format that code review tools read.
 #include "lint/Report.h"
 
+#include "text/Uri.h"
+
 #include <fmt/format.h>
 
 #include <algorithm>
@@ -8,22 +10,6 @@
 namespace lint {
 
 namespace {
-
-/// A path as the path of a URI.
-std::string asUri(std::string_view path) {
-    constexpr std::string_view PLAIN = "-._~/";
-    std::string uri = path.starts_with('/') ? "file://" : "";
-    for (const char byte : path) {
-        const bool isLetterOrDigit =
-            (byte >= 'a' && byte <= 'z') || (byte >= 'A' && byte <= 'Z') || (byte >= '0' && byte <= '9');
-        if (isLetterOrDigit || PLAIN.find(byte) != PLAIN.npos) {
-            uri += byte;
-        } else {
-            uri += fmt::format("%{:02X}", static_cast<unsigned char>(byte));
-        }
-    }
-    return uri;
-}
 
 /// The number of characters in the text, as the reports show it: each byte that is not UTF-8 is one.
 std::size_t characters(std::string_view text) {

@@ -130,26 +130,23 @@ private:
 } // namespace
 
 RuleSet commentRules() {
-    return {"comments to the linter", {&UNREADABLE_COMMENT, &UNUSED_SUPPRESSION}, nullptr};
+    return {"comments to the linter", {&UNREADABLE_COMMENT, &UNUSED_SUPPRESSION}, nullptr, nullptr};
 }
 
-std::vector<Finding> withoutSuppressed(const Model& model, const Findings& findings) {
+std::vector<Finding> withoutSuppressed(const Model& model, std::vector<Finding> findings) {
     Findings ofComments;
     std::map<const AcdLines*, Comments> comments;
-    for (const AcdLines& file : model.files()) {
-        comments.try_emplace(&file, file, ofComments);
+    for (const AcdLines* file : model.files()) {
+        comments.try_emplace(file, *file, ofComments);
     }
-    std::vector<Finding> kept;
-    for (const Finding& finding : findings.all()) {
-        if (!comments.at(finding.location.file).ignores(finding.rule->code, finding.location.line)) {
-            kept.push_back(finding);
-        }
-    }
+    std::erase_if(findings, [&comments](const Finding& finding) {
+        return comments.at(finding.location.file).ignores(finding.rule->code, finding.location.line);
+    });
     for (const auto& [file, ofFile] : comments) {
         ofFile.addUnused(ofComments);
     }
-    kept.insert(kept.end(), ofComments.all().begin(), ofComments.all().end());
-    return kept;
+    findings.insert(findings.end(), ofComments.all().begin(), ofComments.all().end());
+    return findings;
 }
 
 } // namespace lint

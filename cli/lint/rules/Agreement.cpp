@@ -1,5 +1,5 @@
 // Rules about mode lists, tables and properties that contradict each other, or that cannot be reached.
-#include "lint/Findings.h"
+#include "lint/FamilyResult.h"
 #include "lint/rules/RuleSets.h"
 
 #include "model/Vocabulary.h"
@@ -94,9 +94,6 @@ it does not exist, so these options are never given.)",
 /// How many modes have cells in the tables.
 constexpr std::size_t TABLE_MODES = static_cast<std::size_t>(MODE_TYPE::SPI) + 1;
 
-/// A set of modes by their values.
-using Modes = std::bitset<16>;
-
 std::optional<std::size_t> position(const std::vector<std::string>& all, std::string_view text) {
     const auto found = std::find(all.begin(), all.end(), text);
     return found == all.end() ? std::nullopt : std::optional(static_cast<std::size_t>(found - all.begin()));
@@ -159,28 +156,11 @@ Modes modesOf(const std::vector<Token>& keys) {
     return modes;
 }
 
-/// The families under each mode that has a key; nothing for a mode that has none.
-std::vector<std::optional<std::set<std::string_view>>> modeFamilies(const Model& model) {
-    std::vector<std::optional<std::set<std::string_view>>> all;
-    for (const std::string& mode : vocabulary::modes()) {
-        const std::vector<Item>& items = model.baseKeys().items(mode);
-        auto& families = all.emplace_back();
-        if (items.size() > 1) {
-            families.emplace();
-            for (std::size_t i = 1; i < items[1].fields.size(); ++i) {
-                families->insert(items[1].fields[i].text);
-            }
-        }
-    }
-    return all;
-}
-
 /// Checks one family with all its devices, and collects the modes that it uses.
 class FamilyCheck {
 public:
-    FamilyCheck(const Model& model, const FamilyData& family,
-                const std::vector<std::optional<std::set<std::string_view>>>& modes, Findings& findings)
-        : m_model(model), m_family(family), m_modes(modes), m_findings(findings),
+    FamilyCheck(const FamilyData& family, const FamilyContext& context, Findings& findings)
+        : m_family(family), m_context(context), m_findings(findings),
           m_operations(family.own.items(schema::OPERATION)),
           m_options(family.own.items(schema::PROGRAM_OPTION)), m_properties(family.own) {}
 
@@ -197,9 +177,9 @@ private:
     [[nodiscard]] const Section& family() const { return m_family.own; }
 
     void checkDevice(const Section& device) {
-        const bool isSupported = m_model.supported().contains(device.name.text);
+        const bool isSupported = m_context.supported.contains(device.name.text);
         const bool hasOperations = isSupported && device.find(schema::OPERATION) != nullptr;
-        const bool hasOptions = m_model.optionPackages().contains(device.name.text) &&
+        const bool hasOptions = m_context.optionPackages.contains(device.name.text) &&
                                 device.find(schema::PROGRAM_OPTION) != nullptr;
         const PropertyValues own(device);
         const bool hasProperties = std::any_of(own.values.begin(), own.values.end(), [](const auto& value) {
@@ -269,8 +249,8 @@ private:
                 continue; // found as an unknown mode key
             }
             m_used.set(*mode);
-            if (m_family.kind != schema::File::BASE && m_modes[*mode] &&
-                !m_modes[*mode]->contains(m_family.name)) {
+            const auto& families = m_context.modes[*mode].families;
+            if (m_family.kind != schema::File::BASE && families && !families->contains(m_family.name)) {
                 report(OFFERED_OUT_OF_MODE, value, fact::inMode(m_family.name, value.text),
                        "{} of base.acd does not list the family {}", value.text, inQuotes(m_family.name));
             } else if (hasRecords(*mode) && !operations.modes.empty() && !operations.of(name).test(*mode)) {
@@ -344,9 +324,8 @@ private:
         }
     }
 
-    const Model& m_model;
     const FamilyData& m_family;
-    const std::vector<std::optional<std::set<std::string_view>>>& m_modes;
+    const FamilyContext& m_context;
     Findings& m_findings;
     Table m_operations;
     Table m_options;
@@ -383,13 +362,13 @@ void checkModes(const Model& model, const std::map<std::string_view, Modes>& use
     }
 }
 
-void checkParts(const Model& model, const std::vector<std::optional<std::set<std::string_view>>>& modes,
-                Findings& findings) {
+void checkParts(const Model& model, Findings& findings) {
+    const FamilyContext context(model);
     for (const Token& part : model.baseKeys().list(schema::NOT_SUPPORTED_PART_IN_MODE)) {
         const std::size_t first = part.text.find('_');
         const std::size_t second = part.text.find('_', first == part.text.npos ? first : first + 1);
         const std::optional<std::size_t> mode = position(vocabulary::modes(), part.text.substr(0, first));
-        if (!mode || second == part.text.npos || !modes[*mode] ||
+        if (!mode || second == part.text.npos || !context.modes[*mode].families ||
             *mode == static_cast<std::size_t>(MODE_TYPE::SPI)) {
             continue;
         }
@@ -398,7 +377,7 @@ void checkParts(const Model& model, const std::vector<std::optional<std::set<std
         const std::string_view family = model.isFlashInAnyCase(std::string(name)) ? schema::SPI_FAMILY
                                         : device != nullptr                       ? device->family->name
                                                                                   : std::string_view();
-        if (!family.empty() && !modes[*mode]->contains(family)) {
+        if (!family.empty() && !context.modes[*mode].families->contains(family)) {
             findings
                 .add(PART_OUT_OF_MODE, part,
                      "{} does not list the family {} of {}, so it refuses the part anyway",
@@ -408,14 +387,17 @@ void checkParts(const Model& model, const std::vector<std::optional<std::set<std
     }
 }
 
-void check(const Model& model, Findings& findings) {
-    const auto modes = modeFamilies(model);
+void checkFamily(const FamilyData& family, const FamilyContext& context, FamilyResult& result) {
+    result.usedModes = FamilyCheck(family, context, result.findings).check();
+}
+
+void check(const Model& model, const FamilyResults& families, Findings& findings) {
     std::map<std::string_view, Modes> used;
-    for (const FamilyData& family : model.families()) {
-        used[family.name] = FamilyCheck(model, family, modes, findings).check();
+    for (const auto& [family, result] : families) {
+        used[family->name] = result.usedModes;
     }
     checkModes(model, used, findings);
-    checkParts(model, modes, findings);
+    checkParts(model, findings);
 }
 
 } // namespace
@@ -424,6 +406,7 @@ RuleSet agreementRules() {
     return {"",
             {&NO_MODE_KEY, &IDLE_FAMILY, &PART_OUT_OF_MODE, &OFFERED_OUT_OF_MODE, &PROPERTY_WITHOUT_RECORD,
              &RECORD_WITHOUT_PROPERTY, &OPTION_WITHOUT_RECORD, &UNREACHABLE_OPTIONS},
+            checkFamily,
             check};
 }
 

@@ -1,13 +1,17 @@
 // Rules about names and values that differ from all others of their kind: usually typing errors.
-#include "lint/Findings.h"
+#include "lint/FamilyResult.h"
 #include "lint/rules/RuleSets.h"
 
 #include "model/Vocabulary.h"
 #include "text/Suggest.h"
 
 #include <algorithm>
+#include <array>
 #include <map>
+#include <numeric>
 #include <set>
+#include <unordered_map>
+#include <utility>
 
 namespace lint {
 
@@ -39,42 +43,12 @@ constexpr Rule UNUSUAL_VALUE{
     R"(At least four of five other values of the property are decimal numbers, or TRUE and FALSE. Applications read this one
 as a number up to its first other character, or as a flag that is not set.)",
     "PROPERTY = PINS,14O"};
-constexpr Rule CONFUSABLE_PACKAGE{
-    "C104",
-    "confusable-package",
-    Severity::WARNING,
-    "package that looks like a common one",
-    R"(The name differs from a more common package only in O and 0, I and 1, S and 5 or B and 8.)",
-    "PROPERTIES = PACKAGES,1,TQI00"};
-
 /// A name is common if that many sections use it, and rare up to the second number.
 constexpr std::size_t MIN_COMMON = 5;
 constexpr std::size_t MAX_RARE = 2;
 
 /// Of names; a file full of different ones must not take forever.
 constexpr std::size_t MAX_COMPARISONS = 5'000'000;
-
-/// One property of a section.
-struct Use {
-    const Token* name;
-    const std::vector<Token>* fields;
-    std::size_t firstValue;
-    std::size_t section; ///< the number of the section
-};
-
-/// Uses of properties that follow the same conventions: all of part families, or all of flashes.
-struct Domain {
-    const char* owners;
-    std::vector<Use> uses;
-
-    void add(const std::vector<Item>& items, std::size_t firstValue, std::size_t section) {
-        for (const Item& item : items) {
-            if (!item.fields.front().text.empty()) {
-                uses.push_back({&item.fields.front(), &item.fields, firstValue, section});
-            }
-        }
-    }
-};
 
 bool isDigit(char byte) { return byte >= '0' && byte <= '9'; }
 
@@ -110,51 +84,83 @@ bool hasMeaning(std::string_view name) {
            std::find(operations.begin(), operations.end(), name) != operations.end();
 }
 
-/// @return the sections that have such a name
-std::set<std::size_t> checkRareNames(const Domain& domain, Findings& findings) {
-    // Sections come in the order of their numbers.
-    std::map<std::string_view, std::vector<std::size_t>> sections;
-    for (const Use& use : domain.uses) {
-        std::vector<std::size_t>& users = sections[use.name->text];
-        if (users.empty() || users.back() != use.section) {
-            users.push_back(use.section);
+/// What property names are reported of; one for all part families, and one for the flashes.
+struct Domain {
+    const char* owners;
+    std::vector<const PropertyUses*> families;
+};
+
+/// The uses of each property, with the number of the family in the domain.
+using Uses = std::map<std::string_view, std::vector<std::pair<std::size_t, const PropertyUses::Property*>>>;
+
+Uses usesOf(const Domain& domain) {
+    Uses all;
+    for (std::size_t i = 0; i < domain.families.size(); ++i) {
+        for (const auto& [name, property] : domain.families[i]->properties) {
+            all[name].emplace_back(i, &property);
         }
     }
+    return all;
+}
+
+/// How many sections use a property.
+std::size_t countSections(const Uses::mapped_type& uses) {
+    return std::accumulate(uses.begin(), uses.end(), std::size_t{0}, [](std::size_t sum, const auto& use) {
+        return sum + use.second->sections.size();
+    });
+}
+
+/// Does a section of the domain use the name of `uses` together with another one?
+bool isUsedWith(const Domain& domain, const Uses::mapped_type& uses, std::string_view other) {
+    return std::any_of(uses.begin(), uses.end(), [&](const auto& use) {
+        const auto& properties = domain.families[use.first]->properties;
+        const auto found = properties.find(other);
+        return found != properties.end() &&
+               std::any_of(use.second->sections.begin(), use.second->sections.end(),
+                           [&found](std::size_t section) {
+                               return std::binary_search(found->second.sections.begin(),
+                                                         found->second.sections.end(), section);
+                           });
+    });
+}
+
+/// The sections that have a misspelt name, each with the number of its family.
+using Misspelt = std::set<std::pair<std::size_t, std::size_t>>;
+
+Misspelt checkRareNames(const Domain& domain, const Uses& uses, Findings& findings) {
+    std::map<std::string_view, std::size_t> sections;
     std::vector<std::string_view> common;
-    for (const auto& [name, users] : sections) {
-        if (users.size() >= MIN_COMMON) {
+    for (const auto& [name, users] : uses) {
+        sections.emplace(name, countSections(users));
+        if (sections[name] >= MIN_COMMON) {
             common.push_back(name);
         }
     }
-    std::map<std::string_view, std::string_view> rare;
+    Misspelt found;
     std::size_t comparisons = MAX_COMPARISONS;
-    for (const auto& [name, users] : sections) {
-        if (users.size() > MAX_RARE || hasMeaning(name) || common.size() > comparisons) {
+    for (const auto& [name, users] : uses) {
+        if (sections[name] > MAX_RARE || hasMeaning(name) || common.size() > comparisons) {
             continue;
         }
         comparisons -= common.size();
-        for (const std::string_view other : common) {
-            if (!isOneEdit(name, other)) {
-                continue;
-            }
-            const std::vector<std::size_t>& others = sections[other];
-            if (std::none_of(users.begin(), users.end(), [&others](std::size_t section) {
-                    return std::binary_search(others.begin(), others.end(), section);
-                })) {
-                rare.emplace(name, other);
-            }
+        const auto meant =
+            std::find_if(common.begin(), common.end(), [&, &name = name, &users = users](auto other) {
+                return isOneEdit(name, other) && !isUsedWith(domain, users, other);
+            });
+        if (meant == common.end()) {
+            continue;
         }
-    }
-    std::set<std::size_t> found;
-    for (const Use& use : domain.uses) {
-        if (const auto meant = rare.find(use.name->text); meant != rare.end()) {
-            found.insert(use.section);
-            findings
-                .add(RARE_NAME, *use.name, "{} is used {}, {} in {} {}; did you mean {}?",
-                     inQuotes(use.name->text), sections[use.name->text].size() == 1 ? "once" : "twice",
-                     inQuotes(meant->second), sections[meant->second].size(), domain.owners,
-                     inQuotes(meant->second))
-                .restsOn = fact::name(use.name->text);
+        for (const auto& [family, property] : users) {
+            for (const std::size_t section : property->sections) {
+                found.emplace(family, section);
+            }
+            for (const Token* use : property->names) {
+                findings
+                    .add(RARE_NAME, *use, "{} is used {}, {} in {} {}; did you mean {}?", inQuotes(name),
+                         sections[name] == 1 ? "once" : "twice", inQuotes(*meant), sections[*meant],
+                         domain.owners, inQuotes(*meant))
+                    .restsOn = fact::name(name);
+            }
         }
     }
     return found;
@@ -173,33 +179,53 @@ bool isNumber(std::string_view text) {
 
 bool isFlag(std::string_view text) { return sameWithoutCase(text, "TRUE") || sameWithoutCase(text, "FALSE"); }
 
-void checkValues(const Domain& domain, Findings& findings) {
-    struct Kind {
-        const char* text;
-        bool (*matches)(std::string_view);
-    };
-    for (const Kind& kind : {Kind{"a number", isNumber}, Kind{"TRUE or FALSE", isFlag}}) {
-        std::map<std::string_view, std::pair<std::size_t, std::vector<const Token*>>> found; ///< good, others
-        for (const Use& use : domain.uses) {
-            if (use.fields->size() == use.firstValue + 1) {
-                const Token& value = (*use.fields)[use.firstValue];
-                auto& [good, others] = found[use.name->text];
-                if (kind.matches(value.text)) {
-                    ++good;
-                } else {
-                    others.push_back(&value);
-                }
+struct ValueKind {
+    const char* text;
+    bool (*matches)(std::string_view);
+};
+
+constexpr std::array<ValueKind, 2> VALUE_KINDS{{{"a number", isNumber}, {"TRUE or FALSE", isFlag}}};
+
+void checkValues(const Domain& domain, const Uses& uses, Findings& findings) {
+    for (const auto& [name, users] : uses) {
+        for (std::size_t kind = 0; kind < VALUE_KINDS.size(); ++kind) {
+            std::size_t good = 0;
+            std::vector<const Token*> others;
+            for (const auto& [family, property] : users) {
+                const PropertyUses::Kind& values = property->kinds[kind];
+                good += values.matching;
+                others.insert(others.end(), values.others.begin(), values.others.end());
             }
-        }
-        for (const auto& [name, counts] : found) {
-            const auto& [good, others] = counts;
             // Of the other values at least four of five must be of the kind.
             if (good >= 4 && !others.empty() && good * 5 >= (good + others.size() - 1) * 4) {
                 for (const Token* value : others) {
                     findings.add(UNUSUAL_VALUE, *value, "{} is not {}, as {} is in {} of {} {}",
-                                 inQuotes(value->text), kind.text, name, good, good + others.size(),
-                                 domain.owners);
+                                 inQuotes(value->text), VALUE_KINDS[kind].text, name, good,
+                                 good + others.size(), domain.owners);
                 }
+            }
+        }
+    }
+}
+
+/// Adds the properties of a section, or of a property key of flashes.
+void addUses(const std::vector<Item>& items, std::size_t firstValue, std::size_t section,
+             PropertyUses& uses) {
+    for (const Item& item : items) {
+        const std::vector<Token>& fields = item.fields;
+        if (fields.front().text.empty()) {
+            continue;
+        }
+        PropertyUses::Property& property = uses.properties[fields.front().text];
+        property.names.push_back(&fields.front());
+        if (property.sections.empty() || property.sections.back() != section) {
+            property.sections.push_back(section);
+        }
+        for (std::size_t kind = 0; kind < VALUE_KINDS.size() && fields.size() == firstValue + 1; ++kind) {
+            if (VALUE_KINDS[kind].matches(fields.back().text)) {
+                ++property.kinds[kind].matching;
+            } else {
+                property.kinds[kind].others.push_back(&fields.back());
             }
         }
     }
@@ -209,11 +235,11 @@ void checkValues(const Domain& domain, Findings& findings) {
 struct Sibling {
     const Value* value; ///< where its properties are; null when it has none
     std::set<std::string_view> names;
-    bool isReported; ///< for a misspelt name
+    std::size_t section;
 };
 
-void checkMissing(const std::vector<Sibling>& siblings, const std::set<std::string_view>& inherited,
-                  const char* owners, Findings& findings) {
+void findMissing(const std::vector<Sibling>& siblings, const std::set<std::string_view>& inherited,
+                 PropertyUses& uses) {
     if (siblings.size() < MIN_COMMON - 1) {
         return;
     }
@@ -228,9 +254,23 @@ void checkMissing(const std::vector<Sibling>& siblings, const std::set<std::stri
             continue;
         }
         for (const Sibling& sibling : siblings) {
-            if (sibling.value != nullptr && !sibling.isReported && !sibling.names.contains(name)) {
-                findings.add(MISSING_PROPERTY, sibling.value->key, "{} is missing here; {} of {} {} have it",
-                             inQuotes(name), count, siblings.size(), owners);
+            if (sibling.value != nullptr && !sibling.names.contains(name)) {
+                uses.missing.push_back({name, &sibling.value->key, sibling.section, siblings.size()});
+            }
+        }
+    }
+}
+
+/// Checks what was collected. A section with a misspelt name does not lack the name that was meant.
+void checkUses(const Domain& domain, const char* siblings, Findings& findings) {
+    const Uses uses = usesOf(domain);
+    const Misspelt reported = checkRareNames(domain, uses, findings);
+    checkValues(domain, uses, findings);
+    for (std::size_t family = 0; family < domain.families.size(); ++family) {
+        for (const PropertyUses::Missing& missing : domain.families[family]->missing) {
+            if (!reported.contains({family, missing.section})) {
+                findings.add(MISSING_PROPERTY, *missing.key, "{} is missing here; {} of {} {} have it",
+                             inQuotes(missing.name), missing.siblings - 1, missing.siblings, siblings);
             }
         }
     }
@@ -246,44 +286,37 @@ std::set<std::string_view> namesOf(const Section& section) {
     return names;
 }
 
-void checkFamilies(const Model& model, Findings& findings) {
-    Domain domain{"sections", {}};
-    std::map<const Section*, std::size_t> numbers;
-    for (const FamilyData& family : model.families()) {
-        family.forEachSection([&](const Section& section) {
-            const std::size_t number = numbers.emplace(&section, numbers.size()).first->second;
-            for (const schema::PropertyKey key : schema::PROPERTY_KEYS) {
-                domain.add(section.items(key.key), key.firstValue, number);
-            }
-        });
-    }
-    const std::set<std::size_t> reported = checkRareNames(domain, findings);
-    checkValues(domain, findings);
-    for (const FamilyData& family : model.families()) {
-        std::vector<Sibling> siblings;
-        for (const Section& device : family.devices) {
-            const Value* const single = device.find(schema::PROPERTY);
-            siblings.push_back({single == nullptr ? device.find(schema::PROPERTIES) : single, namesOf(device),
-                                reported.contains(numbers[&device])});
+PropertyUses usesOfSections(const FamilyData& family) {
+    PropertyUses uses;
+    std::vector<Sibling> siblings;
+    std::size_t number = 0;
+    family.forEachSection([&](const Section& section) {
+        for (const schema::PropertyKey key : schema::PROPERTY_KEYS) {
+            addUses(section.items(key.key), key.firstValue, number, uses);
         }
-        checkMissing(siblings, namesOf(family.own), "devices of the family", findings);
-    }
+        if (&section != &family.own) {
+            const Value* const single = section.find(schema::PROPERTY);
+            siblings.push_back(
+                {single == nullptr ? section.find(schema::PROPERTIES) : single, namesOf(section), number});
+        }
+        ++number;
+    });
+    findMissing(siblings, namesOf(family.own), uses);
+    return uses;
 }
 
-void checkFlashes(const Model& model, Findings& findings) {
-    Domain domain{"property keys", {}};
+PropertyUses usesOfFlashes(const Section& spiKeys) {
+    PropertyUses uses;
     std::map<std::string_view, std::size_t> numbers;
-    for (const auto& [key, value] : model.spiKeys().values) {
+    for (const auto& [key, value] : spiKeys.values) {
         if (key.ends_with(schema::PROPERTY_SUFFIX)) {
-            domain.add(value.items, 1, numbers.emplace(key, numbers.size()).first->second);
+            addUses(value.items, 1, numbers.emplace(key, numbers.size()).first->second, uses);
         }
     }
-    const std::set<std::size_t> reported = checkRareNames(domain, findings);
-    checkValues(domain, findings);
-    for (const FlashList& family : model.flashFamilies()) {
-        const auto names = [&model](std::string_view flash) {
+    for (const FlashList& family : flashLists(spiKeys)) {
+        const auto names = [&spiKeys](std::string_view flash) {
             std::set<std::string_view> all;
-            for (const Item& item : model.spiKeys().items(schema::propertyKey(flash))) {
+            for (const Item& item : spiKeys.items(schema::propertyKey(flash))) {
                 all.insert(item.fields.front().text);
             }
             return all;
@@ -292,76 +325,41 @@ void checkFlashes(const Model& model, Findings& findings) {
         for (const Token& flash : family.devices) {
             const std::string key = schema::propertyKey(flash.text);
             const auto number = numbers.find(key);
-            siblings.push_back({model.spiKeys().find(key), names(flash.text),
-                                number != numbers.end() && reported.contains(number->second)});
+            siblings.push_back({spiKeys.find(key), names(flash.text),
+                                number == numbers.end() ? numbers.size() : number->second});
         }
         const bool isClass = schema::isFlashClass(family.family.text);
-        checkMissing(siblings, isClass ? names(family.family.text) : std::set<std::string_view>(),
-                     "flashes of the family", findings);
+        findMissing(siblings, isClass ? names(family.family.text) : std::set<std::string_view>(), uses);
     }
+    return uses;
 }
 
-void checkPackages(const Model& model, Findings& findings) {
-    const auto normalised = [](std::string_view package) {
-        std::string text(package);
-        constexpr std::string_view FROM = "OISB";
-        constexpr std::string_view TO = "0158";
-        for (char& byte : text) {
-            const std::size_t at = FROM.find(byte);
-            byte = at == FROM.npos ? byte : TO[at];
-        }
-        return text;
-    };
-    std::map<std::string, std::map<std::string_view, std::vector<const Token*>>> all;
-    for (const FamilyData& family : model.families()) {
-        family.forEachSection([&](const Section& section) {
-            for (const Item& item : section.items(schema::PROPERTIES)) {
-                for (std::size_t i = 2;
-                     item.fields.front().text == schema::PACKAGES && i < item.fields.size(); ++i) {
-                    all[normalised(item.fields[i].text)][item.fields[i].text].push_back(&item.fields[i]);
-                }
-            }
-        });
-    }
-    for (const auto& [text, spellings] : all) {
-        // Of two names that are equally common the one that is letters and then digits is right.
-        const auto rank = [](const auto& spelling) {
-            const std::string_view package = spelling.first;
-            const std::size_t digits = std::min(package.find_first_of("0123456789"), package.size());
-            const bool isRegular =
-                std::all_of(package.begin() + static_cast<std::ptrdiff_t>(digits), package.end(), isDigit);
-            return std::pair(spelling.second.size(), isRegular);
-        };
-        const auto common = std::max_element(
-            spellings.begin(), spellings.end(),
-            [&rank](const auto& left, const auto& right) { return rank(left) < rank(right); });
-        for (const auto& spelling : spellings) {
-            for (const Token* use : spelling.second) {
-                if (rank(spelling) < rank(*common) && spelling.second.size() <= MAX_RARE) {
-                    findings
-                        .add(CONFUSABLE_PACKAGE, *use,
-                             "{} looks like {}, which is listed {}; did you mean that?",
-                             inQuotes(spelling.first), inQuotes(common->first),
-                             common->second.size() == 1 ? std::string("once")
-                                                        : fmt::format("{} times", common->second.size()))
-                        .reports = common->first;
-                }
-            }
-        }
-    }
+void checkFlashes(const FamilyData& spi, Findings& findings) {
+    const PropertyUses uses = usesOfFlashes(spi.own);
+    checkUses({"property keys", {&uses}}, "flashes of the family", findings);
 }
 
-void check(const Model& model, Findings& findings) {
-    checkFamilies(model, findings);
-    checkFlashes(model, findings);
-    checkPackages(model, findings);
+void check(const Model& /*any*/, const FamilyResults& families, Findings& findings) {
+    Domain domain{"sections", {}};
+    for (const auto& [family, result] : families) {
+        domain.families.push_back(&result.uses);
+    }
+    checkUses(domain, "devices of the family", findings);
+}
+
+void checkFamily(const FamilyData& family, const FamilyContext& /*any*/, FamilyResult& result) {
+    result.uses = usesOfSections(family);
+    if (family.kind == schema::File::SPI) {
+        checkFlashes(family, result.findings);
+    }
 }
 
 } // namespace
 
 RuleSet consistencyRules() {
     return {"names and values unlike all others",
-            {&RARE_NAME, &MISSING_PROPERTY, &UNUSUAL_VALUE, &CONFUSABLE_PACKAGE},
+            {&RARE_NAME, &MISSING_PROPERTY, &UNUSUAL_VALUE},
+            checkFamily,
             check};
 }
 

@@ -1,5 +1,5 @@
 // Rules about spi.acd: names are looked up in upper case, and classes only if they are families, too.
-#include "lint/Findings.h"
+#include "lint/FamilyResult.h"
 #include "lint/rules/RuleSets.h"
 
 #include "model/Multiboot.h"
@@ -238,7 +238,7 @@ void checkProperties(const Model& model, Findings& findings) {
     }
 }
 
-void check(const Model& model, Findings& findings) {
+void check(const Model& model, const FamilyResults& /*any*/, Findings& findings) {
     checkFamilies(model, findings);
     checkClasses(model, findings);
     checkUnclassed(model, findings);
@@ -253,6 +253,7 @@ RuleSet flashRules() {
             {&NAME_NOT_UPPER_CASE, &PROPERTY_NOT_UPPER_CASE, &NO_DEVICE_LIST, &CLASS_WITHOUT_FAMILY,
              &IN_SEVERAL_CLASSES, &UNKNOWN_IN_CLASS, &UNKNOWN_IN_MULTIBOOT, &IN_SEVERAL_FAMILIES,
              &SAME_JOINED_NAME, &NO_PROPERTIES, &UNSHARED_PROPERTIES},
+            nullptr,
             check};
 }
 

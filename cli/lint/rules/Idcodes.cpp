@@ -1,5 +1,5 @@
 // Rules about IDCODE: the codes that identify devices on the cable.
-#include "lint/Findings.h"
+#include "lint/FamilyResult.h"
 #include "lint/rules/RuleSets.h"
 
 #include "model/IdcodePattern.h"
@@ -173,7 +173,7 @@ void checkDevice(const Model& model, const Token& device, const std::vector<Toke
     }
 }
 
-void check(const Model& model, Findings& findings) {
+void check(const Model& model, const FamilyResults& /*any*/, Findings& findings) {
     std::map<std::string_view, const AcdLines*> withCode;
     // Only the last code of a device counts: a layer on top may give its former code to another device.
     std::map<std::string_view, const Token*> last;
@@ -223,6 +223,7 @@ RuleSet idcodeRules() {
     return {"IDCODEs",
             {&MALFORMED_CODE, &BIT_0_CLEAR, &AMBIGUOUS_CODE, &UNKNOWN_DEVICE, &NO_CODE, &DEVICE_TWICE,
              &MALFORMED_ENTRY},
+            nullptr,
             check};
 }
 

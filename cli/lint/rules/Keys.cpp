@@ -1,5 +1,5 @@
 // Rules about keys: one that is set twice loses a value, one that is unknown has no effect.
-#include "lint/Findings.h"
+#include "lint/FamilyResult.h"
 #include "lint/rules/RuleSets.h"
 
 #include "text/Suggest.h"
@@ -50,8 +50,8 @@ Otherwise they fill the table of the whole family: the device or family that is 
 depend on the order of questions. Listing the device together with a package does not prevent that.)",
     "[KS50]\nPROGRAM_OPTION = VERIFY,Bscan,USB2"};
 
-void checkDuplicates(const Model& model, Findings& findings) {
-    for (const AcdLines& file : model.files()) {
+void checkDuplicates(const FamilyData& family, Findings& findings) {
+    for (const AcdLines& file : family.files) {
         std::map<std::pair<std::string, std::string_view>, unsigned> lines;
         std::string section;
         bool isDropped = false;
@@ -75,13 +75,14 @@ void checkDuplicates(const Model& model, Findings& findings) {
 }
 
 /// The keys that are read before the first section of a file.
-std::vector<std::string> knownKeys(const Model& model, schema::File kind) {
-    std::vector<std::string> all = schema::fixedKeys(kind);
-    if (kind == schema::File::SPI) {
-        for (const FlashList& family : model.flashFamilies()) {
-            all.push_back(schema::devicesKey(family.family.text));
+std::vector<std::string> knownKeys(const FamilyData& family) {
+    std::vector<std::string> all = schema::fixedKeys(family.kind);
+    if (family.kind == schema::File::SPI) {
+        const std::vector<FlashList> flashes = flashLists(family.own);
+        for (const FlashList& list : flashes) {
+            all.push_back(schema::devicesKey(list.family.text));
         }
-        for (const std::string& name : model.flashNames()) {
+        for (const std::string& name : namesOf(flashes)) {
             all.push_back(schema::propertyKey(name));
         }
     }
@@ -102,8 +103,8 @@ std::string fileHint(std::string_view key, schema::File kind) {
 /// Checks the keys of the files of one family.
 class KeyCheck {
 public:
-    KeyCheck(const Model& model, const FamilyData& family, Findings& findings)
-        : m_kind(family.kind), m_own(knownKeys(model, family.kind)), m_findings(findings) {
+    KeyCheck(const FamilyData& family, Findings& findings)
+        : m_kind(family.kind), m_own(knownKeys(family)), m_findings(findings) {
         std::sort(m_own.begin(), m_own.end());
     }
 
@@ -179,16 +180,15 @@ private:
     std::set<std::pair<std::string, std::string>> m_set;
 };
 
-void checkKnown(const Model& model, Findings& findings) {
-    for (const FamilyData& family : model.families()) {
-        KeyCheck check(model, family, findings);
-        for (const AcdLines* file : family.files) {
-            check.check(*file);
-        }
+void checkFamily(const FamilyData& family, const FamilyContext& /*any*/, FamilyResult& result) {
+    checkDuplicates(family, result.findings);
+    KeyCheck check(family, result.findings);
+    for (const AcdLines& file : family.files) {
+        check.check(file);
     }
 }
 
-void checkSections(const Model& model, Findings& findings) {
+void check(const Model& model, const FamilyResults& /*any*/, Findings& findings) {
     for (const auto& [name, device] : model.devices()) {
         if (model.supported().contains(name)) {
             continue; // its tables are its own
@@ -211,16 +211,11 @@ void checkSections(const Model& model, Findings& findings) {
     }
 }
 
-void check(const Model& model, Findings& findings) {
-    checkDuplicates(model, findings);
-    checkKnown(model, findings);
-    checkSections(model, findings);
-}
-
 } // namespace
 
 RuleSet keyRules() {
-    return {"keys", {&DUPLICATE_KEY, &UNKNOWN_KEY, &IGNORED_OPERATIONS, &LEAKING_OPTIONS}, check};
+    return {
+        "keys", {&DUPLICATE_KEY, &UNKNOWN_KEY, &IGNORED_OPERATIONS, &LEAKING_OPTIONS}, checkFamily, check};
 }
 
 } // namespace lint

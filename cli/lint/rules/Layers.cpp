@@ -1,5 +1,5 @@
 // Rules about "=" and "+=" in layers and sections: each mistake is reported once, at the line that makes it.
-#include "lint/Findings.h"
+#include "lint/FamilyResult.h"
 #include "lint/rules/RuleSets.h"
 
 namespace lint {
@@ -60,28 +60,27 @@ void checkHidings(std::string_view key, const Value& value, Findings& findings) 
     }
 }
 
-void check(const Model& model, Findings& findings) {
-    for (const FamilyData& family : model.families()) {
-        family.forEachSection([&](const Section& section) {
-            for (const auto& [key, value] : section.values) {
-                checkHidings(key, value, findings);
-                for (const Token& text : value.joinedAppends) {
-                    const char* const separator = schema::firstListed(family.kind, key) <= 1 ? "," : ":";
-                    findings
-                        .add(JOINED_APPEND, text, "{} is joined to the text before it; begin with \"{}\"",
-                             inQuotes(text.text), separator)
-                        .fix = insertingBefore(partOf(text, 0, 0), separator);
-                }
+void checkFamily(const FamilyData& family, const FamilyContext& /*any*/, FamilyResult& result) {
+    Findings& findings = result.findings;
+    family.forEachSection([&](const Section& section) {
+        for (const auto& [key, value] : section.values) {
+            checkHidings(key, value, findings);
+            for (const Token& text : value.joinedAppends) {
+                const char* const separator = schema::firstListed(family.kind, key) <= 1 ? "," : ":";
+                findings
+                    .add(JOINED_APPEND, text, "{} is joined to the text before it; begin with \"{}\"",
+                         inQuotes(text.text), separator)
+                    .fix = insertingBefore(partOf(text, 0, 0), separator);
             }
-        });
-        for (const Section& device : family.devices) {
-            for (const schema::Table& table : schema::TABLES) {
-                const Value* const value = device.find(table.key);
-                if (value != nullptr && !value->isAssigned && family.own.find(table.key) != nullptr) {
-                    findings.add(APPEND_WITHOUT_VALUE, value->key,
-                                 "the section of {} has no {} of its own: this hides the family's",
-                                 inQuotes(device.name.text), table.key);
-                }
+        }
+    });
+    for (const Section& device : family.devices) {
+        for (const schema::Table& table : schema::TABLES) {
+            const Value* const value = device.find(table.key);
+            if (value != nullptr && !value->isAssigned && family.own.find(table.key) != nullptr) {
+                findings.add(APPEND_WITHOUT_VALUE, value->key,
+                             "the section of {} has no {} of its own: this hides the family's",
+                             inQuotes(device.name.text), table.key);
             }
         }
     }
@@ -92,7 +91,8 @@ void check(const Model& model, Findings& findings) {
 RuleSet layerRules() {
     return {"layers and sections",
             {&APPEND_WITHOUT_VALUE, &HIDDEN_NAMES, &HIDDEN_PROPERTIES, &JOINED_APPEND},
-            check};
+            checkFamily,
+            nullptr};
 }
 
 } // namespace lint

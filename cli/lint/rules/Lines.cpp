@@ -1,7 +1,7 @@
 // Rules about lines that the reader rejects: each costs the line and is reported at its place.
 #include "lint/rules/RuleSets.h"
 
-#include "lint/Findings.h"
+#include "lint/FamilyResult.h"
 #include "text/Trimmed.h"
 
 #include <algorithm>
@@ -235,8 +235,9 @@ void checkReturns(const AcdLines& file, unsigned line, Findings& findings) {
     }
 }
 
-void check(const Model& model, Findings& findings) {
-    for (const AcdLines& file : model.files()) {
+void checkFamily(const FamilyData& family, const FamilyContext& /*any*/, FamilyResult& result) {
+    Findings& findings = result.findings;
+    for (const AcdLines& file : family.files) {
         if (!file.readError().empty()) {
             findings.add(UNREADABLE_FILE, startOf(file), "the file cannot be read: {}", file.readError());
         }
@@ -254,16 +255,14 @@ void check(const Model& model, Findings& findings) {
             }
         }
     }
-    for (const FamilyData& family : model.families()) {
-        family.forEachSection([&](const Section& section) {
-            for (const auto& [key, value] : section.values) {
-                for (const Token& text : value.oversizedAppends) {
-                    findings.add(VALUE_TOO_LONG, text, "the value of {} would grow over 1 GiB by this",
-                                 inQuotes(key));
-                }
+    family.forEachSection([&](const Section& section) {
+        for (const auto& [key, value] : section.values) {
+            for (const Token& text : value.oversizedAppends) {
+                findings.add(VALUE_TOO_LONG, text, "the value of {} would grow over 1 GiB by this",
+                             inQuotes(key));
             }
-        });
-    }
+        }
+    });
 }
 
 } // namespace
@@ -273,7 +272,8 @@ RuleSet lineRules() {
             {&NO_EQUALS_SIGN, &EMPTY_KEY, &BLANK_IN_KEY, &NUL_BYTE, &LINE_TOO_LONG, &CONTINUED_AT_END,
              &UNCLOSED_HEADER, &EMPTY_NAME, &BLANK_IN_NAME, &TEXT_AFTER_HEADER, &VALUE_TOO_LONG,
              &SWALLOWED_LINE, &LONE_CR, &UNREADABLE_FILE},
-            check};
+            checkFamily,
+            nullptr};
 }
 
 } // namespace lint

@@ -1,5 +1,5 @@
 // Rules about the items and fields of values: nothing is trimmed and nothing is skipped when they are read.
-#include "lint/Findings.h"
+#include "lint/FamilyResult.h"
 #include "lint/rules/RuleSets.h"
 #include "text/Trimmed.h"
 
@@ -153,29 +153,27 @@ void checkTwice(const Item& item, std::size_t first, Findings& findings) {
     }
 }
 
-void check(const Model& model, Findings& findings) {
-    for (const FamilyData& family : model.families()) {
-        family.forEachSection([&](const Section& section) {
-            for (const auto& [key, value] : section.values) {
-                checkSeparators(value, findings);
-                if (!value.items.empty()) {
-                    const Token& first = value.items.front().whole;
-                    if (first.text.starts_with('=') || first.text.starts_with('+')) {
-                        findings
-                            .add(DOUBLED_OPERATOR, first, "the value begins with \"{}\"", first.text.front())
-                            .fix = withOneOperator(first);
-                    }
-                }
-                for (const Item& item : value.items) {
-                    checkTwice(item, schema::firstListed(family.kind, key), findings);
-                }
-                for (const Token& token : value.truncatedItems) {
-                    findings.add(LIST_TOO_LONG, token,
-                                 "items from here on are never read: there are 32768 before");
+void checkFamily(const FamilyData& family, const FamilyContext& /*any*/, FamilyResult& result) {
+    Findings& findings = result.findings;
+    family.forEachSection([&](const Section& section) {
+        for (const auto& [key, value] : section.values) {
+            checkSeparators(value, findings);
+            if (!value.items.empty()) {
+                const Token& first = value.items.front().whole;
+                if (first.text.starts_with('=') || first.text.starts_with('+')) {
+                    findings.add(DOUBLED_OPERATOR, first, "the value begins with \"{}\"", first.text.front())
+                        .fix = withOneOperator(first);
                 }
             }
-        });
-    }
+            for (const Item& item : value.items) {
+                checkTwice(item, schema::firstListed(family.kind, key), findings);
+            }
+            for (const Token& token : value.truncatedItems) {
+                findings.add(LIST_TOO_LONG, token,
+                             "items from here on are never read: there are 32768 before");
+            }
+        }
+    });
 }
 
 } // namespace
@@ -184,7 +182,8 @@ RuleSet listRules() {
     return {"items and fields",
             {&BLANK_AROUND_SEPARATOR, &TRAILING_SEPARATOR, &EMPTY_ITEM, &DUPLICATE_ITEM, &LIST_TOO_LONG,
              &COMMENT_AFTER_VALUE, &DOUBLED_OPERATOR},
-            check};
+            checkFamily,
+            nullptr};
 }
 
 } // namespace lint

@@ -1,5 +1,5 @@
 // Rules about the mode keys of base.acd and the parts that it excludes from modes.
-#include "lint/Findings.h"
+#include "lint/FamilyResult.h"
 #include "lint/rules/RuleSets.h"
 
 #include "model/Vocabulary.h"
@@ -217,7 +217,7 @@ void checkPart(const Model& model, const Token& part, const std::set<std::string
     }
 }
 
-void check(const Model& model, Findings& findings) {
+void check(const Model& model, const FamilyResults& /*any*/, Findings& findings) {
     for (const std::string& mode : vocabulary::modes()) {
         if (const Value* const value = model.baseKeys().find(mode)) {
             checkMode(model, *value, findings);
@@ -240,6 +240,7 @@ RuleSet modeRules() {
     return {"modes and excluded parts",
             {&UNKNOWN_MODE_OUTPUT, &UNKNOWN_MODE_FAMILY, &NO_LABEL, &NOT_TWO_ITEMS, &MALFORMED_PART,
              &UNKNOWN_PART_MODE, &UNKNOWN_PART_DEVICE, &UNKNOWN_PART_PACKAGE, &SPI_PART},
+            nullptr,
             check};
 }
 

@@ -1,5 +1,5 @@
 // Rules about the names of families and devices: a name that looks right may never be found.
-#include "lint/Findings.h"
+#include "lint/FamilyResult.h"
 #include "lint/rules/RuleSets.h"
 
 #include "text/Suggest.h"
@@ -105,7 +105,7 @@ void checkSeparators(std::string_view kind, const Token& name, Findings& finding
     }
 }
 
-void checkFamily(const FamilyData& family, Findings& findings) {
+void checkFamilyName(const FamilyData& family, Findings& findings) {
     // The file does not contain its name, so the first line stands for it.
     const Token name{family.name, family.start().location};
     if (family.name != lowerCase(family.name)) {
@@ -139,28 +139,34 @@ std::string otherOwner(const Model& model, const std::string& name) {
                        inQuotes(model.deviceInAnyCase(name)->family->name));
 }
 
-void checkDevice(const Model& model, const FamilyData& family, const Section& section, Findings& findings) {
-    const Token& name = section.name;
+void checkDevice(const FamilyData& family, const Token& name, Findings& findings) {
     if (family.kind != schema::File::FAMILY) {
         findings.add(SECTION_IN_CATALOGUE, name, "the device {} in family {} is never known",
                      inQuotes(name.text), inQuotes(family.name));
         return;
     }
-    if (model.isFamilyInAnyCase(std::string(name.text))) {
-        findings.add(DEVICE_NAMED_AS_FAMILY, name,
-                     "the device {} is named as a family, which is found in its place", inQuotes(name.text));
-    }
     if (const std::size_t cut = name.text.find('_'); cut != name.text.npos) {
         findings.add(UNDERSCORE_IN_DEVICE, name, "the name {} is cut to {} when it is asked for",
                      inQuotes(name.text), inQuotes(name.text.substr(0, cut)));
     }
-    const std::string text(name.text);
-    if (model.deviceInAnyCase(text)->section != &section || model.isFlashInAnyCase(text)) {
-        findings.add(DEVICE_IN_TWO_FAMILIES, name, "the section of {} is never read: {}", inQuotes(text),
-                     otherOwner(model, text));
-    }
     checkName("device", name, findings);
     checkSeparators("device", name, findings);
+}
+
+/// Finds devices that are never read, since something else has their name.
+void checkOwners(const Model& model, const FamilyData& family, Findings& findings) {
+    for (const Section& section : family.devices) {
+        const Token& name = section.name;
+        const std::string text(name.text);
+        if (model.isFamilyInAnyCase(text)) {
+            findings.add(DEVICE_NAMED_AS_FAMILY, name,
+                         "the device {} is named as a family, which is found in its place", inQuotes(text));
+        }
+        if (model.deviceInAnyCase(text)->section != &section || model.isFlashInAnyCase(text)) {
+            findings.add(DEVICE_IN_TWO_FAMILIES, name, "the section of {} is never read: {}", inQuotes(text),
+                         otherOwner(model, text));
+        }
+    }
 }
 
 void checkPackages(const Section& section, Findings& findings) {
@@ -180,8 +186,9 @@ void checkOptionPackages(const Model& model, Findings& findings) {
     }
 }
 
-void check(const Model& model, Findings& findings) {
-    for (const AcdLines& file : model.files()) {
+void checkFamily(const FamilyData& family, const FamilyContext& /*any*/, FamilyResult& result) {
+    Findings& findings = result.findings;
+    for (const AcdLines& file : family.files) {
         checkReopened(file, findings);
         for (const std::string& other : file.caseCollisions()) {
             findings.add(SAME_FILE_NAME, startOf(file),
@@ -189,12 +196,17 @@ void check(const Model& model, Findings& findings) {
                          inQuotes(other.substr(other.rfind('/') + 1)));
         }
     }
-    for (const FamilyData& family : model.families()) {
-        checkFamily(family, findings);
-        checkPackages(family.own, findings);
-        for (const Section& device : family.devices) {
-            checkDevice(model, family, device, findings);
-            checkPackages(device, findings);
+    checkFamilyName(family, findings);
+    family.forEachSection([&](const Section& section) { checkPackages(section, findings); });
+    for (const Section& device : family.devices) {
+        checkDevice(family, device.name, findings);
+    }
+}
+
+void check(const Model& model, const FamilyResults& /*any*/, Findings& findings) {
+    for (const auto& family : model.families()) {
+        if (family->kind == schema::File::FAMILY) {
+            checkOwners(model, *family, findings);
         }
     }
     checkOptionPackages(model, findings);
@@ -213,6 +225,7 @@ RuleSet nameRules() {
             {&DEVICE_REOPENED, &DEVICE_IN_TWO_FAMILIES, &DEVICE_NAMED_AS_FAMILY, &UNDERSCORE_IN_DEVICE,
              &SEPARATOR_IN_NAME, &PERCENT_IN_NAME, &NAME_TOO_LONG, &FAMILY_NOT_LOWER_CASE,
              &SECTION_IN_CATALOGUE, &SAME_FILE_NAME},
+            checkFamily,
             check};
 }
 

@@ -1,5 +1,5 @@
 // Rules about PROPERTY, PROPERTIES and the _PROPERTY keys of flashes: names, counts and values.
-#include "lint/Findings.h"
+#include "lint/FamilyResult.h"
 #include "lint/rules/RuleSets.h"
 
 #include "model/Vocabulary.h"
@@ -291,12 +291,11 @@ void checkSection(const Section& section, const Section& family, Findings& findi
     checkBothKeys(section, findings);
 }
 
-void check(const Model& model, Findings& findings) {
-    for (const FamilyData& family : model.families()) {
-        family.forEachSection([&](const Section& section) { checkSection(section, family.own, findings); });
-    }
-    for (const auto& [key, value] : model.spiKeys().values) {
-        if (!key.ends_with(schema::PROPERTY_SUFFIX)) {
+void checkFamily(const FamilyData& family, const FamilyContext& /*any*/, FamilyResult& result) {
+    Findings& findings = result.findings;
+    family.forEachSection([&](const Section& section) { checkSection(section, family.own, findings); });
+    for (const auto& [key, value] : family.own.values) {
+        if (family.kind != schema::File::SPI || !key.ends_with(schema::PROPERTY_SUFFIX)) {
             continue;
         }
         checkTwice(value.items, findings);
@@ -315,7 +314,8 @@ RuleSet propertyRules() {
             {&WRONG_COUNT, &NO_COUNT, &NO_VALUE, &SEVERAL_VALUES, &IN_BOTH_KEYS, &NAME_TWICE,
              &FLAG_NOT_UPPER_CASE, &UNKNOWN_MODE_KEY, &UNKNOWN_OPTION_VALUE, &UNKNOWN_OPERATION_NAME,
              &HIDDEN_OPTIONS},
-            check};
+            checkFamily,
+            nullptr};
 }
 
 } // namespace lint

@@ -6,12 +6,12 @@ namespace lint {
 
 [[nodiscard]] RuleSet agreementRules();
 [[nodiscard]] RuleSet commentRules(); ///< checked last, by `Suppressions`
+[[nodiscard]] RuleSet confusableRules();
 [[nodiscard]] RuleSet consistencyRules();
 [[nodiscard]] RuleSet flashRules();
 [[nodiscard]] RuleSet idcodeRules();
 [[nodiscard]] RuleSet keyRules();
 [[nodiscard]] RuleSet layerRules();
-[[nodiscard]] RuleSet letterRules();
 [[nodiscard]] RuleSet lineRules();
 [[nodiscard]] RuleSet listRules();
 [[nodiscard]] RuleSet modeRules();

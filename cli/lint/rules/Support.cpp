@@ -1,5 +1,5 @@
 // Rules about DEVICE_SUPPORTED and PROGRAM_OPTION_PACKAGE: a name without a table raises when it is asked for.
-#include "lint/Findings.h"
+#include "lint/FamilyResult.h"
 #include "lint/rules/RuleSets.h"
 
 #include "model/Vocabulary.h"
@@ -216,13 +216,13 @@ void checkTables(const Model& model, const std::string& family, Findings& findin
 }
 
 void checkFamilies(const Model& model, Findings& findings) {
-    for (const FamilyData& family : model.families()) {
-        if (!model.supported().contains(family.name) && !model.optionPackages().contains(family.name) &&
-            !isUnderAMode(model, family.name)) {
-            findings.add(UNLISTED_FAMILY, family.start(), "no list of base.acd names the family {}",
-                         inQuotes(family.name));
+    for (const auto& family : model.families()) {
+        if (!model.supported().contains(family->name) && !model.optionPackages().contains(family->name) &&
+            !isUnderAMode(model, family->name)) {
+            findings.add(UNLISTED_FAMILY, family->start(), "no list of base.acd names the family {}",
+                         inQuotes(family->name));
         } else {
-            checkTables(model, family.name, findings);
+            checkTables(model, family->name, findings);
         }
     }
     // In SPI mode every device is looked up as spi, with or without flashes.
@@ -241,7 +241,7 @@ void checkFamilies(const Model& model, Findings& findings) {
     }
 }
 
-void check(const Model& model, Findings& findings) {
+void check(const Model& model, const FamilyResults& /*any*/, Findings& findings) {
     if (model.base() == nullptr) {
         return;
     }
@@ -256,6 +256,7 @@ RuleSet supportRules() {
     return {"lists of names with tables",
             {&UNKNOWN_SUPPORTED, &UNKNOWN_OPTION_OWNER, &UNKNOWN_PACKAGE, &UNLISTED_FAMILY,
              &UNSUPPORTED_FAMILY, &NO_OPTION_TABLE, &PACKAGE_OF_SUPPORTED, &NO_TABLES},
+            nullptr,
             check};
 }
 

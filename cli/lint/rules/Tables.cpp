@@ -1,5 +1,5 @@
 // Rules about OPERATION, BSDL_OPERATION and PROGRAM_OPTION: which cells of the permission tables they set.
-#include "lint/Findings.h"
+#include "lint/FamilyResult.h"
 #include "lint/rules/RuleSets.h"
 
 #include "model/Vocabulary.h"
@@ -132,43 +132,12 @@ std::optional<std::size_t> position(const std::vector<std::string>& all, std::st
     return found == all.end() ? std::nullopt : std::optional(static_cast<std::size_t>(found - all.begin()));
 }
 
-/// The lists of a mode in base.acd. A list that is missing is unknown, not empty.
-struct ModeLists {
-    std::optional<std::set<std::string_view>> outputs;
-    std::optional<std::set<std::string_view>> families;
-};
-
-/// By mode.
-using AllModeLists = std::vector<ModeLists>;
-
-/// The names after the label.
-std::set<std::string_view> listed(const Item& item) {
-    std::set<std::string_view> names;
-    for (std::size_t i = 1; i < item.fields.size(); ++i) {
-        names.insert(item.fields[i].text);
-    }
-    return names;
-}
-
-AllModeLists modeLists(const Model& model) {
-    AllModeLists all;
-    for (const std::string& mode : vocabulary::modes()) {
-        ModeLists& lists = all.emplace_back();
-        const std::vector<Item>& items = model.baseKeys().items(mode);
-        if (items.size() > 1) {
-            lists.outputs = listed(items[0]);
-            lists.families = listed(items[1]);
-        }
-    }
-    return all;
-}
-
 /// Checks the records of one key.
 class TableCheck {
 public:
-    TableCheck(const schema::Table& table, const FamilyData& family, const AllModeLists& modes,
+    TableCheck(const schema::Table& table, const FamilyData& family, const FamilyContext& context,
                Findings& findings)
-        : m_table(table), m_family(family), m_modes(modes), m_findings(findings) {}
+        : m_table(table), m_family(family), m_modes(context.modes), m_findings(findings) {}
 
     void check(const std::vector<Item>& records) {
         for (const Item& record : records) {
@@ -324,21 +293,18 @@ private:
 
     const schema::Table& m_table;
     const FamilyData& m_family;
-    const AllModeLists& m_modes;
+    const std::vector<FamilyContext::ModeLists>& m_modes;
     Findings& m_findings;
     std::set<Row> m_rows; ///< of all records
     std::set<std::tuple<std::size_t, std::size_t, std::size_t>> m_cells;
 };
 
-void check(const Model& model, Findings& findings) {
-    const AllModeLists modes = modeLists(model);
-    for (const FamilyData& family : model.families()) {
-        family.forEachSection([&](const Section& section) {
-            for (const schema::Table& table : schema::TABLES) {
-                TableCheck(table, family, modes, findings).check(section.items(table.key));
-            }
-        });
-    }
+void checkFamily(const FamilyData& family, const FamilyContext& context, FamilyResult& result) {
+    family.forEachSection([&](const Section& section) {
+        for (const schema::Table& table : schema::TABLES) {
+            TableCheck(table, family, context, result.findings).check(section.items(table.key));
+        }
+    });
 }
 
 } // namespace
@@ -348,7 +314,8 @@ RuleSet tableRules() {
             {&UNKNOWN_OPERATION, &UNKNOWN_OPTION, &UNREADABLE_OPTION, &UNKNOWN_MODE, &ACCIDENTAL_MODE,
              &UNKNOWN_OUTPUT, &OUTPUT_WITHOUT_CELL, &MODE_WITHOUT_CELL, &NO_OUTPUT, &CELL_TWICE,
              &SPI_MODE_ELSEWHERE, &MODE_WITHOUT_FAMILY, &MODE_WITHOUT_OUTPUT},
-            check};
+            checkFamily,
+            nullptr};
 }
 
 } // namespace lint

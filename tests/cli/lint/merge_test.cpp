@@ -75,9 +75,9 @@ TEST(LintModel, HasTheValuesThatTheReadersGive) {
         }
         const OpenDatabase open(paths);
         const lint::Model model(AcdLines::ofDatabase());
-        for (const lint::FamilyData& family : model.families()) {
-            for (const auto& [key, value] : family.own.values) {
-                compared += compare(family.name, key, value) ? 1U : 0U;
+        for (const auto& family : model.families()) {
+            for (const auto& [key, value] : family->own.values) {
+                compared += compare(family->name, key, value) ? 1U : 0U;
             }
         }
         for (const auto& [name, device] : model.devices()) {

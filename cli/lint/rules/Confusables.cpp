@@ -1,17 +1,24 @@
-// A rule about characters that look like others: nobody sees them on a screen.
-#include "lint/Findings.h"
+// Rules about texts that look like others: packages whose letters and digits are mixed up, and letters of other scripts.
+#include "lint/FamilyResult.h"
 #include "lint/rules/RuleSets.h"
 
 #include <algorithm>
 #include <array>
+#include <map>
 #include <optional>
 #include <unordered_map>
-#include <utility>
 
 namespace lint {
 
 namespace {
 
+constexpr Rule CONFUSABLE_PACKAGE{
+    "C104",
+    "confusable-package",
+    Severity::WARNING,
+    "package that looks like a common one",
+    R"(The name differs from a more common package only in O and 0, I and 1, S and 5 or B and 8.)",
+    "PROPERTIES = PACKAGES,1,TQI00"};
 constexpr Rule CONFUSABLE_LETTER{
     "C105",
     "confusable-letter",
@@ -22,6 +29,68 @@ zero-width space. It equals no name that is typed on a keyboard. Words of anothe
     "PROPERTY = VENDOR,K<U+043E>rvel",
     false,
     true};
+
+/// A spelling is rare up to this number.
+constexpr std::size_t MAX_RARE = 2;
+
+bool isDigit(char byte) { return byte >= '0' && byte <= '9'; }
+
+void addPackages(const FamilyData& family, FamilyResult& result) {
+    family.forEachSection([&](const Section& section) {
+        for (const Item& item : section.items(schema::PROPERTIES)) {
+            for (std::size_t i = 2; item.fields.front().text == schema::PACKAGES && i < item.fields.size();
+                 ++i) {
+                result.packages[item.fields[i].text].push_back(&item.fields[i]);
+            }
+        }
+    });
+}
+
+void checkPackages(const FamilyResults& families, Findings& findings) {
+    const auto normalised = [](std::string_view package) {
+        std::string text(package);
+        constexpr std::string_view FROM = "OISB";
+        constexpr std::string_view TO = "0158";
+        for (char& byte : text) {
+            const std::size_t at = FROM.find(byte);
+            byte = at == FROM.npos ? byte : TO[at];
+        }
+        return text;
+    };
+    std::map<std::string, std::map<std::string_view, std::vector<const Token*>>> all;
+    for (const auto& [family, result] : families) {
+        for (const auto& [package, uses] : result.packages) {
+            std::vector<const Token*>& found = all[normalised(package)][package];
+            found.insert(found.end(), uses.begin(), uses.end());
+        }
+    }
+    for (const auto& [text, spellings] : all) {
+        // Of two names that are equally common the one that is letters and then digits is right.
+        const auto rank = [](const auto& spelling) {
+            const std::string_view package = spelling.first;
+            const std::size_t digits = std::min(package.find_first_of("0123456789"), package.size());
+            const bool isRegular =
+                std::all_of(package.begin() + static_cast<std::ptrdiff_t>(digits), package.end(), isDigit);
+            return std::pair(spelling.second.size(), isRegular);
+        };
+        const auto common = std::max_element(
+            spellings.begin(), spellings.end(),
+            [&rank](const auto& left, const auto& right) { return rank(left) < rank(right); });
+        for (const auto& spelling : spellings) {
+            for (const Token* use : spelling.second) {
+                if (rank(spelling) < rank(*common) && spelling.second.size() <= MAX_RARE) {
+                    findings
+                        .add(CONFUSABLE_PACKAGE, *use,
+                             "{} looks like {}, which is listed {}; did you mean that?",
+                             inQuotes(spelling.first), inQuotes(common->first),
+                             common->second.size() == 1 ? std::string("once")
+                                                        : fmt::format("{} times", common->second.size()))
+                        .reports = common->first;
+                }
+            }
+        }
+    }
+}
 
 /// A character of a word that looks like another.
 struct Confusable {
@@ -93,18 +162,23 @@ void checkLetters(const AcdLines& file, unsigned line, Findings& findings) {
     }
 }
 
-void check(const Model& model, Findings& findings) {
-    for (const AcdLines& file : model.files()) {
+void checkFamily(const FamilyData& family, const FamilyContext& /*any*/, FamilyResult& result) {
+    addPackages(family, result);
+    for (const AcdLines& file : family.files) {
         for (const AcdLines::Line& line : file.lines()) {
             for (unsigned number = line.firstLine; number <= line.lastLine; ++number) {
-                checkLetters(file, number, findings);
+                checkLetters(file, number, result.findings);
             }
         }
     }
 }
 
+void check(const Model& /*any*/, const FamilyResults& families, Findings& findings) {
+    checkPackages(families, findings);
+}
+
 } // namespace
 
-RuleSet letterRules() { return {"", {&CONFUSABLE_LETTER}, check}; }
+RuleSet confusableRules() { return {"", {&CONFUSABLE_PACKAGE, &CONFUSABLE_LETTER}, checkFamily, check}; }
 
 } // namespace lint
