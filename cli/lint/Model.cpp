@@ -1,6 +1,7 @@
 // Builds the model that all rules check: files merged as the readers merge them, each text with its location.
 #include "lint/Model.h"
 
+#include "database/IndexMaintenance.h"
 #include "model/RecordSplitter.h"
 #include "text/Suggest.h"
 
@@ -204,6 +205,24 @@ const std::vector<Token>& Section::list(std::string_view key) const {
 
 Token FamilyData::start() const { return startOf(files.front()); }
 
+std::string directoryOf(const AcdLines& file) {
+    const std::size_t slash = file.path().rfind('/');
+    return slash == std::string::npos ? std::string() : file.path().substr(0, slash + 1);
+}
+
+std::vector<std::string> unusedIndexes(const std::vector<AcdLines>& files) {
+    std::set<std::string> directories;
+    std::transform(files.begin(), files.end(), std::inserter(directories, directories.end()), directoryOf);
+    std::vector<std::string> unused;
+    std::copy_if(directories.begin(), directories.end(), std::back_inserter(unused),
+                 [](const std::string& directory) {
+                     const acd::IndexState state =
+                         directory.empty() ? acd::IndexState::MISSING : acd::checkIndex(directory).state;
+                     return state == acd::IndexState::STALE || state == acd::IndexState::INVALID;
+                 });
+    return unused;
+}
+
 Token startOf(const AcdLines& file) {
     if (file.lines().empty()) {
         return {{}, {&file, 1, 1}};
@@ -285,7 +304,8 @@ std::vector<std::string> namesOf(const std::vector<FlashList>& flashes) {
     return names;
 }
 
-Model::Model(Families families) : m_families(std::move(families)) {
+Model::Model(Families families, std::vector<std::string> unusedIndexes)
+    : m_families(std::move(families)), m_unusedIndexes(std::move(unusedIndexes)) {
     for (const auto& family : m_families) {
         m_base = family->kind == schema::File::BASE ? family.get() : m_base;
         m_spi = family->kind == schema::File::SPI ? family.get() : m_spi;

@@ -149,6 +149,12 @@ using Families = std::vector<std::shared_ptr<const FamilyData>>;
 /// @param files those of a family follow each other, the bottom layer first
 [[nodiscard]] Families familiesOf(std::vector<AcdLines> files);
 
+/// The directory of a file, as its path has it; nothing for a file in memory.
+[[nodiscard]] std::string directoryOf(const AcdLines& file);
+
+/// The directories of the files whose index does not match the files in it.
+[[nodiscard]] std::vector<std::string> unusedIndexes(const std::vector<AcdLines>& files);
+
 /// Where to report something that no line of a file says.
 [[nodiscard]] Token startOf(const AcdLines& file);
 
@@ -173,8 +179,10 @@ struct FlashList {
 /// A database as the rules see it. Immutable.
 class Model {
 public:
-    explicit Model(Families families);
-    explicit Model(std::vector<AcdLines> files) : Model(familiesOf(std::move(files))) {}
+    /// @param unusedIndexes the directories whose index does not match their files
+    explicit Model(Families families, std::vector<std::string> unusedIndexes = {});
+    explicit Model(std::vector<AcdLines> files, std::vector<std::string> unusedIndexes = {})
+        : Model(familiesOf(std::move(files)), std::move(unusedIndexes)) {}
     Model(const Model&) = delete;
     Model& operator=(const Model&) = delete;
 
@@ -182,6 +190,9 @@ public:
 
     /// The files of all families, in their order.
     [[nodiscard]] std::vector<const AcdLines*> files() const;
+
+    /// The directories whose index does not match their files.
+    [[nodiscard]] const std::vector<std::string>& unusedIndexes() const noexcept { return m_unusedIndexes; }
 
     /// Could all files be read?
     [[nodiscard]] bool isComplete() const;
@@ -225,6 +236,7 @@ private:
     void findDevices();
 
     Families m_families;
+    std::vector<std::string> m_unusedIndexes;
     const FamilyData* m_base = nullptr;
     const FamilyData* m_spi = nullptr;
     std::map<std::string_view, Device> m_devices;

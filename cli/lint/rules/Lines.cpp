@@ -122,6 +122,16 @@ constexpr Rule UNREADABLE_FILE{
 files are checked, but names that this file may define are not reported as unknown. The exit status is 2.)",
     ""};
 
+constexpr Rule UNUSED_INDEX{
+    "L115",
+    "unused-index",
+    Severity::WARNING,
+    "index.acx that does not match the files",
+    R"(The index of the directory was made from other files, or is damaged or of another version. Applications do not use it:
+their first answers take longer. Make it again: tarvik index DIR. The finding is reported in the first file of the
+directory.)",
+    "# a file was edited after \"tarvik index\""};
+
 const Rule* ruleFor(AcdLines::ParseError error) {
     switch (error) {
     case AcdLines::ParseError::NO_EQUALS_SIGN:
@@ -265,15 +275,26 @@ void checkFamily(const FamilyData& family, const FamilyContext& /*any*/, FamilyR
     });
 }
 
+void check(const Model& model, const FamilyResults& /*any*/, Findings& findings) {
+    const std::vector<const AcdLines*> files = model.files();
+    for (const std::string& directory : model.unusedIndexes()) {
+        const auto first = std::find_if(files.begin(), files.end(), [&directory](const AcdLines* file) {
+            return directoryOf(*file) == directory;
+        });
+        findings.addText(UNUSED_INDEX, startOf(**first),
+                         "index.acx of this directory does not match the files, so it is not used");
+    }
+}
+
 } // namespace
 
 RuleSet lineRules() {
     return {"lines",
             {&NO_EQUALS_SIGN, &EMPTY_KEY, &BLANK_IN_KEY, &NUL_BYTE, &LINE_TOO_LONG, &CONTINUED_AT_END,
              &UNCLOSED_HEADER, &EMPTY_NAME, &BLANK_IN_NAME, &TEXT_AFTER_HEADER, &VALUE_TOO_LONG,
-             &SWALLOWED_LINE, &LONE_CR, &UNREADABLE_FILE},
+             &SWALLOWED_LINE, &LONE_CR, &UNREADABLE_FILE, &UNUSED_INDEX},
             checkFamily,
-            nullptr};
+            check};
 }
 
 } // namespace lint

@@ -47,6 +47,19 @@ TEST_F(Index, IsReplacedWhole) {
     EXPECT_EQ(shown()["files"].size(), 4U);
 }
 
+TEST_F(Index, ThatDoesNotMatchIsAFindingOfLint) {
+    const auto lint = [&] {
+        return runTool({"lint", "--select", "L115", "--format", "json", m_database.path()}).output;
+    };
+    EXPECT_EQ(json::parse(lint())["findings"].size(), 0U) << "there is no index";
+    EXPECT_EQ(run({m_database.path()}).status, 0);
+    EXPECT_EQ(json::parse(lint())["findings"].size(), 0U);
+    std::ofstream(m_database.path("crane.acd")) << "[CR1]\n";
+    EXPECT_THAT(lint(), HasSubstr("index.acx of this directory does not match"));
+    EXPECT_EQ(run({m_database.path()}).status, 0);
+    EXPECT_EQ(json::parse(lint())["findings"].size(), 0U);
+}
+
 TEST_F(Index, HasAState) {
     EXPECT_EQ(state(), "missing");
     std::ofstream(m_database.path("index.acx")) << "tarvik index 0\n";
