@@ -78,6 +78,9 @@ def figures(results):
         yield "operations through Python, us", size, results["call, operations", size]["Python"] / 1000, 3
         batch = results["batch", size]["requests a second"]
         yield "batch: 200,000 requests a second, part of what it does", size, 200_000 / batch, 1
+        for command in ("which, property", "diff", "report"):
+            clock = [results[f"{command}{fault}, by the clock", size]["process"] for fault in ("", ", with a fault")]
+            yield f"{command}: growth by a fault", size, clock[1] / clock[0], 3
         if size == "L":
             loading = results["loading", size]
             memory = results["loading, peak memory", size]

@@ -27,6 +27,7 @@ using namespace bench;
 struct Program {
     std::string measure;
     std::vector<std::string> command;
+    int lastStatus = 1; ///< that is no failure
 };
 
 /// What a run of a program took, of itself and of the processes that it started.
@@ -54,7 +55,7 @@ Cost run(const Program& program) {
     int status = 0;
     rusage usage{};
     if (fault != 0 || wait4(process, &status, 0, &usage) != process || !WIFEXITED(status) ||
-        WEXITSTATUS(status) > 1) {
+        WEXITSTATUS(status) > program.lastStatus) {
         throw std::runtime_error("can't run " + program.command.front());
     }
     const auto milliseconds = [](const timeval& time) {
@@ -83,6 +84,15 @@ std::string copyWithIndex(const std::string& tool, const std::string& database, 
     std::filesystem::remove_all(copy);
     std::filesystem::copy(database, copy);
     run({"index", {tool, "index", copy}});
+    return copy;
+}
+
+/// A copy of a database, beside it, in which an option of base.acd is unknown.
+std::string copyWithFault(const std::string& database) {
+    std::string copy = database + "-faulty";
+    std::filesystem::remove_all(copy);
+    std::filesystem::copy(database, copy);
+    std::ofstream(copy + "/base.acd", std::ios::app) << "PROGRAM_OPTION = NOSUCH,Bscan,USB2\n";
     return copy;
 }
 
@@ -132,11 +142,18 @@ int main(int argumentCount, char** arguments) {
                 4 * ROUNDS);
         compare(size->name, {{"dump operations", {tool, "--database", database, "dump", "operations"}}},
                 ROUNDS);
-        measureWhole(size->name, {"which, property",
-                                  {tool, "--database", database, "which", "--property", "VENDOR=Korvel"}});
         measureWhole(size->name, {"lint", {tool, "lint", database}});
-        measureWhole(size->name, {"diff", {tool, "diff", database, database}});
-        measureWhole(size->name, {"report", {tool, "--database", database, "report", "--file", "-"}});
+        for (const auto& [directory, suffix] :
+             {std::pair(database, std::string()), {copyWithFault(database), std::string(", with a fault")}}) {
+            const int lastStatus = suffix.empty() ? 1 : 2; // some devices have no answer
+            const auto measure = [&](const std::string& name, std::vector<std::string> command) {
+                measureWhole(size->name, {name + suffix, std::move(command), lastStatus});
+            };
+            measure("which, property",
+                    {tool, "--database", directory, "which", "--property", "VENDOR=Korvel"});
+            measure("diff", {tool, "diff", directory, directory});
+            measure("report", {tool, "--database", directory, "report", "--file", "-"});
+        }
         return EXIT_SUCCESS;
     } catch (const std::exception& exception) {
         std::fprintf(stderr, "%s\n", exception.what());
