@@ -235,6 +235,9 @@ std::vector<AcdLines> fixed(Tool& tool, std::vector<AcdLines> files, const lint:
 }
 
 ExitCode run(Tool& tool, const Arguments& arguments) {
+    if (arguments.format == "json") {
+        tool.useJson();
+    }
     lint::Selection selection{rulesOf(arguments.selected), rulesOf(arguments.ignored)};
     if (!arguments.explained.empty()) {
         return explain(tool, arguments);

@@ -57,6 +57,23 @@ std::optional<ApplicationFault> findApplicationFault(const AnswerInWords& ask) {
     return std::nullopt;
 }
 
+bool isStartUpFault(std::string_view message) {
+    return message.find(" raised by Tarvik at ") != message.npos;
+}
+
+std::optional<catalogue::SourceText> findStartUpFault() {
+    ReadLog reads;
+    bool isReported = false;
+    {
+        const ReplacedSink sink([&isReported](const Port_MsgManData::Message& message) {
+            isReported = isReported || isStartUpFault(message.text);
+        });
+        reads.record([] { static_cast<void>(ManagerFactory::make()); });
+    }
+    const ReadLog::Match record = reads.lastOrItsRecord();
+    return isReported && record ? std::optional(record.sourceText()) : std::nullopt;
+}
+
 std::string inWords(bool answer) { return answer ? "yes" : "no"; }
 
 std::string inWords(const std::vector<std::string>& answer) {

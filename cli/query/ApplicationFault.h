@@ -5,6 +5,7 @@
 #include <functional>
 #include <optional>
 #include <string>
+#include <string_view>
 #include <vector>
 
 class ConstraintsManager;
@@ -31,6 +32,13 @@ struct ApplicationFault {
 /// Asks a fresh manager with exceptions on, twice.
 /// @return nothing if it does not raise, or raises only because a property is missing
 [[nodiscard]] std::optional<ApplicationFault> findApplicationFault(const AnswerInWords& ask);
+
+/// Does the message report a fault that ended the start-up of a manager?
+[[nodiscard]] bool isStartUpFault(std::string_view message);
+
+/// The text at which the start-up of a manager ends early, which leaves all that is read later unread.
+/// @return nothing if the start-up reads everything
+[[nodiscard]] std::optional<catalogue::SourceText> findStartUpFault();
 
 /// `database/kestrel.acd:26:18: "VERFY" is faulty`, or what else is the reason.
 [[nodiscard]] std::string reasonOf(const ApplicationFault& fault);

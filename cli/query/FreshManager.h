@@ -3,16 +3,22 @@
 #include <ManagerFactory.h>
 #include <Port_MsgManData.h>
 
-/// Drops all messages while it lives.
-class MutedMessages {
+/// Gives all messages to another sink while it lives.
+class ReplacedSink {
 public:
-    MutedMessages() : m_former(Port_MsgManData::setSink([](const Port_MsgManData::Message&) {})) {}
-    ~MutedMessages() { Port_MsgManData::setSink(std::move(m_former)); }
-    MutedMessages(const MutedMessages&) = delete;
-    MutedMessages& operator=(const MutedMessages&) = delete;
+    explicit ReplacedSink(Port_MsgManData::Sink sink) : m_former(Port_MsgManData::setSink(std::move(sink))) {}
+    ~ReplacedSink() { Port_MsgManData::setSink(std::move(m_former)); }
+    ReplacedSink(const ReplacedSink&) = delete;
+    ReplacedSink& operator=(const ReplacedSink&) = delete;
 
 private:
     Port_MsgManData::Sink m_former;
+};
+
+/// Drops all messages while it lives.
+class MutedMessages : ReplacedSink {
+public:
+    MutedMessages() : ReplacedSink([](const Port_MsgManData::Message&) {}) {}
 };
 
 /// Makes a manager that was asked nothing yet, with exceptions off.

@@ -1,9 +1,12 @@
 // Shows the answers, messages and errors of all commands alike, as text or as JSON.
 #include "query/Tool.h"
 
+#include "query/ApplicationFault.h"
 #include "query/Database.h"
 
 #include <tarvik/ConstraintsManager.h>
+
+#include <fmt/format.h>
 
 #include <unistd.h>
 #include <utility>
@@ -100,6 +103,17 @@ void Tool::writeJson(const Json& facts, const std::vector<Messages::Message>& me
     }
 }
 
+/// The manager's own message does not say where the start-up ended.
+void Tool::noteStartUpFault(const std::string& message) const {
+    if (!isStartUpFault(message)) {
+        return;
+    }
+    if (const std::optional<catalogue::SourceText> fault = findStartUpFault()) {
+        note(fmt::format("{}: \"{}\" ends the start-up, in applications, too: nothing behind it is read",
+                         catalogue::asText(fault->origin), fault->text));
+    }
+}
+
 std::vector<Messages::Message> Tool::showMessages() {
     std::vector<Messages::Message> shown;
     for (Messages::Message& message : m_messages.take()) {
@@ -110,6 +124,7 @@ std::vector<Messages::Message> Tool::showMessages() {
             if (m_captured == nullptr) {
                 writeError(message.text);
             }
+            noteStartUpFault(message.text);
         } else if (!m_settings.json) {
             m_output.write(m_terminal.isTerminal() ? printableLines(message.text) : message.text);
         }

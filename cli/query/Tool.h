@@ -29,6 +29,9 @@ public:
     /// @throw CommandError (FAULT) if it is missing or cannot be read
     void openDatabase();
 
+    /// From now on answers, and the reason why there is none, are JSON objects.
+    void useJson() noexcept { m_settings.json = true; }
+
     /// The manager, with exceptions off, on the database.
     /// @throw CommandError (FAULT) as `openDatabase`
     [[nodiscard]] ConstraintsManager& manager();
@@ -75,6 +78,7 @@ private:
     /// Info and debug messages go to standard error; status messages go where text answers go, while in JSON
     /// they are in the object only. Debug messages are shown only with `--verbose`.
     std::vector<Messages::Message> showMessages();
+    void noteStartUpFault(const std::string& message) const;
 
     Settings m_settings;
     Messages m_messages;

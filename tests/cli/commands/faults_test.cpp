@@ -140,6 +140,21 @@ TEST(Faults, CommandsThatHaveNoAnswerGiveThePlace) {
     EXPECT_THAT(database.run(question).output, HasSubstr(database.path("finch.acd") + ":2:18: NONSENSE\n"));
 }
 
+TEST(Faults, RecordThatEndsTheStartUpIsNamed) {
+    const DatabaseDirectory database(
+        {{"base.acd", "DEVICE_SUPPORTED = base,spi\nPROGRAM_OPTION_PACKAGE = base,spi\n"},
+         {"spi.acd",
+          "DEVICE_FAMILY = AT1\nAT1_DEVICES = OV1\nPROGRAM_OPTION = ERASE,Bscan,USB2:NOSUCH,Bscan,USB2\n"}});
+    const std::string note =
+        "tarvik: " + database.path("spi.acd") + ":3:35: \"NOSUCH\" ends the start-up, in applications, too";
+    for (const Words& words :
+         {Words{"families"}, Words{"which", "--operation", "ERASE"}, Words{"spi", "OV1"}}) {
+        Words all{"--database", database.path()};
+        all.insert(all.end(), words.begin(), words.end());
+        EXPECT_THAT(runTool(all).error, HasSubstr(note)) << words.front();
+    }
+}
+
 TEST(Faults, SurveysSayHowManyDevicesHaveNoAnswer) {
     const FaultyDatabase database(UNKNOWN_OPTION);
     const std::string note = "tarvik: no answer for 2 devices, the first FN10: see tarvik show FN10\n";

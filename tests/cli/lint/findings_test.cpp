@@ -228,3 +228,10 @@ TEST(LintFingerprints, TellEqualLinesApart) {
         lint(withFamily("no sense\nno sense\n[KS50]\n"), {"--format", "json"}).output)["findings"];
     EXPECT_NE(findings[0]["fingerprint"], findings[1]["fingerprint"]);
 }
+
+TEST(Lint, AnUnreadableDatabaseIsAnErrorObjectInJson) {
+    const ProcessResult outcome = runLint({"/no/such/directory", "--format", "json"});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_NE(nlohmann::json::parse(outcome.output).at("error").get<std::string>().find("/no/such/directory"),
+              std::string::npos);
+}
