@@ -29,6 +29,11 @@ public:
     /// @throw CommandError (FAULT) if it is missing or cannot be read
     void openDatabase();
 
+    /// Chooses the directories of a database to be changed, which may have no base.acd yet.
+    /// @return them, the uppermost layer first
+    /// @throw CommandError (FAULT) if there are none, or one cannot be read
+    [[nodiscard]] std::vector<std::string> openDirectories() const;
+
     /// The manager, with exceptions off, on the database.
     /// @throw CommandError (FAULT) as `openDatabase`
     [[nodiscard]] ConstraintsManager& manager();
