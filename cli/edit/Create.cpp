@@ -118,7 +118,7 @@ private:
         if (m_like.empty()) {
             return known->name;
         }
-        const std::string family = m_model.device(m_like)->family->name;
+        std::string family = m_model.device(m_like)->family->name;
         if (known && known->name != family) {
             refuse(fmt::format("\"{}\" is of family \"{}\", so it cannot be copied to \"{}\"", m_like, family,
                                known->name));

@@ -52,9 +52,8 @@ public:
             if (place.header->kind == AcdLines::Kind::INVALID) {
                 addWords(file.source(place.header->line), m_scope);
             }
-        } else if (place.line != nullptr && schema::shapeInSection(place.line->name) != schema::Shape::NONE) {
-            addName(file.family());
-        } else if (schema::fileOf(file.family()) == schema::File::FAMILY || place.line == nullptr) {
+        } else if (schema::fileOf(file.family()) == schema::File::FAMILY || place.line == nullptr ||
+                   schema::shapeInSection(place.line->name) != schema::Shape::NONE) {
             addName(file.family());
         } else {
             addNamesOf(*place.line, finding);

@@ -51,13 +51,13 @@ std::optional<std::string> snapshot(const Files& files) {
     }
 }
 
-/// The answers about each device; those in general are about "".
+/// The answers about each name; those in general are about "". A device that becomes a family is still there.
 using Answered = std::map<std::string, diff::Answers>;
 
 Answered answered(const diff::Snapshot& database) {
     Answered all{{"", database.general()}};
     for (const auto& [name, device] : database.devices()) {
-        diff::Answers& answers = all[(device.isFamily ? "family " : "device ") + std::string(name)];
+        diff::Answers& answers = all[std::string(name)];
         answers = diff::deserialized(device.own);
         answers.insert(device.shared->begin(), device.shared->end());
         answers[{"", "is there"}] = {"yes"};
