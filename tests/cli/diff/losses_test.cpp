@@ -51,26 +51,35 @@ std::optional<std::string> snapshot(const Files& files) {
     }
 }
 
-/// The answers about each name; those in general are about "". A device that becomes a family is still there.
-using Answered = std::map<std::string, diff::Answers>;
+/// The answers about each name.
+struct Named {
+    bool isFamily;
+    diff::Answers answers;
+};
+using Answered = std::map<std::string, Named>;
 
+/// A device that becomes a family is still there.
 Answered answered(const diff::Snapshot& database) {
-    Answered all{{"", database.general()}};
+    Answered all{{"in general", {false, database.general()}}};
     for (const auto& [name, device] : database.devices()) {
-        diff::Answers& answers = all[std::string(name)];
-        answers = diff::deserialized(device.own);
-        answers.insert(device.shared->begin(), device.shared->end());
-        answers[{"", "is there"}] = {"yes"};
+        Named& named = all["of " + std::string(name)];
+        named = {device.isFamily, diff::deserialized(device.own)};
+        named.answers.insert(device.shared->begin(), device.shared->end());
+        named.answers[{"", "is there"}] = {"yes"};
     }
     return all;
 }
 
 /// The answers of a database one by one, to its own questions and to those of another database. What is not said of a
-/// package is as without a package.
+/// package is as without a package. Whether there is a family is among the general answers.
 Facts factsOf(const Answered& database, const Answered& other) {
     Facts facts;
-    for (const auto& [device, answers] : database) {
-        const auto addAll = [&facts, &device = device, &answers = answers](const diff::Answers& asked) {
+    for (const auto& [device, named] : database) {
+        const auto same = other.find(device);
+        if (named.isFamily && same == other.end()) {
+            continue;
+        }
+        const auto addAll = [&facts, &device = device, &answers = named.answers](const diff::Answers& asked) {
             for (const auto& [question, ignored] : asked) {
                 diff::Question general = question;
                 general.package.clear();
@@ -81,9 +90,9 @@ Facts factsOf(const Answered& database, const Answered& other) {
                 }
             }
         };
-        addAll(answers);
-        if (const auto same = other.find(device); same != other.end()) {
-            addAll(same->second);
+        addAll(named.answers);
+        if (same != other.end()) {
+            addAll(same->second.answers);
         }
     }
     return facts;
