@@ -56,7 +56,8 @@ CommandLine::CommandLine() {
         {"Questions", declared({&command::CHECK, &command::OPERATIONS, &command::OPTIONS, &command::BSDL,
                                 &command::OPERATION_OPTIONS, &command::PROPERTY, &command::MULTIBOOT,
                                 &command::WHY, &command::WHICH})},
-        {"Databases", declared({&command::LINT, &command::FORMAT, &command::DIFF, &command::INDEX})},
+        {"Databases", declared({&command::LINT, &command::FORMAT, &command::DIFF, &command::NEW,
+                                &command::RENAME, &command::REMOVE, &command::INDEX})},
         {"Programs", declared({&command::BATCH, &command::DUMP})},
         {"Help", {declaredHelp()}},
     };

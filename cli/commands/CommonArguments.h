@@ -50,4 +50,10 @@ namespace argument {
             .target = target};
 }
 
+[[nodiscard]] inline Argument dryRun(Argument::Target target) {
+    return {.name = "--dry-run",
+            .description = "Write nothing; show what would change, as a patch",
+            .target = target};
+}
+
 } // namespace argument

@@ -1,13 +1,14 @@
 // `format`: brings database files into their canonical form.
 #include "commands/Commands.h"
 #include "commands/DatabaseArguments.h"
+#include "commands/EditedFiles.h"
 
 #include "diff/Presentation.h"
+#include "edit/FileWriter.h"
 #include "edit/Format.h"
 #include "edit/Proof.h"
-#include "edit/UnifiedDiff.h"
+#include "edit/Sort.h"
 #include "query/Tool.h"
-#include "term/AtomicFile.h"
 
 #include <AcdStore.h>
 
@@ -22,53 +23,41 @@ struct Arguments {
     std::vector<std::string> paths;
     bool check = false;
     bool diff = false;
+    bool sort = false;
 };
 
-/// What was, or would be, formatted.
-struct Formatted {
-    std::vector<std::string> files;
-    std::string diff;
-    bool isWritten;
-};
-
-std::string asText(const Formatted& formatted, const Terminal& /*any*/) {
-    std::string text = formatted.diff;
-    for (const std::string& file : formatted.diff.empty() ? formatted.files : std::vector<std::string>()) {
-        text += printable(file) + '\n';
-    }
-    return text;
-}
-
-Json asJson(const Formatted& formatted) {
-    return {{"files", formatted.files}, {"written", formatted.isWritten}, {"diff", formatted.diff}};
-}
-
-/// The files of the database that are meant and are not in their canonical form, with that form.
-std::vector<edit::Rewrite> rewrites(const DatabaseArguments& database, std::string& diff) {
-    std::vector<edit::Rewrite> all;
-    for (const AcdLines& lines : AcdLines::ofDatabase()) {
-        if (!database.isMeant(lines.path())) {
+/// Gives the files that are meant their canonical form.
+void format(edit::Draft& draft, const DatabaseArguments& database, bool isSorting) {
+    const edit::KeysOfFamilies skipped =
+        isSorting ? edit::keysWithFindings(draft.model()) : edit::KeysOfFamilies();
+    for (edit::Draft::File& each : draft.files()) {
+        if (!database.isMeant(each.path)) {
             continue;
         }
-        const edit::SourceFile file(edit::readFile(lines.path()), lines.path(), lines.family());
-        std::string text = joined(edit::formatted(file));
-        if (text == file.text()) {
-            continue;
+        if (isSorting) {
+            const auto keys = skipped.find(each.family);
+            each.text = edit::sorted(edit::SourceFile(each.text, each.path, each.family),
+                                     keys == skipped.end() ? std::set<std::string>() : keys->second);
         }
-        if (!edit::readsAlike(file.lines(), AcdLines(text))) {
+        const edit::SourceFile file(each.text, each.path, each.family);
+        each.text = joined(edit::formatted(file));
+        if (!edit::readsAlike(file.lines(), AcdLines(each.text))) {
             throw CommandError(ExitCode::FAULT, fmt::format("{} has no canonical form that reads alike",
-                                                            printable(lines.path())));
+                                                            printable(each.path)));
         }
-        diff += edit::unifiedDiff(lines.path(), file.text(), text);
-        all.push_back({lines.path(), std::move(text)});
     }
-    return all;
 }
 
 /// The canonical form never changes an answer. This is the last line of defence against a fault of the formatter.
 void requireSameAnswers(const std::vector<std::string>& directories,
-                        const std::vector<edit::Rewrite>& rewrites) {
+                        const std::vector<edit::Rewrite>& rewrites, bool isSorting) {
     const std::optional<diff::Comparison> effect = edit::effectOf(directories, rewrites);
+    if (!effect && isSorting) {
+        throw CommandError(
+            ExitCode::FAULT,
+            "a database without base.acd has no answers that could prove that sorting keeps them: "
+            "name the directories of the layers below, too");
+    }
     if (effect && !effect->isEmpty()) {
         throw CommandError(ExitCode::FAULT,
                            fmt::format("nothing is written, since the form would change answers:\n{}",
@@ -91,18 +80,19 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
                                fmt::format("there is no directory \"{}\"", printable(directory)));
         }
     }
-    std::string diff;
-    const std::vector<edit::Rewrite> wanted = rewrites(database, diff);
+    edit::Draft draft = edit::Draft::ofDatabase();
+    format(draft, database, arguments.sort);
+    const std::vector<edit::Rewrite> wanted = draft.rewrites();
     const bool isWritten = !arguments.check && !arguments.diff;
-    if (isWritten && !wanted.empty()) {
-        requireSameAnswers(directories, wanted);
+    if ((isWritten || arguments.sort) && !wanted.empty()) {
+        requireSameAnswers(directories, wanted, arguments.sort);
     }
-    Formatted result{{}, arguments.diff ? diff : std::string(), isWritten};
+    EditedFiles result{{}, arguments.diff ? draft.diff() : std::string(), isWritten};
     for (const edit::Rewrite& rewrite : wanted) {
-        if (isWritten) {
-            writeFile(rewrite.path, rewrite.text);
-        }
         result.files.push_back(rewrite.path);
+    }
+    if (isWritten) {
+        edit::writeAll(wanted);
     }
     return tool.answer(result, arguments.check && !wanted.empty() ? ExitCode::NO : ExitCode::YES);
 }
@@ -121,6 +111,9 @@ Action declare(ArgumentList& list) {
         {.name = "--diff",
          .description = "Write nothing; show what would change",
          .target = &arguments->diff},
+        {.name = "--sort",
+         .description = "Sort what has no order: sections, names of lists, records of tables",
+         .target = &arguments->sort},
     };
     return [arguments](Tool& tool) { return run(tool, *arguments); };
 }
@@ -135,6 +128,7 @@ const Command command::FORMAT{
     "comment: both forms are compared before a file is written.",
     "tarvik format database\n"
     "tarvik format --check database\n"
+    "tarvik format --sort --diff database\n"
     "tarvik format --diff database/kestrel.acd",
     declare,
 };

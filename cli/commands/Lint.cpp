@@ -3,12 +3,12 @@
 #include "commands/DatabaseArguments.h"
 
 #include "diff/Presentation.h"
+#include "edit/FileWriter.h"
 #include "edit/Fixes.h"
 #include "lint/Check.h"
 #include "lint/Report.h"
 #include "query/Database.h"
 #include "query/Tool.h"
-#include "term/AtomicFile.h"
 #include "term/Progress.h"
 #include "term/Table.h"
 
@@ -201,10 +201,15 @@ std::vector<AcdLines> fixed(Tool& tool, std::vector<AcdLines> files, const lint:
     if (directories.empty()) {
         throw CommandError(ExitCode::FAULT, "the built-in demonstration cannot be changed: name a directory");
     }
-    const edit::FixResult result = edit::fixFindings(
-        files, {selection, arguments.unsafeFixes, [&database](const lint::Finding& finding) {
-                    return database.isMeant(finding.location.file->path());
-                }});
+    const edit::FixResult result =
+        edit::fixFindings(files, {selection, arguments.unsafeFixes,
+                                  [&database](const lint::Finding& finding) {
+                                      return database.isMeant(finding.location.file->path());
+                                  },
+                                  directories});
+    for (const std::string& refused : result.refused) {
+        tool.note("not fixed without --unsafe-fixes: " + refused);
+    }
     if (arguments.diff) {
         tool.output().write(fmt::format("{}", fmt::join(result.diffs, "")));
         return files;
@@ -212,15 +217,12 @@ std::vector<AcdLines> fixed(Tool& tool, std::vector<AcdLines> files, const lint:
     if (result.fixed == 0) {
         return files;
     }
-    const std::optional<diff::Comparison> effect = edit::effectOf(directories, result.rewrites);
-    for (const edit::Rewrite& rewrite : result.rewrites) {
-        writeFile(rewrite.path, rewrite.text);
-    }
+    edit::writeAll(result.rewrites);
     std::string note =
         fmt::format("fixed {} finding{} in {} file{}", result.fixed, result.fixed == 1 ? "" : "s",
                     result.rewrites.size(), result.rewrites.size() == 1 ? "" : "s");
-    if (effect && !effect->isEmpty()) {
-        note += "; answers that change:\n" + diff::asMarkdown(*effect);
+    if (result.effect && !result.effect->isEmpty()) {
+        note += "; answers that change:\n" + diff::asMarkdown(*result.effect);
     }
     tool.note(note);
     for (AcdLines& file : files) {
@@ -228,7 +230,7 @@ std::vector<AcdLines> fixed(Tool& tool, std::vector<AcdLines> files, const lint:
             std::find_if(result.rewrites.begin(), result.rewrites.end(),
                          [&file](const edit::Rewrite& each) { return each.path == file.path(); });
         if (rewrite != result.rewrites.end()) {
-            file = AcdLines(rewrite->text, std::string(file.path()), std::string(file.family()));
+            file = AcdLines(*rewrite->text, std::string(file.path()), std::string(file.family()));
         }
     }
     return files;
@@ -315,7 +317,8 @@ Action declare(ArgumentList& list) {
          .description = "Remove the findings that can be fixed safely, and write the files",
          .target = &arguments->fix},
         {.name = "--unsafe-fixes",
-         .description = "Apply guesses as well, such as the nearest name",
+         .description = "Apply guesses as well, such as the nearest name, and fixes that change answers "
+                        "about other names",
          .target = &arguments->unsafeFixes},
         {.name = "--diff",
          .description = "Write nothing; show what --fix would change",

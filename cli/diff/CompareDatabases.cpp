@@ -20,14 +20,16 @@ std::string outputOf(Subprocess& process) {
 
 } // namespace
 
-Comparison compareDatabases(const std::string& oldDatabase, const std::string& newDatabase) {
+Comparison compareDatabases(const std::string& oldDatabase, const std::string& newDatabase,
+                            const Renaming& renamed) {
     const auto snapshotOf = [](const std::string& database) {
         return std::vector<std::string>{"diff", "--format", SNAPSHOT_FORMAT, "--", database, database};
     };
     // Both take about the same time, so one of them shows the progress.
     Subprocess oldProcess(snapshotOf(oldDatabase), false);
     Subprocess newProcess(snapshotOf(newDatabase), true);
-    const Snapshot before(outputOf(oldProcess));
+    Snapshot before(outputOf(oldProcess));
+    before.rename(renamed);
     const Snapshot after(outputOf(newProcess));
     return compare(before, after);
 }

@@ -16,7 +16,9 @@ inline constexpr char FAULT_MARK = '!';
 /// Asks two databases everything, each in a process of its own.
 /// @param oldDatabase its directories, the uppermost layer first, separated by ":"
 /// @param newDatabase likewise
+/// @param renamed what names of the old one are called in the new one
 /// @throw CommandError (FAULT) if one of them cannot be read
-[[nodiscard]] Comparison compareDatabases(const std::string& oldDatabase, const std::string& newDatabase);
+[[nodiscard]] Comparison compareDatabases(const std::string& oldDatabase, const std::string& newDatabase,
+                                          const Renaming& renamed = {});
 
 } // namespace diff

@@ -27,7 +27,54 @@ std::string_view takeBlock(std::string_view& rest) {
     return block;
 }
 
+/// The answers after families and devices got other names.
+Answers renamedAnswers(const Answers& answers, const Renaming& renamed) {
+    const auto contains = [](const std::string& topic) {
+        return topic == FAMILY || topic == FAMILIES || topic == FLASH_FAMILIES;
+    };
+    Answers result;
+    for (const auto& [question, texts] : answers) {
+        StringSet& changed = result[question];
+        for (std::string text : texts) {
+            if (const auto found = renamed.find(text); contains(question.topic) && found != renamed.end()) {
+                text = found->second;
+            } else if (question.topic == FAULTS) {
+                for (const auto& [from, to] : renamed) {
+                    for (std::size_t at = text.find(from); at != text.npos;
+                         at = text.find(from, at + to.size())) {
+                        text.replace(at, from.size(), to);
+                    }
+                }
+            }
+            changed.insert(std::move(text));
+        }
+    }
+    return result;
+}
+
 } // namespace
+
+void Snapshot::rename(const Renaming& renamed) {
+    if (renamed.empty()) {
+        return;
+    }
+    m_general = renamedAnswers(m_general, renamed);
+    const auto newName = [this, &renamed](std::string_view name) -> std::string_view {
+        const auto found = renamed.find(name);
+        return found == renamed.end() ? name : m_renamedTexts.emplace_back(found->second);
+    };
+    std::map<std::string_view, Device, NaturalLess> devices;
+    for (auto& [name, device] : m_devices) {
+        const bool isConcerned = renamed.contains(name) || renamed.contains(device.family);
+        if (isConcerned) {
+            device.own =
+                m_renamedTexts.emplace_back(serialized(renamedAnswers(deserialized(device.own), renamed)));
+        }
+        device.family = newName(device.family);
+        devices.emplace(newName(name), device);
+    }
+    m_devices = std::move(devices);
+}
 
 Snapshot::Snapshot(std::string text) : m_text(std::move(text)) {
     std::string_view rest = m_text;

@@ -5,6 +5,8 @@
 
 #include <tarvik/TARVIKNS.h>
 
+#include <deque>
+#include <functional>
 #include <map>
 #include <optional>
 #include <set>
@@ -37,6 +39,17 @@ using Answers = std::map<Question, StringSet>;
 /// The topic of answers that are missing because the manager raises.
 inline constexpr const char* FAULTS = "faults";
 
+// The topics whose answers are names of families.
+inline constexpr const char* FAMILY = "family";
+inline constexpr const char* FAMILIES = "families";
+inline constexpr const char* FLASH_FAMILIES = "families of flashes";
+
+/// Begins the topics about the outputs of a mode.
+inline constexpr const char* OUTPUTS_OF_MODE = "outputs of mode ";
+
+/// The new names of devices and families, by their former ones.
+using Renaming = std::map<std::string, std::string, std::less<>>;
+
 /// All that a database answers, read from its serialised form.
 class Snapshot {
 public:
@@ -52,6 +65,9 @@ public:
     Snapshot(const Snapshot&) = delete;
     Snapshot& operator=(const Snapshot&) = delete;
 
+    /// Gives devices and families other names, also where answers contain them.
+    void rename(const Renaming& renamed);
+
     [[nodiscard]] const Answers& general() const { return m_general; }
 
     /// The devices and flashes, and the families as names of their own.
@@ -59,6 +75,7 @@ public:
 
 private:
     std::string m_text;
+    std::deque<std::string> m_renamedTexts; ///< what devices refer to in place of the text
     Answers m_general;
     std::map<std::string_view, Answers> m_shared; ///< by the first device that has them
     std::map<std::string_view, Device, NaturalLess> m_devices;

@@ -65,7 +65,7 @@ private:
 
     [[nodiscard]] static Answers own(const DeviceDetails& details) {
         Answers answers;
-        answers[value("family")] = {details.family};
+        answers[value(FAMILY)] = {details.family};
         if (details.idcode) {
             answers[value("IDCODE")] = {details.idcode->value};
         }
@@ -135,7 +135,7 @@ private:
         const ManagerFactory::Manager manager = freshManager();
         Answers answers;
         for (const std::string& mode : vocabulary::modes()) {
-            StringSet& outputs = answers[names("outputs of mode " + mode)];
+            StringSet& outputs = answers[names(OUTPUTS_OF_MODE + mode)];
             for (const std::string& output : vocabulary::outputs()) {
                 if (manager->checkConstraints(vocabulary::readMode(mode), vocabulary::readOutput(output))) {
                     outputs.insert(output);
@@ -154,9 +154,9 @@ private:
         addTable(answers, "", OPERATIONS, survey.spiOperations(), true);
         addTable(answers, "", OPTIONS, survey.spiOptions(), true);
         const std::vector<std::string> families = catalogue::families();
-        answers[names("families")] = {families.begin(), families.end()};
+        answers[names(FAMILIES)] = {families.begin(), families.end()};
         for (const std::string& family : catalogue::list("spi.acd", "DEVICE_FAMILY")) {
-            answers[names("families of flashes")].insert(family);
+            answers[names(FLASH_FAMILIES)].insert(family);
         }
         return answers;
     }

@@ -1,8 +1,12 @@
 // Applies the linter's fixes, and keeps those that do what they promise.
 #include "edit/Fixes.h"
 
+#include "edit/Scope.h"
 #include "edit/SourceFile.h"
 #include "edit/UnifiedDiff.h"
+
+#include <fmt/format.h>
+#include <fmt/ranges.h>
 
 #include <algorithm>
 #include <map>
@@ -39,6 +43,11 @@ Identity identityOf(const lint::Finding& finding) {
     return {finding.rule, finding.location.file->path(), finding.text};
 }
 
+std::string shown(const lint::Finding& finding) {
+    return fmt::format("{}:{}:{}: {} [{}]", finding.location.file->path(), finding.location.line,
+                       finding.location.column, finding.text, finding.rule->code);
+}
+
 Counts countsOf(const std::vector<lint::Finding>& findings) {
     Counts counts;
     for (const lint::Finding& finding : findings) {
@@ -50,6 +59,8 @@ Counts countsOf(const std::vector<lint::Finding>& findings) {
 /// A fix, ready to be applied.
 struct Candidate {
     Identity finding;
+    std::string shown; ///< the finding with its place
+    Scope scope;
     std::vector<Change> changes;
 };
 
@@ -60,6 +71,7 @@ public:
             std::string text = file.readError().empty() ? readFile(file.path()) : std::string();
             m_files.push_back({file.path(), file.family(), text, text});
         }
+        m_counts = findingsIn(texts());
     }
 
     [[nodiscard]] FixResult run() {
@@ -73,12 +85,14 @@ public:
                 break;
             }
         }
+        result.rewrites = rewrites(texts());
         for (const File& file : m_files) {
             if (file.text != file.original) {
-                result.rewrites.push_back({file.path, file.text});
                 result.diffs.push_back(unifiedDiff(file.path, file.original, file.text));
             }
         }
+        result.refused = std::move(m_refusals);
+        result.effect = std::move(m_effect);
         return result;
     }
 
@@ -116,7 +130,8 @@ private:
             if (!isWanted) {
                 continue;
             }
-            Candidate& candidate = all.emplace_back(Candidate{identityOf(finding), {}});
+            Candidate& candidate = all.emplace_back(
+                Candidate{identityOf(finding), shown(finding), scopeOf(finding, current), {}});
             for (const lint::TextEdit& edit : finding.fix->edits) {
                 const auto file = static_cast<std::size_t>(
                     std::find(files.begin(), files.end(), edit.location.file) - files.begin());
@@ -165,11 +180,8 @@ private:
     }
 
     /// Do the fixes remove their findings, and add none?
-    [[nodiscard]] bool isProven(const std::vector<Candidate>& used,
-                                const std::vector<std::string>& edited) const {
-        const Counts before = findingsIn(texts());
-        const Counts after = findingsIn(edited);
-        Counts left = before;
+    [[nodiscard]] bool isProven(const std::vector<Candidate>& used, const Counts& after) const {
+        Counts left = m_counts;
         for (const Candidate& candidate : used) {
             --left[candidate.finding];
         }
@@ -179,16 +191,56 @@ private:
         });
     }
 
+    [[nodiscard]] std::vector<Rewrite> rewrites(const std::vector<std::string>& texts) const {
+        std::vector<Rewrite> all;
+        for (std::size_t i = 0; i < m_files.size(); ++i) {
+            if (texts[i] != m_files[i].original) {
+                all.push_back({m_files[i].path, texts[i]});
+            }
+        }
+        return all;
+    }
+
+    /// Which names do these fixes, and those before them, change answers about that no finding concerns?
+    [[nodiscard]] std::set<std::string> strangers(const std::vector<Candidate>& used,
+                                                  const std::optional<diff::Comparison>& effect) const {
+        if (!effect || m_request.withUnsafe) {
+            return {};
+        }
+        Scope scope = m_scope;
+        for (const Candidate& candidate : used) {
+            scope.add(candidate.scope);
+        }
+        return namesOutside(scope, *effect);
+    }
+
     /// @return how many findings were fixed
     [[nodiscard]] std::size_t fix(const std::vector<Candidate>& wanted) {
         std::vector<Candidate> used;
         std::vector<std::string> edited = applied(wanted, used);
-        if (used.empty() || !isProven(used, edited)) {
+        if (used.empty()) {
+            return 0;
+        }
+        Counts after = findingsIn(edited);
+        if (!isProven(used, after)) {
+            return 0;
+        }
+        std::optional<diff::Comparison> effect = effectOf(m_request.layers, rewrites(edited));
+        if (const std::set<std::string> others = strangers(used, effect); !others.empty()) {
+            if (wanted.size() == 1) {
+                m_refusals.insert(fmt::format("{}\nits fix would change answers about {}, too",
+                                              used.front().shown, fmt::join(others, ", ")));
+            }
             return 0;
         }
         for (std::size_t i = 0; i < m_files.size(); ++i) {
             m_files[i].text = std::move(edited[i]);
         }
+        for (const Candidate& candidate : used) {
+            m_scope.add(candidate.scope);
+        }
+        m_counts = std::move(after);
+        m_effect = std::move(effect);
         return used.size();
     }
 
@@ -209,7 +261,11 @@ private:
 
     const FixRequest& m_request;
     std::vector<File> m_files;
-    std::set<Identity> m_refused; ///< whose fixes do not do what they promise
+    Counts m_counts;                          ///< of the findings in the current texts
+    Scope m_scope;                            ///< of what is fixed so far
+    std::optional<diff::Comparison> m_effect; ///< of the same
+    std::set<Identity> m_refused;             ///< whose fixes do not do what they promise
+    std::set<std::string> m_refusals;         ///< of them those that would change other answers
 };
 
 } // namespace

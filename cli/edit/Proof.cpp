@@ -1,7 +1,6 @@
 // Shows what an edit does before it is done: the edited database is made beside, and both are asked everything.
 #include "edit/Proof.h"
 
-#include "diff/CompareDatabases.h"
 #include "term/ExitCode.h"
 #include "term/TemporaryDirectory.h"
 
@@ -19,20 +18,43 @@ namespace {
 
 namespace fs = std::filesystem;
 
-/// Makes a layer with the texts in place of some files; the others are links to those of the layer.
-void copyLayer(const fs::path& layer, const fs::path& copy,
-               const std::map<fs::path, const std::string*>& texts) {
+fs::path normalised(const fs::path& path) { return fs::absolute(path).lexically_normal(); }
+
+/// The new texts by path; none for a path that has no file any more.
+using Texts = std::map<fs::path, const std::string*>;
+
+Texts textsOf(const std::vector<Rewrite>& rewrites) {
+    Texts texts;
+    for (const Rewrite& rewrite : rewrites) {
+        if (!rewrite.formerPath.empty()) {
+            texts.emplace(normalised(rewrite.formerPath), nullptr);
+        }
+    }
+    // After them: a file may take the path of one that is renamed.
+    for (const Rewrite& rewrite : rewrites) {
+        texts[normalised(rewrite.path)] = rewrite.text ? &*rewrite.text : nullptr;
+    }
+    return texts;
+}
+
+/// Makes a layer with the new texts; the other files are links to those of the layer.
+void copyLayer(const fs::path& layer, const fs::path& copy, const Texts& texts) {
     fs::create_directory(copy);
-    for (const fs::directory_entry& entry : fs::directory_iterator(layer)) {
-        const fs::path target = copy / entry.path().filename();
-        if (const auto text = texts.find(fs::absolute(entry.path()).lexically_normal());
-            text == texts.end()) {
-            fs::create_symlink(fs::absolute(entry.path()), target);
-        } else {
-            std::ofstream file(target, std::ios::binary);
-            if (!(file << *text->second).flush()) {
-                throw CommandError(ExitCode::FAULT, fmt::format("cannot write \"{}\"", target.string()));
+    if (fs::exists(layer)) {
+        for (const fs::directory_entry& entry : fs::directory_iterator(layer)) {
+            if (!texts.contains(normalised(entry.path()))) {
+                fs::create_symlink(fs::absolute(entry.path()), copy / entry.path().filename());
             }
+        }
+    }
+    for (const auto& [path, text] : texts) {
+        if (text == nullptr || path != normalised(layer / path.filename())) {
+            continue;
+        }
+        const fs::path target = copy / path.filename();
+        std::ofstream file(target, std::ios::binary);
+        if (!(file << *text).flush()) {
+            throw CommandError(ExitCode::FAULT, fmt::format("cannot write \"{}\"", target.string()));
         }
     }
 }
@@ -40,15 +62,13 @@ void copyLayer(const fs::path& layer, const fs::path& copy,
 } // namespace
 
 std::optional<diff::Comparison> effectOf(const std::vector<std::string>& layers,
-                                         const std::vector<Rewrite>& rewrites) {
+                                         const std::vector<Rewrite>& rewrites,
+                                         const diff::Renaming& renamed) {
     if (std::none_of(layers.begin(), layers.end(),
                      [](const std::string& layer) { return fs::exists(fs::path(layer) / "base.acd"); })) {
         return std::nullopt;
     }
-    std::map<fs::path, const std::string*> texts;
-    for (const Rewrite& rewrite : rewrites) {
-        texts.emplace(fs::absolute(rewrite.path).lexically_normal(), &rewrite.text);
-    }
+    const Texts texts = textsOf(rewrites);
     const TemporaryDirectory scratch;
     std::vector<std::string> copies;
     try {
@@ -60,7 +80,7 @@ std::optional<diff::Comparison> effectOf(const std::vector<std::string>& layers,
         throw CommandError(ExitCode::FAULT, error.what());
     }
     return diff::compareDatabases(fmt::format("{}", fmt::join(layers, ":")),
-                                  fmt::format("{}", fmt::join(copies, ":")));
+                                  fmt::format("{}", fmt::join(copies, ":")), renamed);
 }
 
 } // namespace edit

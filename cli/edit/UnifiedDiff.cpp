@@ -115,13 +115,18 @@ std::string range(std::size_t line, std::size_t count) {
 } // namespace
 
 std::string unifiedDiff(const std::string& path, std::string_view before, std::string_view after) {
+    return unifiedDiff(path, path, before, after);
+}
+
+std::string unifiedDiff(const std::string& path, const std::string& newPath, std::string_view before,
+                        std::string_view after) {
     if (before == after) {
         return {};
     }
     const Lines oldLines = linesOf(before);
     const Lines newLines = linesOf(after);
     const std::vector<Step> steps = Matcher(oldLines, newLines).take();
-    std::string text = fmt::format("--- {}\n+++ {}\n", path, path);
+    std::string text = fmt::format("--- {}\n+++ {}\n", path, newPath);
     std::size_t line = 1;
     std::size_t otherLine = 1;
     const auto isChange = [](const Step& step) { return step.mark != ' '; };

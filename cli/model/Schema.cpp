@@ -81,6 +81,33 @@ bool hasNamedRecords(File file, std::string_view key) {
            (file == File::SPI && key.ends_with(PROPERTY_SUFFIX));
 }
 
+NamePlaces namePlaces(File file, std::string_view key) {
+    if (file == File::BASE) {
+        if (key == DEVICE_SUPPORTED) {
+            return NamePlaces::ITEMS;
+        }
+        if (key == PROGRAM_OPTION_PACKAGE) {
+            return NamePlaces::JOINED_ITEMS;
+        }
+        if (key == NOT_SUPPORTED_PART_IN_MODE) {
+            return NamePlaces::PART_ITEMS;
+        }
+        return key == IDCODE                        ? NamePlaces::FIRST_FIELDS
+               : contains(vocabulary::modes(), key) ? NamePlaces::SECOND_RECORD
+                                                    : NamePlaces::NONE;
+    }
+    if (shapeOf(file, key) != Shape::LIST) {
+        return NamePlaces::NONE;
+    }
+    return contains(multiboot::keys(), key) ? NamePlaces::ITEMS_IN_ANY_CASE : NamePlaces::ITEMS;
+}
+
+std::string_view nameOfPart(std::string_view item) {
+    const std::size_t name = item.find('_') + 1;
+    const std::size_t end = item.find('_', name);
+    return name == 0 || end == item.npos ? std::string_view() : item.substr(name, end - name);
+}
+
 std::vector<std::string> fixedKeys(File file) {
     std::vector<std::string> all(FAMILY_KEYS.begin(), FAMILY_KEYS.end());
     const auto add = [&all](const auto& names) { all.insert(all.end(), names.begin(), names.end()); };

@@ -103,6 +103,24 @@ inline constexpr std::array<const char*, 5> FAMILY_KEYS{OPERATION, BSDL_OPERATIO
 /// Do the records of a key begin with a name of their own, so that a record replaces one of the same name?
 [[nodiscard]] bool hasNamedRecords(File file, std::string_view key);
 
+/// Which texts of a value are names of families, devices or flashes.
+enum class NamePlaces {
+    NONE,
+    ITEMS,             ///< the items of a list
+    ITEMS_IN_ANY_CASE, ///< likewise, compared without case
+    JOINED_ITEMS,      ///< likewise, each alone or with a package after it
+    PART_ITEMS,        ///< the second part of each item MODEKEY_NAME_PACKAGE
+    FIRST_FIELDS,      ///< the first field of each record
+    SECOND_RECORD,     ///< the fields of the second record, without the first one
+};
+
+/// The places of names in the value of a key before the first section of a file. In sections there are none.
+[[nodiscard]] NamePlaces namePlaces(File file, std::string_view key);
+
+/// The name in an item "MODEKEY_NAME_PACKAGE" of `NOT_SUPPORTED_PART_IN_MODE`.
+/// @return NAME; empty if the item has fewer parts
+[[nodiscard]] std::string_view nameOfPart(std::string_view item);
+
 /// The keys of a file whose names are fixed. Those of spi.acd that contain a name are not among them.
 [[nodiscard]] std::vector<std::string> fixedKeys(File file);
 

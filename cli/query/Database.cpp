@@ -54,3 +54,16 @@ void openDatabase(const std::vector<std::string>& directories) {
     requireDirectories(path);
     requireBase(path);
 }
+
+std::vector<std::string> openDirectories(const std::vector<std::string>& directories) {
+    if (!directories.empty()) {
+        AcdStore::setSearchPath(directories);
+    }
+    std::vector<std::string> path = AcdStore::searchPath();
+    if (path.empty()) {
+        throw CommandError(ExitCode::FAULT,
+                           "the built-in demonstration cannot be changed: name a directory with --database");
+    }
+    requireDirectories(path);
+    return path;
+}

@@ -7,3 +7,8 @@
 /// installation, else the demonstration, with a note on standard error.
 /// @throw CommandError (FAULT) that names the paths tried, when a database is missing or can't be read
 void openDatabase(const std::vector<std::string>& directories);
+
+/// Settles which database is to be changed, likewise, but without the demonstration. There may be no base.acd yet.
+/// @return its directories, the uppermost layer first
+/// @throw CommandError (FAULT) if no database is given, or a directory can't be read
+[[nodiscard]] std::vector<std::string> openDirectories(const std::vector<std::string>& directories);

@@ -23,6 +23,8 @@ void Tool::openDatabase() {
     }
 }
 
+std::vector<std::string> Tool::openDirectories() const { return ::openDirectories(m_settings.databases); }
+
 ConstraintsManager& Tool::manager() {
     openDatabase();
     ConstraintsManager* const manager = ConstraintsManager::getConstraintsManager();

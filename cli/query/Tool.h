@@ -32,6 +32,11 @@ public:
     /// From now on answers, and the reason why there is none, are JSON objects.
     void useJson() noexcept { m_settings.json = true; }
 
+    /// Chooses the directories of a database to be changed, which may have no base.acd yet.
+    /// @return them, the uppermost layer first
+    /// @throw CommandError (FAULT) if there are none, or one cannot be read
+    [[nodiscard]] std::vector<std::string> openDirectories() const;
+
     /// The manager, with exceptions off, on the database.
     /// @throw CommandError (FAULT) as `openDatabase`
     [[nodiscard]] ConstraintsManager& manager();

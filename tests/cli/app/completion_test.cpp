@@ -61,6 +61,10 @@ TEST_F(Completion, OffersNamesOfTheDatabase) {
     EXPECT_THAT(offered({"spi", "F"}), ElementsAre("FLA", "FLB", "FLC"));
     EXPECT_THAT(offered({"devices", "--family", ""}), ElementsAre("finch"));
     EXPECT_THAT(offered({"dump", "operations", "FN10", "FN2"}), ElementsAre("FN20"));
+    EXPECT_THAT(offered({"rename", "f"}), ElementsAre("finch", "FN10", "FN20", "FLA", "FLB", "FLC"));
+    EXPECT_THAT(offered({"remove", "FL"}), ElementsAre("FLA", "FLB", "FLC"));
+    EXPECT_THAT(offered({"new", "d"}), ElementsAre("device"));
+    EXPECT_THAT(offered({"new", "device", "FN30", "--like", "FN1"}), ElementsAre("FN10"));
 }
 
 TEST_F(Completion, OffersTheVocabulary) {

@@ -120,6 +120,13 @@ lint nowhere
 format --check database
 format --diff mine
 format nowhere
+--database database new device KS75 --like KS50 --idcode 0xX4105FB7 --dry-run
+--database database new flash OVD128 --like OVD64 --dry-run
+--database database rename kestrel falcon --dry-run
+--database database remove KS50 --dry-run
+new family kestrel --like osprey
+rename KS50 KS55
+remove spi
 diff nowhere nowhere
 report
 report --file page.html

@@ -113,3 +113,19 @@ TEST(Fixes, AreInTheReport) {
     EXPECT_EQ(finding.at("fix").at("edits").at(0).at("length"), 4);
     EXPECT_EQ(finding.at("fix").at("edits").at(0).at("text"), "TRUE");
 }
+
+TEST(Fixes, ThatChangeOtherAnswersAreMadeOnRequestOnly) {
+    // "AB" with "CD" and "ABC" with "D" are the same property, so that of ABC hides the one of its class.
+    const std::string text =
+        "DEVICE_FAMILY = ST1\nST1_DEVICES = AB,ABC\nST1_PROPERTY = D,2\nAB_PROPERTY = Cd,1\n";
+    const DatabaseDirectory directory({{"base.acd", "DEVICE_SUPPORTED       = base,spi\n"
+                                                    "PROGRAM_OPTION_PACKAGE = base,spi\n"},
+                                       {"spi.acd", text}});
+    const ProcessResult outcome = lint({"--fix", directory.path()});
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_THAT(outcome.error, HasSubstr("not fixed without --unsafe-fixes: "));
+    EXPECT_THAT(outcome.error, HasSubstr("its fix would change answers about ABC, too"));
+    EXPECT_EQ(read(directory.path("spi.acd")), text);
+    EXPECT_EQ(lint({"--unsafe-fixes", directory.path()}).status, 0);
+    EXPECT_THAT(read(directory.path("spi.acd")), HasSubstr("AB_PROPERTY = CD,1"));
+}

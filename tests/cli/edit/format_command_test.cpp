@@ -116,3 +116,33 @@ TEST(FormatCommand, AnswersInJson) {
     EXPECT_EQ(answer.at("files").size(), 2U);
     EXPECT_EQ(answer.at("written"), false);
 }
+
+TEST(FormatCommand, SortsWhatHasNoOrder) {
+    const DatabaseDirectory directory(DatabaseDirectory::Files{
+        {"base.acd", "DEVICE_SUPPORTED = kestrel,base\nPROGRAM_OPTION_PACKAGE = kestrel,base\n"
+                     "BS = outs,USB2,PARALLEL:fams,kestrel\nIDCODE = KS100,0x00000003:KS50,0x00000001\n"},
+        {"kestrel.acd",
+         "# kestrel\n\nOPERATION = VERIFY,Bscan,USB2,PARALLEL:PROGRAM,Bscan,USB2\n"
+         "PROPERTIES = VERIFY,1,BS:PROGRAM,1,BS\n# the large one\n[KS100]\n# below\n\n[KS50]\n"}});
+    const ProcessResult outcome = format({"--sort", directory.path()});
+    EXPECT_EQ(outcome.status, 0) << outcome.error;
+    EXPECT_EQ(read(directory.path("base.acd")),
+              "DEVICE_SUPPORTED       = base,kestrel\nPROGRAM_OPTION_PACKAGE = base,kestrel\n"
+              "BS                     = outs,PARALLEL,USB2: \\\n"
+              "                         fams,kestrel\n"
+              "IDCODE                 = KS50,0x00000001:KS100,0x00000003\n");
+    EXPECT_EQ(
+        read(directory.path("kestrel.acd")),
+        "# kestrel\n\nOPERATION  = PROGRAM,Bscan,USB2: \\\n             VERIFY,Bscan,PARALLEL,USB2\n"
+        "PROPERTIES = VERIFY,1,BS: \\\n             PROGRAM,1,BS\n\n[KS50]\n\n# the large one\n[KS100]\n"
+        "# below\n");
+    EXPECT_EQ(format({"--sort", directory.path()}).output, "");
+}
+
+TEST(FormatCommand, SortsNothingWithoutAnswersToCompare) {
+    const DatabaseDirectory layer(DatabaseDirectory::Files{{"kestrel.acd", "[KS50]\n\n[KS10]\n"}});
+    const ProcessResult outcome = format({"--sort", layer.path()});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_THAT(outcome.error, HasSubstr("name the directories of the layers below"));
+    EXPECT_EQ(read(layer.path("kestrel.acd")), "[KS50]\n\n[KS10]\n");
+}
