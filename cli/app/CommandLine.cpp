@@ -57,7 +57,7 @@ CommandLine::CommandLine() {
                                 &command::OPERATION_OPTIONS, &command::PROPERTY, &command::MULTIBOOT,
                                 &command::WHY, &command::WHICH})},
         {"Databases", declared({&command::LINT, &command::FORMAT, &command::DIFF, &command::INDEX})},
-        {"Programs", declared({&command::BATCH, &command::DUMP})},
+        {"Programs", declared({&command::BATCH, &command::LSP, &command::DUMP})},
         {"Help", {declaredHelp()}},
     };
 }
