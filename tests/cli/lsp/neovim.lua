@@ -1,5 +1,5 @@
--- Neovim as a client: nvim --headless -u NONE -l is newer than the oldest Neovim that has a client, so this is its
--- configuration: TARVIK=... DATABASE=... nvim --headless -u neovim.lua
+-- Neovim as a client. This is its configuration, since Neovim 0.7 of Debian 12 has no option to run a script:
+--   TARVIK=... EDITOR_FILES=... DATABASE=... nvim --headless -u neovim.lua
 vim.opt.runtimepath:prepend(vim.env.EDITOR_FILES)
 vim.cmd('filetype plugin on')
 vim.cmd('syntax on')

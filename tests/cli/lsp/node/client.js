@@ -61,7 +61,7 @@ async function main() {
   await until(() => published.has(uriOf(name)));
   assert.deepStrictEqual(published.get(uriOf(name)), []);
 
-  await change(name, 2, text.replace("OPERATION", "OPERATOIN"));
+  await change(name, 2, text.replace(/^OPERATION/m, "OPERATOIN"));
   await until(() => published.get(uriOf(name)).some((each) => each.code === "K102"));
   const finding = published.get(uriOf(name)).find((each) => each.code === "K102");
   const actions = await connection.sendRequest(lsp.CodeActionRequest.type, {
