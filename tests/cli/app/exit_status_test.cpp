@@ -113,6 +113,7 @@ std::vector<Endings> endings(const std::string& database) {
          {{}, {"/nowhere"}, {"--show", "/nowhere"}, {"--show", database, database}}},
         {"report", {{"--file", "/dev/null"}}, {}, {{}, {"--file", "/nowhere/page.html"}}},
         {"batch", {{}}, {}, {{"zz"}}},
+        {"lsp", {}, {{}, {"--stdio"}}, {{"zz"}}},
         {"help", {{}, {"check"}}, {}, {{"zz"}}},
     };
 }
@@ -149,9 +150,9 @@ TEST(ExitStatus, OfEveryCommandWithoutItsDatabase) {
     const SmallDatabase database;
     const DatabaseDirectory empty;
     for (const Endings& each : endings(database.path())) {
-        // Two are about the tool itself, and two name their databases.
+        // Two are about the tool itself, and the others name their databases.
         if (each.command == "vocabulary" || each.command == "help" || each.command == "diff" ||
-            each.command == "format" || each.command == "index") {
+            each.command == "format" || each.command == "index" || each.command == "lsp") {
             continue;
         }
         Words words = each.command == "lint" ? Words{} : each.yes.front();
@@ -173,8 +174,10 @@ TEST(ExitStatus, IsTheSameWithJson) {
                 words.insert(words.begin(), {"--json", each.command});
                 const ProcessResult outcome = database.run(words);
                 EXPECT_EQ(outcome.status, status) << joined(words) << '\n' << outcome;
-                // Help is text, and batch writes one object for each request.
-                if ((each.command != "batch" && each.command != "help") || status == 2) {
+                // Help is text, batch writes one object for each request, and lsp speaks its own protocol.
+                const bool hasOwnForm =
+                    each.command == "batch" || each.command == "help" || each.command == "lsp";
+                if (!hasOwnForm || status == 2) {
                     EXPECT_THAT(outcome.output, StartsWith("{\"version\":1,")) << joined(words);
                 }
             }
