@@ -256,7 +256,7 @@ private:
 
     void addPackages() {
         std::set<std::string_view> packages;
-        for (const auto& [name, device] : m_model.devices()) {
+        for (const lint::Device& device : m_model.devices()) {
             for (const lint::Token& package : m_model.packages(device)) {
                 packages.insert(package.text);
             }
@@ -277,8 +277,8 @@ private:
             return;
         }
         const std::string mode = lint::upperCase(prefix.substr(0, first + 1));
-        for (const auto& [name, device] : m_model.devices()) {
-            const std::string start = mode + std::string(name) + '_';
+        for (const lint::Device& device : m_model.devices()) {
+            const std::string start = mode + std::string(device.section->name.text) + '_';
             if (prefix.find('_', first + 1) == prefix.npos) {
                 m_items.add(start, CLASS, "device");
             } else if (lowerCase(prefix).starts_with(lowerCase(start))) {

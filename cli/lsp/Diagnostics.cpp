@@ -7,6 +7,7 @@
 #include <fmt/format.h>
 
 #include <algorithm>
+#include <utility>
 
 namespace lsp {
 
@@ -16,13 +17,11 @@ namespace {
 constexpr int ERROR = 1;
 constexpr int WARNING = 2;
 
-Range rangeOf(const View& view, const lint::Finding& finding) {
+Json diagnosticOf(UnitCounter& counter, const lint::Finding& finding) {
     const lint::SourceLocation& location = finding.location;
-    return lsp::rangeOf(*location.file, location.line, location.column, finding.length, view.encoding);
-}
-
-Json diagnosticOf(const View& view, const lint::Finding& finding) {
-    return {{"range", asJson(rangeOf(view, finding))},
+    const Position start = counter.positionOf(*location.file, location.line, location.column);
+    const Position end = counter.positionOf(*location.file, location.line, location.column + finding.length);
+    return {{"range", asJson(Range{start, end})},
             {"severity", finding.rule->severity == lint::Severity::ERROR ? ERROR : WARNING},
             {"code", finding.rule->code},
             {"source", "tarvik"},
@@ -43,6 +42,7 @@ std::string titleOf(const lint::TextEdit& edit) {
 }
 
 Json actionOf(const View& view, const lint::Finding& finding, std::string_view lineEnd) {
+    UnitCounter counter(view.encoding);
     Json edits = Json::array();
     for (const lint::TextEdit& edit : finding.fix->edits) {
         std::string text;
@@ -55,7 +55,7 @@ Json actionOf(const View& view, const lint::Finding& finding, std::string_view l
     }
     return {{"title", fmt::format("{}: {}", finding.rule->code, titleOf(finding.fix->edits.front()))},
             {"kind", "quickfix"},
-            {"diagnostics", Json::array({diagnosticOf(view, finding)})},
+            {"diagnostics", Json::array({diagnosticOf(counter, finding)})},
             {"isPreferred", finding.fix->isSafe},
             {"edit", {{"changes", {{view.uri(view.file.path()), edits}}}}}};
 }
@@ -72,22 +72,24 @@ std::string_view lineEndOf(const View& view) {
 
 Json diagnosticsOf(const View& view) {
     Json all = Json::array();
-    for (const lint::Finding& finding : view.workspace.findings()) {
-        if (finding.location.file == &view.file) {
-            all.push_back(diagnosticOf(view, finding));
-        }
+    UnitCounter counter(view.encoding);
+    for (const lint::Finding& finding : view.workspace.findingsIn(view.file)) {
+        all.push_back(diagnosticOf(counter, finding));
     }
     return all;
 }
 
 Json codeActionsOf(const View& view, const Range& range) {
     Json all = Json::array();
-    for (const lint::Finding& finding : view.workspace.findings()) {
-        if (!finding.fix || finding.location.file != &view.file) {
-            continue;
-        }
-        const Range found = rangeOf(view, finding);
-        if (found.start <= range.end && range.start <= found.end) {
+    const Place first = view.placeOf(range.start);
+    const Place last = view.placeOf(range.end);
+    const std::pair start(first.line, first.column);
+    const std::pair end(last.line, last.column);
+    for (const lint::Finding& finding : view.workspace.findingsIn(view.file)) {
+        const lint::SourceLocation& location = finding.location;
+        const bool isBefore = std::pair(location.line, location.column + finding.length) < start;
+        const bool isAfter = std::pair<unsigned, std::size_t>(location.line, location.column) > end;
+        if (finding.fix && !isBefore && !isAfter) {
             all.push_back(actionOf(view, finding, lineEndOf(view)));
         }
     }

@@ -134,16 +134,9 @@ void Server::publish() {
 void Server::publish(Workspace& workspace, const std::map<std::string, Json>& former) {
     std::map<std::string, Json> all;
     if (workspace.fault().empty()) {
-        const lint::Model& model = workspace.model();
-        std::set<const AcdLines*> found;
-        for (const lint::Finding& finding : workspace.findings()) {
-            found.insert(finding.location.file);
-        }
-        for (const auto& family : model.families()) {
+        for (const auto& family : workspace.model().families()) {
             for (const AcdLines& file : family->files) {
-                all[file.path()] = found.contains(&file)
-                                       ? diagnosticsOf({workspace, *family, file, m_documents, m_encoding})
-                                       : Json::array();
+                all[file.path()] = diagnosticsOf({workspace, *family, file, m_documents, m_encoding});
             }
         }
     }

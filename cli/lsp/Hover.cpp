@@ -26,7 +26,8 @@ std::string code(std::string_view text) {
 
 class Hover {
 public:
-    Hover(const View& view, const Position& position) : m_view(view), m_position(position) {}
+    Hover(const View& view, const Position& position)
+        : m_view(view), m_position(position), m_place(view.placeOf(position)) {}
 
     [[nodiscard]] Json show() {
         addFindings();
@@ -45,9 +46,7 @@ public:
 
 private:
     [[nodiscard]] bool isAt(const lint::Token& token) const {
-        const Range range = m_view.rangeOf(token);
-        return token.location.line == m_position.line + 1 && range.start <= m_position &&
-               m_position <= range.end;
+        return m_place.touches(token.location, token.text.size());
     }
 
     /// Where a text is: the file, and its layer if there are several.
@@ -59,12 +58,8 @@ private:
     }
 
     void addFindings() {
-        for (const lint::Finding& finding : m_view.workspace.findings()) {
-            lint::Token token{{}, finding.location};
-            token.text = finding.location.file->source(finding.location.line);
-            token.text = token.text.substr(
-                std::min<std::size_t>(finding.location.column - 1, token.text.size()), finding.length);
-            if (finding.location.file == &m_view.file && isAt(token)) {
+        for (const lint::Finding& finding : m_view.workspace.findingsIn(m_view.file)) {
+            if (m_place.touches(finding.location, finding.length)) {
                 const lint::Rule& rule = *finding.rule;
                 m_paragraphs.push_back(fmt::format("**{}** ({}, `{}`): {}\n\n{}", rule.code,
                                                    nameOf(rule.severity), rule.slug, finding.text,
@@ -80,8 +75,7 @@ private:
                 section = sectionOf(line.name);
                 return;
             }
-            if (m_position.line + 1 < line.firstLine || m_position.line + 1 > line.lastLine ||
-                section == nullptr) {
+            if (m_place.line < line.firstLine || m_place.line > line.lastLine || section == nullptr) {
                 return;
             }
             if (isAt(lsp::nameOf(m_view.file, line))) {
@@ -223,6 +217,7 @@ private:
 
     const View& m_view;
     Position m_position;
+    Place m_place;
     std::vector<std::string> m_paragraphs;
     std::optional<Range> m_range;
 };

@@ -179,13 +179,10 @@ void forEachName(const lint::Model& model, const AcdLines& file, std::string_vie
 
 std::optional<FoundName> nameAt(const View& view, const Position& position) {
     std::optional<FoundName> found;
+    const Place place = view.placeOf(position);
     forEachName(view.workspace.model(), view.file, {}, [&](const NameUse& use) {
-        if (use.token.location.line != position.line + 1) {
-            return;
-        }
-        const Range range = view.rangeOf(use.token);
-        if (range.start <= position && position <= range.end) {
-            found = {{use.kind, std::string(use.token.text)}, range};
+        if (place.touches(use.token.location, use.token.text.size())) {
+            found = {{use.kind, std::string(use.token.text)}, view.rangeOf(use.token)};
         }
     });
     return found;

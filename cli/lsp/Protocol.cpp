@@ -70,6 +70,19 @@ Position positionOf(const AcdLines& file, unsigned line, std::size_t column, Enc
     return {line - 1U, unitsOf(file.source(line).substr(0, column - 1), encoding)};
 }
 
+Position UnitCounter::positionOf(const AcdLines& file, unsigned line, std::size_t column) {
+    const std::string_view source = file.source(line);
+    const std::size_t bytes = std::min(column - 1, source.size());
+    if (&file != m_file || line != m_line || bytes < m_bytes) {
+        m_file = &file;
+        m_line = line;
+        m_bytes = m_units = 0;
+    }
+    m_units += unitsOf(source.substr(m_bytes, bytes - m_bytes), m_encoding);
+    m_bytes = bytes;
+    return {line - 1U, m_units};
+}
+
 Range rangeOf(const AcdLines& file, unsigned line, std::size_t column, std::size_t length,
               Encoding encoding) {
     return {positionOf(file, line, column, encoding), positionOf(file, line, column + length, encoding)};

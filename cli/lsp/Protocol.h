@@ -64,6 +64,22 @@ struct Range {
 [[nodiscard]] Range rangeOf(const AcdLines& file, unsigned line, std::size_t column, std::size_t length,
                             Encoding encoding);
 
+/// Counts units of places that come in order: each line is walked over once, however many places it has.
+class UnitCounter {
+public:
+    explicit UnitCounter(Encoding encoding) : m_encoding(encoding) {}
+
+    /// As `positionOf`.
+    [[nodiscard]] Position positionOf(const AcdLines& file, unsigned line, std::size_t column);
+
+private:
+    Encoding m_encoding;
+    const AcdLines* m_file = nullptr;
+    unsigned m_line = 0;
+    std::size_t m_bytes = 0;
+    std::size_t m_units = 0;
+};
+
 /// The offset of a position in a text. Positions after the end of a line, or of the text, are at that end.
 [[nodiscard]] std::size_t offsetOf(std::string_view text, const Position& position, Encoding encoding);
 

@@ -17,6 +17,11 @@ Range View::rangeOf(const lint::Token& token) const {
                         encoding);
 }
 
+Place View::placeOf(const Position& position) const {
+    const auto line = static_cast<unsigned>(position.line) + 1U;
+    return {line, bytesOf(file.source(line), position.character, encoding) + 1};
+}
+
 Json View::locationOf(const lint::Token& token) const {
     return {{"uri", uri(token.location.file->path())}, {"range", asJson(rangeOf(token))}};
 }

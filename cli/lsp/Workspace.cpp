@@ -109,11 +109,16 @@ void Workspace::requireDatabase() {
                                        fmt::join(m_directories, "\", \""));
 }
 
-const std::vector<lint::Finding>& Workspace::findings() {
+const std::vector<lint::Finding>& Workspace::findingsIn(const AcdLines& file) {
     if (!m_findings) {
-        m_findings = m_checker.check(*m_model, {});
+        m_findings.emplace();
+        for (lint::Finding& finding : m_checker.check(*m_model, {})) {
+            (*m_findings)[finding.location.file].push_back(std::move(finding));
+        }
     }
-    return *m_findings;
+    static const std::vector<lint::Finding> none;
+    const auto found = m_findings->find(&file);
+    return found == m_findings->end() ? none : found->second;
 }
 
 const lint::FamilyData* Workspace::family(std::string_view path) const {

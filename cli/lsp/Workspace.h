@@ -52,8 +52,8 @@ public:
 
     [[nodiscard]] const lint::Model& model() const noexcept { return *m_model; }
 
-    /// What lint finds in the model.
-    [[nodiscard]] const std::vector<lint::Finding>& findings();
+    /// What lint finds in a file of the model.
+    [[nodiscard]] const std::vector<lint::Finding>& findingsIn(const AcdLines& file);
 
     /// A file of the database; null for any other path.
     [[nodiscard]] const AcdLines* file(std::string_view path) const;
@@ -85,7 +85,7 @@ private:
     std::unique_ptr<const lint::Model> m_model = std::make_unique<const lint::Model>(lint::Families());
     std::string m_fault;
     lint::Checker m_checker;
-    std::optional<std::vector<lint::Finding>> m_findings;
+    std::optional<std::map<const AcdLines*, std::vector<lint::Finding>>> m_findings; ///< by file
 };
 
 } // namespace lsp
