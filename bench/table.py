@@ -76,6 +76,9 @@ def figures(results):
             row = results[f"call, {kind}", size]
             yield f"{kind} through C: ns above 1.3 times C++", size, row["C"] - 1.3 * row["C++"], 20
         yield "operations through Python, us", size, results["call, operations", size]["Python"] / 1000, 3
+        if size in ("M", "L"):
+            keystroke = results["keystroke, 99th percentile", size]["lsp"]
+            yield "findings after a keystroke, 99th percentile, ms", size, keystroke, 50 if size == "M" else 300
         batch = results["batch", size]["requests a second"]
         yield "batch: 200,000 requests a second, part of what it does", size, 200_000 / batch, 1
         for command in ("which, property", "diff", "report"):

@@ -60,6 +60,7 @@ if(TARGET tarvik)
   install(TARGETS tarvik RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT tool)
   install(FILES docs/tarvik.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1 COMPONENT tool)
   install(DIRECTORY cli/schema DESTINATION ${CMAKE_INSTALL_DATADIR}/tarvik COMPONENT tool)
+  install(DIRECTORY editors DESTINATION ${CMAKE_INSTALL_DATADIR}/tarvik COMPONENT tool)
   # Where each shell looks for completions by itself.
   install(FILES cli/app/completion/tarvik.bash RENAME tarvik
     DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions COMPONENT tool)

@@ -58,7 +58,7 @@ CommandLine::CommandLine() {
                                 &command::WHY, &command::WHICH})},
         {"Databases", declared({&command::LINT, &command::FORMAT, &command::DIFF, &command::NEW,
                                 &command::RENAME, &command::REMOVE, &command::INDEX})},
-        {"Programs", declared({&command::BATCH, &command::DUMP})},
+        {"Programs", declared({&command::BATCH, &command::LSP, &command::DUMP})},
         {"Help", {declaredHelp()}},
     };
 }

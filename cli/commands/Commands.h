@@ -16,6 +16,7 @@ extern const Command FORMAT;
 extern const Command IDENTIFY;
 extern const Command INDEX;
 extern const Command LINT;
+extern const Command LSP;
 extern const Command MULTIBOOT;
 extern const Command NEW;
 extern const Command OPERATION_OPTIONS;

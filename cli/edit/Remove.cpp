@@ -178,9 +178,9 @@ private:
 
 std::set<std::string> namesRemovedWith(const lint::Model& model, const KnownName& known) {
     std::set<std::string> names{known.name};
-    for (const auto& [name, device] : model.devices()) {
+    for (const lint::Device& device : model.devices()) {
         if (known.isFamily && device.family->name == known.name) {
-            names.emplace(name);
+            names.emplace(device.section->name.text);
         }
     }
     for (const lint::FlashList& family : model.flashFamilies()) {

@@ -340,6 +340,12 @@ std::vector<const AcdLines*> Model::files() const {
 }
 
 void Model::findDevices() {
+    std::size_t count = 0;
+    for (const auto& family : m_families) {
+        count += family->devices.size();
+    }
+    m_devices.reserve(count); // so that they stay where they are
+    m_lowerDevices.reserve(count);
     for (const auto& family : m_families) {
         if (family->kind != schema::File::FAMILY) {
             continue;
@@ -348,8 +354,7 @@ void Model::findDevices() {
             // Of several families the first one has the device.
             const auto [known, isNew] = m_lowerDevices.try_emplace(lowerCase(section.name.text));
             if (isNew) {
-                known->second =
-                    &m_devices.emplace(section.name.text, Device{family.get(), &section}).first->second;
+                known->second = &m_devices.emplace_back(Device{family.get(), &section});
                 m_deviceNames.emplace_back(section.name.text);
             }
         }
@@ -373,8 +378,8 @@ const Section& Model::spiKeys() const {
 }
 
 const Device* Model::device(std::string_view name) const {
-    const auto found = m_devices.find(name);
-    return found == m_devices.end() ? nullptr : &found->second;
+    const Device* const found = deviceInAnyCase(std::string(name));
+    return found == nullptr || found->section->name.text != name ? nullptr : found;
 }
 
 bool Model::isFamily(std::string_view name) const { return m_sortedFamilyNames.contains(name); }

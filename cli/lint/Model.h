@@ -11,6 +11,7 @@
 #include <string>
 #include <string_view>
 #include <unordered_map>
+#include <unordered_set>
 #include <utility>
 #include <vector>
 
@@ -205,8 +206,8 @@ public:
     [[nodiscard]] const Section& baseKeys() const;
     [[nodiscard]] const Section& spiKeys() const;
 
-    /// The devices of the part families by name; of several with one name the one that is found.
-    [[nodiscard]] const std::map<std::string_view, Device>& devices() const noexcept { return m_devices; }
+    /// The devices of the part families in the order of the files; of several with one name the one that is found.
+    [[nodiscard]] const std::vector<Device>& devices() const noexcept { return m_devices; }
     [[nodiscard]] const Device* device(std::string_view name) const;
     [[nodiscard]] bool isFamily(std::string_view name) const;
 
@@ -239,7 +240,7 @@ private:
     std::vector<std::string> m_unusedIndexes;
     const FamilyData* m_base = nullptr;
     const FamilyData* m_spi = nullptr;
-    std::map<std::string_view, Device> m_devices;
+    std::vector<Device> m_devices;
     std::set<std::string_view> m_supported;
     std::set<std::string_view> m_optionPackages;
     std::vector<FlashList> m_flashFamilies;
@@ -247,9 +248,9 @@ private:
     std::vector<std::string> m_deviceNames;
     std::vector<std::string> m_flashNames;
     std::set<std::string_view> m_sortedFamilyNames;
-    std::set<std::string> m_lowerFamilies;
+    std::unordered_set<std::string> m_lowerFamilies;
     std::unordered_map<std::string, const Device*> m_lowerDevices;
-    std::set<std::string> m_lowerFlashes;
+    std::unordered_set<std::string> m_lowerFlashes;
 };
 
 } // namespace lint

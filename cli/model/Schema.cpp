@@ -81,25 +81,154 @@ bool hasNamedRecords(File file, std::string_view key) {
            (file == File::SPI && key.ends_with(PROPERTY_SUFFIX));
 }
 
+namespace {
+
+/// What the values of a property hold.
+Content contentOfProperty(std::string_view name) {
+    if (contains(vocabulary::operations(), name)) {
+        return Content::MODE_KEY;
+    }
+    if (name == PACKAGES || name == PACKAGE) {
+        return Content::PACKAGE_NAME;
+    }
+    return name.starts_with(OPTIONS_PREFIX) ? Content::OPTION_NAME : Content::TEXT;
+}
+
+Content contentOfTable(const Table& table, std::size_t field) {
+    if (field >= table.firstOutput) {
+        return Content::TABLE_OUTPUT;
+    }
+    if (field == 1) {
+        return Content::TABLE_MODE;
+    }
+    return table.hasOptions ? Content::OPTION_NAME : Content::OPERATION_NAME;
+}
+
+Content contentOfList(std::string_view key) {
+    if (key == DEVICE_SUPPORTED) {
+        return Content::OWNER;
+    }
+    if (key == PROGRAM_OPTION_PACKAGE) {
+        return Content::OPTION_OWNER;
+    }
+    if (key == NOT_SUPPORTED_PART_IN_MODE) {
+        return Content::PART;
+    }
+    if (key == DEVICE_FAMILY) {
+        return Content::FLASH_FAMILY;
+    }
+    return key.ends_with(DEVICES_SUFFIX) ? Content::FLASH : Content::FLASH_OR_DEVICE;
+}
+
+} // namespace
+
+Content contentOf(File file, std::string_view key, const Field& field) {
+    const Shape shape = shapeOf(file, key);
+    if (shape == Shape::NONE) {
+        return Content::NONE;
+    }
+    if (shape == Shape::LIST) {
+        return contentOfList(key);
+    }
+    for (const Table& table : TABLES) {
+        if (key == table.key) {
+            return contentOfTable(table, field.field);
+        }
+    }
+    if (file == File::BASE && key == IDCODE) {
+        return field.field == 0   ? Content::DEVICE
+               : field.field == 1 ? Content::IDCODE_PATTERN
+                                  : Content::NONE;
+    }
+    if (!hasNamedRecords(file, key)) { // a mode
+        const Content listed = field.item == 0 ? Content::MODE_OUTPUT : Content::FAMILY;
+        return field.item > 1 ? Content::NONE : field.field == 0 ? Content::TEXT : listed;
+    }
+    if (field.field == 0) {
+        return Content::PROPERTY_NAME;
+    }
+    return key == PROPERTIES && field.field == 1 ? Content::COUNT : contentOfProperty(field.name);
+}
+
+std::string_view formOf(File file, std::string_view key) {
+    if (shapeOf(file, key) == Shape::NONE) {
+        return {};
+    }
+    switch (contentOf(file, key, {})) {
+    case Content::OPERATION_NAME:
+        return key == OPERATION ? "operation,mode,output,...:..." : "operation,output,...:...";
+    case Content::OPTION_NAME:
+        return "option,mode,output,...:...";
+    case Content::PROPERTY_NAME:
+        return key == PROPERTIES ? "name,count,value,...:..." : "name,value:...";
+    case Content::DEVICE:
+        return "device,code:...";
+    case Content::TEXT:
+        return "label,output,...:label,family,...";
+    case Content::PART:
+        return "modekey_device_package,...";
+    case Content::FLASH_FAMILY:
+        return "family,...";
+    case Content::FLASH:
+    case Content::FLASH_OR_DEVICE:
+        return "device,...";
+    default:
+        return "name,...";
+    }
+}
+
+const std::vector<std::string>& wordsOf(Content content) {
+    static const std::vector<std::string> none;
+    switch (content) {
+    case Content::OPERATION_NAME:
+        return vocabulary::operations();
+    case Content::OPTION_NAME:
+        return tableOptions();
+    case Content::TABLE_MODE:
+        return tableModes();
+    case Content::TABLE_OUTPUT:
+        return tableOutputs();
+    case Content::MODE_OUTPUT:
+        return modeOutputs();
+    case Content::MODE_KEY:
+        return vocabulary::modes();
+    case Content::PROPERTY_NAME:
+        return propertyNames();
+    default:
+        return none;
+    }
+}
+
+const std::vector<std::string>& propertyNames() {
+    static const std::vector<std::string> all = [] {
+        std::vector<std::string> names{PACKAGES};
+        for (const std::string& operation : vocabulary::operations()) {
+            names.push_back(operation);
+            names.push_back(std::string(OPTIONS_PREFIX).append(operation));
+        }
+        return names;
+    }();
+    return all;
+}
+
 NamePlaces namePlaces(File file, std::string_view key) {
-    if (file == File::BASE) {
-        if (key == DEVICE_SUPPORTED) {
-            return NamePlaces::ITEMS;
-        }
-        if (key == PROGRAM_OPTION_PACKAGE) {
-            return NamePlaces::JOINED_ITEMS;
-        }
-        if (key == NOT_SUPPORTED_PART_IN_MODE) {
-            return NamePlaces::PART_ITEMS;
-        }
-        return key == IDCODE                        ? NamePlaces::FIRST_FIELDS
-               : contains(vocabulary::modes(), key) ? NamePlaces::SECOND_RECORD
-                                                    : NamePlaces::NONE;
+    switch (contentOf(file, key, {})) {
+    case Content::OWNER:
+    case Content::FLASH_FAMILY:
+    case Content::FLASH:
+        return NamePlaces::ITEMS;
+    case Content::FLASH_OR_DEVICE:
+        return NamePlaces::ITEMS_IN_ANY_CASE;
+    case Content::OPTION_OWNER:
+        return NamePlaces::JOINED_ITEMS;
+    case Content::PART:
+        return NamePlaces::PART_ITEMS;
+    case Content::DEVICE:
+        return NamePlaces::FIRST_FIELDS;
+    default:
+        return contentOf(file, key, {1, 1, {}}) == Content::FAMILY ? NamePlaces::SECOND_RECORD
+                                                                   : NamePlaces::NONE;
     }
-    if (shapeOf(file, key) != Shape::LIST) {
-        return NamePlaces::NONE;
-    }
-    return contains(multiboot::keys(), key) ? NamePlaces::ITEMS_IN_ANY_CASE : NamePlaces::ITEMS;
 }
 
 std::string_view nameOfPart(std::string_view item) {

@@ -103,6 +103,49 @@ inline constexpr std::array<const char*, 5> FAMILY_KEYS{OPERATION, BSDL_OPERATIO
 /// Do the records of a key begin with a name of their own, so that a record replaces one of the same name?
 [[nodiscard]] bool hasNamedRecords(File file, std::string_view key);
 
+/// What a field of a value holds.
+enum class Content {
+    NONE, ///< nothing that is read
+    TEXT, ///< any text
+    OPERATION_NAME,
+    OPTION_NAME,
+    TABLE_MODE,   ///< the word of a mode in records
+    TABLE_OUTPUT, ///< the word of an output in records
+    MODE_OUTPUT,  ///< the word of an output in a mode key
+    MODE_KEY,
+    PROPERTY_NAME,
+    COUNT,
+    PACKAGE_NAME,
+    IDCODE_PATTERN,
+    FAMILY,
+    OWNER,        ///< a family or a device
+    OPTION_OWNER, ///< a family, a device, or a device and a package, joined
+    DEVICE,
+    PART, ///< a mode key, a device and a package, joined by "_"
+    FLASH_FAMILY,
+    FLASH,
+    FLASH_OR_DEVICE,
+};
+
+/// Which field of a value.
+struct Field {
+    std::size_t item = 0;  ///< counted from 0
+    std::size_t field = 0; ///< of the item, likewise
+    std::string_view name; ///< the first field of the item
+};
+
+/// What a field holds.
+[[nodiscard]] Content contentOf(File file, std::string_view key, const Field& field);
+
+/// How the value of a key is written: "operation,mode,output,...:..."; empty if the key is not read.
+[[nodiscard]] std::string_view formOf(File file, std::string_view key);
+
+/// The words that a field can hold, if they are fixed; none otherwise.
+[[nodiscard]] const std::vector<std::string>& wordsOf(Content content);
+
+/// The properties that have a meaning for the manager.
+[[nodiscard]] const std::vector<std::string>& propertyNames();
+
 /// Which texts of a value are names of families, devices or flashes.
 enum class NamePlaces {
     NONE,

@@ -41,6 +41,9 @@ public:
     /// @throw CommandError (FAULT) as `openDatabase`
     [[nodiscard]] ConstraintsManager& manager();
 
+    /// The databases that the command line names.
+    [[nodiscard]] const std::vector<std::string>& databases() const noexcept { return m_settings.databases; }
+
     [[nodiscard]] Messages& messages() noexcept { return m_messages; }
     [[nodiscard]] Output& output() noexcept { return m_output; }
 

@@ -1,5 +1,6 @@
 #include <AcdLines.h>
 
+#include "database/FileLines.h"
 #include "database/LineReader.h"
 #include "database/Store.h"
 
@@ -70,6 +71,14 @@ constexpr std::array KINDS{AcdLines::Kind::HEADER, AcdLines::Kind::ASSIGNMENT, A
 
 } // namespace
 
+AcdLines AcdFileLines::make(const acd::Family& family, const acd::SourceFile& file, std::string_view text,
+                            std::string readError) {
+    AcdLines lines(text, file.path, family.name);
+    lines.m_readError = std::move(readError);
+    lines.m_caseCollisions = file.caseCollisions;
+    return lines;
+}
+
 std::vector<AcdLines> AcdLines::ofDatabase() {
     acd::Store& store = acd::Store::instance();
     std::vector<AcdLines> all;
@@ -77,9 +86,7 @@ std::vector<AcdLines> AcdLines::ofDatabase() {
         for (const acd::SourceFile& file : family->files) {
             std::string error;
             const acd::Text text = store.tryRead(file, error);
-            all.emplace_back(std::string_view(text.bytes.get(), text.size), file.path, family->name);
-            all.back().m_readError = std::move(error);
-            all.back().m_caseCollisions = file.caseCollisions;
+            all.push_back(AcdFileLines::make(*family, file, {text.bytes.get(), text.size}, std::move(error)));
         }
     }
     return all;

@@ -47,13 +47,20 @@ void tryRead(SourceFile& file, DeferredMessages& reports, Read read) {
 
 } // namespace
 
-Catalogue::Catalogue(const std::vector<std::string>& directories, DeferredMessages& reports)
+Catalogue::Catalogue(const std::vector<std::string>& directories, DeferredMessages& reports,
+                     const std::vector<std::string>& unsaved)
     : m_workingDirectory(workingDirectory()), m_directories(directories.rbegin(), directories.rend()) {
     for (std::uint32_t layer = 0; layer != m_directories.size(); ++layer) {
         const std::string& directory = m_directories[layer];
         try {
             std::vector<std::string> names = listDirectory(directory);
+            for (const std::string& path : unsaved) {
+                if (joinPath(directory, std::string(fileNameOf(path))) == path) {
+                    names.emplace_back(fileNameOf(path));
+                }
+            }
             std::sort(names.begin(), names.end());
+            names.erase(std::unique(names.begin(), names.end()), names.end());
             for (const std::string& name : names) {
                 addFile(name, {joinPath(directory, name), layer, nullptr});
             }

@@ -45,7 +45,9 @@ class Catalogue {
 public:
     /// Lists the directories, each once. One that can't be listed is reported; the others still serve.
     /// @param directories the top one first
-    Catalogue(const std::vector<std::string>& directories, DeferredMessages& reports);
+    /// @param unsaved paths of files in them that an editor holds, whether or not they exist yet
+    Catalogue(const std::vector<std::string>& directories, DeferredMessages& reports,
+              const std::vector<std::string>& unsaved = {});
 
     explicit Catalogue(std::shared_ptr<const MemoryFiles> files);
 

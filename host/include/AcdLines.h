@@ -108,6 +108,8 @@ public:
     [[nodiscard]] std::string_view source(unsigned line) const noexcept;
 
 private:
+    friend class AcdFileLines;
+
     void splitSource();
     void readLines();
     [[nodiscard]] unsigned addComments(unsigned first, unsigned last);

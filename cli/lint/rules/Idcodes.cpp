@@ -10,6 +10,7 @@
 #include <map>
 #include <optional>
 #include <set>
+#include <unordered_map>
 #include <utility>
 
 namespace lint {
@@ -174,16 +175,17 @@ void checkDevice(const Model& model, const Token& device, const std::vector<Toke
 }
 
 void check(const Model& model, const FamilyResults& /*any*/, Findings& findings) {
-    std::map<std::string_view, const AcdLines*> withCode;
+    const std::vector<Item>& items = model.baseKeys().items(schema::IDCODE);
+    std::unordered_map<std::string_view, const AcdLines*> withCode(items.size());
     // Only the last code of a device counts: a layer on top may give its former code to another device.
-    std::map<std::string_view, const Token*> last;
+    std::unordered_map<std::string_view, const Token*> last(items.size());
     std::vector<Token> used;
-    for (const Item& item : model.baseKeys().items(schema::IDCODE)) {
+    for (const Item& item : items) {
         last.insert_or_assign(item.fields.front().text, &item.fields.front());
         used.push_back(item.fields.front());
     }
     IdcodeIndex codes;
-    for (const Item& item : model.baseKeys().items(schema::IDCODE)) {
+    for (const Item& item : items) {
         const std::vector<Token>& fields = item.fields;
         const Token& device = fields.front();
         if (device.text.empty()) {
@@ -208,7 +210,8 @@ void check(const Model& model, const FamilyResults& /*any*/, Findings& findings)
                       codes, findings);
         }
     }
-    for (const auto& [name, device] : model.devices()) {
+    for (const Device& device : model.devices()) {
+        const std::string_view name = device.section->name.text;
         if (!withCode.contains(name)) {
             findings
                 .add(NO_CODE, device.section->name, "IDCODE of base.acd lacks the device {}", inQuotes(name))

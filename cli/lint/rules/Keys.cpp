@@ -189,7 +189,8 @@ void checkFamily(const FamilyData& family, const FamilyContext& /*any*/, FamilyR
 }
 
 void check(const Model& model, const FamilyResults& /*any*/, Findings& findings) {
-    for (const auto& [name, device] : model.devices()) {
+    for (const Device& device : model.devices()) {
+        const std::string_view name = device.section->name.text;
         if (model.supported().contains(name)) {
             continue; // its tables are its own
         }

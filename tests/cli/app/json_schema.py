@@ -16,7 +16,7 @@ from pathlib import Path
 
 import jsonschema
 
-NOT_IN_JSON = {"batch", "help"}
+NOT_IN_JSON = {"batch", "help", "lsp"}
 
 # Beside the examples of the help: what reaches every branch of an answer, refusals and mistakes too.
 QUESTIONS = """

@@ -80,7 +80,8 @@ TEST(LintModel, HasTheValuesThatTheReadersGive) {
                 compared += compare(family->name, key, value) ? 1U : 0U;
             }
         }
-        for (const auto& [name, device] : model.devices()) {
+        for (const lint::Device& device : model.devices()) {
+            const std::string_view name = device.section->name.text;
             for (const auto& [key, value] : device.section->values) {
                 if (!isHidden(model, name)) {
                     compared += compare(std::string(name), key, value) ? 1U : 0U;

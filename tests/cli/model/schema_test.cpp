@@ -44,3 +44,38 @@ TEST(Schema, ListsTheWordsThatADatabaseCanGive) {
     EXPECT_EQ(schema::modeOutputs().size(), 7U);
     EXPECT_EQ(schema::tableOptions().back(), "SECTOR_LOCKDOWN");
 }
+
+TEST(Schema, KnowsWhatEachFieldHolds) {
+    using schema::Content;
+    const auto content = [](File file, const char* key, std::size_t item, std::size_t field,
+                            std::string_view name = {}) {
+        return schema::contentOf(file, key, {item, field, name});
+    };
+    EXPECT_EQ(content(File::FAMILY, "OPERATION", 3, 1), Content::TABLE_MODE);
+    EXPECT_EQ(content(File::FAMILY, "BSDL_OPERATION", 0, 1), Content::TABLE_OUTPUT);
+    EXPECT_EQ(content(File::FAMILY, "PROGRAM_OPTION", 0, 0), Content::OPTION_NAME);
+    EXPECT_EQ(content(File::FAMILY, "PROPERTIES", 1, 1, "PACKAGES"), Content::COUNT);
+    EXPECT_EQ(content(File::FAMILY, "PROPERTIES", 1, 2, "PACKAGES"), Content::PACKAGE_NAME);
+    EXPECT_EQ(content(File::FAMILY, "PROPERTIES", 1, 2, "VERIFY"), Content::MODE_KEY);
+    EXPECT_EQ(content(File::FAMILY, "PROPERTY", 1, 1, "OP_VERIFY"), Content::OPTION_NAME);
+    EXPECT_EQ(content(File::FAMILY, "PROPERTY", 1, 1, "PINS"), Content::TEXT);
+    EXPECT_EQ(content(File::FAMILY, "IDCODE", 0, 0), Content::NONE);
+    EXPECT_EQ(content(File::BASE, "IDCODE", 9, 0), Content::DEVICE);
+    EXPECT_EQ(content(File::BASE, "IDCODE", 9, 2), Content::NONE);
+    EXPECT_EQ(content(File::BASE, "SM", 0, 0), Content::TEXT);
+    EXPECT_EQ(content(File::BASE, "SM", 0, 1), Content::MODE_OUTPUT);
+    EXPECT_EQ(content(File::BASE, "SM", 1, 1), Content::FAMILY);
+    EXPECT_EQ(content(File::BASE, "SM", 2, 1), Content::NONE);
+    EXPECT_EQ(content(File::SPI, "NV1_DEVICES", 0, 7), Content::FLASH);
+    EXPECT_EQ(content(File::SPI, "TYPE_MB_SPI_NONE_LEAD", 0, 0), Content::FLASH_OR_DEVICE);
+}
+
+TEST(Schema, KnowsTheFormOfEachKey) {
+    for (const File file : {File::BASE, File::SPI, File::FAMILY}) {
+        for (const std::string& key : schema::fixedKeys(file)) {
+            EXPECT_TRUE(schema::formOf(file, key).ends_with("...")) << key;
+        }
+    }
+    EXPECT_EQ(schema::formOf(File::BASE, "BSDL_OPERATION"), "operation,output,...:...");
+    EXPECT_EQ(schema::formOf(File::FAMILY, "BS"), "");
+}
