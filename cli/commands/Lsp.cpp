@@ -47,7 +47,7 @@ ExitCode run(Tool& tool) {
             directories.push_back(std::move(directory));
         }
     }
-    lsp::Server server(std::move(directories), [&tool](const Json& message) {
+    lsp::Server server(directories, [&tool](const Json& message) {
         const std::string content = oneLine(message);
         tool.output().write(fmt::format("Content-Length: {}\r\n\r\n{}", content.size(), content));
     });

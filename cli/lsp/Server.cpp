@@ -65,7 +65,7 @@ bool isId(const Json& json) { return json.is_string() || json.is_number_integer(
 
 } // namespace
 
-Server::Server(std::vector<std::string> directories, Send send)
+Server::Server(const std::vector<std::string>& directories, Send send)
     : m_directories(normalised(directories, {})), m_send(std::move(send)) {}
 
 const std::map<std::string, Server::Request, std::less<>>& Server::requests() {

@@ -22,7 +22,7 @@ public:
     using Send = std::function<void(const Json& message)>;
 
     /// @param directories the layers of the database, the uppermost first; none: each file's own directory
-    Server(std::vector<std::string> directories, Send send);
+    Server(const std::vector<std::string>& directories, Send send);
 
     /// Takes bytes from the editor. A request to cancel takes effect on what was received before it and is not answered.
     void receive(std::string_view bytes);

@@ -35,9 +35,9 @@ inline Json openingOf(const std::string& path, const std::string& text) {
 class Editor {
 public:
     explicit Editor(const DatabaseDirectory::Files& files, Json initialization = Json::object(),
-                    std::vector<std::string> layers = {})
+                    const std::vector<std::string>& layers = {})
         : m_directory(files),
-          m_server(std::move(layers), [this](const Json& message) { m_received.push_back(message); }) {
+          m_server(layers, [this](const Json& message) { m_received.push_back(message); }) {
         if (!initialization.is_null()) {
             static_cast<void>(ask("initialize", std::move(initialization)));
             notify("initialized");
