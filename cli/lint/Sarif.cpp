@@ -1,6 +1,8 @@
 // Prints findings in SARIF 2.1.0, the format that code review tools read.
 #include "lint/Report.h"
 
+#include "platform/Platform.h"
+
 #include <fmt/format.h>
 
 #include <algorithm>
@@ -12,8 +14,9 @@ namespace {
 /// A path as the path of a URI.
 std::string asUri(std::string_view path) {
     constexpr std::string_view PLAIN = "-._~/";
-    std::string uri = path.starts_with('/') ? "file://" : "";
-    for (const char byte : path) {
+    std::string uri = !acd::platform::isAbsolute(path) ? "" : path.starts_with('/') ? "file://" : "file:///";
+    for (const char given : path) {
+        const char byte = acd::platform::pathSeparators().find(given) != path.npos ? '/' : given;
         const bool isLetterOrDigit =
             (byte >= 'a' && byte <= 'z') || (byte >= 'A' && byte <= 'Z') || (byte >= '0' && byte <= '9');
         if (isLetterOrDigit || PLAIN.find(byte) != PLAIN.npos) {

@@ -2,6 +2,7 @@
 #include "lint/Findings.h"
 #include "lint/rules/RuleSets.h"
 
+#include "database/FileNames.h"
 #include "text/Suggest.h"
 
 #include <map>
@@ -186,7 +187,7 @@ void check(const Model& model, Findings& findings) {
         for (const std::string& other : file.caseCollisions()) {
             findings.add(SAME_FILE_NAME, startOf(file),
                          "nothing is read from {}: this file is called alike and comes first",
-                         inQuotes(other.substr(other.rfind('/') + 1)));
+                         inQuotes(acd::fileNameOf(other)));
         }
     }
     for (const FamilyData& family : model.families()) {
