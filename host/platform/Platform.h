@@ -114,14 +114,9 @@ void close(int descriptor) noexcept;
 } // namespace platform
 
 /// A path of the standard library from one of ours.
-[[nodiscard]] inline std::filesystem::path toPath(std::string_view path) {
-    return std::filesystem::path(std::u8string(path.begin(), path.end()));
-}
+[[nodiscard]] std::filesystem::path toPath(std::string_view path);
 
 /// The reverse. Names are separated by `/` on every system.
-[[nodiscard]] inline std::string fromPath(const std::filesystem::path& path) {
-    const std::u8string text = path.generic_u8string();
-    return {text.begin(), text.end()};
-}
+[[nodiscard]] std::string fromPath(const std::filesystem::path& path);
 
 } // namespace acd

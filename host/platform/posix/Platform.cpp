@@ -154,4 +154,8 @@ char listSeparator() noexcept { return ':'; }
 
 } // namespace platform
 
+std::filesystem::path toPath(std::string_view path) { return path; }
+
+std::string fromPath(const std::filesystem::path& path) { return path.string(); }
+
 } // namespace acd

@@ -244,4 +244,11 @@ char listSeparator() noexcept { return ';'; }
 
 } // namespace platform
 
+std::filesystem::path toPath(std::string_view path) { return std::u8string(path.begin(), path.end()); }
+
+std::string fromPath(const std::filesystem::path& path) {
+    const std::u8string text = path.generic_u8string();
+    return {text.begin(), text.end()};
+}
+
 } // namespace acd
