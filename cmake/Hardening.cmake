@@ -5,7 +5,7 @@ if(PROJECT_IS_TOP_LEVEL)
   check_pie_supported(LANGUAGES CXX)
 endif()
 
-if(NOT CMAKE_CXX_FLAGS MATCHES "-fsanitize")
+if(NOT WIN32 AND NOT CMAKE_CXX_FLAGS MATCHES "-fsanitize")
   set(optimised $<CONFIG:Release,RelWithDebInfo,MinSizeRel>)
   add_compile_options($<${optimised}:-fstack-protector-strong> $<${optimised}:-U_FORTIFY_SOURCE>
                       $<${optimised}:-D_FORTIFY_SOURCE=2>)

@@ -24,7 +24,8 @@ else()
   set(host_headers ${CMAKE_INSTALL_INCLUDEDIR}/tarvik/host)
   list(APPEND libraries TarvikHost TarvikC)
   set_target_properties(TarvikHost PROPERTIES EXPORT_NAME Host INSTALL_RPATH "$ORIGIN")
-  target_include_directories(TarvikHost PUBLIC $<INSTALL_INTERFACE:${host_headers}>)
+  target_include_directories(TarvikHost PUBLIC
+    $<INSTALL_INTERFACE:${host_headers}> $<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>)
   install(DIRECTORY host/include/ DESTINATION ${host_headers} COMPONENT development)
   install(FILES include/tarvik/tarvik.h DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/tarvik COMPONENT development)
   set_target_properties(TarvikC PROPERTIES EXPORT_NAME C INSTALL_RPATH "$ORIGIN")
@@ -35,6 +36,7 @@ else()
 endif()
 
 install(TARGETS ${libraries} EXPORT TarvikConstraintsManagerTargets
+  RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT runtime
   LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT runtime NAMELINK_COMPONENT development
   ARCHIVE DESTINATION ${CMAKE_INSTALL_LIBDIR} COMPONENT development)
 install(EXPORT TarvikConstraintsManagerTargets NAMESPACE Tarvik::

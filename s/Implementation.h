@@ -10,6 +10,7 @@
 #include "PermissionTable.h"
 #include "PropertyTable.h"
 
+#include <tarvik/Attributes.h>
 #include <tarvik/ConstraintsManager.h>
 
 #include <array>
@@ -20,7 +21,7 @@ class PM_DEVKEY;
 
 /// The members of the manager and the operations on them. The exported operations are described in
 /// `tarvik/ConstraintsManager.h`. Null texts arrive here as empty ones, except where the difference shows.
-class [[gnu::visibility("hidden")]] ConstraintsManager::Implementation {
+class TARVIK_HIDDEN ConstraintsManager::Implementation {
 public:
     using MODE_TYPE = TARVIKNS::MODE_TYPE;
     using OUTPUT_TYPE = TARVIKNS::OUTPUT_TYPE;
@@ -58,14 +59,14 @@ public:
     // SPI flash and multiboot.
     bool isSpiDevice(StringBase device) const;
     const char* getSpiDeviceStringProperty(const char* device, std::string_view property) const;
-    bool isMbBpiSpiSupport(const char* device, std::string_view typePrefix, std::string_view width, bool lead)
-        const;
+    bool isMbBpiSpiSupport(const char* device, std::string_view typePrefix, std::string_view width,
+                           bool lead) const;
 
     // Dumps.
-    void dumpOperationsTable(TarvikSmokeMgr * recorder) const;
-    void dumpBsdlOperationsTable(TarvikSmokeMgr * recorder) const;
-    void dumpProgramOptionsTable(TarvikSmokeMgr * recorder) const;
-    void dumpCachedDeviceFamilies(TarvikSmokeMgr * recorder) const;
+    void dumpOperationsTable(TarvikSmokeMgr* recorder) const;
+    void dumpBsdlOperationsTable(TarvikSmokeMgr* recorder) const;
+    void dumpProgramOptionsTable(TarvikSmokeMgr* recorder) const;
+    void dumpCachedDeviceFamilies(TarvikSmokeMgr* recorder) const;
     void dumpMbBpiSpi() const;
     StringBase supportedDeviceNameAt(int position) const;
     StringBase programOptionPackageNameAt(int position) const;
@@ -83,16 +84,16 @@ public:
     struct SpiClass;
     static const std::array<SpiClass, 6>& spiClasses();
     void loadSpiCatalogue();
-    void readSpiNames(PM_DEVKEY * accessor);
-    void readSpiProperties(PM_DEVKEY * accessor);
-    void readMultibootDeviceLists(PM_DEVKEY * accessor);
-    void readMultibootTypes(PM_DEVKEY * accessor);
+    void readSpiNames(PM_DEVKEY* accessor);
+    void readSpiProperties(PM_DEVKEY* accessor);
+    void readMultibootDeviceLists(PM_DEVKEY* accessor);
+    void readMultibootTypes(PM_DEVKEY* accessor);
     StringBase spiDeviceClass(const char* device) const;
 
     // The records that fill the permission tables.
-    void parseOperationEntries(PM_DEVKEY * accessor, unsigned familyIndex, const char* family);
-    void parseBsdlOperationEntries(PM_DEVKEY * accessor, unsigned familyIndex, const char* family);
-    void parseProgramOptionEntries(PM_DEVKEY * accessor, const char* family);
+    void parseOperationEntries(PM_DEVKEY* accessor, unsigned familyIndex, const char* family);
+    void parseBsdlOperationEntries(PM_DEVKEY* accessor, unsigned familyIndex, const char* family);
+    void parseProgramOptionEntries(PM_DEVKEY* accessor, const char* family);
     int programOptionTableIndex(std::string_view name);
 
     // Families, and loading on demand.
@@ -102,8 +103,8 @@ public:
     void loadDeviceData(std::string_view device, std::string_view package);
     StringBase loadDevice(const StringBase& device, std::string_view package);
     void loadFamily(const StringBase& family);
-    void loadFamilyTables(PM_DEVKEY * accessor, const char* family);
-    void loadProperties(PM_DEVKEY * accessor, const StringBase& owner);
+    void loadFamilyTables(PM_DEVKEY* accessor, const char* family);
+    void loadProperties(PM_DEVKEY* accessor, const StringBase& owner);
 
     // What the checks are made of.
     struct ModeTable;
@@ -123,7 +124,7 @@ public:
     void cacheOptionLookup(const StringBase& device, std::size_t block);
     StringBase operationOwner(const StringBase& device);
     bool isProgramOptionTableLoaded(std::string_view name) const;
-    std::string_view loadedOptionOwner(StringBase & name, std::string_view package);
+    std::string_view loadedOptionOwner(StringBase& name, std::string_view package);
     const PropertyValues* findLoaded(std::string_view owner, std::string_view property) const;
     const PropertyValues* findProperty(std::string_view device, std::string_view key);
 

@@ -3,6 +3,7 @@
 #include "StringViews.h"
 
 #include <StringBase.h>
+#include <tarvik/Attributes.h>
 
 #include <algorithm>
 #include <array>
@@ -35,7 +36,7 @@ void PropertyTable::assign(std::string_view owner, std::vector<ParsedProperty> p
         const std::size_t count = std::min(checksums.size(), parsed.size() - first);
         for (std::size_t place = 0; place != count; ++place) {
             checksums[place] = checksumOf(owner, view(parsed[first + place].name));
-            __builtin_prefetch(&m_buckets[bucketOf(checksums[place])]);
+            TARVIK_PREFETCH(&m_buckets[bucketOf(checksums[place])]);
         }
         for (std::size_t place = 0; place != count; ++place) {
             assign(checksums[place], owner, parsed[first + place]);

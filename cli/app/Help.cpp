@@ -2,6 +2,7 @@
 #include "app/Help.h"
 
 #include "model/Vocabulary.h"
+#include "term/Streams.h"
 #include "term/Table.h"
 
 #include <fmt/format.h>
@@ -9,7 +10,6 @@
 
 #include <algorithm>
 #include <sstream>
-#include <unistd.h>
 
 namespace {
 
@@ -133,7 +133,7 @@ std::string toolHelp(const CommandLine& line, std::size_t width) {
 } // namespace
 
 std::string helpText(const CommandLine& line, const DeclaredCommand* command) {
-    const Terminal terminal(STDOUT_FILENO, Terminal::Colours::NEVER);
+    const Terminal terminal(streams::OUTPUT, Terminal::Colours::NEVER);
     // Prose is read by people in a pipe, too.
     const std::size_t width = terminal.isTerminal() ? terminal.width() : LINE_WIDTH;
     return command == nullptr ? toolHelp(line, width) : commandHelp(*command, width);

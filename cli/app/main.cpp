@@ -3,13 +3,13 @@
 #include "app/ManualPage.h"
 #include "app/Parser.h"
 #include "app/completion/Completion.h"
+#include "term/Streams.h"
 
 #include <TarvikException.h>
 
 #include <fmt/format.h>
 
 #include <algorithm>
-#include <csignal>
 
 namespace {
 
@@ -72,11 +72,9 @@ ExitCode run(const std::vector<std::string>& words) {
 } // namespace
 
 int main(int argc, char** argv) {
-    // A reader that closes its end shows as a failing write, which ends the run quietly.
-    std::signal(SIGPIPE, SIG_IGN);
     ExitCode status = ExitCode::FAULT;
     try {
-        status = run({argv + std::min(argc, 1), argv + argc});
+        status = run(streams::prepare(argc, argv));
     } catch (const std::exception& error) {
         writeError(std::string("tarvik: ") + error.what());
     }

@@ -3,25 +3,14 @@
 
 #include "term/ExitCode.h"
 #include "term/Output.h"
+#include "term/Streams.h"
 
 #include <cerrno>
 #include <cstring>
-#include <poll.h>
-#include <unistd.h>
 
 namespace {
 
 constexpr std::size_t READ_SIZE = std::size_t{64} * 1024;
-
-bool isWaiting() {
-    pollfd input{STDIN_FILENO, POLLIN, 0};
-    return ::poll(&input, 1, 0) == 0;
-}
-
-void waitForInput() {
-    pollfd input{STDIN_FILENO, POLLIN, 0};
-    ::poll(&input, 1, -1);
-}
 
 } // namespace
 
@@ -58,7 +47,7 @@ bool InputLines::fill() {
     if (m_ended) {
         return false;
     }
-    if (isWaiting()) {
+    if (streams::isInputWaiting()) {
         m_output.flush();
         if (m_output.closed()) {
             return false;
@@ -66,11 +55,7 @@ bool InputLines::fill() {
     }
     const std::size_t kept = m_buffer.size();
     m_buffer.resize(kept + READ_SIZE);
-    ssize_t count = ::read(STDIN_FILENO, m_buffer.data() + kept, READ_SIZE);
-    while (count < 0 && (errno == EINTR || errno == EAGAIN)) {
-        waitForInput();
-        count = ::read(STDIN_FILENO, m_buffer.data() + kept, READ_SIZE);
-    }
+    const std::ptrdiff_t count = streams::readInput(m_buffer.data() + kept, READ_SIZE);
     m_buffer.resize(kept + static_cast<std::size_t>(count < 0 ? 0 : count));
     if (count < 0) {
         throw CommandError(ExitCode::FAULT,

@@ -6,13 +6,13 @@
 #include "model/Idcodes.h"
 #include "query/Tool.h"
 #include "term/Table.h"
+#include "text/Glob.h"
 #include "text/Suggest.h"
 
 #include <tarvik/ConstraintsManager.h>
 
 #include <fmt/format.h>
 
-#include <fnmatch.h>
 #include <memory>
 #include <optional>
 #include <unordered_set>
@@ -64,9 +64,7 @@ Json asJson(const Devices& devices) {
 /// Does the device have the name, or the IDCODE, that is searched for?
 /// @param code the pattern as an IDCODE, if it is one
 bool matches(const std::string& glob, const std::optional<IdcodePattern>& code, const Device& device) {
-    const auto isLike = [&](const std::string& text) {
-        return ::fnmatch(glob.c_str(), text.c_str(), FNM_CASEFOLD) == 0;
-    };
+    const auto isLike = [&](const std::string& text) { return matchesGlob(glob, text); };
     if (glob.empty() || isLike(device.name)) {
         return true;
     }

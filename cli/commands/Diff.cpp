@@ -1,9 +1,11 @@
 // `diff`: which answers two databases give differently.
 #include "commands/Commands.h"
 
+#include "database/SearchPath.h"
 #include "diff/CompareDatabases.h"
 #include "diff/Presentation.h"
 #include "diff/Revision.h"
+#include "platform/Platform.h"
 #include "query/Database.h"
 #include "query/DeviceTables.h"
 #include "query/Tool.h"
@@ -14,7 +16,6 @@
 
 #include <exception>
 #include <memory>
-#include <sstream>
 
 namespace {
 
@@ -25,15 +26,9 @@ struct Arguments {
     std::string format = "text";
 };
 
-/// The directories of a database whose layers are separated by ":".
+/// The directories of a database, whose layers are separated as in a search path.
 std::vector<std::string> layers(const std::string& text) {
-    std::vector<std::string> directories;
-    std::istringstream rest(text);
-    for (std::string directory; std::getline(rest, directory, ':');) {
-        if (!directory.empty()) {
-            directories.push_back(directory);
-        }
-    }
+    std::vector<std::string> directories = acd::splitDirectories(text);
     if (directories.empty()) {
         throw CommandError(ExitCode::FAULT, "a database has no directory: \"" + text + '"');
     }
@@ -86,8 +81,9 @@ diff::Comparison compare(const Arguments& arguments) {
         return diff::compareDatabases(arguments.databases[0], arguments.databases[1]);
     }
     const diff::Revision revision(arguments.against, layers(arguments.databases[0]));
-    return diff::compareDatabases(fmt::format("{}", fmt::join(revision.directories(), ":")),
-                                  arguments.databases[0]);
+    return diff::compareDatabases(
+        fmt::format("{}", fmt::join(revision.directories(), std::string{acd::platform::listSeparator()})),
+        arguments.databases[0]);
 }
 
 ExitCode run(Tool& tool, const Arguments& arguments) {

@@ -8,6 +8,7 @@
 #include "edit/Format.h"
 #include "edit/Proof.h"
 #include "edit/Sort.h"
+#include "platform/Platform.h"
 #include "query/Tool.h"
 
 #include <AcdStore.h>
@@ -75,7 +76,7 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
         throw CommandError(ExitCode::FAULT, "no database given: name its directory, or one of its files");
     }
     for (const std::string& directory : directories) {
-        if (!std::filesystem::is_directory(directory)) {
+        if (!std::filesystem::is_directory(acd::toPath(directory))) {
             throw CommandError(ExitCode::FAULT,
                                fmt::format("there is no directory \"{}\"", printable(directory)));
         }

@@ -1,39 +1,40 @@
 // Makes the index of a directory.
 #include "commands/IndexWriter.h"
 
+#include "database/FileNames.h"
 #include "database/IndexMaintenance.h"
 #include "term/AtomicFile.h"
 #include "term/ExitCode.h"
+#include "term/TemporaryFiles.h"
 
 #include <fmt/format.h>
 
-#include <cerrno>
-#include <cstring>
-#include <fcntl.h>
-#include <unistd.h>
+#include <filesystem>
+#include <system_error>
 
 namespace {
 
 /// The status of a new file in the directory: which device it is on, and what time it is there.
 acd::FileStatus probe(const std::string& directory) {
-    std::string path = fmt::format("{}/.{}.XXXXXX", directory, acd::indexFormat::FILE_NAME);
-    const int descriptor = ::mkostemp(path.data(), O_CLOEXEC);
-    if (descriptor == -1) {
-        throw CommandError(ExitCode::FAULT,
-                           fmt::format("can't write \"{}\": {}", indexPath(directory), std::strerror(errno)));
+    try {
+        const struct Removal {
+            std::string path;
+            ~Removal() {
+                std::error_code ignored;
+                std::filesystem::remove(acd::toPath(path), ignored);
+            }
+        } probe{createTemporaryFile(directory, fmt::format(".{}.", acd::indexFormat::FILE_NAME))};
+        return acd::FileSource(probe.path).status();
+    } catch (const std::system_error& failure) {
+        throw CommandError(ExitCode::FAULT, fmt::format("can't write \"{}\": {}", indexPath(directory),
+                                                        failure.code().message()));
     }
-    ::close(descriptor);
-    const struct Removal {
-        const std::string& path;
-        ~Removal() { ::unlink(path.c_str()); }
-    } removal{path};
-    return acd::FileSource(path).status();
 }
 
 } // namespace
 
 std::string indexPath(const std::string& directory) {
-    return fmt::format("{}{}{}", directory, directory.ends_with('/') ? "" : "/", acd::indexFormat::FILE_NAME);
+    return acd::joinPath(directory, acd::indexFormat::FILE_NAME);
 }
 
 acd::IndexContents writeIndex(const std::string& directory) {

@@ -7,6 +7,7 @@
 #include "edit/Fixes.h"
 #include "lint/Check.h"
 #include "lint/Report.h"
+#include "platform/Platform.h"
 #include "query/Database.h"
 #include "query/Tool.h"
 #include "term/Progress.h"
@@ -113,7 +114,7 @@ ExitCode explain(Tool& tool, const Arguments& arguments) {
 
 /// The fingerprints of a former report.
 std::set<std::string> readBaseline(const std::string& path) {
-    std::ifstream file(path, std::ios::binary);
+    std::ifstream file(acd::toPath(path), std::ios::binary);
     const Json report = file ? Json::parse(file, nullptr, false) : Json();
     if (!report.is_object() || !report.contains("findings") || !report["findings"].is_array()) {
         throw CommandError(ExitCode::FAULT,

@@ -1,8 +1,8 @@
 // Compares two databases by the answers that two further runs of this program give.
 #include "diff/CompareDatabases.h"
 
-#include "diff/Subprocess.h"
 #include "term/ExitCode.h"
+#include "term/Subprocess.h"
 
 #include <vector>
 

@@ -1,8 +1,8 @@
 // Takes databases out of git, through an index of its own.
 #include "diff/Revision.h"
 
-#include "diff/Subprocess.h"
 #include "term/ExitCode.h"
+#include "term/Subprocess.h"
 
 #include <fmt/format.h>
 
@@ -10,7 +10,6 @@
 #include <array>
 #include <optional>
 #include <string_view>
-#include <unistd.h>
 
 namespace diff {
 
@@ -20,14 +19,11 @@ namespace {
 std::vector<std::string> environment() {
     constexpr std::array<std::string_view, 4> OF_REPOSITORY{
         "GIT_DIR=", "GIT_WORK_TREE=", "GIT_INDEX_FILE=", "GIT_PREFIX="};
-    std::vector<std::string> all;
-    for (char** variable = environ; *variable != nullptr; ++variable) {
-        const std::string_view text = *variable;
-        if (std::none_of(OF_REPOSITORY.begin(), OF_REPOSITORY.end(),
-                         [text](std::string_view name) { return text.starts_with(name); })) {
-            all.emplace_back(text);
-        }
-    }
+    std::vector<std::string> all = environmentVariables();
+    std::erase_if(all, [&](const std::string& variable) {
+        return std::any_of(OF_REPOSITORY.begin(), OF_REPOSITORY.end(),
+                           [&](std::string_view name) { return variable.starts_with(name); });
+    });
     return all;
 }
 

@@ -1,6 +1,7 @@
 // Takes a file apart by the readers' own lines, so that no second grammar can disagree with them.
 #include "edit/SourceFile.h"
 
+#include "platform/Platform.h"
 #include "term/ExitCode.h"
 
 #include <fmt/format.h>
@@ -66,7 +67,7 @@ std::size_t SourceFile::offsetOf(unsigned line, unsigned column) const noexcept 
 }
 
 std::string readFile(const std::string& path) {
-    std::ifstream file(path, std::ios::binary);
+    std::ifstream file(acd::toPath(path), std::ios::binary);
     std::ostringstream text;
     if (!file || !(text << file.rdbuf() || file.peek() == std::ifstream::traits_type::eof())) {
         throw CommandError(ExitCode::FAULT, fmt::format("cannot read \"{}\"", path));

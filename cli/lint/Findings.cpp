@@ -1,6 +1,7 @@
 // Collects findings, sorts them, and identifies them independently of edits elsewhere in the file.
 #include "lint/Findings.h"
 
+#include "database/FileNames.h"
 #include "text/Suggest.h"
 
 #include <algorithm>
@@ -15,12 +16,6 @@ namespace lint {
 
 namespace {
 
-/// The name of a file without its directories.
-std::string_view fileName(std::string_view path) {
-    const std::size_t slash = path.rfind('/');
-    return slash == path.npos ? path : path.substr(slash + 1);
-}
-
 std::string_view withoutBlanks(std::string_view text) {
     const std::size_t first = std::min(text.find_first_not_of(" \t"), text.size());
     return text.substr(first, text.find_last_not_of(" \t\r") + 1 - first);
@@ -30,7 +25,7 @@ std::string_view withoutBlanks(std::string_view text) {
 std::string subject(const Finding& finding) {
     constexpr std::size_t MAX_LENGTH = 400;
     std::string text(finding.rule->code);
-    text.append("\n").append(fileName(finding.location.file->path())).append("\n");
+    text.append("\n").append(acd::fileNameOf(finding.location.file->path())).append("\n");
     std::string_view source = finding.location.file->source(finding.location.line);
     if (source.size() > MAX_LENGTH) {
         const std::size_t at = std::min<std::size_t>(finding.location.column - 1, source.size());

@@ -1,6 +1,7 @@
 // Chooses the database: a named one that can't be used is a fault, never a silent change to another.
 #include "query/Database.h"
 
+#include "platform/Platform.h"
 #include "query/Demonstration.h"
 #include "term/ExitCode.h"
 #include "term/Output.h"
@@ -24,9 +25,10 @@ CommandError unusable(const std::string& fault, const std::vector<std::string>& 
 void requireDirectories(const std::vector<std::string>& path) {
     for (const std::string& directory : path) {
         std::error_code fault;
-        const std::filesystem::directory_iterator entries(directory, fault);
+        const std::filesystem::directory_iterator entries(acd::toPath(directory), fault);
         if (fault) {
-            throw unusable(fmt::format("can't read the database \"{}\": {}", directory, fault.message()),
+            throw unusable(fmt::format("can't read the database \"{}\": {}", directory,
+                                       fault.default_error_condition().message()),
                            path);
         }
     }

@@ -3,18 +3,18 @@
 
 #include "query/ApplicationFault.h"
 #include "query/Database.h"
+#include "term/Streams.h"
 
 #include <tarvik/ConstraintsManager.h>
 
 #include <fmt/format.h>
 
-#include <unistd.h>
 #include <utility>
 
 using Channel = Port_MsgManData::Channel;
 
 Tool::Tool(Settings settings)
-    : m_settings(std::move(settings)), m_terminal(STDOUT_FILENO, m_settings.colours) {}
+    : m_settings(std::move(settings)), m_terminal(streams::OUTPUT, m_settings.colours) {}
 
 void Tool::openDatabase() {
     if (!m_opened) {

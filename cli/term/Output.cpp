@@ -2,46 +2,16 @@
 #include "term/Output.h"
 
 #include "term/ExitCode.h"
+#include "term/Streams.h"
 #include "term/Terminal.h"
 
 #include <cerrno>
 #include <cstring>
-#include <poll.h>
-#include <unistd.h>
 #include <utility>
 
 namespace {
 
 constexpr std::size_t FULL = std::size_t{64} * 1024;
-
-/// Writes some of the text, waiting while the descriptor accepts none.
-/// @return the number of bytes written; negative for an error, which is in `errno`
-ssize_t writeSome(int descriptor, std::string_view text) {
-    for (;;) {
-        const ssize_t written = ::write(descriptor, text.data(), text.size());
-        if (written >= 0) {
-            return written;
-        }
-        if (errno == EAGAIN) {
-            pollfd waiting{descriptor, POLLOUT, 0};
-            ::poll(&waiting, 1, -1);
-        } else if (errno != EINTR) {
-            return written;
-        }
-    }
-}
-
-/// @return false for an error, which is in `errno`
-bool writeAll(int descriptor, std::string_view text) {
-    while (!text.empty()) {
-        const ssize_t written = writeSome(descriptor, text);
-        if (written < 0) {
-            return false;
-        }
-        text.remove_prefix(static_cast<std::size_t>(written));
-    }
-    return true;
-}
 
 } // namespace
 
@@ -54,7 +24,7 @@ void Output::write(std::string_view text) {
 
 void Output::flush() {
     const std::string text = std::exchange(m_buffer, {});
-    if (m_closed || writeAll(STDOUT_FILENO, text)) {
+    if (m_closed || streams::write(streams::OUTPUT, text)) {
         return;
     }
     if (errno != EPIPE) {
@@ -65,7 +35,7 @@ void Output::flush() {
 }
 
 void writeError(std::string_view line) {
-    std::string text = ::isatty(STDERR_FILENO) == 1 ? printableLines(line) : std::string(line);
+    std::string text = streams::isTerminal(streams::ERRORS) ? printableLines(line) : std::string(line);
     if (!text.ends_with('\n')) {
         text += '\n';
     }
@@ -74,5 +44,5 @@ void writeError(std::string_view line) {
 
 void writeErrorRaw(std::string_view text) {
     // There is nowhere to report a failure of standard error.
-    static_cast<void>(writeAll(STDERR_FILENO, text));
+    static_cast<void>(streams::write(streams::ERRORS, text));
 }

@@ -2,12 +2,12 @@
 #include "term/Progress.h"
 
 #include "term/Output.h"
+#include "term/Streams.h"
 #include "term/Terminal.h"
 
 #include <fmt/format.h>
 
 #include <algorithm>
-#include <unistd.h>
 #include <utility>
 
 namespace {
@@ -17,7 +17,7 @@ constexpr std::chrono::milliseconds PAUSE{100};
 constexpr std::size_t WIDEST_BAR = 30;
 
 std::size_t widthOfStandardError() {
-    const Terminal terminal(STDERR_FILENO, Terminal::Colours::NEVER);
+    const Terminal terminal(streams::ERRORS, Terminal::Colours::NEVER);
     return terminal.isTerminal() ? terminal.width() : 0;
 }
 

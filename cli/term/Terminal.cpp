@@ -1,12 +1,12 @@
-// The one place that knows terminals: whether there is one, how wide it is, and how to colour a text.
+// What is written to a terminal: how wide it is, and how to colour a text.
 #include "term/Terminal.h"
+
+#include "term/Streams.h"
 
 #include <algorithm>
 #include <charconv>
 #include <cstdlib>
 #include <optional>
-#include <sys/ioctl.h>
-#include <unistd.h>
 
 namespace {
 
@@ -25,7 +25,7 @@ bool isControl(std::string_view text, std::size_t index) {
 /// The width of what has no width: far more than any line needs, and safe to calculate with.
 constexpr std::size_t UNLIMITED = std::size_t{1} << 40U;
 
-std::size_t columnsOf(int descriptor, bool isTerminal) {
+std::size_t columnsOf(int stream, bool isTerminal) {
     if (const std::optional<std::string_view> columns = variable("COLUMNS")) {
         std::size_t number = 0;
         const char* const end = columns->data() + columns->size();
@@ -37,15 +37,15 @@ std::size_t columnsOf(int descriptor, bool isTerminal) {
     if (!isTerminal) {
         return UNLIMITED;
     }
-    winsize size{};
-    return ::ioctl(descriptor, TIOCGWINSZ, &size) == 0 && size.ws_col != 0 ? size.ws_col : LINE_WIDTH;
+    const std::size_t columns = streams::columns(stream);
+    return columns != 0 ? columns : LINE_WIDTH;
 }
 
-bool showsColours(bool isTerminal, Terminal::Colours colours) {
+bool showsColours(int stream, Terminal::Colours colours) {
     if (colours != Terminal::Colours::AUTOMATIC) {
         return colours == Terminal::Colours::ALWAYS;
     }
-    return isTerminal && !variable("NO_COLOR") && variable("TERM").value_or("dumb") != "dumb";
+    return !variable("NO_COLOR") && streams::hasColours(stream);
 }
 
 } // namespace
@@ -78,9 +78,9 @@ std::string printableLines(std::string_view text) {
     return result;
 }
 
-Terminal::Terminal(int descriptor, Colours colours)
-    : m_isTerminal(::isatty(descriptor) == 1), m_hasColours(showsColours(m_isTerminal, colours)),
-      m_width(columnsOf(descriptor, m_isTerminal)) {}
+Terminal::Terminal(int stream, Colours colours)
+    : m_isTerminal(streams::isTerminal(stream)), m_hasColours(showsColours(stream, colours)),
+      m_width(columnsOf(stream, m_isTerminal)) {}
 
 std::string Terminal::sanitised(std::string_view text) const {
     return m_isTerminal ? printable(text) : std::string(text);

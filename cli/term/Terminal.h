@@ -19,10 +19,10 @@ public:
     /// When to use colours.
     enum class Colours { AUTOMATIC, ALWAYS, NEVER };
 
-    /// What an open file leads to. Its width is `COLUMNS`, otherwise that of the terminal; anything but a terminal
+    /// What a stream leads to (Streams.h). Its width is `COLUMNS`, otherwise that of the terminal; anything but a terminal
     /// has no limit. Automatic colours are those of a terminal, unless the environment has `NO_COLOR` or says that the
     /// terminal is dumb.
-    Terminal(int descriptor, Colours colours);
+    Terminal(int stream, Colours colours);
 
     [[nodiscard]] bool isTerminal() const noexcept { return m_isTerminal; }
     [[nodiscard]] std::size_t width() const noexcept { return m_width; }

@@ -1,6 +1,8 @@
 // Paths as URIs, and back: a path may hold any byte, a URI only few.
 #include "text/Uri.h"
 
+#include "platform/Platform.h"
+
 #include <AcdText.h>
 
 #include <fmt/format.h>
@@ -33,8 +35,9 @@ std::string decoded(std::string_view text) {
 
 std::string asUri(std::string_view path) {
     constexpr std::string_view PLAIN = "-._~/";
-    std::string uri = path.starts_with('/') ? "file://" : "";
-    for (const char byte : path) {
+    std::string uri = !acd::platform::isAbsolute(path) ? "" : path.starts_with('/') ? "file://" : "file:///";
+    for (const char given : path) {
+        const char byte = acd::platform::pathSeparators().find(given) != path.npos ? '/' : given;
         const bool isLetterOrDigit =
             (byte >= 'a' && byte <= 'z') || (byte >= 'A' && byte <= 'Z') || (byte >= '0' && byte <= '9');
         if (isLetterOrDigit || PLAIN.find(byte) != PLAIN.npos) {

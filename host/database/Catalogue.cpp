@@ -3,7 +3,6 @@
 #include "database/FileNames.h"
 
 #include <algorithm>
-#include <cstdlib>
 #include <filesystem>
 #include <iterator>
 #include <system_error>
@@ -16,20 +15,13 @@ namespace acd {
 
 namespace {
 
-[[nodiscard]] std::string joinPath(const std::string& directory, const std::string& name) {
-    return directory.ends_with('/') ? directory + name : directory + '/' + name;
-}
-
 [[nodiscard]] std::string workingDirectory() {
     std::error_code error;
-    return std::filesystem::current_path(error).string();
+    return fromPath(std::filesystem::current_path(error));
 }
 
 /// Indexes can be ignored, to compare answers with and without them.
-[[nodiscard]] bool isIndexEnabled() {
-    const char* const setting = secure_getenv("TARVIK_INDEX");
-    return setting == nullptr || std::string_view(setting) != "off";
-}
+[[nodiscard]] bool isIndexEnabled() { return platform::trustedVariable("TARVIK_INDEX") != "off"; }
 
 /// Reads what is in a file, unless that failed before; the first failure is reported.
 template <typename Read>
@@ -200,7 +192,7 @@ std::unique_ptr<ByteSource> Catalogue::open(const SourceFile& file) const {
 }
 
 std::string Catalogue::absolute(const std::string& path) const {
-    return path.starts_with('/') ? path : joinPath(m_workingDirectory, path);
+    return platform::isAbsolute(path) ? path : joinPath(m_workingDirectory, path);
 }
 
 } // namespace acd

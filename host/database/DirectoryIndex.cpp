@@ -1,5 +1,7 @@
 #include "database/DirectoryIndex.h"
 
+#include "database/FileNames.h"
+
 #include <algorithm>
 #include <utility>
 
@@ -17,7 +19,7 @@ constexpr std::size_t MAX_INDEX_SIZE = std::size_t{256} << 20;
 
 std::optional<DirectoryIndex> DirectoryIndex::read(const std::string& directory) {
     try {
-        FileSource source(directory + '/' + indexFormat::FILE_NAME);
+        FileSource source(joinPath(directory, indexFormat::FILE_NAME));
         if (source.expectedSize() > MAX_INDEX_SIZE) {
             return std::nullopt;
         }

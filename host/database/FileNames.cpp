@@ -1,5 +1,7 @@
 #include "database/FileNames.h"
 
+#include "platform/Platform.h"
+
 #include <AcdText.h>
 
 #include <algorithm>
@@ -10,12 +12,20 @@
 namespace acd {
 
 std::string_view directoryOf(std::string_view path) noexcept {
-    const std::size_t slash = path.rfind('/');
+    const std::size_t slash = path.find_last_of(platform::pathSeparators());
     // The root is named by its slash.
     return slash == path.npos ? std::string_view() : path.substr(0, std::max<std::size_t>(slash, 1));
 }
 
-std::string_view fileNameOf(std::string_view path) noexcept { return path.substr(path.rfind('/') + 1); }
+std::string_view fileNameOf(std::string_view path) noexcept {
+    return path.substr(path.find_last_of(platform::pathSeparators()) + 1);
+}
+
+std::string joinPath(const std::string& directory, const std::string& name) {
+    const std::string_view separators = platform::pathSeparators();
+    const bool isOpen = !directory.empty() && separators.find(directory.back()) != separators.npos;
+    return isOpen ? directory + name : directory + separators.front() + name;
+}
 
 std::string_view familyName(std::string_view fileName) noexcept {
     constexpr std::string_view EXTENSION = ".acd";

@@ -32,7 +32,7 @@ IndexContents describeDirectory(const std::string& directory, std::uint64_t devi
             IndexedFile& file = contents.files.emplace_back();
             file.name = name;
             file.sections = scan.names([&] {
-                auto source = std::make_unique<FileSource>(directory + '/' + name);
+                auto source = std::make_unique<FileSource>(joinPath(directory, name));
                 // From before the first byte is read: what changes the file from here on changes its status, too.
                 file.status = source->status();
                 return source;

@@ -17,11 +17,7 @@ struct SearchPath {
 /// The search path of a process that does not set one: the environment's, else the installed database.
 [[nodiscard]] SearchPath defaultSearchPath();
 
-/// The file that this code was loaded from: the library, or the program that it is linked into.
-/// @return its path, absolute; empty if it is unknown
-[[nodiscard]] std::string findOwnFile();
-
-/// The parts of a list of directories separated by `:`, without the empty ones.
+/// The parts of a list of directories separated by `:`, on Windows by `;`, without the empty ones.
 [[nodiscard]] std::vector<std::string> splitDirectories(std::string_view list);
 
 /// The search path of a library that is loaded from `library`: the first database directory that is

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <TarvikAbi.h>
+#include <tarvik/Attributes.h>
 
 #include <cstddef>
 #include <string>
@@ -10,7 +11,7 @@
 /// The logical lines of one database file: continuations joined, blank lines removed, comments separate.
 ///
 /// For tools that show what a file contains and what is wrong with it. Use `AcdReader` to read values.
-class __attribute__((visibility("default"))) AcdLines {
+class TARVIK_HOST_API AcdLines {
 public:
     /// What a line is.
     enum class Kind {

@@ -1,12 +1,14 @@
 #pragma once
 
+#include <tarvik/Attributes.h>
+
 class PM_DEVKEY;
 
 /// Opens a database of the search path by the name of a file, a family or a device.
 ///
 /// A name is looked for without regard to ASCII case: as a file ("spi.acd"), as a family, as a device; only
 /// when all three fail, the name cut at its first "_", likewise. A name never becomes a path.
-class __attribute__((visibility("default"))) AcdReader {
+class TARVIK_HOST_API AcdReader {
 public:
     /// Opens the base database.
     /// @throw DataNotFoundException when there is no base.acd or it can't be read; an info message that names

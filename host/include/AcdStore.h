@@ -1,6 +1,7 @@
 #pragma once
 
 #include <TarvikAbi.h>
+#include <tarvik/Attributes.h>
 
 #include <cstddef>
 #include <functional>
@@ -16,7 +17,7 @@
 /// `setSearchPath` or `setMemoryFiles`, else by the environment variable TARVIK_DATABASE (directories
 /// separated by ":"; ignored in a set-user-id process), else by the installed share/tarvik/database.
 /// What has been read lives as long as the process.
-class __attribute__((visibility("default"))) AcdStore {
+class TARVIK_HOST_API AcdStore {
 public:
     /// Looks in these directories. To be called before the first reader: once a reader, a configuration or a
     /// method of this class but `searchPath()` has looked for a database, so once a manager exists, the call is

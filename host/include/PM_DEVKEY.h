@@ -2,6 +2,7 @@
 
 #include <AcdText.h>
 #include <TarvikAbi.h>
+#include <tarvik/Attributes.h>
 
 #include <cstddef>
 #include <string>
@@ -16,7 +17,7 @@ class Section;
 } // namespace acd
 
 /// Reads keyed values of one database: a device's accessor falls back to its family's keys.
-class __attribute__((visibility("default"))) PM_DEVKEY {
+class TARVIK_HOST_API PM_DEVKEY {
 public:
     /// Opens a file on a configuration. No such file gives an empty database.
     /// @param file its name, for example "spi.acd"

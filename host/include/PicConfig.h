@@ -1,5 +1,7 @@
 #pragma once
 
+#include <tarvik/Attributes.h>
+
 /// How a part name is bound to its personality module. Passed through unchanged.
 enum class PM_PARTNAME_BINDING : int {
     UNBOUND = 0, ///< not at all
@@ -7,7 +9,7 @@ enum class PM_PARTNAME_BINDING : int {
 };
 
 /// What is known of a part: the personality module that describes it.
-class __attribute__((visibility("default"))) PM_SPEC {
+class TARVIK_HOST_API PM_SPEC {
 public:
     /// The part's family.
     /// @return its name as its file spells it, which lives as long as the process; null when the database has
@@ -23,13 +25,13 @@ private:
 };
 
 /// A configuration on which databases can be opened.
-class __attribute__((visibility("default"))) PM_PIC : public PM_SPEC {
+class TARVIK_HOST_API PM_PIC : public PM_SPEC {
 protected:
     using PM_SPEC::PM_SPEC;
 };
 
 /// The configuration of a part, a family or a file, found by its name.
-class __attribute__((visibility("default"))) PicConfig : public PM_PIC {
+class TARVIK_HOST_API PicConfig : public PM_PIC {
 public:
     /// Resolves a name as `AcdReader` does, without opening what it finds.
     /// @param name part, family or file name; null is the empty name, which resolves to nothing

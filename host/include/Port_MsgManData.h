@@ -2,6 +2,8 @@
 
 #include "TarvikAbi.h"
 
+#include <tarvik/Attributes.h>
+
 #include <functional>
 #include <string_view>
 
@@ -21,7 +23,7 @@
 /// for any content: `%%` gives `%`, any other `%` stays as it is. The other is printf-like; a null text
 /// formats as `(null)`; it is a template only so that overload resolution prefers the other one where there
 /// are no further arguments.
-class __attribute__((visibility("default"))) Port_MsgManData {
+class TARVIK_HOST_API Port_MsgManData {
 public:
     /// Whom a message is for.
     enum class Channel : int {
@@ -68,7 +70,8 @@ public:
     /// Issues a notice to the user.
     /// @param format as of printf, as are the arguments after it
     template <typename Formatted = void>
-    [[gnu::format(printf, 2, 3)]] void issueInfo(const char* format, ...) const;
+    TARVIK_PRINTF(2, 3)
+    void issueInfo(const char* format, ...) const;
 
     /// Issues a status or dump line, or a piece of one.
     /// @param text finished
@@ -77,7 +80,8 @@ public:
     /// Issues a status or dump line, or a piece of one.
     /// @param format as of printf, as are the arguments after it
     template <typename Formatted = void>
-    [[gnu::format(printf, 2, 3)]] void issueStatus(const char* format, ...) const;
+    TARVIK_PRINTF(2, 3)
+    void issueStatus(const char* format, ...) const;
 
     /// Issues trace output for developers.
     /// @param text finished
@@ -86,7 +90,8 @@ public:
     /// Issues trace output for developers.
     /// @param format as of printf, as are the arguments after it
     template <typename Formatted = void>
-    [[gnu::format(printf, 1, 2)]] static void debugStub(const char* format, ...);
+    TARVIK_PRINTF(1, 2)
+    static void debugStub(const char* format, ...);
 
 private:
     Port_MsgManData(const char* product, const char* source, int line, const char* revision) noexcept;

@@ -2,6 +2,8 @@
 
 #include "TarvikAbi.h"
 
+#include <tarvik/Attributes.h>
+
 #include <cstddef>
 #include <cstdint>
 #include <iosfwd>
@@ -13,7 +15,7 @@
 ///
 /// It may contain any byte, NUL included; nothing is ever interpreted as a character encoding. Case is that
 /// of ASCII alone: bytes over 127 have none. A null text is treated as the empty text everywhere.
-class __attribute__((visibility("default"))) StringBase {
+class TARVIK_HOST_API StringBase {
     /// Takes part if `Text` is a text, but not a `StringBase`.
     template <typename Text>
     using IfOther = std::enable_if_t<std::is_convertible_v<const Text&, std::string_view> &&
@@ -86,7 +88,8 @@ public:
     /// resolution prefers the finished text where there are no further arguments.
     /// @param format as of printf, as are the arguments after it
     template <typename Formatted = void>
-    [[gnu::format(printf, 2, 3)]] void Format(const char* format, ...);
+    TARVIK_PRINTF(2, 3)
+    void Format(const char* format, ...);
 
     /// Turns a to z into A to Z.
     void MakeUpper() noexcept;

@@ -3,6 +3,8 @@
 // Makes it a link error to build an application against other containers or texts than the libraries have: sizes and
 // layouts of `std::string` and of all containers change with the standard library, its string ABI and its debug mode.
 
+#include <tarvik/Attributes.h>
+
 #include <cstddef> // the standard library's own macros
 
 #if defined(_LIBCPP_VERSION)
@@ -20,24 +22,12 @@
 #endif
 
 /// Defined by the library under the name that fits how it was built: no other name can be linked.
-extern "C" __attribute__((visibility("default"))) const char TARVIK_ABI;
+extern "C" TARVIK_HOST_API const char TARVIK_ABI;
 
 namespace {
 
-// Kept by linkers that drop unused sections, too.
-#if defined(__ELF__) && defined(__has_attribute)
-#if __has_attribute(retain)
-#define TARVIK_RETAIN __attribute__((retain))
-#endif
-#endif
-#ifndef TARVIK_RETAIN
-#define TARVIK_RETAIN
-#endif
-
-/// Asks for that name in every file that includes a host header.
+/// Asks for that name in every file that includes a host header, and is kept by linkers that drop unused sections.
 // NOLINTNEXTLINE(misc-definitions-in-headers): deliberately one in each file
-TARVIK_RETAIN __attribute__((used)) const char* const tarvikAbi = &TARVIK_ABI;
-
-#undef TARVIK_RETAIN
+TARVIK_RETAIN TARVIK_USED const char* const tarvikAbi = &TARVIK_ABI;
 
 } // namespace

@@ -2,6 +2,8 @@
 
 #include "TarvikAbi.h"
 
+#include <tarvik/Attributes.h>
+
 #include <exception>
 #include <memory>
 #include <string>
@@ -9,7 +11,7 @@
 namespace Port {
 
 /// The root of everything that the host libraries and their users raise.
-class __attribute__((visibility("default"))) Exception : public std::exception {
+class TARVIK_HOST_API Exception : public std::exception {
 public:
     ~Exception() override;
 };
@@ -19,7 +21,7 @@ public:
 /// A failure with its place of origin. Thrown by value; copying never fails.
 ///
 /// The texts handed to a constructor must outlive the exception: pass constants.
-class __attribute__((visibility("default"))) TarvikException : public Port::Exception {
+class TARVIK_HOST_API TarvikException : public Port::Exception {
 public:
     /// A failure at a place.
     /// @param product that fails
@@ -73,7 +75,7 @@ private:
 };
 
 /// A failure of the data or of the call, rather than of the machine.
-class __attribute__((visibility("default"))) LogicException : public TarvikException {
+class TARVIK_HOST_API LogicException : public TarvikException {
 public:
     /// @copydoc TarvikException::TarvikException(const char*, const char*, const char*, int)
     LogicException(const char* product, const char* source, const char* revision, int line) noexcept
@@ -85,7 +87,7 @@ protected:
 };
 
 /// A record of the database does not have the form it must have.
-class __attribute__((visibility("default"))) DataMismatchException : public LogicException {
+class TARVIK_HOST_API DataMismatchException : public LogicException {
 public:
     /// @copydoc TarvikException::TarvikException(const char*, const char*, const char*, int)
     DataMismatchException(const char* product, const char* source, const char* revision, int line) noexcept
@@ -94,7 +96,7 @@ public:
 };
 
 /// A value or a name lies outside what there is.
-class __attribute__((visibility("default"))) OutOfRangeException : public LogicException {
+class TARVIK_HOST_API OutOfRangeException : public LogicException {
 public:
     /// @copydoc TarvikException::TarvikException(const char*, const char*, const char*, int)
     OutOfRangeException(const char* product, const char* source, const char* revision, int line) noexcept
@@ -103,7 +105,7 @@ public:
 };
 
 /// Data that must be there is not there, or can't be read.
-class __attribute__((visibility("default"))) DataNotFoundException : public LogicException {
+class TARVIK_HOST_API DataNotFoundException : public LogicException {
 public:
     /// @copydoc TarvikException::TarvikException(const char*, const char*, const char*, int)
     DataNotFoundException(const char* product, const char* source, const char* revision, int line) noexcept

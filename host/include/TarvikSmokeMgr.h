@@ -2,10 +2,12 @@
 
 #include "StringBase.h"
 
+#include <tarvik/Attributes.h>
+
 /// Records text for smoke tests, such as the dumps of the constraints manager.
 ///
 /// Pieces are joined as they come, nothing is put between them.
-class __attribute__((visibility("default"))) TarvikSmokeMgr {
+class TARVIK_HOST_API TarvikSmokeMgr {
 public:
     /// Records a finished piece.
     /// @param piece safe for any content: `%%` gives `%`, any other `%` stays as it is
@@ -15,7 +17,8 @@ public:
     /// resolution prefers the finished piece where there are no further arguments.
     /// @param format as of printf, as are the arguments after it
     template <typename Formatted = void>
-    [[gnu::format(printf, 2, 3)]] void smokeStatus(const char* format, ...);
+    TARVIK_PRINTF(2, 3)
+    void smokeStatus(const char* format, ...);
 
     /// @return all that was recorded so far; valid until the next piece
     [[nodiscard]] const StringBase& text() const noexcept { return m_text; }

@@ -86,7 +86,7 @@ void Port_MsgManData::issueInfo(const char* format, ...) const {
     va_end(arguments);
     send({Channel::INFO, m_product, m_source, m_line, m_revision, text});
 }
-template void Port_MsgManData::issueInfo<void>(const char* format, ...) const;
+template TARVIK_HOST_API void Port_MsgManData::issueInfo<void>(const char* format, ...) const;
 
 void Port_MsgManData::issueStatus(const char* text) const {
     send({Channel::STATUS, m_product, m_source, m_line, m_revision, formatting::unescapePercent(text)});
@@ -100,7 +100,7 @@ void Port_MsgManData::issueStatus(const char* format, ...) const {
     va_end(arguments);
     send({Channel::STATUS, m_product, m_source, m_line, m_revision, text});
 }
-template void Port_MsgManData::issueStatus<void>(const char* format, ...) const;
+template TARVIK_HOST_API void Port_MsgManData::issueStatus<void>(const char* format, ...) const;
 
 void Port_MsgManData::debugStub(const char* text) { sendDebug(formatting::unescapePercent(text)); }
 
@@ -112,4 +112,4 @@ void Port_MsgManData::debugStub(const char* format, ...) {
     va_end(arguments);
     sendDebug(text);
 }
-template void Port_MsgManData::debugStub<void>(const char* format, ...);
+template TARVIK_HOST_API void Port_MsgManData::debugStub<void>(const char* format, ...);

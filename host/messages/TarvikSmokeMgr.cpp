@@ -17,4 +17,4 @@ void TarvikSmokeMgr::smokeStatus(const char* format, ...) {
     va_end(arguments);
     m_text += StringBase(text.data(), text.size());
 }
-template void TarvikSmokeMgr::smokeStatus<void>(const char* format, ...);
+template TARVIK_HOST_API void TarvikSmokeMgr::smokeStatus<void>(const char* format, ...);

@@ -65,7 +65,7 @@ void StringBase::Format(const char* format, ...) {
     va_end(arguments);
     m_text = std::move(result);
 }
-template void StringBase::Format<void>(const char* format, ...);
+template TARVIK_HOST_API void StringBase::Format<void>(const char* format, ...);
 
 void StringBase::MakeUpper() noexcept {
     std::transform(m_text.begin(), m_text.end(), m_text.begin(), AcdText::toUpper);

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <tarvik/Attributes.h>
 #include <tarvik/TARVIKNS.h>
 #include <tarvik/ltptstr.h>
 
@@ -39,7 +40,7 @@ class TarvikSmokeMgr;
 ///
 /// **Messages.** A message sink may call the manager. It must not throw: an exception from a sink ends the call as a
 /// fault of the database does, and what was being loaded stays incomplete.
-class __attribute__((visibility("default"))) ConstraintsManager {
+class TARVIK_MANAGER_API ConstraintsManager {
 public:
     /// Texts by name, in byte order of the names.
     using Texts = std::map<StringBase, StringBase, ltptstr>;
@@ -349,10 +350,10 @@ private:
     friend class TarvikTestPeer;
     class Implementation;
 
-    [[gnu::visibility("hidden")]] ConstraintsManager();
-    [[gnu::visibility("hidden")]] ~ConstraintsManager();
+    TARVIK_HIDDEN ConstraintsManager();
+    TARVIK_HIDDEN ~ConstraintsManager();
 
-    [[gnu::visibility("hidden")]] static ConstraintsManager* s_instance;
+    TARVIK_HIDDEN static ConstraintsManager* s_instance;
 
     Implementation* const m_implementation;
 };

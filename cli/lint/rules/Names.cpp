@@ -2,6 +2,7 @@
 #include "lint/FamilyResult.h"
 #include "lint/rules/RuleSets.h"
 
+#include "database/FileNames.h"
 #include "text/Suggest.h"
 
 #include <map>
@@ -193,7 +194,7 @@ void checkFamily(const FamilyData& family, const FamilyContext& /*any*/, FamilyR
         for (const std::string& other : file.caseCollisions()) {
             findings.add(SAME_FILE_NAME, startOf(file),
                          "nothing is read from {}: this file is called alike and comes first",
-                         inQuotes(other.substr(other.rfind('/') + 1)));
+                         inQuotes(acd::fileNameOf(other)));
         }
     }
     checkFamilyName(family, findings);

@@ -28,7 +28,7 @@
 class TemporaryDirectory {
 public:
     TemporaryDirectory() {
-        std::string name = (std::filesystem::temp_directory_path() / "tarvik-XXXXXX").string();
+        std::string name = (std::filesystem::temp_directory_path() / "tarvik-XXXXXX").generic_string();
         if (mkdtemp(name.data()) == nullptr) {
             throw std::runtime_error("no temporary directory");
         }
@@ -43,7 +43,7 @@ public:
 
     /// The path of an entry; of the directory itself without a name.
     [[nodiscard]] std::string path(const std::string& name = {}) const {
-        return name.empty() ? m_path.string() : (m_path / name).string();
+        return (name.empty() ? m_path : m_path / name).generic_string();
     }
 
     void write(const std::string& name, std::string_view text) const {

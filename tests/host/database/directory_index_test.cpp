@@ -123,6 +123,9 @@ TEST_F(DirectoryIndexes, AreNotUsedAfterAFileIsRemoved) {
 }
 
 TEST_F(DirectoryIndexes, AreNotUsedAfterAFileIsRenamed) {
+    if (std::filesystem::exists(directory.path("BASE.acd"))) {
+        GTEST_SKIP() << "names in any case are the same here";
+    }
     directory.write("osprey.acd", "");
     writeIndex(withGhost());
     std::filesystem::rename(directory.path("osprey.acd"), directory.path("OSPREY.acd"));
@@ -140,6 +143,9 @@ TEST_F(DirectoryIndexes, AreNotUsedInAnotherDirectory) {
 }
 
 TEST_F(DirectoryIndexes, DescribeFilesThatDifferInCaseAlone) {
+    if (std::filesystem::exists(directory.path("BASE.acd"))) {
+        GTEST_SKIP() << "names in any case are the same here";
+    }
     directory.write("KESTREL.acd", "[KS50]\n[KS100]\n");
     IndexContents contents = describe(directory);
     addGhost(contents, "KESTREL.acd");

@@ -1,6 +1,7 @@
 #include "DatabaseFixtures.h"
 
 #include "database/SearchPath.h"
+#include "platform/Platform.h"
 
 #include <AcdLines.h>
 
@@ -275,17 +276,17 @@ int __wrap_dladdr(const void* address, Dl_info* information) {
 TEST_F(SearchPaths, AreEmptyWhereTheLoaderCannotTellTheLibrarysPlace) {
     for (const Loader answer : {Loader::UNKNOWING, Loader::NAMELESS}) {
         loader() = answer;
-        EXPECT_EQ(acd::findOwnFile(), "");
+        EXPECT_EQ(acd::platform::findOwnFile(), "");
     }
     loader() = Loader::AS_IT_IS;
-    EXPECT_NE(acd::findOwnFile(), "");
+    EXPECT_NE(acd::platform::findOwnFile(), "");
     EXPECT_THAT(acd::installedSearchPath("").directories, IsEmpty());
     EXPECT_THAT(acd::installedSearchPath("").tried, IsEmpty());
 }
 
 TEST_F(SearchPaths, ComeFromTheProgramWhereTheLoaderNamesItAsItWasTyped) {
     loader() = Loader::BARE_NAME;
-    EXPECT_EQ(acd::findOwnFile(), std::filesystem::read_symlink("/proc/self/exe").string());
+    EXPECT_EQ(acd::platform::findOwnFile(), std::filesystem::read_symlink("/proc/self/exe").string());
     loader() = Loader::AS_IT_IS;
 }
 

@@ -66,11 +66,6 @@ TEST(FormattedText, OfANullTextIsSafeWhereThePrecisionIsTooShortToShowIt) {
 
 TEST(FormattedText, OfANullFormatIsEmpty) { EXPECT_EQ(formatted(noText, 1), ""); }
 
-TEST(FormattedText, ThatCannotBePrintedIsTheFormat) {
-    const char* const tooWide = "a %99999999999d b";
-    EXPECT_EQ(formatted(tooWide, 1), tooWide);
-}
-
 TEST(FinishedText, WithoutPercentSignsStays) {
     EXPECT_EQ(formatting::unescapePercent(""), "");
     EXPECT_EQ(formatting::unescapePercent("Device KS50 belongs to kestrel\n"),

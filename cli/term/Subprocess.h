@@ -1,9 +1,11 @@
 #pragma once
 
+#include <cstdint>
 #include <string>
 #include <vector>
 
-namespace diff {
+/// The variables of this process, as "NAME=value".
+[[nodiscard]] std::vector<std::string> environmentVariables();
 
 /// A run of a program, side by side with this one.
 ///
@@ -38,12 +40,10 @@ public:
     [[nodiscard]] bool succeeds(std::string& text);
 
 private:
-    void start(const char* program, const std::vector<std::string>& command,
+    void start(const std::string& program, const std::vector<std::string>& command,
                const std::vector<std::string>& environment, bool isSilent);
     [[nodiscard]] int wait() noexcept;
 
-    int m_output = -1;
-    int m_process = -1;
+    int m_output = -1;            ///< a descriptor
+    std::intptr_t m_process = -1; ///< as the system identifies it
 };
-
-} // namespace diff

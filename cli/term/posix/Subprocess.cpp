@@ -1,5 +1,5 @@
-// Runs this program again, by POSIX means.
-#include "diff/Subprocess.h"
+// Processes on POSIX systems.
+#include "term/Subprocess.h"
 
 #include "term/ExitCode.h"
 
@@ -10,8 +10,6 @@
 #include <spawn.h>
 #include <sys/wait.h>
 #include <unistd.h>
-
-namespace diff {
 
 namespace {
 
@@ -37,22 +35,26 @@ std::string readAll(int input) {
 
 } // namespace
 
+std::vector<std::string> environmentVariables() {
+    std::vector<std::string> all;
+    for (char** variable = environ; *variable != nullptr; ++variable) {
+        all.emplace_back(*variable);
+    }
+    return all;
+}
+
 Subprocess::Subprocess(const std::vector<std::string>& arguments, bool isSilent) {
     std::vector<std::string> command{"tarvik"};
     command.insert(command.end(), arguments.begin(), arguments.end());
-    std::vector<std::string> environment;
-    for (char** variable = environ; *variable != nullptr; ++variable) {
-        environment.emplace_back(*variable);
-    }
-    start("/proc/self/exe", command, environment, isSilent);
+    start("/proc/self/exe", command, environmentVariables(), isSilent);
 }
 
 Subprocess::Subprocess(const std::vector<std::string>& command, const std::vector<std::string>& environment,
                        bool isSilent) {
-    start(command.front().c_str(), command, environment, isSilent);
+    start(command.front(), command, environment, isSilent);
 }
 
-void Subprocess::start(const char* program, const std::vector<std::string>& command,
+void Subprocess::start(const std::string& program, const std::vector<std::string>& command,
                        const std::vector<std::string>& environment, bool isSilent) {
     const auto pointers = [](const std::vector<std::string>& texts) {
         std::vector<char*> all;
@@ -75,15 +77,17 @@ void Subprocess::start(const char* program, const std::vector<std::string>& comm
     if (isSilent) {
         ::posix_spawn_file_actions_addopen(&actions, STDERR_FILENO, "/dev/null", O_WRONLY, 0);
     }
-    const int error = ::posix_spawnp(&m_process, program, &actions, nullptr, words.data(), variables.data());
+    pid_t process = -1;
+    const int error =
+        ::posix_spawnp(&process, program.c_str(), &actions, nullptr, words.data(), variables.data());
     ::posix_spawn_file_actions_destroy(&actions);
     ::close(ends[1]);
     if (error != 0) {
         ::close(m_output = ends[0]);
-        m_process = -1;
         fail(("can't start " + command.front()).c_str(), error);
     }
     m_output = ends[0];
+    m_process = process;
 }
 
 Subprocess::~Subprocess() {
@@ -110,10 +114,8 @@ bool Subprocess::succeeds(std::string& text) {
 int Subprocess::wait() noexcept {
     ::close(m_output);
     int status = -1;
-    while (::waitpid(m_process, &status, 0) < 0 && errno == EINTR) {
+    while (::waitpid(static_cast<pid_t>(m_process), &status, 0) < 0 && errno == EINTR) {
     }
     m_process = -1;
     return status;
 }
-
-} // namespace diff
