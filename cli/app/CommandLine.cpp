@@ -31,9 +31,10 @@ CommandLine::CommandLine() {
         {.name = "--version", .letter = 'V', .description = "Show the version", .target = &version},
         {.name = "--database",
          .value = "DIR",
-         .description =
-             "The directory of the database. Repeat to stack directories; earlier ones win. Default: "
-             "TARVIK_DATABASE, the installed database or a built-in demonstration",
+         .description = "The directory of the database. Repeat to stack directories, or separate them as in "
+                        "TARVIK_DATABASE; "
+                        "earlier ones win. Default: "
+                        "TARVIK_DATABASE, the installed database or a built-in demonstration",
          .kind = ValueKind::PATH,
          .target = &settings.databases},
         {.name = "--json", .description = "Answer with one JSON object", .target = &settings.json},

@@ -1,7 +1,6 @@
 // `diff`: which answers two databases give differently.
 #include "commands/Commands.h"
 
-#include "database/SearchPath.h"
 #include "diff/CompareDatabases.h"
 #include "diff/Presentation.h"
 #include "diff/Revision.h"
@@ -26,15 +25,6 @@ struct Arguments {
     std::string format = "text";
 };
 
-/// The directories of a database, whose layers are separated as in a search path.
-std::vector<std::string> layers(const std::string& text) {
-    std::vector<std::string> directories = acd::splitDirectories(text);
-    if (directories.empty()) {
-        throw CommandError(ExitCode::FAULT, "a database has no directory: \"" + text + '"');
-    }
-    return directories;
-}
-
 /// A comparison as release notes show it.
 struct ReleaseNotes {
     const diff::Comparison& comparison;
@@ -55,7 +45,7 @@ Json asJson(const Written& /*written*/) { return {}; }
 
 std::string snapshotOrFault(Tool& tool, const std::string& database) {
     try {
-        openDatabase(layers(database));
+        openDatabase(directoriesOf({database}));
         Progress progress("asking about each device");
         std::string snapshot = diff::takeSnapshot(
             [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
@@ -80,7 +70,7 @@ diff::Comparison compare(const Arguments& arguments) {
     if (wanted == 2) {
         return diff::compareDatabases(arguments.databases[0], arguments.databases[1]);
     }
-    const diff::Revision revision(arguments.against, layers(arguments.databases[0]));
+    const diff::Revision revision(arguments.against, directoriesOf({arguments.databases[0]}));
     return diff::compareDatabases(
         fmt::format("{}", fmt::join(revision.directories(), std::string{acd::platform::listSeparator()})),
         arguments.databases[0]);

@@ -1,6 +1,7 @@
 // Chooses the database: a named one that can't be used is a fault, never a silent change to another.
 #include "query/Database.h"
 
+#include "database/SearchPath.h"
 #include "platform/Platform.h"
 #include "query/Demonstration.h"
 #include "term/ExitCode.h"
@@ -14,6 +15,7 @@
 #include <fmt/ranges.h>
 
 #include <filesystem>
+#include <iterator>
 #include <system_error>
 
 namespace {
@@ -43,6 +45,18 @@ void requireBase(const std::vector<std::string>& path) {
 }
 
 } // namespace
+
+std::vector<std::string> directoriesOf(const std::vector<std::string>& databases) {
+    std::vector<std::string> all;
+    for (const std::string& database : databases) {
+        std::vector<std::string> layers = acd::splitDirectories(database);
+        if (layers.empty()) {
+            throw CommandError(ExitCode::FAULT, "a database has no directory: \"" + database + '"');
+        }
+        std::move(layers.begin(), layers.end(), std::back_inserter(all));
+    }
+    return all;
+}
 
 void openDatabase(const std::vector<std::string>& directories) {
     if (!directories.empty()) {

@@ -18,12 +18,14 @@ Tool::Tool(Settings settings)
 
 void Tool::openDatabase() {
     if (!m_opened) {
-        ::openDatabase(m_settings.databases);
+        ::openDatabase(directoriesOf(m_settings.databases));
         m_opened = true;
     }
 }
 
-std::vector<std::string> Tool::openDirectories() const { return ::openDirectories(m_settings.databases); }
+std::vector<std::string> Tool::openDirectories() const {
+    return ::openDirectories(directoriesOf(m_settings.databases));
+}
 
 ConstraintsManager& Tool::manager() {
     openDatabase();

@@ -6,6 +6,7 @@
 #include "model/Catalogue.h"
 #include "model/Vocabulary.h"
 #include "query/AskedDevice.h"
+#include "query/Database.h"
 #include "query/Demonstration.h"
 #include "query/Properties.h"
 #include "term/Messages.h"
@@ -179,7 +180,7 @@ std::vector<Candidate> optionsOf(const CommandLine& line, const DeclaredCommand*
 /// Opens the database without a message: a mistake in it is reported when the command runs.
 void openDatabase(const PartialCommandLine& partial) {
     if (!partial.databases.empty()) {
-        AcdStore::setSearchPath(partial.databases);
+        AcdStore::setSearchPath(directoriesOf(partial.databases));
     } else if (AcdStore::searchPath().empty()) {
         AcdStore::setMemoryFiles(demonstrationFiles());
     }

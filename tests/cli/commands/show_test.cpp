@@ -262,6 +262,8 @@ TEST(Show, NamesWhatLayersShadow) {
                                                            {"finch.acd", "[FN10]\nPROPERTY = PINS,48\n"}});
     const ProcessResult outcome =
         runTool({{"--database", above.path(), "--database", below.path(), "show", "FN10"}, {}, {}, {}});
+    EXPECT_EQ(runTool({"--database", above.path() + ':' + below.path(), "show", "FN10"}).output,
+              outcome.output);
     EXPECT_EQ(outcome.status, 0);
     EXPECT_THAT(outcome.output,
                 HasSubstr("IDCODE  0x0030  " + above.path("base.acd") + ":1:12\n        shadows " +
