@@ -1,6 +1,8 @@
 // Builds the model that all rules check: files merged as the readers merge them, each text with its location.
 #include "lint/Model.h"
 
+#include "database/FileNames.h"
+#include "database/FileReading.h"
 #include "database/IndexMaintenance.h"
 #include "model/RecordSplitter.h"
 #include "text/Suggest.h"
@@ -205,22 +207,25 @@ const std::vector<Token>& Section::list(std::string_view key) const {
 
 Token FamilyData::start() const { return startOf(files.front()); }
 
-std::string directoryOf(const AcdLines& file) {
-    const std::size_t slash = file.path().rfind('/');
-    return slash == std::string::npos ? std::string() : file.path().substr(0, slash + 1);
+std::vector<std::string> directoriesOf(const std::vector<AcdLines>& files) {
+    std::set<std::string> directories;
+    for (const AcdLines& file : files) {
+        directories.emplace(acd::directoryOf(file.path()));
+    }
+    directories.erase(std::string());
+    return {directories.begin(), directories.end()};
 }
 
-std::vector<std::string> unusedIndexes(const std::vector<AcdLines>& files) {
-    std::set<std::string> directories;
-    std::transform(files.begin(), files.end(), std::inserter(directories, directories.end()), directoryOf);
-    std::vector<std::string> unused;
-    std::copy_if(directories.begin(), directories.end(), std::back_inserter(unused),
-                 [](const std::string& directory) {
-                     const acd::IndexState state =
-                         directory.empty() ? acd::IndexState::MISSING : acd::checkIndex(directory).state;
-                     return state == acd::IndexState::STALE || state == acd::IndexState::INVALID;
-                 });
-    return unused;
+std::vector<std::string> unusedIndexes(std::vector<std::string> directories) {
+    std::erase_if(directories, [](const std::string& directory) {
+        try {
+            const acd::IndexState state = acd::checkIndex(directory).state;
+            return state == acd::IndexState::MISSING || state == acd::IndexState::CURRENT;
+        } catch (const acd::ReadError&) {
+            return true; // that it cannot be listed is reported otherwise
+        }
+    });
+    return directories;
 }
 
 Token startOf(const AcdLines& file) {

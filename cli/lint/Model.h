@@ -150,11 +150,11 @@ using Families = std::vector<std::shared_ptr<const FamilyData>>;
 /// @param files those of a family follow each other, the bottom layer first
 [[nodiscard]] Families familiesOf(std::vector<AcdLines> files);
 
-/// The directory of a file, as its path has it; nothing for a file in memory.
-[[nodiscard]] std::string directoryOf(const AcdLines& file);
+/// The directories of files; those in memory have none.
+[[nodiscard]] std::vector<std::string> directoriesOf(const std::vector<AcdLines>& files);
 
-/// The directories of the files whose index does not match the files in it.
-[[nodiscard]] std::vector<std::string> unusedIndexes(const std::vector<AcdLines>& files);
+/// Those of the directories whose index does not match the files in it.
+[[nodiscard]] std::vector<std::string> unusedIndexes(std::vector<std::string> directories);
 
 /// Where to report something that no line of a file says.
 [[nodiscard]] Token startOf(const AcdLines& file);

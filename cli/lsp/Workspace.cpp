@@ -43,6 +43,7 @@ void Workspace::reload(const Documents& documents) {
     }
     acd::DeferredMessages faults; // a directory that cannot be listed has no base.acd
     m_catalogue = std::make_unique<acd::Catalogue>(m_directories, faults, unsaved);
+    m_unusedIndexes = lint::unusedIndexes(m_directories);
     m_statuses.clear();
     for (const std::string& directory : m_directories) {
         try {
@@ -91,9 +92,9 @@ void Workspace::update(const Documents& documents) {
         families.push_back(entry.data);
         m_entries.emplace(family->name, std::move(entry));
     }
-    if (!isSame || m_entries.size() != former.size()) {
+    if (!isSame || m_entries.size() != former.size() || m_model->unusedIndexes() != m_unusedIndexes) {
         m_findings.reset(); // before the model that they refer to
-        m_model = std::make_unique<const lint::Model>(std::move(families));
+        m_model = std::make_unique<const lint::Model>(std::move(families), m_unusedIndexes);
     }
     requireDatabase();
 }

@@ -81,6 +81,7 @@ private:
     std::vector<std::string> m_directories;
     std::map<std::string, Entry> m_entries; ///< by family
     std::unique_ptr<acd::Catalogue> m_catalogue;
+    std::vector<std::string> m_unusedIndexes;          ///< when they were listed
     std::map<std::string, acd::FileStatus> m_statuses; ///< of the files on disk, when they were listed
     std::unique_ptr<const lint::Model> m_model = std::make_unique<const lint::Model>(lint::Families());
     std::string m_fault;

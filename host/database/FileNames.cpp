@@ -23,7 +23,7 @@ std::string_view fileNameOf(std::string_view path) noexcept {
 
 std::string joinPath(const std::string& directory, const std::string& name) {
     const std::string_view separators = platform::pathSeparators();
-    const bool isOpen = !directory.empty() && separators.find(directory.back()) != separators.npos;
+    const bool isOpen = directory.find_last_of(separators) + 1 == directory.size();
     return isOpen ? directory + name : directory + separators.front() + name;
 }
 

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <AcdText.h>
+
 #include <algorithm>
 #include <array>
 #include <cstddef>
@@ -15,18 +17,13 @@ namespace acd::platform {
     constexpr std::array<std::string_view, 13> NUMBERS{
         "0", "1", "2", "3",        "4",        "5",       "6",
         "7", "8", "9", "\xC2\xB9", "\xC2\xB2", "\xC2\xB3"}; // also superscripts
-    const auto equals = [](std::string_view left, std::string_view right) noexcept {
-        return std::equal(left.begin(), left.end(), right.begin(), right.end(), [](char a, char b) {
-            return (a >= 'a' && a <= 'z' ? static_cast<char>(a - 'a' + 'A') : a) == b;
-        });
-    };
     std::string_view name = fileName.substr(0, fileName.find_first_of(".:"));
     name = name.substr(0, name.find_last_not_of(' ') + 1);
     const std::string_view device = name.substr(0, std::min<std::size_t>(name.size(), 3));
     return std::any_of(DEVICES.begin(), DEVICES.end(),
-                       [&](std::string_view each) { return equals(name, each); }) ||
+                       [&](std::string_view each) { return AcdText::equalsIgnoreCase(name, each); }) ||
            (std::any_of(NUMBERED.begin(), NUMBERED.end(),
-                        [&](std::string_view each) { return equals(device, each); }) &&
+                        [&](std::string_view each) { return AcdText::equalsIgnoreCase(device, each); }) &&
             std::find(NUMBERS.begin(), NUMBERS.end(), name.substr(device.size())) != NUMBERS.end());
 }
 

@@ -1,6 +1,7 @@
 // Rules about lines that the reader rejects: each costs the line and is reported at its place.
 #include "lint/rules/RuleSets.h"
 
+#include "database/FileNames.h"
 #include "lint/FamilyResult.h"
 #include "text/Trimmed.h"
 
@@ -279,7 +280,7 @@ void check(const Model& model, const FamilyResults& /*any*/, Findings& findings)
     const std::vector<const AcdLines*> files = model.files();
     for (const std::string& directory : model.unusedIndexes()) {
         const auto first = std::find_if(files.begin(), files.end(), [&directory](const AcdLines* file) {
-            return directoryOf(*file) == directory;
+            return acd::directoryOf(file->path()) == directory;
         });
         findings.addText(UNUSED_INDEX, startOf(**first),
                          "index.acx of this directory does not match the files, so it is not used");
