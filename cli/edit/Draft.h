@@ -45,7 +45,7 @@ public:
     [[nodiscard]] std::vector<File>& files() { return m_files; }
     [[nodiscard]] const std::vector<File>& files() const { return m_files; }
 
-    /// The file of a family in a layer, which is created if there is none.
+    /// The file of a family in a layer, which is created if it does not exist.
     /// @param directory of the layer
     [[nodiscard]] File& fileOf(const std::string& family, std::size_t layer, const std::string& directory);
 

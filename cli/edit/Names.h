@@ -33,7 +33,7 @@ struct NamedItem {
     std::size_t begin; ///< in the value
     std::size_t end;
     std::size_t nameBegin; ///< of the name in it
-    std::size_t nameEnd;   ///< the same where there is none
+    std::size_t nameEnd;   ///< equal to the start if the name is missing
 };
 
 /// A statement before the first section of base.acd or spi.acd whose value can contain names.
@@ -52,7 +52,7 @@ class NameIndex {
 public:
     explicit NameIndex(const lint::Model& model);
 
-    /// The name of an item, which may be joined with a package; empty if there is none.
+    /// The name of an item, which may be joined with a package; empty if it has no name.
     [[nodiscard]] std::string_view nameOf(const NamedStatement& statement, const NamedItem& item) const;
 
     /// Is it the same name at this place?

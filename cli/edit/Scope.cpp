@@ -12,7 +12,7 @@ namespace edit {
 
 namespace {
 
-/// The line of the readers that has a location, and the header before it; null where there is none.
+/// The line that contains a location, and the header before it; null if no line does, or no header precedes it.
 struct Place {
     const AcdLines::Line* line = nullptr;
     const AcdLines::Line* header = nullptr;

@@ -19,7 +19,7 @@ struct Element {
     const AcdLines::Line* line = nullptr; ///< what the readers make of a LINE; null for the others
 };
 
-/// The text of a database file, taken apart as the readers do and without any loss: the byte-order mark and the
+/// The text of a database file, split as the readers split it and without any loss: the byte-order mark and the
 /// elements, one after the other, are the text.
 class SourceFile {
 public:

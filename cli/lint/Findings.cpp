@@ -43,7 +43,7 @@ std::uint64_t hash(std::string_view text) {
     return value;
 }
 
-/// Tells whether a finding has a cause among all.
+/// Finds out which findings are caused by others.
 class Causes {
 public:
     explicit Causes(const std::vector<Finding>& findings) {

@@ -146,7 +146,7 @@ private:
 /// Families by the order of their files. Models share those that do not differ.
 using Families = std::vector<std::shared_ptr<const FamilyData>>;
 
-/// Takes the files of a database apart into families.
+/// Groups the files of a database by family.
 /// @param files those of a family follow each other, the bottom layer first
 [[nodiscard]] Families familiesOf(std::vector<AcdLines> files);
 

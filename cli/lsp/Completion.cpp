@@ -176,7 +176,7 @@ private:
         field.item = firstItem(m_context.kind, line);
         if (schema::shapeOf(m_context.kind, key) == schema::Shape::RECORDS) {
             field.item += static_cast<std::size_t>(std::count(value.begin(), value.end(), splitter::RECORDS));
-            value.remove_prefix(value.rfind(splitter::RECORDS) + 1); // 0 if there is none
+            value.remove_prefix(value.rfind(splitter::RECORDS) + 1); // 0 without a separator
             field.field = static_cast<std::size_t>(std::count(value.begin(), value.end(), splitter::FIELDS));
             field.name = value.substr(0, value.find(splitter::FIELDS));
         }

@@ -7,7 +7,7 @@
 
 namespace lsp {
 
-/// Takes a stream of messages apart: headers, a blank line, and as many bytes as `Content-Length` says.
+/// Splits a stream into messages: headers, a blank line, and as many bytes as `Content-Length` says.
 ///
 /// What is not a message is skipped up to the next header of that name, so that one fault costs little.
 class MessageReader {

@@ -120,7 +120,7 @@ void forEachUse(const View& view, const Name& name, const std::function<void(con
     }
 }
 
-/// A family has no line of its own: the start of its files stands for it.
+/// No line defines a family, so its definition is the start of its files.
 std::vector<lint::Token> filesOf(const View& view, const Name& family) {
     std::vector<lint::Token> starts;
     for (const AcdLines* file : view.workspace.model().files()) {

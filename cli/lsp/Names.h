@@ -44,7 +44,7 @@ struct FoundName {
 
 /// The edits that give it another name, in all files of the database.
 /// @param canRenameFiles says whether the editor can
-/// @throw RequestError (REQUEST_FAILED) if the new name is none, or is in use
+/// @throw RequestError (REQUEST_FAILED) if the new name is not a valid name, or is in use
 [[nodiscard]] Json renamingOf(const View& view, const Name& name, const std::string& newName,
                               bool canRenameFiles);
 

@@ -102,7 +102,7 @@ std::size_t offsetOf(std::string_view text, const Position& position, Encoding e
 
 Position positionOf(std::string_view text, std::size_t offset, Encoding encoding) {
     const std::string_view before = text.substr(0, offset);
-    const std::size_t start = before.rfind('\n') + 1; // 0 if there is none
+    const std::size_t start = before.rfind('\n') + 1; // 0 on the first line
     return {static_cast<std::size_t>(std::count(before.begin(), before.end(), '\n')),
             unitsOf(before.substr(start), encoding)};
 }

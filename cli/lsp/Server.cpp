@@ -255,7 +255,7 @@ Json Server::shutdown(const Json& /*none*/) {
     return {};
 }
 
-/// Asks to be told of files that other programs change.
+/// Registers for changes of files by other programs.
 void Server::initialized(const Json& /*none*/) {
     if (m_canWatch) {
         const Json watcher{{"globPattern", "**/*.acd"}};

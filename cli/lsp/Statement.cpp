@@ -1,4 +1,4 @@
-// Takes statements apart by the schema.
+// Splits statements by the schema.
 #include "lsp/Statement.h"
 
 #include "model/RecordSplitter.h"

@@ -113,7 +113,7 @@ void Tool::noteStartUpFault(const std::string& message) const {
         return;
     }
     if (const std::optional<catalogue::SourceText> fault = findStartUpFault()) {
-        note(fmt::format("{}: \"{}\" ends the start-up, in applications, too: nothing behind it is read",
+        note(fmt::format("{}: \"{}\" ends the start-up, in applications, too: nothing after it is read",
                          catalogue::asText(fault->origin), fault->text));
     }
 }

@@ -29,7 +29,7 @@ public:
     /// @throw CommandError (FAULT) if it is missing or cannot be read
     void openDatabase();
 
-    /// From now on answers, and the reason why there is none, are JSON objects.
+    /// From now on answers and errors are JSON objects.
     void useJson() noexcept { m_settings.json = true; }
 
     /// Chooses the directories of a database to be changed, which may have no base.acd yet.

@@ -16,14 +16,14 @@ struct Element {
 
 unsigned char lower(char byte) { return static_cast<unsigned char>(AcdText::toLower(byte)); }
 
-/// A backslash takes the next byte as it is. @return nothing if there is none
+/// A backslash makes the next byte literal. @return nothing at the end of the pattern
 std::optional<char> takeByte(std::string_view pattern, std::size_t& position) {
     position += pattern[position] == '\\' ? 1U : 0U;
     return position < pattern.size() ? std::optional(pattern[position++]) : std::nullopt;
 }
 
 /// @param pattern begins with `[`
-/// @return nothing if the bracket is not closed, so that it stands for itself
+/// @return nothing if the bracket is not closed, so that it matches itself
 std::optional<Element> matchBracket(std::string_view pattern, char byte) {
     std::size_t position = 1;
     const bool isNegated =
