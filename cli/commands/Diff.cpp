@@ -5,6 +5,7 @@
 #include "diff/Presentation.h"
 #include "diff/Revision.h"
 #include "platform/Platform.h"
+#include "query/ApplicationFault.h"
 #include "query/Database.h"
 #include "query/DeviceTables.h"
 #include "query/Tool.h"
@@ -47,10 +48,12 @@ std::string snapshotOrFault(Tool& tool, const std::string& database) {
     try {
         openDatabase(directoriesOf({database}));
         Progress progress("asking about each device");
-        std::string snapshot = diff::takeSnapshot(
+        std::string text;
+        diff::putBlock(text, oneLine(findApplicationFaults()));
+        text += diff::takeSnapshot(
             [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
         static_cast<void>(tool.messages().take());
-        return snapshot;
+        return text;
     } catch (const std::exception& fault) {
         std::string reason(1, diff::FAULT_MARK);
         for (const Messages::Message& message : tool.messages().take()) {
@@ -93,6 +96,7 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
             comparison.unanswered.size(), comparison.unanswered.front()));
         status = ExitCode::FAULT;
     }
+    noteApplicationFaults(tool, comparison.applicationFaults);
     return arguments.format == "markdown" ? tool.answer(ReleaseNotes{comparison}, status)
                                           : tool.answer(comparison, status);
 }

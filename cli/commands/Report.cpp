@@ -1,6 +1,7 @@
 // `report`: a page about all devices, to look at in a browser.
 #include "commands/Commands.h"
 
+#include "query/ApplicationFault.h"
 #include "query/DeviceSurvey.h"
 #include "query/Tool.h"
 #include "report/Page.h"
@@ -61,6 +62,7 @@ ExitCode run(Tool& tool, const std::string& file) {
                 }
             },
             [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
+    noteApplicationFaults(tool, findApplicationFaults());
     if (file == STANDARD_OUTPUT || isStandardOutput(file)) {
         static_cast<void>(tool.answer(Shown{page}));
     } else {

@@ -247,13 +247,10 @@ Json asJson(const Shown& shown) {
             {"options", asJson(details.options->rows)}};
 }
 
-/// Notes what an application gets that asks for a device's operations, then for its options. Both load all there is.
+/// Notes what an application gets that asks about the device.
 void noteFault(Tool& tool, const std::string& device) {
     const auto ask = [&](ConstraintsManager& manager) {
-        constexpr auto MODE = TARVIKNS::MODE_TYPE::BS;
-        constexpr auto OUTPUT = TARVIKNS::OUTPUT_TYPE::USB2;
-        static_cast<void>(manager.getDeviceOperations(device.c_str(), MODE, OUTPUT));
-        static_cast<void>(manager.getProgramOptions(device.c_str(), MODE, OUTPUT, nullptr));
+        askForTables(manager, device);
         return std::string();
     };
     noteApplicationFault(tool, ask, std::nullopt);

@@ -3,6 +3,7 @@
 
 #include "commands/CommonArguments.h"
 #include "model/Vocabulary.h"
+#include "query/ApplicationFault.h"
 #include "query/DeviceSurvey.h"
 #include "query/Tool.h"
 #include "term/Progress.h"
@@ -194,6 +195,7 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     const ExitCode status = !matches.faults.empty()   ? ExitCode::FAULT
                             : matches.devices.empty() ? ExitCode::NO
                                                       : ExitCode::YES;
+    noteApplicationFaults(tool, findApplicationFaults());
     static_cast<void>(tool.answer(matches));
     if (!matches.faults.empty()) {
         tool.note(unansweredText(matches.faults));

@@ -4,34 +4,47 @@
 #include "term/ExitCode.h"
 #include "term/Subprocess.h"
 
+#include <string_view>
+#include <utility>
 #include <vector>
 
 namespace diff {
 
 namespace {
 
-std::string outputOf(Subprocess& process) {
-    std::string text = process.output();
+/// What such a process wrote.
+/// @param side which of the two databases it is
+/// @param faults gets what an application meets in it
+std::string snapshotOf(Subprocess& process, const char* side, Json& faults) {
+    const std::string text = process.output();
     if (text.starts_with(FAULT_MARK)) {
         throw CommandError(ExitCode::FAULT, text.substr(1));
     }
-    return text;
+    std::string_view rest = text;
+    for (Json& fault : Json::parse(takeBlock(rest))) {
+        fault["database"] = side;
+        faults.push_back(std::move(fault));
+    }
+    return std::string(rest);
 }
 
 } // namespace
 
 Comparison compareDatabases(const std::string& oldDatabase, const std::string& newDatabase,
                             const Renaming& renamed) {
-    const auto snapshotOf = [](const std::string& database) {
+    const auto command = [](const std::string& database) {
         return std::vector<std::string>{"diff", "--format", SNAPSHOT_FORMAT, "--", database, database};
     };
     // Both take about the same time, so one of them shows the progress.
-    Subprocess oldProcess(snapshotOf(oldDatabase), false);
-    Subprocess newProcess(snapshotOf(newDatabase), true);
-    Snapshot before(outputOf(oldProcess));
+    Subprocess oldProcess(command(oldDatabase), false);
+    Subprocess newProcess(command(newDatabase), true);
+    Json faults = Json::array();
+    Snapshot before(snapshotOf(oldProcess, "old", faults));
     before.rename(renamed);
-    const Snapshot after(outputOf(newProcess));
-    return compare(before, after);
+    const Snapshot after(snapshotOf(newProcess, "new", faults));
+    Comparison comparison = compare(before, after);
+    comparison.applicationFaults = std::move(faults);
+    return comparison;
 }
 
 } // namespace diff

@@ -7,7 +7,7 @@
 namespace diff {
 
 /// The format in which a process writes the answers of one database for the process that compares them: an argument of
-/// the command `diff` that is not offered to people.
+/// the command `diff` that is not offered to people. Before the answers is a block: what an application meets, in JSON.
 inline constexpr const char* SNAPSHOT_FORMAT = "snapshot";
 
 /// The start of a text that such a process writes to say why there are no answers.

@@ -2,6 +2,7 @@
 
 #include "diff/NaturalLess.h"
 #include "diff/Snapshot.h"
+#include "text/Json.h"
 
 #include <cstddef>
 #include <map>
@@ -42,6 +43,10 @@ struct Comparison {
 
     /// Devices for which answers are missing in both databases, because the manager raises.
     std::vector<std::string> unanswered;
+
+    /// What an application meets in both databases, as `findApplicationFaults` returns it. It is no difference: answers
+    /// are compared as the tool gets them, with exceptions off.
+    Json applicationFaults = Json::array();
 
     [[nodiscard]] bool isEmpty() const;
 

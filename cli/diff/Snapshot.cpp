@@ -13,8 +13,6 @@ void putBlock(std::string& text, std::string_view block) {
     text.append(std::to_string(block.size()) + ':').append(block);
 }
 
-namespace {
-
 std::string_view takeBlock(std::string_view& rest) {
     std::size_t size = 0;
     const auto [end, fault] = std::from_chars(rest.data(), rest.data() + rest.size(), size);
@@ -26,6 +24,8 @@ std::string_view takeBlock(std::string_view& rest) {
     rest.remove_prefix(start + size);
     return block;
 }
+
+namespace {
 
 /// The answers after families and devices got other names.
 Answers renamedAnswers(const Answers& answers, const Renaming& renamed) {

@@ -85,8 +85,12 @@ private:
 /// @return the answers in a form that another process can read
 [[nodiscard]] std::string takeSnapshot(const ProgressCallback& progress);
 
-/// Appends a part of a snapshot, with its size before it.
+/// Appends a part to a text of several, with its size before it.
 void putBlock(std::string& text, std::string_view block);
+
+/// Cuts the first part off.
+/// @throw CommandError (FAULT) if there is none
+[[nodiscard]] std::string_view takeBlock(std::string_view& rest);
 
 /// Answers as lines of fields. Both ends are bytes that no text of a database holds.
 [[nodiscard]] std::string serialized(const Answers& answers);

@@ -1,6 +1,7 @@
 // Finds the faults of a database that the tool survives and an application meets.
 #include "query/ApplicationFault.h"
 
+#include "query/DeviceList.h"
 #include "query/FreshManager.h"
 #include "query/ReadLog.h"
 #include "query/Tool.h"
@@ -13,6 +14,11 @@
 
 #include <fmt/format.h>
 #include <fmt/ranges.h>
+
+#include <algorithm>
+#include <cstddef>
+#include <map>
+#include <utility>
 
 namespace {
 
@@ -35,14 +41,11 @@ std::string askAgain(ConstraintsManager& manager, const AnswerInWords& ask) {
     }
 }
 
-} // namespace
-
-std::optional<ApplicationFault> findApplicationFault(const AnswerInWords& ask) {
-    const MutedMessages muted;
-    const ManagerFactory::Manager manager = ManagerFactory::make();
+/// What some work raises, other than that a property is missing.
+std::optional<ApplicationFault> findFault(const std::function<void()>& work) {
     ReadLog reads;
     try {
-        reads.record([&] { static_cast<void>(ask(*manager)); });
+        reads.record(work);
     } catch (const TarvikException& fault) {
         if (fault.line() == location::PROPERTY_NOT_FOUND) {
             return std::nullopt;
@@ -51,10 +54,35 @@ std::optional<ApplicationFault> findApplicationFault(const AnswerInWords& ask) {
         if (const ReadLog::Match record = reads.lastOrItsRecord(); record && isAboutRecord(fault.line())) {
             found.record = record.sourceText();
         }
-        found.again = askAgain(*manager, ask);
         return found;
     }
     return std::nullopt;
+}
+
+Json asJson(const ApplicationFault& fault) {
+    Json object{{"exception", fault.exception}, {"location", fault.location}};
+    if (fault.record) {
+        object.update(catalogue::asJson(fault.record->origin));
+        object["fragment"] = fault.record->text;
+    }
+    return object;
+}
+
+/// The sentence that tells the user about it.
+std::string noteOf(const ApplicationFault& fault, const std::optional<std::string>& answer) {
+    return reasonOf(fault) + ": " + effectOf(fault, answer);
+}
+
+} // namespace
+
+std::optional<ApplicationFault> findApplicationFault(const AnswerInWords& ask) {
+    const MutedMessages muted;
+    const ManagerFactory::Manager manager = ManagerFactory::make();
+    std::optional<ApplicationFault> fault = findFault([&] { static_cast<void>(ask(*manager)); });
+    if (fault) {
+        fault->again = askAgain(*manager, ask);
+    }
+    return fault;
 }
 
 bool isStartUpFault(std::string_view message) {
@@ -105,13 +133,59 @@ void noteApplicationFault(Tool& tool, const AnswerInWords& ask, const std::optio
     if (!fault) {
         return;
     }
-    Json object{{"exception", fault->exception}, {"location", fault->location}};
+    Json object = asJson(*fault);
     if (answer) {
         object["again"] = fault->again;
     }
-    if (fault->record) {
-        object.update(catalogue::asJson(fault->record->origin));
-        object["fragment"] = fault->record->text;
+    tool.note(noteOf(*fault, answer), "fault", std::move(object));
+}
+
+void askForTables(ConstraintsManager& manager, const std::string& device) {
+    constexpr auto MODE = TARVIKNS::MODE_TYPE::BS;
+    constexpr auto OUTPUT = TARVIKNS::OUTPUT_TYPE::USB2;
+    static_cast<void>(manager.getDeviceOperations(device.c_str(), MODE, OUTPUT));
+    static_cast<void>(manager.getProgramOptions(device.c_str(), MODE, OUTPUT, nullptr));
+}
+
+Json findApplicationFaults() {
+    const MutedMessages muted;
+    const ManagerFactory::Manager manager = ManagerFactory::make();
+    Json faults = Json::array();
+    std::map<std::string, std::vector<std::string>> devices; // by the note about the fault that they meet
+    for (const ListedName& name : deviceList()) {
+        const std::optional<ApplicationFault> fault = findFault(
+            [&] { askForTables(name.isOrderDependent ? *ManagerFactory::make() : *manager, name.name); });
+        if (!fault) {
+            continue;
+        }
+        Json object = asJson(*fault);
+        const std::string note = object["note"] = noteOf(*fault, std::nullopt);
+        devices[note].push_back(name.name);
+        if (devices[note].size() == 1) {
+            faults.push_back(std::move(object));
+        }
     }
-    tool.note(reasonOf(*fault) + ": " + effectOf(*fault, answer), "fault", std::move(object));
+    for (Json& fault : faults) {
+        if (!fault.contains("file")) {
+            const std::vector<std::string>& concerned = devices[fault["note"]];
+            const std::size_t others = concerned.size() - 1;
+            fault["note"] = fmt::format("{}{}: {}", concerned.front(),
+                                        others == 0 ? "" : fmt::format(" and {} more", others),
+                                        fault["note"].get<std::string>());
+        }
+    }
+    return faults;
+}
+
+void noteApplicationFaults(Tool& tool, const Json& faults) {
+    constexpr std::size_t SHOWN = 5;
+    for (std::size_t position = 0; position < std::min(SHOWN, faults.size()); ++position) {
+        tool.note(faults[position]["note"]);
+    }
+    if (faults.size() > SHOWN) {
+        tool.note(fmt::format("{} more such faults: see tarvik lint", faults.size() - SHOWN));
+    }
+    if (!faults.empty()) {
+        tool.addMember("applicationFaults", faults);
+    }
 }

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "model/Records.h"
+#include "text/Json.h"
 
 #include <functional>
 #include <optional>
@@ -50,3 +51,13 @@ struct ApplicationFault {
 /// Tells the user, in a note and as the member "fault" of the JSON object, if an application gets something else.
 /// @param answer as for `effectOf`
 void noteApplicationFault(Tool& tool, const AnswerInWords& ask, const std::optional<std::string>& answer);
+
+/// Asks for a device's operations, then for its options. Both load all there is.
+void askForTables(ConstraintsManager& manager, const std::string& device);
+
+/// Asks for the tables of all devices and flashes, with exceptions on.
+/// @return the faults that an application meets, each once: objects as in the answers, with a "note" in words
+[[nodiscard]] Json findApplicationFaults();
+
+/// Tells the user about such faults, if there are any, in notes and as the member "applicationFaults" of the JSON object.
+void noteApplicationFaults(Tool& tool, const Json& faults);

@@ -45,8 +45,10 @@ void Tool::note(const std::string& text) const {
 
 void Tool::note(const std::string& text, const char* member, Json value) {
     note(text);
-    m_remarks[member] = std::move(value);
+    addMember(member, std::move(value));
 }
+
+void Tool::addMember(const char* member, Json value) { m_remarks[member] = std::move(value); }
 
 Json Tool::answerOf(const std::function<ExitCode(Tool&)>& command) {
     Json answer;

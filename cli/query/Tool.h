@@ -69,6 +69,9 @@ public:
     /// The same, and adds a member to the JSON object of the answer.
     void note(const std::string& text, const char* member, Json value);
 
+    /// Adds a member to the JSON object of the answer that follows.
+    void addMember(const char* member, Json value);
+
     /// Runs a command and returns the JSON object that it would write with `--json`, instead of writing it. Its notes
     /// are dropped.
     /// @throw CommandError if there is no answer

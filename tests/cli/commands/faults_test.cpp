@@ -8,8 +8,11 @@
 namespace {
 
 using nlohmann::json;
+using testing::AllOf;
+using testing::EndsWith;
 using testing::HasSubstr;
 using testing::Not;
+using testing::StartsWith;
 using Words = std::vector<std::string>;
 
 /// A database of one family with the devices FN10 and FN20.
@@ -21,6 +24,7 @@ public:
                                     "BS = outputs,USB2:families,finch\n"},
                        {"finch.acd", family + "[FN10]\n[FN20]\n"}}) {}
 
+    [[nodiscard]] std::string path() const { return m_directory.path(); }
     [[nodiscard]] std::string path(const std::string& name) const { return m_directory.path(name); }
 
     [[nodiscard]] ProcessResult run(Words words) const {
@@ -157,17 +161,76 @@ TEST(Faults, RecordThatEndsTheStartUpIsNamed) {
 
 TEST(Faults, SurveysSayHowManyDevicesHaveNoAnswer) {
     const FaultyDatabase database(UNKNOWN_OPTION);
+    const std::string place = database.path("finch.acd") + ":2:18: \"NONSENSE\" is faulty";
     const std::string note = "tarvik: no answer for 2 devices, the first FN10: see tarvik show FN10\n";
     for (const Words& words :
          {Words{"which", "--operation", "ERASE"}, Words{"which", "--property", "VENDOR=Korvel"},
           Words{"report", "--file", "-"}, Words{"report", "--file", database.path("report.html")}}) {
         const ProcessResult outcome = database.run(words);
         EXPECT_EQ(outcome.status, 2);
-        EXPECT_EQ(outcome.error, note);
+        EXPECT_THAT(outcome.error, AllOf(HasSubstr(place), EndsWith(note)));
     }
     EXPECT_EQ(database.answer({"report", "--file", database.path("report.html")})["faults"],
               (json{"FN10", "FN20"}));
     EXPECT_EQ(database.answer({"which", "--operation", "ERASE"})["faults"], (json{"FN10", "FN20"}));
+}
+
+TEST(Faults, SurveysSayWhatAnApplicationGets) {
+    const FaultyDatabase database(TYPO);
+    const FaultyDatabase sound("OPERATION = ERASE,Bscan,USB2\n");
+    const std::string note = database.path("finch.acd") +
+                             ":1:32: \"VERFY\" is faulty: an application gets OutOfRangeException (location "
+                             "1631), and afterwards answers without this record and those after it";
+    json fault{{"exception", "OutOfRangeException"},
+               {"location", 1631},
+               {"file", database.path("finch.acd")},
+               {"line", 1},
+               {"column", 32},
+               {"fragment", "VERFY"},
+               {"note", note}};
+    for (const Words& words :
+         {Words{"which", "--operation", "ERASE"}, Words{"which", "--property", "VENDOR=Korvel"},
+          Words{"report", "--file", database.path("report.html")}}) {
+        const ProcessResult outcome = database.run(words);
+        EXPECT_EQ(outcome.status, 0);
+        EXPECT_THAT(outcome.error, StartsWith("tarvik: " + note + "\n"));
+        EXPECT_EQ(database.answer(words)["applicationFaults"], json{fault});
+    }
+    const Words diff{"diff", sound.path(), database.path(), "--json"};
+    EXPECT_THAT(runTool({diff.begin(), diff.end() - 1}).error, StartsWith("tarvik: " + note + "\n"));
+    fault["database"] = "new";
+    EXPECT_EQ(json::parse(runTool(diff).output)["applicationFaults"], json{fault});
+}
+
+TEST(Faults, SurveysSayWhatADeviceWithoutATableGets) {
+    const DatabaseDirectory database(
+        {{"base.acd", "DEVICE_SUPPORTED = other\nPROGRAM_OPTION_PACKAGE = finch\n"},
+         {"finch.acd", "OPERATION = ERASE,Bscan,USB2\nPROPERTY = VENDOR,Korvel\n[FN10]\n[FN20]\n[FN30]\n"}});
+    const ProcessResult outcome =
+        runTool({"--database", database.path(), "which", "--property", "VENDOR=Korvel"});
+    EXPECT_THAT(outcome.error,
+                StartsWith("tarvik: FN10 and 2 more: DEVICE_SUPPORTED lists neither the device nor "
+                           "its family: an application gets OutOfRangeException (location 1999)"));
+}
+
+TEST(Faults, SurveysShowTheFirstFaultsOfMany) {
+    std::string sections;
+    std::string names = "finch";
+    for (int device = 1; device <= 8; ++device) {
+        const std::string number = std::to_string(device);
+        sections += "[FN" + number + "]\nOPERATION = WRONG" + number + ",Bscan,USB2\n";
+        names += ",FN" + number;
+    }
+    const DatabaseDirectory database(
+        {{"base.acd", "DEVICE_SUPPORTED = " + names + "\nPROGRAM_OPTION_PACKAGE = finch\n"},
+         {"finch.acd", sections}});
+    Words words{"--database", database.path(), "which", "--operation", "ERASE"};
+    const std::string notes = runTool(words).error;
+    EXPECT_THAT(notes, HasSubstr("\"WRONG5\" is faulty"));
+    EXPECT_THAT(notes, Not(HasSubstr("\"WRONG6\" is faulty")));
+    EXPECT_THAT(notes, HasSubstr("tarvik: 3 more such faults: see tarvik lint\n"));
+    words.emplace_back("--json");
+    EXPECT_EQ(json::parse(runTool(words).output)["applicationFaults"].size(), 8U);
 }
 
 TEST(Faults, SurveysOfASoundDatabase) {
@@ -176,6 +239,8 @@ TEST(Faults, SurveysOfASoundDatabase) {
     EXPECT_EQ(report.status, 0);
     EXPECT_EQ(report.error, "");
     EXPECT_EQ(database.run({"which", "--operation", "ERASE"}).status, 0);
+    EXPECT_FALSE(database.answer({"which", "--operation", "ERASE"}).contains("applicationFaults"));
+    EXPECT_EQ(runTool({"diff", database.path(), database.path()}).error, "");
 }
 
 } // namespace
