@@ -48,10 +48,11 @@ std::string snapshotOrFault(Tool& tool, const std::string& database) {
     try {
         openDatabase(directoriesOf({database}));
         Progress progress("asking about each device");
+        const std::string snapshot = diff::takeSnapshot(
+            [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
         std::string text;
         diff::putBlock(text, oneLine(findApplicationFaults()));
-        text += diff::takeSnapshot(
-            [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
+        text += snapshot;
         static_cast<void>(tool.messages().take());
         return text;
     } catch (const std::exception& fault) {

@@ -85,6 +85,10 @@ struct MaskQuestion {
     noteApplicationFault(
         tool, [&](ConstraintsManager& manager) { return inWords(membersOf(manager).keys); },
         inWords(members.keys));
+    if (members.asked.contains("mode") &&
+        members.asked["mode"] == vocabulary::key(TARVIKNS::MODE_TYPE::SPI)) {
+        tool.note(questions::SPI_MODE_RULE);
+    }
     const ExitCode status = tool.answer(members, members.keys.empty() ? ExitCode::NO : ExitCode::YES);
     if (members.keys.empty()) {
         tool.note(

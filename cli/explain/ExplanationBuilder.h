@@ -3,6 +3,7 @@
 #include "explain/Explanation.h"
 #include "explain/Inquiry.h"
 
+#include <functional>
 #include <set>
 #include <string>
 #include <vector>
@@ -29,6 +30,8 @@ private:
     [[nodiscard]] bool isExcluded(const std::string& device);
     [[nodiscard]] std::vector<Match> modeWords(int record) const;
     void addAbsentFromMode(int record, const std::string& absent, const std::string& noRecord);
+    void addMisspelledWords(int record, const char* kind, const std::string& word,
+                            const std::function<bool(const std::string&)>& isKnown);
 
     // Permission tables.
     struct Permission {

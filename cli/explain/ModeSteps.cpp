@@ -1,12 +1,17 @@
 // What a mode can use, and what can be configured in it: the mode tables of the base database.
 #include "explain/ExplanationBuilder.h"
 
+#include "model/Catalogue.h"
 #include "model/Schema.h"
 #include "model/Vocabulary.h"
+#include "query/ManagerQueries.h"
+#include "text/Suggest.h"
 
 #include <tarvik/ConstraintsManager.h>
 
 #include <fmt/format.h>
+
+#include <algorithm>
 
 namespace explanation {
 
@@ -50,6 +55,17 @@ void ExplanationBuilder::addAbsentFromMode(int record, const std::string& absent
     }
 }
 
+/// Notes the words of a mode's record that would be the one that is asked for if they were not mistyped.
+void ExplanationBuilder::addMisspelledWords(int record, const char* kind, const std::string& word,
+                                            const std::function<bool(const std::string&)>& isKnown) {
+    for (const Match& match : modeWords(record)) {
+        const std::string& text = match.text->text;
+        if (!isKnown(text) && suggest(text, {word})) {
+            add("note", fmt::format("\"{}\" is not {}; is {} meant?", text, kind, word), match);
+        }
+    }
+}
+
 bool ExplanationBuilder::output() {
     const std::string& mode = vocabulary::key(m_question.mode);
     const std::string& output = vocabulary::key(m_question.output);
@@ -81,6 +97,9 @@ bool ExplanationBuilder::output() {
     }
     addAbsentFromMode(OUTPUTS, fmt::format("mode {} can use {}, not {}", mode, listed(keys), output),
                       fmt::format("base.acd has no key {}", mode));
+    addMisspelledWords(OUTPUTS, "an output", output, [](const std::string& word) {
+        return ConstraintsManager::cableString2Type(word.c_str()) != OUTPUT_TYPE::NONE;
+    });
     return false;
 }
 
@@ -98,7 +117,7 @@ bool ExplanationBuilder::modeAllowsDevice() {
     std::string name = addNameStep();
     if (m_question.mode == MODE_TYPE::SPI) {
         name = "spi";
-        add("name", "SPI mode treats every device as \"spi\"");
+        add("name", questions::SPI_MODE_RULE);
     }
     if (isExcluded(name)) {
         return false;
@@ -115,6 +134,10 @@ bool ExplanationBuilder::modeAllowsDevice() {
     addAbsentFromMode(FAMILIES,
                       fmt::format("mode {} takes the families {}, not {}", mode, listed(families), family),
                       fmt::format("base.acd lists no families under {}", mode));
+    const std::vector<std::string> known = catalogue::families();
+    addMisspelledWords(FAMILIES, "a family", family, [&known](const std::string& word) {
+        return std::ranges::find(known, word) != known.end();
+    });
     return false;
 }
 

@@ -3,6 +3,7 @@
 
 #include "model/Schema.h"
 #include "model/Vocabulary.h"
+#include "query/ManagerQueries.h"
 #include "text/Suggest.h"
 
 #include <TarvikException.h>
@@ -71,8 +72,7 @@ bool ExplanationBuilder::permission() {
     const Table& table = tableOf(m_question.kind);
     std::string owner = "spi";
     if (table.hasModes && m_question.mode == MODE_TYPE::SPI) {
-        add("rule",
-            fmt::format("SPI mode treats every device as \"spi\": the {} of \"spi\" answer", table.rows));
+        add("rule", fmt::format("{}: the {} of \"spi\" answer", questions::SPI_MODE_RULE, table.rows));
     } else {
         owner = m_question.kind == Kind::OPTION ? optionOwner() : operationOwner();
     }

@@ -4,6 +4,7 @@
 #include "model/Catalogue.h"
 #include "model/Schema.h"
 #include "model/Vocabulary.h"
+#include "query/ManagerQueries.h"
 
 #include <TarvikException.h>
 #include <tarvik/ConstraintsManager.h>
@@ -178,7 +179,7 @@ std::vector<std::string> skippedChecks(const Question& question) {
     const std::string& mode = vocabulary::key(question.mode);
     std::vector<std::string> skipped;
     if (takesMode(kind) && takesOutput(kind) && kind != Kind::OUTPUT && question.mode == MODE_TYPE::SPI) {
-        skipped.emplace_back("SPI mode treats every device as \"spi\"");
+        skipped.emplace_back(questions::SPI_MODE_RULE);
     }
     if (isOneOf(kind, {Kind::OUTPUT, Kind::DEVICE_THROUGH, Kind::COMPLETE}) &&
         question.mode == MODE_TYPE::PFF) {

@@ -11,6 +11,9 @@ class Tool;
 /// Questions that several commands ask the manager.
 namespace questions {
 
+/// Why an answer in SPI mode is not about the device alone.
+inline constexpr const char* SPI_MODE_RULE = "SPI mode treats every device as \"spi\"";
+
 /// The keys of the modes in which the device, or family, may be configured through some output.
 /// @param package may be null
 [[nodiscard]] std::vector<std::string> modes(ConstraintsManager& manager, const std::string& device,

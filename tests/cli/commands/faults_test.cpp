@@ -107,6 +107,26 @@ TEST(Faults, WhyNamesTheRecordThatIsMistyped) {
     EXPECT_THAT(database.run(question).output, HasSubstr("and \"no\" when it asks again\n"));
 }
 
+TEST(Faults, WhyNamesTheMistypedWordsOfAMode) {
+    const DatabaseDirectory database(
+        {{"base.acd",
+          "DEVICE_SUPPORTED = finch\nPROGRAM_OPTION_PACKAGE = finch\n"
+          "BS = outputs,USB3,SVF:families,finhc,base\nSS = outputs,USB3,USB2:families,finhc,finch\n"},
+         {"finch.acd", "[FN10]\n"}});
+    const auto why = [&](const std::string& mode, const std::string& output) {
+        return runTool({"--database", database.path(), "why", "FN10", "--mode", mode, "--output", output})
+            .output;
+    };
+    const std::string output = "  note      \"USB3\" is not an output; is USB2 meant?\n            " +
+                               database.path("base.acd") + ":3:14: USB3\n";
+    const std::string family = "  note      \"finhc\" is not a family; is finch meant?\n            " +
+                               database.path("base.acd") + ":3:32: finhc\n";
+    EXPECT_THAT(why("BS", "USB2"), AllOf(HasSubstr(output), HasSubstr(family)));
+    // Words that others than the one that is asked for are meant by.
+    EXPECT_THAT(why("BS", "PARALLEL"), Not(HasSubstr("an output;")));
+    EXPECT_THAT(why("SS", "USB2"), Not(HasSubstr("meant?")));
+}
+
 TEST(Faults, RecordThatLacksAFieldIsNamedWhole) {
     const FaultyDatabase database("OPERATION = PROGRAM,Bscan:ERASE,Bscan,USB2\n");
     EXPECT_THAT(
@@ -231,6 +251,15 @@ TEST(Faults, SurveysShowTheFirstFaultsOfMany) {
     EXPECT_THAT(notes, HasSubstr("tarvik: 3 more such faults: see tarvik lint\n"));
     words.emplace_back("--json");
     EXPECT_EQ(json::parse(runTool(words).output)["applicationFaults"].size(), 8U);
+}
+
+TEST(Faults, ComparisonNamesTheFileThatCannotBeRead) {
+    const FaultyDatabase sound("");
+    const DatabaseDirectory unreadable({{"base.acd", "DEVICE_SUPPORTED = finch\n"}, {"spi.acd", ""}});
+    std::filesystem::create_directory(unreadable.path("finch.acd"));
+    const ProcessResult outcome = runTool({"diff", sound.path(), unreadable.path()});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_THAT(outcome.error, HasSubstr("tarvik: " + unreadable.path("finch.acd") + ": can't be read: "));
 }
 
 TEST(Faults, SurveysOfASoundDatabase) {

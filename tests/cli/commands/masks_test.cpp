@@ -26,8 +26,9 @@ TEST(Operations, MaskAndKeysStandInJson) {
 
 TEST(Operations, SpiModeAnswersForTheFlashes) {
     const SmallDatabase database;
-    EXPECT_EQ(database.run({"operations", "FN10", "--mode", "SPI", "--output", "USB2"}).output,
-              "ERASE  Erase\n");
+    const ProcessResult outcome = database.run({"operations", "FN10", "--mode", "SPI", "--output", "USB2"});
+    EXPECT_EQ(outcome.output, "ERASE  Erase\n");
+    EXPECT_EQ(outcome.error, "tarvik: SPI mode treats every device as \"spi\"\n");
 }
 
 TEST(Operations, NoneIsAnAnswerWithANote) {
