@@ -143,11 +143,12 @@ std::vector<std::string> names() {
 CommandError unknownDevice(const std::string& name) {
     const std::vector<std::string> known = names();
     const std::string base = name.substr(0, name.find('_'));
-    if (base != name && std::ranges::find(known, name) != known.end()) {
-        return {ExitCode::NO,
-                fmt::format("the database has \"{}\", but \"_\" begins a package, so the manager "
-                            "looks for the device \"{}\"",
-                            name, base)};
+    if (std::ranges::find(known, name) != known.end()) {
+        const std::string reason =
+            base == name
+                ? "the manager looks for flashes in upper case"
+                : fmt::format("\"_\" begins a package, so the manager looks for the device \"{}\"", base);
+        return {ExitCode::NO, fmt::format("the database has \"{}\", but {}", name, reason)};
     }
     const std::string suggestion = didYouMean(name, known);
     return {ExitCode::NO, fmt::format("the database has no device \"{}\"{}", name,

@@ -125,6 +125,16 @@ TEST_F(Completion, IsQuietAboutADatabaseThatIsNotThere) {
     EXPECT_EQ(runTool({"complete"}).status, 0);
 }
 
+TEST_F(Completion, IsQuietAboutAFaultyDatabase) {
+    const DatabaseDirectory faulty(
+        {{"base.acd", "DEVICE_SUPPORTED = finch\nPROGRAM_OPTION_PACKAGE = finch\n"},
+         {"finch.acd", "PROGRAM_OPTION = NONSENSE,Bscan,USB2\n[FN10]\nPROPERTY = PINS,44\n"}});
+    const ProcessResult outcome = run({"--database", faulty.path(), "property", "FN10", ""});
+    EXPECT_EQ(outcome.status, 2);
+    EXPECT_THAT(outcome.output, IsEmpty());
+    EXPECT_THAT(outcome.error, IsEmpty());
+}
+
 TEST_F(Completion, KnowsTheDemonstration) {
     const ProcessResult outcome = runTool({"complete", "show", "KS5"});
     EXPECT_THAT(outcome.output, testing::HasSubstr("KS50\n"));

@@ -282,6 +282,11 @@ TEST(BatchCalls, ShowAndWhyAnswerAsTheCommands) {
     EXPECT_EQ(result("show", R"({"device": "FN10"})", database), database.json({"show", "FN10"}));
     EXPECT_EQ(result("why", R"({"device": "FN10", "mode": "slave serial", "package": "P48"})", database),
               database.json({"why", "FN10", "--mode", "SS", "--package", "P48"}));
+    EXPECT_EQ(
+        result("why",
+               R"({"device": "FLA", "multiboot": "MB_SPI", "width": "NONE", "lead": true, "chain": false})",
+               database),
+        database.json({"why", "FLA", "--multiboot", "MB_SPI", "--width", "NONE", "--lead"}));
     EXPECT_EQ(error("show", R"({"device": "FN11"})"),
               "the database has no device \"FN11\"; did you mean \"FN10\"?");
     for (const char* const arguments :

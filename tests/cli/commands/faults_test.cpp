@@ -164,6 +164,13 @@ TEST(Faults, CommandsThatHaveNoAnswerGiveThePlace) {
     EXPECT_THAT(database.run(question).output, HasSubstr(database.path("finch.acd") + ":2:18: NONSENSE\n"));
 }
 
+TEST(Faults, PackageInANameIsTakenOffBeforeTheFault) {
+    const FaultyDatabase database(UNKNOWN_OPTION);
+    const ProcessResult outcome = database.run({"check", "FN10_P48", "--mode", "BS", "--output", "USB2"});
+    EXPECT_EQ(outcome.status, 0);
+    EXPECT_EQ(outcome.output, "yes: FN10 in package P48 in mode BS through USB2\n");
+}
+
 TEST(Faults, RecordThatEndsTheStartUpIsNamed) {
     const DatabaseDirectory database(
         {{"base.acd", "DEVICE_SUPPORTED = base,spi\nPROGRAM_OPTION_PACKAGE = base,spi\n"},

@@ -22,7 +22,7 @@ private:
     DatabaseDirectory m_directory{
         {{"base.acd", "DEVICE_SUPPORTED = finch\n"
                       "IDCODE = FN10,0xX4104FB7:FN20,0x04108FB7:FN30,0x1410XFB7:FN40,none\n"},
-         {"finch.acd", "[FN10]\n[FN20]\n[FN30]\n[FN40]\n"}}};
+         {"finch.acd", "[FN10]\n[FN20]\n[FN30]\n[FN40]\n[FN50]\n"}}};
 };
 
 TEST_F(Identify, KnownCodes) {
@@ -47,6 +47,23 @@ TEST_F(Identify, UnknownCodeGivesNearestDevicesAndManufacturer) {
               "0x24104FB7  FN10  finch  0xX4104FB7\n"
               "0x24104FB5  -     -      unknown: manufacturer 0x7DA, nearest FN10 (1 bit differs)\n"
               "0x04103FB3  -     -      unknown: manufacturer 0x7D9, nearest FN30 (2 bits differ)\n");
+}
+
+TEST_F(Identify, FewOfManyNearestDevicesAreNamed) {
+    std::string codes;
+    std::string sections;
+    for (int device = 10; device < 17; ++device) {
+        const std::string name = "FN" + std::to_string(device);
+        codes += ":" + name + ",0x04104FB7";
+        sections += "[" + name + "]\n";
+    }
+    const DatabaseDirectory database(
+        {{"base.acd", "DEVICE_SUPPORTED = finch\nIDCODE = " + codes.substr(1) + "\n"},
+         {"finch.acd", sections}});
+    EXPECT_EQ(
+        runTool({"--database", database.path(), "identify", "0x04104FB5"}).output,
+        "0x04104FB5  -  -  unknown: manufacturer 0x7DA, nearest FN10, FN11, FN12, FN13, FN14, 2 more (1 bit "
+        "differs)\n");
 }
 
 TEST_F(Identify, ReadsStandardInput) {

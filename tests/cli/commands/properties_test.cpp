@@ -88,6 +88,16 @@ TEST(Spi, UnknownPropertyIsANoWithASuggestion) {
     EXPECT_EQ(outcome.error, "tarvik: \"FLA\" has no property \"DENSITIES\"; did you mean \"DENSITY\"?\n");
 }
 
+TEST(Spi, UnknownFlashIsANo) {
+    const SmallDatabase database;
+    const ProcessResult all = database.run({"spi", "ZZ1"});
+    EXPECT_EQ(all.status, 1);
+    const ProcessResult one = database.run({"spi", "ZZ1", "DENSITY"});
+    EXPECT_EQ(one.status, 1);
+    EXPECT_EQ(one.output, "");
+    EXPECT_EQ(one.error, all.error);
+}
+
 TEST(Spi, DeviceThatIsNoFlashIsANo) {
     const SmallDatabase database;
     EXPECT_EQ(database.run({"spi", "FN10"}).error, "tarvik: the database has no flash \"FN10\"\n");

@@ -273,6 +273,20 @@ TEST(Show, NamesWhatLayersShadow) {
                                        "PINS,44 +shadowed +" + below.path("finch.acd") + ":9:12\n"));
 }
 
+TEST(Show, NamesWhatAnIdcodeShadowsInJson) {
+    const SmallDatabase below;
+    const DatabaseDirectory above(DatabaseDirectory::Files{{"base.acd", "IDCODE += :FN10,0x0030\n"}});
+    const json idcode = json::parse(
+        runTool({"--database", above.path(), "--database", below.path(), "show", "FN10", "--json"})
+            .output)["idcode"];
+    EXPECT_EQ(idcode["value"], "0x0030");
+    EXPECT_EQ(idcode["shadows"], json::array({{{"file", below.path("base.acd")},
+                                               {"line", 7},
+                                               {"column", 10},
+                                               {"layer", below.path()},
+                                               {"text", "FN10,0x0010"}}}));
+}
+
 TEST(Show, NamesLayersInJson) {
     const SmallDatabase below;
     const DatabaseDirectory above(

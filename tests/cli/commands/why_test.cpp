@@ -78,6 +78,18 @@ TEST(Why, SuggestsNamesThatAreNear) {
                 StartsWith("tarvik: unknown option \"ERASEE\"; did you mean \"ERASE\"?\n"));
 }
 
+TEST(Why, FlashInLowerCaseIsUnknown) {
+    // The manager asks for flashes in upper case, so it never finds this one.
+    const DatabaseDirectory database(
+        {{"base.acd", "DEVICE_SUPPORTED = spi\nBS = outputs,USB2:families,spi\n"},
+         {"spi.acd", "DEVICE_FAMILY = ST1\nST1_DEVICES = fla\n"}});
+    const ProcessResult outcome = runTool({"--database", database.path(), "why", "fla", "--mode", "BS"});
+    EXPECT_EQ(outcome.status, 1);
+    EXPECT_EQ(outcome.output, "");
+    EXPECT_THAT(outcome.error,
+                HasSubstr("the database has \"fla\", but the manager looks for flashes in upper case\n"));
+}
+
 TEST(Why, ListsTheFormsOfQuestionsWhenNoneFits) {
     const ProcessResult outcome = SmallDatabase().run({"why", "FN10"});
     EXPECT_EQ(outcome.status, 2);

@@ -146,6 +146,23 @@ TEST(Diff, TellsWhatOneDeviceLosesBesideItsFamilyByItself) {
               "KS50 (kestrel)\n  operations in BS through USB2: -ERASE\n");
 }
 
+TEST(Diff, TellsAChangeOfHalfAFamilyWithTheDevices) {
+    Files before = database();
+    std::string sections;
+    for (const char* const device : {"DV1", "DV2", "DV3", "DV4", "DV5", "DV6", "DV7", "DV8"}) {
+        sections += std::string("[") + device + "]\nPROPERTY = PINS,8\n";
+    }
+    before["dove.acd"] = sections;
+    Files after = before;
+    for (int change = 0; change < 4; ++change) {
+        std::string& text = after["dove.acd"];
+        text.replace(text.find("PINS,8"), 6, "PINS,9");
+    }
+    EXPECT_EQ(diff(before, after).output, "dove (4 of 8 devices)\n"
+                                          "    DV1, DV2, DV3, DV4\n"
+                                          "  property PINS: -8 +9\n");
+}
+
 TEST(Diff, TellsAChangeOfOneDeviceForTheDevice) {
     EXPECT_EQ(difference("base.acd", "KS100,0xX4108FB7", "KS100,0xX4148FB7"),
               "KS100 (kestrel)\n  IDCODE: -0xX4108FB7 +0xX4148FB7\n");

@@ -87,6 +87,14 @@ def main(tool, database, document, hooks):
             assert statuses(lines)[0] == 1
             repository.reset()
 
+        unknown = repository.run("tarvik diff --against nosuch database")
+        assert unknown.returncode == 2 and 'git knows no revision "nosuch" in "database"' in unknown.stderr, unknown
+        repository.run("mkdir later && cp database/* later")
+        missing = repository.run("tarvik diff --against HEAD later")
+        assert missing.returncode == 2, missing
+        assert 'revision "HEAD" does not have the directory "later"' in missing.stderr, missing
+        repository.run("rm -r later")
+
         # In a hook git names the repository by variables, which must not lead to another one.
         repository.environment |= {"GIT_DIR": ".git", "GIT_INDEX_FILE": ".git/index", "GIT_PREFIX": ""}
         assert statuses(["cd database && tarvik diff --against HEAD ."]) == [0]

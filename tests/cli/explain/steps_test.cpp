@@ -334,6 +334,17 @@ TEST(WhyAlternatives, TheRecordsThatAllowItElsewhere) {
     EXPECT_EQ(steps[1].text, "yes in mode SS through SVF");
 }
 
+TEST(WhyAlternatives, SeveralRecordsOfOneMode) {
+    const Databases databases(family("OPERATION = PROGRAM,Bscan,PARALLEL:PROGRAM,Bscan,USB2,SVF"));
+    const std::vector<explanation::Step> steps =
+        explanation::alternatives(programming("D1", MODE_TYPE::SM, OUTPUT_TYPE::USB2));
+    ASSERT_EQ(steps.size(), 2U);
+    EXPECT_EQ(steps[0].text, "yes in mode BS through PARALLEL");
+    EXPECT_EQ(place(steps[0]), "fam.acd:1:13: PROGRAM,Bscan,PARALLEL");
+    EXPECT_EQ(steps[1].text, "yes in mode BS through USB2, SVF");
+    EXPECT_EQ(place(steps[1]), "fam.acd:1:36: PROGRAM,Bscan,USB2,SVF");
+}
+
 TEST(WhyAlternatives, WhatElseIsAllowedThere) {
     const Databases databases(family("OPERATION = VERIFY,Bscan,USB2:ERASE,Bscan,USB2"));
     const std::vector<explanation::Step> steps =
@@ -421,7 +432,7 @@ TEST(WhyPresentation, LongTextsAreBrokenAndLongFragmentsCut) {
     for (int number = 0; number < 30; ++number) {
         words += "word ";
     }
-    const std::string fragment = std::string(66, 'x') + "\xC3\xBC" + std::string(9, 'y');
+    const std::string fragment = std::string(64, 'x') + "\xC3\xBC" + std::string(9, 'y');
     explanation::Explanation explanation{
         Conclusion::NO,
         {{"absent", words + "end", explanation::SourceText{fragment, {std::string(60, 'f'), 12, 3}}}}};
@@ -429,6 +440,7 @@ TEST(WhyPresentation, LongTextsAreBrokenAndLongFragmentsCut) {
     EXPECT_THAT(text, HasSubstr("\n            " + std::string(60, 'f') + ":12:3:\n            "));
     EXPECT_THAT(text, HasSubstr("xxx...\n"));
     EXPECT_THAT(text, testing::Not(HasSubstr("\xC3")));
+    EXPECT_THAT(text, testing::Not(HasSubstr("\xBC")));
 }
 
 TEST(WhyPresentation, JsonTellsPlacesAndWhetherTheStepsAgree) {

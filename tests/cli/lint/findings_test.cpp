@@ -235,3 +235,13 @@ TEST(Lint, AnUnreadableDatabaseIsAnErrorObjectInJson) {
     EXPECT_NE(nlohmann::json::parse(outcome.output).at("error").get<std::string>().find("/no/such/directory"),
               std::string::npos);
 }
+
+TEST(Lint, ALimitThatIsNoNumberIsAMistake) {
+    for (const char* const limit : {"x", "-1", "1x", "99999999999999999999"}) {
+        const ProcessResult outcome = lint(cleanDatabase(), {std::string("--max=") + limit});
+        EXPECT_EQ(outcome.status, 2) << limit;
+        EXPECT_NE(outcome.error.find("--max needs a number, not \"" + std::string(limit) + '"'),
+                  std::string::npos)
+            << outcome.error;
+    }
+}

@@ -4,6 +4,7 @@
 #include <gmock/gmock.h>
 
 using testing::ElementsAre;
+using testing::HasSubstr;
 using testing::IsEmpty;
 
 namespace {
@@ -102,4 +103,25 @@ TEST(NearMisses, CarriageReturnsAtLineEnds) { // L113
     EXPECT_THAT(codes(withFamily("[KS50]\nPROPERTY = A,1\rB\n")), ElementsAre("L113"));
     EXPECT_THAT(codes(withFamily("# a\r\n[KS50]\r\nPROPERTY = A,1: \\\r\n  B,2\r\n\r\n")), IsEmpty());
     EXPECT_THAT(codes(withFamily("[KS50]\r\nPROPERTY = A,1\r\n#")), IsEmpty());
+}
+
+TEST(NearMisses, KeysOfOtherFiles) { // K101
+    EXPECT_THAT(lint(withFamily("IDCODE = KS50,0xX4104FB7\n[KS50]\n")).output,
+                HasSubstr("the key \"IDCODE\" is not read here; it belongs to base.acd"));
+    EXPECT_THAT(lint(withFamily("DEVICE_FAMILY = ST1\n[KS50]\n")).output,
+                HasSubstr("the key \"DEVICE_FAMILY\" is not read here; it belongs to spi.acd"));
+}
+
+TEST(NearMisses, OperatorsWithBlanks) { // F107
+    constexpr const char* HINT = "1 can be fixed by --fix";
+    EXPECT_THAT(lint(withFamily("PROPERTY =+ A,1\n[KS50]\n")).error, HasSubstr(HINT));
+    // Here the sign may be meant as a part of the value.
+    const ProcessResult apart = lint(withFamily("PROPERTY = + A,1\n[KS50]\n"));
+    EXPECT_THAT(apart.error, testing::AllOf(HasSubstr("F107: 1"), testing::Not(HasSubstr(HINT))));
+}
+
+TEST(NearMisses, EmptyNamesOfFlashFamilies) { // S101
+    EXPECT_THAT(codes(flashes("DEVICE_FAMILY = ST1,,ST2\nST1_DEVICES = MRS1M\nST2_DEVICES = MRS2M\n"
+                              "MRS1M_PROPERTY = DENSITY,1\nMRS2M_PROPERTY = DENSITY,2\n")),
+                ElementsAre("F103"));
 }
