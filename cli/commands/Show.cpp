@@ -6,6 +6,7 @@
 #include "query/ApplicationFault.h"
 #include "query/AskedDevice.h"
 #include "query/DeviceDetails.h"
+#include "query/ManagerQueries.h"
 #include "query/Tool.h"
 #include "term/Table.h"
 
@@ -45,9 +46,9 @@ std::string legend(const std::string& letters) {
     return fmt::format("  through  {}\n", fmt::join(words, "  "));
 }
 
-/// Rows by modes; the cells show the outputs.
+/// Rows by modes; the cells show the outputs. Rows that the device has in SPI mode only are marked, unless it is a flash.
 std::string matrix(const std::string& title, const std::vector<DeviceTable::Row>& rows, bool withBsdl,
-                   const Terminal& terminal) {
+                   bool isFlash, const Terminal& terminal) {
     if (rows.empty()) {
         return {};
     }
@@ -60,8 +61,13 @@ std::string matrix(const std::string& title, const std::vector<DeviceTable::Row>
         headings.emplace_back("BSDL");
     }
     Table table(std::move(headings));
+    std::string mark;
     for (const DeviceTable::Row& row : rows) {
         Table::Row cells{row.key};
+        if (!isFlash && row.isOfSpiModeOnly()) {
+            cells.front() += " (spi)";
+            mark = fmt::format("  (spi)    {}\n", questions::SPI_MODE_RULE);
+        }
         for (const DeviceTable::Outputs outputs : row.outputs) {
             cells.push_back(cell(outputs, letters));
         }
@@ -70,7 +76,8 @@ std::string matrix(const std::string& title, const std::vector<DeviceTable::Row>
         }
         table.add(std::move(cells));
     }
-    return fmt::format("\n{}\n{}{}", terminal.heading(title), legend(letters), table.text(terminal, 2));
+    return fmt::format("\n{}\n{}{}{}", terminal.heading(title), legend(letters), mark,
+                       table.text(terminal, 2));
 }
 
 std::string section(const char* title, const Properties& properties, const Terminal& terminal) {
@@ -120,8 +127,9 @@ std::string packageMatrices(const DeviceDetails& details, const Terminal& termin
         if (hasOwnOptions(changes, details)) {
             const std::string title = "Programming options in package " + terminal.sanitised(package) +
                                       (changes.options->rows.empty() ? ": none" : "");
-            text += changes.options->rows.empty() ? fmt::format("\n{}\n", terminal.heading(title))
-                                                  : matrix(title, changes.options->rows, false, terminal);
+            text += changes.options->rows.empty()
+                        ? fmt::format("\n{}\n", terminal.heading(title))
+                        : matrix(title, changes.options->rows, false, details.flash, terminal);
         }
     }
     return text;
@@ -152,8 +160,8 @@ std::string asText(const Shown& shown, const Terminal& terminal) {
     return heading(details, terminal) + section("Properties", details.shownProperties(), terminal) +
            section("Flash properties", details.flashProperties, terminal) + packagesText(details, terminal) +
            multibootText(details.multiboot, terminal) +
-           matrix("Operations", details.operations->rows, true, terminal) +
-           matrix("Programming options", details.options->rows, false, terminal) +
+           matrix("Operations", details.operations->rows, true, details.flash, terminal) +
+           matrix("Programming options", details.options->rows, false, details.flash, terminal) +
            packageMatrices(details, terminal);
 }
 

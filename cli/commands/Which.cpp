@@ -2,9 +2,11 @@
 #include "commands/Commands.h"
 
 #include "commands/CommonArguments.h"
+#include "model/Schema.h"
 #include "model/Vocabulary.h"
 #include "query/ApplicationFault.h"
 #include "query/DeviceSurvey.h"
+#include "query/ManagerQueries.h"
 #include "query/Tool.h"
 #include "term/Progress.h"
 #include "term/Table.h"
@@ -48,6 +50,8 @@ struct Matches {
     const Filter& filter;
     std::vector<NamedDevice> devices;
     std::vector<std::string> faults; ///< devices at which the manager raises
+    std::size_t inSpiModeOnly =
+        0; ///< of the devices: those that are no flashes, and allow the operation nowhere else
 };
 
 std::string asText(const Matches& matches, const Terminal& terminal) {
@@ -126,11 +130,17 @@ Filter read(const Arguments& arguments) {
     return filter;
 }
 
-/// Does the table allow the operation in the mode through the output, or anywhere?
-bool allows(const DeviceTable& table, const Filter& filter) {
+/// The row of the operation; null if it is allowed nowhere.
+const DeviceTable::Row* rowOf(const DeviceTable& table, const Filter& filter) {
     const auto row =
         std::ranges::find(table.rows, vocabulary::key(*filter.operation), &DeviceTable::Row::key);
-    if (row == table.rows.end()) {
+    return row == table.rows.end() ? nullptr : &*row;
+}
+
+/// Does the table allow the operation in the mode through the output, or anywhere?
+bool allows(const DeviceTable& table, const Filter& filter) {
+    const DeviceTable::Row* const row = rowOf(table, filter);
+    if (row == nullptr) {
         return false;
     }
     if (!filter.mode) {
@@ -182,6 +192,11 @@ Matches find(const Filter& filter) {
             } else if ((!asked.operations || allows(*device.operations, filter)) &&
                        (!asked.question || device.answer)) {
                 matches.devices.push_back({device.name, device.family});
+                const bool isAnyMode =
+                    filter.operation && !filter.mode && device.family != schema::SPI_FAMILY;
+                if (isAnyMode && rowOf(*device.operations, filter)->isOfSpiModeOnly()) {
+                    ++matches.inSpiModeOnly;
+                }
             }
         },
         [&progress](std::size_t done, std::size_t total) { progress.reach(done, total); });
@@ -199,6 +214,13 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     static_cast<void>(tool.answer(matches));
     if (!matches.faults.empty()) {
         tool.note(unansweredText(matches.faults));
+    }
+    if (filter.operation && filter.mode == TARVIKNS::MODE_TYPE::SPI) {
+        tool.note(questions::SPI_MODE_RULE);
+    }
+    if (matches.inSpiModeOnly != 0) {
+        tool.note(fmt::format("{} of these {} devices allow it in SPI mode only, and {}",
+                              matches.inSpiModeOnly, matches.devices.size(), questions::SPI_MODE_RULE));
     }
     if (status == ExitCode::NO) {
         tool.note("no device matches");

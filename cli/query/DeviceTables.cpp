@@ -55,6 +55,11 @@ DeviceTable tableOf(const std::vector<std::string>& keys, std::size_t first, std
 
 } // namespace
 
+bool DeviceTable::Row::isOfSpiModeOnly() const {
+    return bsdl == 0 &&
+           std::all_of(outputs.begin(), outputs.begin() + SPI_MODE, [](Outputs of) { return of == 0; });
+}
+
 namespace tables {
 
 DeviceTable operations(ConstraintsManager& manager, const std::string& device) {

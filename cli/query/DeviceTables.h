@@ -25,6 +25,9 @@ struct DeviceTable {
         Outputs bsdl;                       ///< as a boundary-scan operation; none for options
 
         bool operator==(const Row&) const = default;
+
+        /// Is it there for SPI mode only, in which the manager answers for "spi", whatever the device?
+        [[nodiscard]] bool isOfSpiModeOnly() const;
     };
 
     std::vector<Row> rows;

@@ -3,6 +3,7 @@
 
 #include "model/Multiboot.h"
 #include "model/Vocabulary.h"
+#include "query/ManagerQueries.h"
 #include "report/HtmlEscape.h"
 
 #include <fmt/format.h>
@@ -52,8 +53,21 @@ std::string headings(const std::vector<std::string>& texts) {
     return html + "</tr></thead>";
 }
 
+/// What the letters of a matrix stand for: "P PARALLEL, Z ZORVA".
+std::string legend() {
+    const std::string letters = outputLetters();
+    std::vector<std::string> words;
+    for (std::size_t output = 0; output < letters.size(); ++output) {
+        words.push_back(fmt::format("<b>{}</b> {}", letters[output], vocabulary::outputs().at(output)));
+    }
+    return fmt::format("<span class=\"legend\">{}</span>", fmt::join(words, ", "));
+}
+
+/// Marks a row that other devices than flashes have in SPI mode only.
+std::string mark() { return fmt::format(" <i title=\"{}\">(spi)</i>", escaped(questions::SPI_MODE_RULE)); }
+
 std::string matrix(const std::string& title, const std::vector<DeviceTable::Row>& rows, bool withBsdl,
-                   const std::string& device) {
+                   const DeviceDetails& details) {
     if (rows.empty()) {
         return {};
     }
@@ -63,16 +77,17 @@ std::string matrix(const std::string& title, const std::vector<DeviceTable::Row>
     if (withBsdl) {
         columns.emplace_back("BSDL");
     }
-    std::string html =
-        fmt::format("<table class=\"matrix\"><caption>{}</caption>{}<tbody>", title, headings(columns));
+    std::string html = fmt::format("<table class=\"matrix\"><caption>{} {}</caption>{}<tbody>", title,
+                                   legend(), headings(columns));
     for (const DeviceTable::Row& row : rows) {
-        html += fmt::format("<tr><th scope=\"row\">{}</th>", escaped(row.key));
+        html += fmt::format("<tr><th scope=\"row\">{}{}</th>", escaped(row.key),
+                            !details.flash && row.isOfSpiModeOnly() ? mark() : "");
         for (const DeviceTable::Outputs outputs : row.outputs) {
             html += cell(outputs);
         }
         html += (withBsdl ? cell(row.bsdl) : "") + "</tr>";
     }
-    return scrolling(title, device, html + "</tbody></table>");
+    return scrolling(title, details.name, html + "</tbody></table>");
 }
 
 std::string values(const Property& property) {
@@ -133,8 +148,8 @@ std::string bodyOf(const DeviceDetails& details) {
     if (const std::string reason = details.whyIncomplete(); !reason.empty()) {
         return fmt::format("<p class=\"fault\">No answer: {}</p>", escaped(reason));
     }
-    return facts(details) + matrix("Operations", details.operations->rows, true, details.name) +
-           matrix("Programming options", details.options->rows, false, details.name) +
+    return facts(details) + matrix("Operations", details.operations->rows, true, details) +
+           matrix("Programming options", details.options->rows, false, details) +
            propertyTable("Properties", details.shownProperties(), details.name) +
            propertyTable("Properties of the flash", details.flashProperties, details.name);
 }

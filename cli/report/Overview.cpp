@@ -4,6 +4,8 @@
 #include "model/Vocabulary.h"
 #include "report/HtmlEscape.h"
 
+#include <tarvik/TARVIKNS.h>
+
 #include <fmt/format.h>
 
 #include <algorithm>
@@ -37,7 +39,10 @@ void Overview::add(const DeviceDetails& details) {
     for (const DeviceTable::Row& row : details.operations->rows) {
         Pairs& pairs = family.operations[row.key];
         for (std::size_t mode = 0; mode < pairs.size(); ++mode) {
-            pairs.at(mode) |= row.outputs.at(mode);
+            // What is allowed in SPI mode is the flashes' own, although every device is asked as one there.
+            if (details.flash || mode != static_cast<std::size_t>(TARVIKNS::MODE_TYPE::SPI)) {
+                pairs.at(mode) |= row.outputs.at(mode);
+            }
         }
     }
 }

@@ -26,16 +26,6 @@ std::string source() {
     return path.empty() ? "the built-in demonstration" : fmt::format("{}", fmt::join(path, ", "));
 }
 
-/// "P for PARALLEL, ..."
-std::string legend() {
-    const std::string letters = outputLetters();
-    std::vector<std::string> words;
-    for (std::size_t output = 0; output < letters.size(); ++output) {
-        words.push_back(fmt::format("<b>{}</b> {}", letters[output], vocabulary::outputs().at(output)));
-    }
-    return fmt::format("{}", fmt::join(words, ", "));
-}
-
 std::string orNone(const std::string& html) { return html.empty() ? "<p>There are none.</p>\n" : html; }
 
 } // namespace
@@ -71,9 +61,6 @@ std::string Page::section(const std::string& name) const {
     if (name == "counts") {
         return fmt::format("<b>{}</b> devices in <b>{}</b> families, <b>{}</b> of them flashes", devices(),
                            families(), flashes());
-    }
-    if (name == "letters") {
-        return legend();
     }
     if (name == "overview") {
         return m_overview.html();

@@ -3,6 +3,7 @@
 
 #include "model/Multiboot.h"
 #include "model/Vocabulary.h"
+#include "query/ManagerQueries.h"
 #include "report/HtmlEscape.h"
 
 #include <fmt/format.h>
@@ -167,13 +168,13 @@ std::string PageData::index() const {
             appendItem(arrangements, fmt::format("[{},[{}]]", jsonString(arrangement), found->second));
         }
     });
-    return fmt::format(R"({{"modes":{},"outputs":{},"letters":{},"families":{},"tables":{},)"
+    return fmt::format(R"({{"modes":{},"outputs":{},"letters":{},"spi":{},"families":{},"tables":{},)"
                        R"("names":[{}],"family":[{}],"table":[{}],"idcode":[{}],"faults":{{{}}},)"
                        R"("multiboot":[{}]}})",
                        jsonList(vocabulary::modes(), DeviceTable::MODES),
                        jsonList(vocabulary::outputs(), DeviceTable::OUTPUTS), jsonString(outputLetters()),
-                       jsonList(m_familyNames), m_tables.list(), m_names, m_families, m_tableOf, m_idcodes,
-                       m_faults, arrangements);
+                       jsonString(questions::SPI_MODE_RULE), jsonList(m_familyNames), m_tables.list(),
+                       m_names, m_families, m_tableOf, m_idcodes, m_faults, arrangements);
 }
 
 void PageData::appendTo(std::string& html) const {

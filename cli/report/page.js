@@ -77,13 +77,20 @@
             (letter, output) => isIn(output) ? element("b", {}, letter) : element("i", {}, "·")));
     }
 
+    const legend = () => element("span", {class: "legend"}, ...[...index.letters].flatMap(
+        (letter, output) => [...(output === 0 ? [] : [", "]), element("b", {}, letter), ` ${index.outputs[output]}`]));
+
     function matrix(title, rows, device, headings) {
         if (rows.length === 0) {
             return [];
         }
-        const body = rows.map(([key, ...sets]) => element("tr", {},
-            element("th", {scope: "row"}, key), ...sets.map(cell)));
-        return [scrolling(title, device, element("table", {class: "matrix"}, element("caption", {}, title),
+        const isFlash = index.families[device.family] === "spi";
+        const spi = index.modes.indexOf("SPI");
+        const marked = (sets) => !isFlash && sets.every((outputs, column) => outputs === 0 || column === spi);
+        const body = rows.map(([key, ...sets]) => element("tr", {}, element("th", {scope: "row"}, key,
+            ...(marked(sets) ? [" ", element("i", {title: index.spi}, "(spi)")] : [])), ...sets.map(cell)));
+        return [scrolling(title, device, element("table", {class: "matrix"},
+            element("caption", {}, `${title} `, legend()),
             headRow(["", ...headings]), element("tbody", {}, ...body)))];
     }
 

@@ -54,11 +54,12 @@ TEST(Show, WholeSheetOfADevice) {
                                   "\n"
                                   "Operations\n"
                                   "  through  P PARALLEL  Z ZORVA  U USB2  S SVF  T STAPL\n"
-                                  "           BS     SS     SM  BSFILE  DP770  SPI    BSDL\n"
-                                  "  PROGRAM  P-U--  -      -   -       -      -      -\n"
-                                  "  VERIFY   -      P----  -   -       -      -      -\n"
-                                  "  ERASE    -      -      -   -       -      --U--  -\n"
-                                  "  HIGHZ    -      -      -   -       -      -      --US-\n"
+                                  "  (spi)    SPI mode treats every device as \"spi\"\n"
+                                  "               BS     SS     SM  BSFILE  DP770  SPI    BSDL\n"
+                                  "  PROGRAM      P-U--  -      -   -       -      -      -\n"
+                                  "  VERIFY       -      P----  -   -       -      -      -\n"
+                                  "  ERASE (spi)  -      -      -   -       -      --U--  -\n"
+                                  "  HIGHZ        -      -      -   -       -      -      --US-\n"
                                   "\n"
                                   "Programming options\n"
                                   "  through  P PARALLEL  Z ZORVA  U USB2  S SVF  T STAPL\n"
@@ -132,6 +133,7 @@ TEST(Show, FlashHasFlashProperties) {
     EXPECT_THAT(outcome.output,
                 HasSubstr("\nFlash properties\n  PROPERTY  VALUE  FROM  WHERE\n  BUS       SPI    ST1 "));
     EXPECT_THAT(outcome.output, Not(HasSubstr("IDCODE")));
+    EXPECT_THAT(outcome.output, HasSubstr("\n  ERASE  -   -   -   -       -      --U--  -\n"));
 }
 
 // The properties that `show`, `spi` and completion list are those that `property` and `which` find.

@@ -101,7 +101,7 @@ TEST(Which, ListsTheDevicesThatAllowAnOperation) {
     const ProcessResult outcome =
         database.run({"which", "--operation", "ERASE", "--mode", "SPI", "--output", "USB2"});
     EXPECT_EQ(outcome.status, 0);
-    EXPECT_THAT(outcome.error, IsEmpty());
+    EXPECT_EQ(outcome.error, "tarvik: SPI mode treats every device as \"spi\"\n");
     // In SPI mode the answer is about the flash that is connected to the device.
     EXPECT_EQ(outcome.output, "DEVICE  FAMILY\n"
                               "FN10    finch\n"
@@ -109,6 +109,16 @@ TEST(Which, ListsTheDevicesThatAllowAnOperation) {
                               "FLA     spi\n"
                               "FLB     spi\n"
                               "FLC     spi\n");
+}
+
+TEST(Which, CountsTheDevicesThatAllowItInSpiModeOnly) {
+    const SmallDatabase database;
+    const ProcessResult erase = database.run({"which", "--operation", "ERASE"});
+    EXPECT_EQ(erase.status, 0);
+    EXPECT_EQ(erase.error,
+              "tarvik: 2 of these 5 devices allow it in SPI mode only, and SPI mode treats every device "
+              "as \"spi\"\n");
+    EXPECT_THAT(database.run({"which", "--operation", "PROGRAM"}).error, IsEmpty());
 }
 
 TEST(Which, ListsTheDevicesThatHaveAProperty) {
