@@ -2,6 +2,7 @@
 #include "commands/Commands.h"
 
 #include "model/Catalogue.h"
+#include "query/ApplicationFault.h"
 #include "query/Tool.h"
 
 #include <TarvikSmokeMgr.h>
@@ -45,18 +46,10 @@ std::vector<std::string> tableNames() {
     return names;
 }
 
-/// Makes the manager load what it has on a device, as a host's questions would.
-void load(ConstraintsManager& manager, const std::string& device) {
-    using namespace TARVIKNS;
-    static_cast<void>(manager.getDeviceOperations(device.c_str(), MODE_TYPE::BS, OUTPUT_TYPE::PARALLEL));
-    static_cast<void>(
-        manager.getProgramOptions(device.c_str(), MODE_TYPE::BS, OUTPUT_TYPE::PARALLEL, nullptr));
-}
-
 ExitCode run(Tool& tool, const Arguments& arguments) {
     ConstraintsManager& manager = tool.manager();
     for (const std::string& device : arguments.devices) {
-        load(manager, device);
+        askForTables(manager, device);
         if (!manager.isKorvelDevice(device.c_str())) {
             throw catalogue::unknownDevice(device);
         }
@@ -64,6 +57,9 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     if (arguments.table == MULTIBOOT) {
         manager.dumpMbBpiSpi();
         return tool.answer(Dump{MULTIBOOT, tool.messages().takeStatus()});
+    }
+    if (arguments.devices.empty()) {
+        tool.note("no device is loaded, so the table has only what the manager reads when it starts");
     }
     TarvikSmokeMgr recorder;
     (manager.*RECORDED.at(arguments.table))(&recorder);
