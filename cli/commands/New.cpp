@@ -100,7 +100,7 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     checkWords(creation);
     edit::Draft draft = edit::Draft::ofDatabase();
     const lint::Model before = draft.model();
-    requireNewName(draft, before, creation.name, creation.kind == Creation::Kind::FAMILY, {});
+    edit::requireNewName(before, creation.name, creation.kind == Creation::Kind::FAMILY, {});
     if (arguments.layer.empty()) {
         creation.layer = layerOf(draft, homeFamily(before, creation), layers.size() - 1);
     } else {

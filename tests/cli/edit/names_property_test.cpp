@@ -155,7 +155,7 @@ TEST_F(NamesOfTheDemonstration, AreRenamed) {
     forEachName([](const Files& files, const std::string& answers, const edit::KnownName& known) {
         edit::Draft draft = draftOf(files);
         EXPECT_EQ(renameName(files, answers, known, draft), "") << known.name;
-        EXPECT_EQ(edit::placeOf(draft, known.name), "") << known.name;
+        EXPECT_EQ(edit::placeOf(draft.model(), known.name), "") << known.name;
         renameIn(draft, newNameFor(known), known.name);
         EXPECT_EQ(filesOf(draft), files) << known.name;
     });
@@ -165,7 +165,7 @@ TEST_F(NamesOfTheDemonstration, AreRemoved) {
     forEachName([](const Files& files, const std::string& answers, const edit::KnownName& known) {
         edit::Draft draft = draftOf(files);
         EXPECT_EQ(removeName(files, answers, known, draft), "") << known.name;
-        EXPECT_EQ(edit::placeOf(draft, known.name), "") << known.name;
+        EXPECT_EQ(edit::placeOf(draft.model(), known.name), "") << known.name;
     });
 }
 
