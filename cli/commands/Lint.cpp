@@ -209,7 +209,7 @@ std::vector<AcdLines> fixed(Tool& tool, std::vector<AcdLines> files, const lint:
                                   },
                                   directories});
     for (const std::string& refused : result.refused) {
-        tool.note("not fixed without --unsafe-fixes: " + refused);
+        tool.note("not fixed: " + refused);
     }
     if (arguments.diff) {
         tool.output().write(fmt::format("{}", fmt::join(result.diffs, "")));
