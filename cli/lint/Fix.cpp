@@ -72,7 +72,7 @@ std::optional<Fix> listing(const Model& model, std::string_view name, const std:
     if (!newLines.empty()) {
         fix.edits.push_back({{&model.base()->files.front(), 1, 1}, 0, newLines});
     }
-    return isPossible ? std::optional(fix) : std::nullopt;
+    return isPossible && !fix.edits.empty() ? std::optional(fix) : std::nullopt;
 }
 
 std::optional<Fix> removing(const Token& item) {

@@ -253,7 +253,8 @@ private:
             Finding& finding =
                 m_findings.add(MODE_WITHOUT_FAMILY, token, "{} of base.acd does not list the family {}",
                                vocabulary::modes()[mode], inQuotes(m_family.name));
-            finding.reports = finding.restsOn = fact::inMode(m_family.name, vocabulary::modes()[mode]);
+            finding.unlistedIn = vocabulary::modes()[mode];
+            finding.reports = finding.restsOn = fact::inMode(m_family.name, finding.unlistedIn);
         }
         return !isMissing;
     }

@@ -158,3 +158,19 @@ TEST(Fixes, ThatListANameAreGuesses) {
                                                 "BS = outputs,USB2:families,wren\n"
                                                 "IDCODE = WR1,0x00000011\n");
 }
+
+TEST(Fixes, ListAFamilyUnderAMode) {
+    const std::string lists = "DEVICE_SUPPORTED = base,wren\nPROGRAM_OPTION_PACKAGE = base,wren\n";
+    const DatabaseDirectory directory(
+        {{"base.acd", lists + "BS = outputs,USB2:families\nPFF = outputs,USB2:families\n"},
+         {"wren.acd", "OPERATION = PROGRAM,Bscan,USB2\nPROPERTIES = PROGRAM,2,BS,PFF\n"}});
+    EXPECT_THAT(lint({directory.path()}).output, AllOf(HasSubstr("[T112]"), HasSubstr("[P205]")));
+    EXPECT_EQ(lint({"--unsafe-fixes", directory.path()}).output, "");
+    EXPECT_EQ(read(directory.path("base.acd")),
+              lists + "BS = outputs,USB2:families,wren\nPFF = outputs,USB2:families,wren\n");
+    // A mode without families is another mistake, which hides this one.
+    const DatabaseDirectory without(
+        {{"base.acd", lists + "BS = outputs,USB2\n"}, {"wren.acd", "OPERATION = PROGRAM,Bscan,USB2\n"}});
+    EXPECT_THAT(lint({"--unsafe-fixes", without.path()}).output, HasSubstr("[M104]"));
+    EXPECT_EQ(read(without.path("base.acd")), lists + "BS = outputs,USB2\n");
+}
