@@ -6,7 +6,6 @@
 #include "lint/Fix.h"
 #include "model/Catalogue.h"
 #include "query/Tool.h"
-#include "text/Suggest.h"
 
 #include <fmt/format.h>
 #include <fmt/ranges.h>
@@ -23,51 +22,21 @@ Json asJson(const EditedFiles& edited) {
     return {{"files", edited.files}, {"written", edited.isWritten}, {"diff", edited.diff}};
 }
 
-void requireNewName(const edit::Draft& draft, const lint::Model& model, const std::string& name,
-                    bool isFamily, const std::string& former) {
-    if (!edit::isUsableName(name) || schema::fileOf(name) != schema::File::FAMILY) {
-        throw CommandError(
-            ExitCode::FAULT,
-            fmt::format("\"{}\" cannot be a name: names have 1 to 15 letters, digits, \"-\", "
-                        "\".\" and \"+\", begin with a letter or a digit, and are not \"base\" "
-                        "or \"spi\"",
-                        printable(name)));
-    }
-    const std::string spelling = isFamily ? lowerCase(name) : upperCase(name);
-    if (name != spelling) {
-        throw CommandError(
-            ExitCode::FAULT,
-            fmt::format("\"{}\" is in the wrong case, since lists are case-sensitive: families are in "
-                        "lower case, all others in upper case: \"{}\"",
-                        name, spelling));
-    }
-    if (sameWithoutCase(name, former)) {
-        return;
-    }
-    if (const std::optional<edit::KnownName> known = edit::findName(model, name)) {
-        throw CommandError(ExitCode::FAULT, fmt::format("the database has \"{}\" already", known->name));
-    }
-    if (const std::string place = placeOf(draft, name); !place.empty()) {
-        throw CommandError(ExitCode::FAULT, fmt::format("\"{}\" is named already: {}", name, place));
-    }
-}
-
-edit::KnownName requireKnownName(const lint::Model& model, const std::string& name) {
-    if (schema::fileOf(name) != schema::File::FAMILY || schema::isFlashClass(name)) {
-        throw CommandError(ExitCode::FAULT,
-                           fmt::format("\"{}\" is a fixed name, which cannot be changed", printable(name)));
-    }
-    const std::optional<edit::KnownName> known = edit::findName(model, name);
+ExitCode editName(Tool& tool, const std::string& name, bool isDryRun, const NameEdit& edit) {
+    const std::vector<std::string> layers = tool.openDirectories();
+    tool.openDatabase();
+    edit::Draft draft = edit::Draft::ofDatabase();
+    const lint::Model before = draft.model();
+    edit::requireChangeable(name);
+    const std::optional<edit::KnownName> known = edit::findName(before, name);
     if (!known) {
         throw catalogue::unknownDevice(name);
     }
-    return *known;
-}
-
-void noteComments(const Tool& tool, const edit::Draft& draft, const std::string& name) {
-    if (const std::vector<std::string> places = commentsAbout(draft, name); !places.empty()) {
-        tool.note(fmt::format("comments mention {}: {}", name, fmt::join(places, ", ")));
+    const edit::Intention intention = edit(draft, before, *known);
+    if (const std::vector<std::string> places = commentsAbout(draft, known->name); !places.empty()) {
+        tool.note(fmt::format("comments mention {}: {}", known->name, fmt::join(places, ", ")));
     }
+    return finishEdit(tool, before, draft, layers, intention, isDryRun);
 }
 
 ExitCode finishEdit(Tool& tool, const lint::Model& before, const edit::Draft& draft,

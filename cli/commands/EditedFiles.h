@@ -9,6 +9,7 @@
 #include "term/Terminal.h"
 #include "text/Json.h"
 
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -24,19 +25,15 @@ struct EditedFiles {
 [[nodiscard]] std::string asText(const EditedFiles& edited, const Terminal& terminal);
 [[nodiscard]] Json asJson(const EditedFiles& edited);
 
-/// Checks that a name can be given to something new.
-/// @param isFamily whether it is for a family of devices, which is in lower case; all others are in upper case
-/// @param former that has the name in another case, if it is renamed
-/// @throw CommandError (FAULT) if it is not usable, or something has it
-void requireNewName(const edit::Draft& draft, const lint::Model& model, const std::string& name,
-                    bool isFamily, const std::string& former);
+/// Changes a draft in which a name is known, and says what it is meant to change.
+using NameEdit = std::function<edit::Intention(edit::Draft& draft, const lint::Model& before,
+                                               const edit::KnownName& known)>;
 
-/// The name in any case, as the database has it.
-/// @throw CommandError (NO) with the nearest names if it has no such name, (FAULT) if its name is fixed
-[[nodiscard]] edit::KnownName requireKnownName(const lint::Model& model, const std::string& name);
-
-/// Shows which comments still contain a name: what they say is for their author to change.
-void noteComments(const Tool& tool, const edit::Draft& draft, const std::string& name);
+/// Edits the open database about a name, in any case, and finishes the edit. Comments that still contain the name are
+/// listed: what they say is for their author to change.
+/// @throw CommandError (NO) with the nearest names if the database has no such name, (FAULT) if its name is fixed, and
+/// as `finishEdit`
+[[nodiscard]] ExitCode editName(Tool& tool, const std::string& name, bool isDryRun, const NameEdit& edit);
 
 /// Proves an edit, writes its files unless only the difference is wanted, and shows them.
 /// @param before the database as it is

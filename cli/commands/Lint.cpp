@@ -209,7 +209,7 @@ std::vector<AcdLines> fixed(Tool& tool, std::vector<AcdLines> files, const lint:
                                   },
                                   directories});
     for (const std::string& refused : result.refused) {
-        tool.note("not fixed without --unsafe-fixes: " + refused);
+        tool.note("not fixed: " + refused);
     }
     if (arguments.diff) {
         tool.output().write(fmt::format("{}", fmt::join(result.diffs, "")));
@@ -258,7 +258,7 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     selection.isMeant = [&database](const lint::Finding& finding) {
         return database.isMeant(finding.location.file->path());
     };
-    std::vector<std::string> unusedIndexes = lint::unusedIndexes(lint::directoriesOf(files));
+    std::vector<std::string> unusedIndexes = lint::unusedIndexes(lint::layersOf(files));
     const lint::Model model(std::move(files), std::move(unusedIndexes));
     // The rules report the readers' faults, too, with a code.
     static_cast<void>(tool.messages().take());

@@ -88,6 +88,26 @@ void checkWords(Creation& creation) {
     }
 }
 
+/// Refuses options that say nothing about what is added.
+void checkKind(const std::string& kind, const Creation& creation) {
+    const auto refuseIf = [&kind](bool isGiven, const char* what) {
+        if (isGiven) {
+            throw CommandError(ExitCode::FAULT, fmt::format("a {} has no {}", kind, what));
+        }
+    };
+    const bool isFamily = creation.kind == Creation::Kind::FAMILY;
+    refuseIf(creation.kind != Creation::Kind::DEVICE && !creation.idcode.empty(), "IDCODE");
+    refuseIf(creation.kind == Creation::Kind::FLASH && creation.packages.size() > 1, "second package");
+    refuseIf(isFamily && !creation.packages.empty(), "packages");
+    refuseIf(isFamily && !creation.family.empty(), "family");
+    const bool hasTables =
+        !creation.modes.empty() || !creation.outputs.empty() || !creation.operations.empty();
+    if (hasTables && (!isFamily || !creation.like.empty())) {
+        throw CommandError(ExitCode::FAULT,
+                           "--mode, --output and --operation are those of a new family without --like");
+    }
+}
+
 ExitCode run(Tool& tool, const Arguments& arguments) {
     std::vector<std::string> layers = tool.openDirectories();
     if (!arguments.layer.empty()) {
@@ -97,10 +117,11 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
     creation.kind = arguments.kind == "device"   ? Creation::Kind::DEVICE
                     : arguments.kind == "family" ? Creation::Kind::FAMILY
                                                  : Creation::Kind::FLASH;
+    checkKind(arguments.kind, creation);
     checkWords(creation);
     edit::Draft draft = edit::Draft::ofDatabase();
     const lint::Model before = draft.model();
-    requireNewName(draft, before, creation.name, creation.kind == Creation::Kind::FAMILY, {});
+    edit::requireNewName(before, creation.name, creation.kind == Creation::Kind::FAMILY, {});
     if (arguments.layer.empty()) {
         creation.layer = layerOf(draft, homeFamily(before, creation), layers.size() - 1);
     } else {

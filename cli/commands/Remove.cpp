@@ -16,15 +16,12 @@ struct Arguments {
 };
 
 ExitCode run(Tool& tool, const Arguments& arguments) {
-    const std::vector<std::string> layers = tool.openDirectories();
-    tool.openDatabase();
-    edit::Draft draft = edit::Draft::ofDatabase();
-    const lint::Model before = draft.model();
-    const edit::KnownName known = requireKnownName(before, arguments.name);
-    const std::set<std::string> names = namesRemovedWith(before, known);
-    removeFrom(draft, names);
-    noteComments(tool, draft, known.name);
-    return finishEdit(tool, before, draft, layers, {.removed = names}, arguments.dryRun);
+    const auto remove = [](edit::Draft& draft, const lint::Model& before, const edit::KnownName& known) {
+        const std::set<std::string> names = namesRemovedWith(before, known);
+        removeFrom(draft, names);
+        return edit::Intention{.removed = names};
+    };
+    return editName(tool, arguments.name, arguments.dryRun, remove);
 }
 
 Action declare(ArgumentList& list) {

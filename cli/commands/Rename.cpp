@@ -5,11 +5,9 @@
 
 #include "edit/Names.h"
 #include "edit/Rename.h"
-#include "model/Catalogue.h"
 #include "query/Tool.h"
 
 #include <fmt/format.h>
-#include <fmt/ranges.h>
 
 #include <memory>
 
@@ -22,19 +20,16 @@ struct Arguments {
 };
 
 ExitCode run(Tool& tool, const Arguments& arguments) {
-    const std::vector<std::string> layers = tool.openDirectories();
-    tool.openDatabase();
-    edit::Draft draft = edit::Draft::ofDatabase();
-    const lint::Model before = draft.model();
-    const edit::KnownName known = requireKnownName(before, arguments.from);
-    const std::string& from = known.name;
-    requireNewName(draft, before, arguments.to, known.isFamily, from);
-    if (from == arguments.to) {
-        throw CommandError(ExitCode::FAULT, fmt::format("\"{}\" has this name already", from));
-    }
-    renameIn(draft, from, arguments.to);
-    noteComments(tool, draft, from);
-    return finishEdit(tool, before, draft, layers, {.renamed = {{from, arguments.to}}}, arguments.dryRun);
+    const std::string& to = arguments.to;
+    const auto rename = [&to](edit::Draft& draft, const lint::Model& before, const edit::KnownName& known) {
+        edit::requireNewName(before, to, known.isFamily, known.name);
+        if (known.name == to) {
+            throw CommandError(ExitCode::FAULT, fmt::format("\"{}\" has this name already", to));
+        }
+        renameIn(draft, known.name, to);
+        return edit::Intention{.renamed = {{known.name, to}}};
+    };
+    return editName(tool, arguments.from, arguments.dryRun, rename);
 }
 
 Action declare(ArgumentList& list) {

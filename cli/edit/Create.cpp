@@ -75,11 +75,10 @@ private:
 
     void addDevice() {
         const std::string family = familyOfDevice();
-        if (!m_creation.idcode.empty()) {
-            addIdcode(family);
-        } else if (m_model.baseKeys().find(schema::IDCODE) != nullptr) {
-            refuse("a new device needs --idcode, since the other devices have IDCODEs");
+        if (m_creation.idcode.empty()) {
+            refuse("a new device needs --idcode");
         }
+        addIdcode(family);
         copyPlaces();
         Draft::File& file = fileOf(family);
         std::string section = fmt::format("[{}]\n", m_creation.name);
@@ -289,9 +288,9 @@ private:
         }
         const catalogue::Records records = catalogue::readRecords(schema::BASE, mode);
         if (!records.isSet) {
-            addStatement(fileOf(BASE_FAMILY),
-                         fmt::format("{} = outputs,{}:families,{}", mode, fmt::join(m_creation.outputs, ","),
-                                     m_creation.name));
+            addStatement(fileOf(BASE_FAMILY), fmt::format("{} = {},{}:{},{}", mode, schema::OUTPUTS_LABEL,
+                                                          fmt::join(m_creation.outputs, ","),
+                                                          schema::FAMILIES_LABEL, m_creation.name));
             m_intention.modes.insert(mode);
             return;
         }
@@ -301,12 +300,16 @@ private:
         }
         for (const std::string& output : m_creation.outputs) {
             if (std::find(std::next(known.begin()), known.end(), output) == known.end()) {
-                refuse(fmt::format("mode {} does not have the output {}: it would be new for all families",
+                refuse(fmt::format("mode {} does not have the output {}: it would be new for all families; "
+                                   "add it there first",
                                    mode, output));
             }
         }
         const bool hasFamilies = records.all.size() > 1;
-        add(BASE_FAMILY, {mode, hasFamilies ? m_creation.name : "families," + m_creation.name, {}},
+        add(BASE_FAMILY,
+            {mode,
+             hasFamilies ? m_creation.name : fmt::format("{},{}", schema::FAMILIES_LABEL, m_creation.name),
+             {}},
             hasFamilies ? splitter::FIELDS : splitter::RECORDS);
     }
 
@@ -330,9 +333,6 @@ private:
     }
 
     [[nodiscard]] std::string familyOfFlash() const {
-        if (!m_creation.idcode.empty()) {
-            refuse("a flash has no IDCODE");
-        }
         if (m_like.empty()) {
             if (!isUsableName(m_creation.family)) {
                 refuse("a new flash needs --family or --like");

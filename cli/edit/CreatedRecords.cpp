@@ -7,6 +7,8 @@
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
+#include <algorithm>
+#include <iterator>
 #include <utility>
 
 namespace edit {
@@ -18,13 +20,20 @@ std::string packagesRecord(const Creation& creation) {
 }
 
 std::vector<std::string> operationRecords(const Creation& creation) {
+    // The tables have cells for some of the modes and outputs only.
+    std::vector<std::string> outputs;
+    const std::vector<std::string>& known = schema::tableOutputs();
+    std::copy_if(creation.outputs.begin(), creation.outputs.end(), std::back_inserter(outputs),
+                 [&known](const std::string& output) {
+                     return std::find(known.begin(), known.end(), output) != known.end();
+                 });
     std::vector<std::string> records;
     for (const std::string& operation : creation.operations) {
         for (const std::string& mode : creation.modes) {
             const auto position = static_cast<std::size_t>(vocabulary::readMode(mode));
-            if (position < schema::tableModes().size()) {
+            if (position < schema::tableModes().size() && !outputs.empty()) {
                 records.push_back(fmt::format("{},{},{}", operation, schema::tableModes()[position],
-                                              fmt::join(creation.outputs, ",")));
+                                              fmt::join(outputs, ",")));
             }
         }
     }

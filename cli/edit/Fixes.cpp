@@ -179,16 +179,18 @@ private:
         return edited;
     }
 
-    /// Do the fixes remove their findings, and add none?
-    [[nodiscard]] bool isProven(const std::vector<Candidate>& used, const Counts& after) const {
+    /// A finding that the fixes leave, or that they add; null if there is none.
+    [[nodiscard]] const Identity* findingAfter(const std::vector<Candidate>& used,
+                                               const Counts& after) const {
         Counts left = m_counts;
         for (const Candidate& candidate : used) {
             --left[candidate.finding];
         }
-        return std::all_of(after.begin(), after.end(), [&left](const auto& found) {
-            const auto known = left.find(found.first);
-            return known != left.end() && found.second <= known->second;
+        const auto found = std::find_if(after.begin(), after.end(), [&left](const auto& each) {
+            const auto known = left.find(each.first);
+            return known == left.end() || each.second > known->second;
         });
+        return found == after.end() ? nullptr : &found->first;
     }
 
     [[nodiscard]] std::vector<Rewrite> rewrites(const std::vector<std::string>& texts) const {
@@ -222,16 +224,20 @@ private:
             return 0;
         }
         Counts after = findingsIn(edited);
-        if (!isProven(used, after)) {
-            return 0;
+        const auto refuse = [&](const std::string& reason) {
+            if (wanted.size() == 1) {
+                m_refusals.insert(fmt::format("{}\n{}", used.front().shown, reason));
+            }
+            return std::size_t{0};
+        };
+        if (const Identity* const found = findingAfter(used, after)) {
+            return refuse(fmt::format("its fix would leave the finding: {} [{}]", std::get<2>(*found),
+                                      std::get<0>(*found)->code));
         }
         std::optional<diff::Comparison> effect = effectOf(m_request.layers, rewrites(edited));
         if (const std::set<std::string> others = strangers(used, effect); !others.empty()) {
-            if (wanted.size() == 1) {
-                m_refusals.insert(fmt::format("{}\nits fix would change answers about {}, too",
-                                              used.front().shown, fmt::join(others, ", ")));
-            }
-            return 0;
+            return refuse(fmt::format("its fix would change answers about {}, too, and needs --unsafe-fixes",
+                                      fmt::join(others, ", ")));
         }
         for (std::size_t i = 0; i < m_files.size(); ++i) {
             m_files[i].text = std::move(edited[i]);
@@ -265,7 +271,7 @@ private:
     Scope m_scope;                            ///< of what is fixed so far
     std::optional<diff::Comparison> m_effect; ///< of the same
     std::set<Identity> m_refused;             ///< whose fixes do not do what they promise
-    std::set<std::string> m_refusals;         ///< of them those that would change other answers
+    std::set<std::string> m_refusals;         ///< the same, with the reasons
 };
 
 } // namespace

@@ -24,9 +24,9 @@ struct FixRequest {
 /// What fixing came to.
 struct FixResult {
     std::size_t fixed = 0;
-    std::vector<Rewrite> rewrites;  ///< of the files that change
-    std::vector<std::string> diffs; ///< of the same, as `diff -u` shows them
-    std::set<std::string> refused; ///< findings whose fixes would change other answers, each with their names
+    std::vector<Rewrite> rewrites;          ///< of the files that change
+    std::vector<std::string> diffs;         ///< of the same, as `diff -u` shows them
+    std::set<std::string> refused;          ///< findings whose fixes were left out, each with the reason
     std::optional<diff::Comparison> effect; ///< on the answers; nothing if there is no database to ask
 };
 

@@ -3,6 +3,8 @@
 
 #include "edit/Sections.h"
 #include "model/RecordSplitter.h"
+#include "term/ExitCode.h"
+#include "term/Terminal.h"
 #include "text/Suggest.h"
 
 #include <fmt/format.h>
@@ -153,37 +155,65 @@ std::vector<NamedItem> StatementReader::items(const AcdLines::Line& line, NamePl
     return all;
 }
 
-std::string placeOf(const Draft& draft, const std::string& name) {
+std::string placeOf(const lint::Model& model, const std::string& name) {
     StatementReader reader;
-    for (const Draft::File& file : draft.files()) {
-        if (file.isRemoved) {
-            continue;
-        }
-        const SourceFile source(file.text, file.path, file.family);
-        const auto asText = [&file](unsigned line, unsigned column) {
-            return fmt::format("{}:{}:{}", file.path, line, column);
+    for (const AcdLines* const file : model.files()) {
+        const auto asText = [file](const AcdLines::Line& line) {
+            return fmt::format("{}:{}:{}", file->path(), line.line, line.column);
         };
-        for (const AcdLines::Line& line : source.lines().lines()) {
+        const bool isOfSpi = schema::fileOf(file->family()) == schema::File::SPI;
+        for (const AcdLines::Line& line : file->lines()) {
             const bool isHeader = line.kind == AcdLines::Kind::HEADER;
-            const bool isOfSpi = schema::fileOf(file.family) == schema::File::SPI;
             if (sameWithoutCase(isHeader  ? line.name
                                 : isOfSpi ? nameInKey(line)
                                           : std::string_view(),
                                 name)) {
-                return asText(line.line, line.column);
+                return asText(line);
             }
         }
-        for (const NamedStatement& statement : reader.read(source.lines())) {
+        for (const NamedStatement& statement : reader.read(*file)) {
             for (const NamedItem& item : statement.items) {
                 const std::string_view text =
                     statement.line.value.substr(item.nameBegin, item.nameEnd - item.nameBegin);
                 if (sameWithoutCase(text, name)) {
-                    return asText(statement.line.line, statement.line.column);
+                    return asText(statement.line);
                 }
             }
         }
     }
     return {};
+}
+
+void requireNewName(const lint::Model& model, const std::string& name, bool isFamily,
+                    const std::string& former) {
+    const auto refuse = [](const std::string& reason) { throw CommandError(ExitCode::FAULT, reason); };
+    if (!isUsableName(name) || schema::fileOf(name) != schema::File::FAMILY) {
+        refuse(fmt::format(
+            "\"{}\" cannot be a name: names have 1 to 15 letters, digits, \"-\", \".\" and \"+\", "
+            "begin with a letter or a digit, and are not \"base\" or \"spi\"",
+            printable(name)));
+    }
+    if (const std::string spelling = isFamily ? lowerCase(name) : upperCase(name); name != spelling) {
+        refuse(fmt::format("\"{}\" is in the wrong case, since lists are case-sensitive: families are in "
+                           "lower case, all others in upper case: \"{}\"",
+                           name, spelling));
+    }
+    if (sameWithoutCase(name, former)) {
+        return;
+    }
+    if (const std::optional<KnownName> known = findName(model, name)) {
+        refuse(fmt::format("the database has \"{}\" already", known->name));
+    }
+    if (const std::string place = placeOf(model, name); !place.empty()) {
+        refuse(fmt::format("\"{}\" is named already: {}", name, place));
+    }
+}
+
+void requireChangeable(const std::string& name) {
+    if (schema::fileOf(name) != schema::File::FAMILY || schema::isFlashClass(name)) {
+        throw CommandError(ExitCode::FAULT,
+                           fmt::format("\"{}\" is a fixed name, which cannot be changed", printable(name)));
+    }
 }
 
 std::string_view nameInKey(const AcdLines::Line& line) {

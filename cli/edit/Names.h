@@ -80,7 +80,18 @@ private:
 };
 
 /// Where a name, in any case, is written already: "file:line:column"; empty if nowhere.
-[[nodiscard]] std::string placeOf(const Draft& draft, const std::string& name);
+[[nodiscard]] std::string placeOf(const lint::Model& model, const std::string& name);
+
+/// Checks that a name can be given to something new.
+/// @param isFamily whether it is for a family of devices, which is in lower case; all others are in upper case
+/// @param former that has the name in another case, if it is renamed
+/// @throw CommandError (FAULT) if it is not usable, or something has it
+void requireNewName(const lint::Model& model, const std::string& name, bool isFamily,
+                    const std::string& former);
+
+/// Checks that a name is not one of those that the manager looks up itself.
+/// @throw CommandError (FAULT) if it is
+void requireChangeable(const std::string& name);
 
 /// The name in the key of a statement of spi.acd: that of a flash, a family or a class. Empty for other keys.
 [[nodiscard]] std::string_view nameInKey(const AcdLines::Line& line);

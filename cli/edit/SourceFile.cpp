@@ -1,6 +1,7 @@
 // Takes a file apart by the readers' own lines, so that no second grammar can disagree with them.
 #include "edit/SourceFile.h"
 
+#include "database/LineReader.h"
 #include "platform/Platform.h"
 #include "term/ExitCode.h"
 
@@ -14,8 +15,6 @@
 namespace edit {
 
 namespace {
-
-constexpr std::string_view BYTE_ORDER_MARK = "\xEF\xBB\xBF";
 
 bool isBlankLine(std::string_view source) { return source.find_first_not_of(" \t\r\n") == source.npos; }
 
@@ -50,7 +49,7 @@ SourceFile::SourceFile(std::string text, std::string path, std::string family)
 }
 
 std::string_view SourceFile::byteOrderMark() const noexcept {
-    return m_text.starts_with(BYTE_ORDER_MARK) ? BYTE_ORDER_MARK : std::string_view();
+    return m_text.starts_with(acd::BYTE_ORDER_MARK) ? acd::BYTE_ORDER_MARK : std::string_view();
 }
 
 std::string_view SourceFile::lineEnd() const noexcept {

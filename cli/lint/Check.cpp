@@ -88,6 +88,11 @@ std::vector<Finding> Checker::check(const Model& model, const Selection& selecti
     if (!selection.withConsequences) {
         all = withoutConsequences(all);
     }
+    for (Finding& finding : all) {
+        if (!finding.unlistedIn.empty()) {
+            finding.fix = listing(model, finding.location.file->family(), {}, {finding.unlistedIn});
+        }
+    }
     return sorted(std::move(all), model);
 }
 

@@ -3,6 +3,7 @@
 
 #include "database/FileNames.h"
 #include "text/Suggest.h"
+#include "text/Trimmed.h"
 
 #include <algorithm>
 #include <cstdint>
@@ -16,11 +17,6 @@ namespace lint {
 
 namespace {
 
-std::string_view withoutBlanks(std::string_view text) {
-    const std::size_t first = std::min(text.find_first_not_of(" \t"), text.size());
-    return text.substr(first, text.find_last_not_of(" \t\r") + 1 - first);
-}
-
 /// The source of a finding's fingerprint, without its ordinal: of a long line the part around the finding.
 std::string subject(const Finding& finding) {
     constexpr std::size_t MAX_LENGTH = 400;
@@ -31,7 +27,7 @@ std::string subject(const Finding& finding) {
         const std::size_t at = std::min<std::size_t>(finding.location.column - 1, source.size());
         source = source.substr(at - std::min(at, MAX_LENGTH / 2), MAX_LENGTH);
     }
-    return text.append(withoutBlanks(source));
+    return text.append(trimmed(source, " \t\r"));
 }
 
 /// FNV-1a: the same on every machine and in every version.

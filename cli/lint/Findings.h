@@ -26,6 +26,9 @@ struct Finding {
     // What connects a finding with its consequences: facts, such as "kestrel under SS", or names.
     std::string reports{}; ///< the fact that it reports, or the name that it takes for the right one
     std::string restsOn{}; ///< the fact whose report makes it a consequence
+
+    /// The mode of base.acd that does not list the file's family: to list it is a fix, which depends on another file.
+    std::string unlistedIn{};
 };
 
 /// The names of the facts that findings report and rest on.

@@ -43,6 +43,38 @@ std::optional<Fix> insertingBefore(const Token& token, std::string text) {
     return Fix{{{token.location, 0, std::move(text)}}};
 }
 
+std::optional<Fix> listing(const Model& model, std::string_view name, const std::vector<const char*>& lists,
+                           const std::vector<std::string>& modes) {
+    if (model.base() == nullptr) {
+        return std::nullopt;
+    }
+    Fix fix{{}, false};
+    bool isPossible = true;
+    const auto addAfter = [&](const Token& last) {
+        isPossible = isPossible && lineFrom(last);
+        std::string text(last.text.empty() ? "" : ",");
+        fix.edits.push_back({partOf(last, last.text.size(), 0).location, 0, text.append(name)});
+    };
+    std::string newLines;
+    for (const char* const key : lists) {
+        if (const std::vector<Token>& names = model.baseKeys().list(key); !names.empty()) {
+            addAfter(names.back());
+        } else {
+            newLines += fmt::format("{} = {}\n", key, name);
+        }
+    }
+    for (const std::string& mode : modes) {
+        // A mode that base.acd does not have, or has without families, is another mistake.
+        if (const std::vector<Item>& items = model.baseKeys().items(mode); items.size() > 1) {
+            addAfter(items[1].fields.back());
+        }
+    }
+    if (!newLines.empty()) {
+        fix.edits.push_back({{&model.base()->files.front(), 1, 1}, 0, newLines});
+    }
+    return isPossible && !fix.edits.empty() ? std::optional(fix) : std::nullopt;
+}
+
 std::optional<Fix> removing(const Token& item) {
     const std::optional<std::string_view> rest = lineFrom(item);
     if (!rest) {

@@ -43,6 +43,12 @@ struct Suggestion {
 /// Writes a text in front of a token.
 [[nodiscard]] std::optional<Fix> insertingBefore(const Token& token, std::string text);
 
+/// Adds a name to lists of base.acd, which are created if they do not exist, and to the families of modes. That is a
+/// guess: what has the name may be what is wrong.
+[[nodiscard]] std::optional<Fix> listing(const Model& model, std::string_view name,
+                                         const std::vector<const char*>& lists,
+                                         const std::vector<std::string>& modes = {});
+
 /// Removes an item with one of the separators around it.
 [[nodiscard]] std::optional<Fix> removing(const Token& item);
 

@@ -207,7 +207,7 @@ const std::vector<Token>& Section::list(std::string_view key) const {
 
 Token FamilyData::start() const { return startOf(files.front()); }
 
-std::vector<std::string> directoriesOf(const std::vector<AcdLines>& files) {
+std::vector<std::string> layersOf(const std::vector<AcdLines>& files) {
     std::set<std::string> directories;
     for (const AcdLines& file : files) {
         directories.emplace(acd::directoryOf(file.path()));

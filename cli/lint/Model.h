@@ -151,7 +151,7 @@ using Families = std::vector<std::shared_ptr<const FamilyData>>;
 [[nodiscard]] Families familiesOf(std::vector<AcdLines> files);
 
 /// The directories of files; those in memory have none.
-[[nodiscard]] std::vector<std::string> directoriesOf(const std::vector<AcdLines>& files);
+[[nodiscard]] std::vector<std::string> layersOf(const std::vector<AcdLines>& files);
 
 /// Those of the directories whose index does not match the files in it.
 [[nodiscard]] std::vector<std::string> unusedIndexes(std::vector<std::string> directories);

@@ -118,7 +118,8 @@ namespace {
 Json asJson(const Fix& fix) {
     Json edits = Json::array();
     for (const TextEdit& edit : fix.edits) {
-        edits.push_back({{"line", edit.location.line},
+        edits.push_back({{"file", edit.location.file->path()},
+                         {"line", edit.location.line},
                          {"column", edit.location.column},
                          {"length", edit.length},
                          {"text", edit.text}});

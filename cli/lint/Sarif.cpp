@@ -56,7 +56,7 @@ Json region(const Finding& finding, Columns& columns) {
             {"endColumn", endColumn}};
 }
 
-/// The fix of a finding, all of whose edits are in the file of the finding.
+/// A safe fix, all of whose edits are in the file of the finding.
 Json asSarif(const Fix& fix) {
     Json replacements = Json::array();
     for (const TextEdit& edit : fix.edits) {

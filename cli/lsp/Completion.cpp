@@ -134,9 +134,7 @@ public:
     [[nodiscard]] Json complete() && {
         const std::string_view text = m_context.text;
         if (text.starts_with('[')) {
-            for (const lint::Section& device : m_view.family.devices) {
-                m_items.add(device.name.text, CLASS, "device");
-            }
+            addHeaders();
         } else if (const std::size_t equals = text.find('='); equals == text.npos) {
             addKeys();
         } else {
@@ -149,6 +147,19 @@ public:
     }
 
 private:
+    /// The devices of the family, and those that have an IDCODE and no section yet.
+    void addHeaders() {
+        for (const lint::Section& device : m_view.family.devices) {
+            m_items.add(device.name.text, CLASS, "device");
+        }
+        for (const lint::Item& item : m_model.baseKeys().items(schema::IDCODE)) {
+            const std::string_view name = item.fields.front().text;
+            if (m_model.deviceInAnyCase(std::string(name)) == nullptr) {
+                m_items.add(name, CLASS, "device without a section");
+            }
+        }
+    }
+
     void addKeys() {
         if (m_context.text.starts_with('#')) {
             return;
@@ -192,14 +203,9 @@ private:
                 m_items.addKnown(item.fields.front().text, PROPERTY, "property");
             });
         case Content::TEXT:
-            return addUsed(key, [this, record](const lint::Item& item, std::size_t firstValue) {
-                for (std::size_t i = firstValue; item.fields.front().text == record && i < item.fields.size();
-                     ++i) {
-                    m_items.addKnown(item.fields[i].text, KEYWORD, "");
-                }
-            });
+            return addUsedValues(key, record, "");
         case Content::PACKAGE_NAME:
-            return addPackages();
+            return addPackages(key);
         case Content::FAMILY:
             return addFamilies();
         case Content::DEVICE:
@@ -254,7 +260,20 @@ private:
         }
     }
 
-    void addPackages() {
+    /// The values that a property has elsewhere.
+    void addUsedValues(std::string_view key, std::string_view property, std::string_view detail) {
+        addUsed(key, [&](const lint::Item& item, std::size_t firstValue) {
+            for (std::size_t i = firstValue; item.fields.front().text == property && i < item.fields.size();
+                 ++i) {
+                m_items.addKnown(item.fields[i].text, KEYWORD, detail);
+            }
+        });
+    }
+
+    void addPackages(std::string_view key) {
+        if (m_context.kind == schema::File::SPI) {
+            addUsedValues(key, schema::PACKAGE, "package");
+        }
         std::set<std::string_view> packages;
         for (const lint::Device& device : m_model.devices()) {
             for (const lint::Token& package : m_model.packages(device)) {

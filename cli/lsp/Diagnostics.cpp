@@ -3,6 +3,9 @@
 
 #include "edit/Format.h"
 #include "edit/SourceFile.h"
+#include "text/Trimmed.h"
+
+#include "database/FileNames.h"
 
 #include <fmt/format.h>
 
@@ -29,43 +32,48 @@ Json diagnosticOf(UnitCounter& counter, const lint::Finding& finding) {
 }
 
 /// What an edit of a fix does, for a menu.
-std::string titleOf(const lint::TextEdit& edit) {
+std::string titleOf(const lint::TextEdit& edit, const AcdLines& shown) {
     const std::string_view line = edit.location.file->source(edit.location.line);
     const std::string_view before =
         line.substr(std::min<std::size_t>(edit.location.column - 1, line.size()), edit.length);
     if (before.empty()) {
-        return fmt::format("insert {}", lint::inQuotes(edit.text));
+        const AcdLines& file = *edit.location.file;
+        return fmt::format("insert {}{}", lint::inQuotes(trimmed(edit.text, "\n")),
+                           &file == &shown ? "" : fmt::format(" in {}", acd::fileNameOf(file.path())));
     }
     return edit.text.empty()
                ? fmt::format("remove {}", lint::inQuotes(before))
                : fmt::format("replace {} with {}", lint::inQuotes(before), lint::inQuotes(edit.text));
 }
 
-Json actionOf(const View& view, const lint::Finding& finding, std::string_view lineEnd) {
-    UnitCounter counter(view.encoding);
-    Json edits = Json::array();
-    for (const lint::TextEdit& edit : finding.fix->edits) {
-        std::string text;
-        for (const char byte : edit.text) {
-            text += byte == '\n' ? std::string(lineEnd) : std::string(1, byte);
-        }
-        edits.push_back({{"range", asJson(lsp::rangeOf(*edit.location.file, edit.location.line,
-                                                       edit.location.column, edit.length, view.encoding))},
-                         {"newText", text}});
-    }
-    return {{"title", fmt::format("{}: {}", finding.rule->code, titleOf(finding.fix->edits.front()))},
-            {"kind", "quickfix"},
-            {"diagnostics", Json::array({diagnosticOf(counter, finding)})},
-            {"isPreferred", finding.fix->isSafe},
-            {"edit", {{"changes", {{view.uri(view.file.path()), edits}}}}}};
-}
-
 /// The end of the file's first line: an editor that has CR and LF shows neither.
-std::string_view lineEndOf(const View& view) {
-    const auto document = view.documents.find(view.file.path());
+std::string_view lineEndOf(const View& view, const std::string& path) {
+    const auto document = view.documents.find(path);
     return document != view.documents.end() && document->second.text.find("\r\n") != std::string::npos
                ? "\r\n"
                : "\n";
+}
+
+Json actionOf(const View& view, const lint::Finding& finding) {
+    UnitCounter counter(view.encoding);
+    Json changes = Json::object();
+    for (const lint::TextEdit& edit : finding.fix->edits) {
+        const AcdLines& file = *edit.location.file;
+        std::string text;
+        for (const char byte : edit.text) {
+            text += byte == '\n' ? lineEndOf(view, file.path()) : std::string_view(&byte, 1);
+        }
+        const Range range =
+            lsp::rangeOf(file, edit.location.line, edit.location.column, edit.length, view.encoding);
+        changes[view.uri(file.path())].push_back({{"range", asJson(range)}, {"newText", text}});
+    }
+    return {
+        {"title", fmt::format("{}: {}{}", finding.rule->code, titleOf(finding.fix->edits.front(), view.file),
+                              finding.fix->isSafe ? "" : " (a guess)")},
+        {"kind", "quickfix"},
+        {"diagnostics", Json::array({diagnosticOf(counter, finding)})},
+        {"isPreferred", finding.fix->isSafe},
+        {"edit", {{"changes", changes}}}};
 }
 
 } // namespace
@@ -90,7 +98,7 @@ Json codeActionsOf(const View& view, const Range& range) {
         const bool isBefore = std::pair(location.line, location.column + finding.length) < start;
         const bool isAfter = std::pair<unsigned, std::size_t>(location.line, location.column) > end;
         if (finding.fix && !isBefore && !isAfter) {
-            all.push_back(actionOf(view, finding, lineEndOf(view)));
+            all.push_back(actionOf(view, finding));
         }
     }
     return all;

@@ -86,6 +86,7 @@ private:
             for (const Field& field : statement.fields()) {
                 if (isAt(field.token) && !field.token.text.empty()) {
                     addWord(field);
+                    addProperty(*section, line.name, field.record);
                 }
             }
         });
@@ -144,13 +145,52 @@ private:
         case schema::Content::TABLE_OUTPUT:
         case schema::Content::MODE_OUTPUT:
             return describe(vocabulary::Kind::OUTPUT, "output");
+        case schema::Content::OUTPUT_LABEL:
+        case schema::Content::FAMILY_LABEL:
+            m_paragraphs.emplace_back("a label, which is skipped");
+            return;
         case schema::Content::PROPERTY_NAME:
+            if (text.starts_with(schema::OPTIONS_PREFIX)) {
+                m_paragraphs.push_back(fmt::format("the options of the operation {}",
+                                                   code(text.substr(schema::OPTIONS_PREFIX.size()))));
+            }
             return describe(vocabulary::Kind::OPERATION, "the modes that offer the operation");
         case schema::Content::COUNT:
             m_paragraphs.push_back(fmt::format("the number of values of {}", field.record));
             return;
         default:
             return;
+        }
+    }
+
+    /// A property of a device or family: the record that is in force there, and those that it hides.
+    void addProperty(const lint::Section& section, std::string_view key, std::string_view property) {
+        const auto isKey = [key](const schema::PropertyKey& each) { return each.key == key; };
+        if (std::none_of(schema::PROPERTY_KEYS.begin(), schema::PROPERTY_KEYS.end(), isKey)) {
+            return;
+        }
+        std::vector<std::string> records; // the one in force first
+        const auto add = [&](const lint::Section& owner) {
+            std::for_each(
+                schema::PROPERTY_KEYS.rbegin(), schema::PROPERTY_KEYS.rend(), [&](const auto& each) {
+                    const std::vector<lint::Item>& items = owner.items(each.key);
+                    const auto last = std::find_if(items.rbegin(), items.rend(), [&](const lint::Item& item) {
+                        return item.fields.front().text == property;
+                    });
+                    if (last != items.rend()) {
+                        records.push_back(
+                            fmt::format("{} of {}, {}", code(last->whole.text),
+                                        &owner == &m_view.family.own ? "the family" : owner.name.text,
+                                        placeOf(last->whole.location)));
+                    }
+                });
+        };
+        add(section);
+        if (&section != &m_view.family.own) {
+            add(m_view.family.own);
+        }
+        for (const std::string& record : records) {
+            m_paragraphs.push_back((&record == &records.front() ? "In force: " : "hides ") + record);
         }
     }
 

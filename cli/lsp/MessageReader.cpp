@@ -2,6 +2,7 @@
 #include "lsp/MessageReader.h"
 
 #include "text/Suggest.h"
+#include "text/Trimmed.h"
 
 #include <algorithm>
 #include <charconv>
@@ -13,11 +14,6 @@ namespace {
 constexpr std::string_view LENGTH = "Content-Length";
 constexpr std::string_view LINE_END = "\r\n";
 constexpr std::string_view HEADERS_END = "\r\n\r\n";
-
-std::string_view trimmed(std::string_view text) {
-    const std::size_t begin = std::min(text.find_first_not_of(" \t"), text.size());
-    return text.substr(begin, text.find_last_not_of(" \t") + 1 - begin);
-}
 
 /// The length that a block of headers gives; nothing if it has none, several or an invalid one.
 std::optional<std::size_t> lengthIn(std::string_view headers) {

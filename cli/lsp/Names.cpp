@@ -1,8 +1,10 @@
 // The one index of names: which fields, headers and keys hold the name of a family, a device, a flash or a package.
 #include "lsp/Names.h"
 
+#include "edit/Names.h"
 #include "lint/Fix.h"
 #include "lsp/Statement.h"
+#include "term/ExitCode.h"
 #include "text/Suggest.h"
 
 #include <AcdText.h>
@@ -131,26 +133,17 @@ std::vector<lint::Token> filesOf(const View& view, const Name& family) {
     return starts;
 }
 
+/// The rules of `tarvik rename`.
 void requireUsable(const View& view, const Name& name, const std::string& newName) {
-    const lint::Model& model = view.workspace.model();
-    const auto refuse = [](const std::string& reason) {
-        throw RequestError(ErrorCode::REQUEST_FAILED, reason);
-    };
     if (name.kind == NameKind::PACKAGE) {
-        refuse("packages cannot be renamed: devices share their names");
+        throw RequestError(ErrorCode::REQUEST_FAILED,
+                           "packages cannot be renamed: devices share their names");
     }
-    if (name.kind == NameKind::FAMILY && schema::fileOf(name.text) != schema::File::FAMILY) {
-        refuse(fmt::format("{} is always called so", name.text));
-    }
-    constexpr std::string_view FORBIDDEN = " \t\r\n,:[]=+#\\/_%";
-    if (newName.empty() || newName.find_first_of(FORBIDDEN) != newName.npos ||
-        newName.find('\0') != newName.npos) {
-        refuse(fmt::format("\"{}\" cannot be a name", newName));
-    }
-    if (!sameWithoutCase(name.text, newName) &&
-        (model.isFamilyInAnyCase(newName) || model.isFlashInAnyCase(newName) ||
-         model.deviceInAnyCase(newName) != nullptr)) {
-        refuse(fmt::format("the database has the name \"{}\" already", newName));
+    try {
+        edit::requireChangeable(name.text);
+        edit::requireNewName(view.workspace.model(), newName, name.kind == NameKind::FAMILY, name.text);
+    } catch (const CommandError& refused) {
+        throw RequestError(ErrorCode::REQUEST_FAILED, refused.what());
     }
 }
 

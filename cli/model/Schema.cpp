@@ -141,8 +141,10 @@ Content contentOf(File file, std::string_view key, const Field& field) {
                                   : Content::NONE;
     }
     if (!hasNamedRecords(file, key)) { // a mode
-        const Content listed = field.item == 0 ? Content::MODE_OUTPUT : Content::FAMILY;
-        return field.item > 1 ? Content::NONE : field.field == 0 ? Content::TEXT : listed;
+        if (field.item == 0) {
+            return field.field == 0 ? Content::OUTPUT_LABEL : Content::MODE_OUTPUT;
+        }
+        return field.item > 1 ? Content::NONE : field.field == 0 ? Content::FAMILY_LABEL : Content::FAMILY;
     }
     if (field.field == 0) {
         return Content::PROPERTY_NAME;
@@ -163,7 +165,7 @@ std::string_view formOf(File file, std::string_view key) {
         return key == PROPERTIES ? "name,count,value,...:..." : "name,value:...";
     case Content::DEVICE:
         return "device,code:...";
-    case Content::TEXT:
+    case Content::OUTPUT_LABEL:
         return "label,output,...:label,family,...";
     case Content::PART:
         return "modekey_device_package,...";
@@ -179,6 +181,8 @@ std::string_view formOf(File file, std::string_view key) {
 
 const std::vector<std::string>& wordsOf(Content content) {
     static const std::vector<std::string> none;
+    static const std::vector<std::string> outputLabel{OUTPUTS_LABEL};
+    static const std::vector<std::string> familyLabel{FAMILIES_LABEL};
     switch (content) {
     case Content::OPERATION_NAME:
         return vocabulary::operations();
@@ -192,6 +196,10 @@ const std::vector<std::string>& wordsOf(Content content) {
         return modeOutputs();
     case Content::MODE_KEY:
         return vocabulary::modes();
+    case Content::OUTPUT_LABEL:
+        return outputLabel;
+    case Content::FAMILY_LABEL:
+        return familyLabel;
     case Content::PROPERTY_NAME:
         return propertyNames();
     default:
@@ -256,7 +264,7 @@ std::vector<std::string> fixedKeys(File file) {
 }
 
 const std::vector<std::string>& tableModes() {
-    static const std::vector<std::string> all{"Bscan", "SSerial", "Smap", "BSFILE", "DP770", "SPI"};
+    static const std::vector<std::string> all{BOUNDARY_SCAN, "SSerial", "Smap", "BSFILE", "DP770", "SPI"};
     return all;
 }
 

@@ -46,6 +46,16 @@ inline constexpr const char* PROPERTY = "PROPERTY";
 inline constexpr const char* PROPERTIES = "PROPERTIES";
 inline constexpr const char* DEVICE_FAMILY = "DEVICE_FAMILY";
 
+/// The labels of the two lists of a mode key. The manager skips them, whatever they are.
+inline constexpr const char* OUTPUTS_LABEL = "outputs";
+inline constexpr const char* FAMILIES_LABEL = "families";
+
+/// The values of a flag, in upper case.
+inline constexpr std::array<const char*, 2> FLAGS{"TRUE", "FALSE"};
+
+/// The word of Boundary Scan mode in records.
+inline constexpr const char* BOUNDARY_SCAN = "Bscan";
+
 /// The property that lists a device's packages. The manager gives it no meaning of its own.
 inline constexpr const char* PACKAGES = "PACKAGES";
 
@@ -113,6 +123,8 @@ enum class Content {
     TABLE_OUTPUT, ///< the word of an output in records
     MODE_OUTPUT,  ///< the word of an output in a mode key
     MODE_KEY,
+    OUTPUT_LABEL, ///< of a mode's outputs
+    FAMILY_LABEL, ///< of a mode's families
     PROPERTY_NAME,
     COUNT,
     PACKAGE_NAME,

@@ -222,13 +222,15 @@ private:
     /// Reports a finding once, even if several devices share its line.
     /// @param fact that the finding reports and rests on, if it has consequences
     template <typename... Arguments>
-    void report(const Rule& rule, const Token& token, const std::string& fact,
-                fmt::format_string<Arguments...> format, Arguments&&... arguments) {
-        if (m_reported.insert({&rule, token.location.file, token.location.line, token.location.column})
-                .second) {
-            Finding& finding = m_findings.add(rule, token, format, std::forward<Arguments>(arguments)...);
-            finding.reports = finding.restsOn = fact;
+    Finding* report(const Rule& rule, const Token& token, const std::string& fact,
+                    fmt::format_string<Arguments...> format, Arguments&&... arguments) {
+        if (!m_reported.insert({&rule, token.location.file, token.location.line, token.location.column})
+                 .second) {
+            return nullptr;
         }
+        Finding& finding = m_findings.add(rule, token, format, std::forward<Arguments>(arguments)...);
+        finding.reports = finding.restsOn = fact;
+        return &finding;
     }
 
     [[nodiscard]] std::string owner(const Section& section) const {
@@ -251,8 +253,12 @@ private:
             m_used.set(*mode);
             const auto& families = m_context.modes[*mode].families;
             if (m_family.kind != schema::File::BASE && families && !families->contains(m_family.name)) {
-                report(OFFERED_OUT_OF_MODE, value, fact::inMode(m_family.name, value.text),
-                       "{} of base.acd does not list the family {}", value.text, inQuotes(m_family.name));
+                Finding* const finding =
+                    report(OFFERED_OUT_OF_MODE, value, fact::inMode(m_family.name, value.text),
+                           "{} of base.acd does not list the family {}", value.text, inQuotes(m_family.name));
+                if (finding != nullptr) {
+                    finding->unlistedIn = value.text;
+                }
             } else if (hasRecords(*mode) && !operations.modes.empty() && !operations.of(name).test(*mode)) {
                 report(PROPERTY_WITHOUT_RECORD, value, {}, "OPERATION of {} has no record for {} in mode {}",
                        owner(section), name, value.text);

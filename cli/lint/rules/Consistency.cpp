@@ -177,7 +177,10 @@ bool isNumber(std::string_view text) {
     return areDigits(text.substr(0, point)) && (point == text.size() || areDigits(text.substr(point + 1)));
 }
 
-bool isFlag(std::string_view text) { return sameWithoutCase(text, "TRUE") || sameWithoutCase(text, "FALSE"); }
+bool isFlag(std::string_view text) {
+    return std::any_of(schema::FLAGS.begin(), schema::FLAGS.end(),
+                       [text](const char* flag) { return sameWithoutCase(text, flag); });
+}
 
 struct ValueKind {
     const char* text;

@@ -203,11 +203,13 @@ void check(const Model& model, const FamilyResults& /*any*/, Findings& findings)
         }
         const Value* const options = device.section->find(schema::PROGRAM_OPTION);
         if (options != nullptr && !model.optionPackages().contains(name)) {
-            findings.add(
-                LEAKING_OPTIONS, options->key,
-                "the options of {} leak into those of family {}: PROGRAM_OPTION_PACKAGE does not list the "
-                "device",
-                inQuotes(name), inQuotes(device.family->name));
+            findings
+                .add(LEAKING_OPTIONS, options->key,
+                     "the options of {} leak into those of family {}: PROGRAM_OPTION_PACKAGE does not list "
+                     "the "
+                     "device",
+                     inQuotes(name), inQuotes(device.family->name))
+                .fix = listing(model, name, {schema::PROGRAM_OPTION_PACKAGE});
         }
     }
 }

@@ -87,7 +87,7 @@ std::optional<Fix> withOneOperator(const Token& value) {
 }
 
 bool isNumberOrFlag(std::string_view text) {
-    return text == "TRUE" || text == "FALSE" ||
+    return std::find(schema::FLAGS.begin(), schema::FLAGS.end(), text) != schema::FLAGS.end() ||
            (!text.empty() && text.find_first_not_of("0123456789.-") == text.npos);
 }
 

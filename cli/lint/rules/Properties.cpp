@@ -199,7 +199,7 @@ void checkMeaning(const Item& item, std::size_t firstValue, const std::set<std::
             continue;
         }
         // The word that records use for a mode is the likeliest mistake.
-        const Suggestion suggestion = !isOption && sameWithoutCase(value.text, "Bscan")
+        const Suggestion suggestion = !isOption && sameWithoutCase(value.text, schema::BOUNDARY_SCAN)
                                           ? Suggestion{"BS", true}
                                           : findings.suggest(value.text, known, item.fields);
         findings.addUnknown(isOption ? UNKNOWN_OPTION_VALUE : UNKNOWN_MODE_KEY, value, value, suggestion,
@@ -210,7 +210,7 @@ void checkMeaning(const Item& item, std::size_t firstValue, const std::set<std::
 void checkFlags(const Item& item, std::size_t firstValue, Findings& findings) {
     for (std::size_t i = firstValue; i < item.fields.size(); ++i) {
         const Token& value = item.fields[i];
-        for (const char* const flag : {"TRUE", "FALSE"}) {
+        for (const char* const flag : schema::FLAGS) {
             if (sameWithoutCase(value.text, flag) && value.text != flag) {
                 findings
                     .add(FLAG_NOT_UPPER_CASE, value, "{} is not {}: flags are compared with case",

@@ -200,27 +200,49 @@ Token listKey(const Model& model, std::string_view key) {
     return value == nullptr ? model.base()->start() : value->key;
 }
 
+/// Reports that a list lacks a name.
+void addMissing(const Model& model, const Rule& rule, const char* list, std::string_view name,
+                const std::string& text, Findings& findings) {
+    Finding& finding = findings.addText(rule, listKey(model, list), text);
+    finding.restsOn = fact::inList(name, list);
+    finding.fix = listing(model, name, {list});
+}
+
 void checkTables(const Model& model, const std::string& family, Findings& findings) {
+    const std::string lacks = fmt::format(" lacks the family {}", inQuotes(family));
     if (!model.supported().contains(family)) {
-        findings
-            .add(UNSUPPORTED_FAMILY, listKey(model, schema::DEVICE_SUPPORTED),
-                 "DEVICE_SUPPORTED lacks the family {}", inQuotes(family))
-            .restsOn = fact::inList(family, schema::DEVICE_SUPPORTED);
+        addMissing(model, UNSUPPORTED_FAMILY, schema::DEVICE_SUPPORTED, family,
+                   schema::DEVICE_SUPPORTED + lacks, findings);
     }
     if (!model.optionPackages().contains(family)) {
-        findings
-            .add(NO_OPTION_TABLE, listKey(model, schema::PROGRAM_OPTION_PACKAGE),
-                 "PROGRAM_OPTION_PACKAGE lacks the family {}", inQuotes(family))
-            .restsOn = fact::inList(family, schema::PROGRAM_OPTION_PACKAGE);
+        addMissing(model, NO_OPTION_TABLE, schema::PROGRAM_OPTION_PACKAGE, family,
+                   schema::PROGRAM_OPTION_PACKAGE + lacks, findings);
     }
 }
 
-void checkFamilies(const Model& model, Findings& findings) {
+/// The modes in which a family offers something.
+std::vector<std::string> modesOf(const FamilyResults& results,
+                                 const std::shared_ptr<const FamilyData>& family) {
+    std::vector<std::string> modes;
+    const auto result = results.find(family);
+    for (std::size_t mode = 0; mode < vocabulary::modes().size(); ++mode) {
+        if (result != results.end() && result->second.usedModes[mode]) {
+            modes.push_back(vocabulary::modes()[mode]);
+        }
+    }
+    return modes;
+}
+
+void checkFamilies(const Model& model, const FamilyResults& results, Findings& findings) {
     for (const auto& family : model.families()) {
         if (!model.supported().contains(family->name) && !model.optionPackages().contains(family->name) &&
             !isUnderAMode(model, family->name)) {
-            findings.add(UNLISTED_FAMILY, family->start(), "no list of base.acd names the family {}",
-                         inQuotes(family->name));
+            findings
+                .add(UNLISTED_FAMILY, family->start(), "no list of base.acd names the family {}",
+                     inQuotes(family->name))
+                .fix =
+                listing(model, family->name, {schema::DEVICE_SUPPORTED, schema::PROGRAM_OPTION_PACKAGE},
+                        modesOf(results, family));
         } else {
             checkTables(model, family->name, findings);
         }
@@ -233,21 +255,21 @@ void checkFamilies(const Model& model, Findings& findings) {
         const Device* const device = model.device(name);
         // A device without tables of its own does not belong into the list in the first place.
         if (device != nullptr && hasOwnTables(*device) && !model.optionPackages().contains(name)) {
-            Finding& finding =
-                findings.add(NO_OPTION_TABLE, listKey(model, schema::PROGRAM_OPTION_PACKAGE),
-                             "PROGRAM_OPTION_PACKAGE lacks {}, a device of DEVICE_SUPPORTED", inQuotes(name));
-            finding.restsOn = fact::inList(name, schema::PROGRAM_OPTION_PACKAGE);
+            addMissing(
+                model, NO_OPTION_TABLE, schema::PROGRAM_OPTION_PACKAGE, name,
+                fmt::format("PROGRAM_OPTION_PACKAGE lacks {}, a device of DEVICE_SUPPORTED", inQuotes(name)),
+                findings);
         }
     }
 }
 
-void check(const Model& model, const FamilyResults& /*any*/, Findings& findings) {
+void check(const Model& model, const FamilyResults& results, Findings& findings) {
     if (model.base() == nullptr) {
         return;
     }
     checkSupported(model, findings);
     checkOptionOwners(model, findings);
-    checkFamilies(model, findings);
+    checkFamilies(model, results, findings);
 }
 
 } // namespace

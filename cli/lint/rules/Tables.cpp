@@ -222,13 +222,13 @@ private:
     std::optional<std::size_t> readMode(const Token& token) {
         const std::string text(token.text);
         const MODE_TYPE mode = ConstraintsManager::modeString2Type(text.c_str());
-        if (mode == MODE_TYPE::BS && !sameWithoutCase(text, "Bscan")) {
+        if (mode == MODE_TYPE::BS && !sameWithoutCase(text, schema::BOUNDARY_SCAN)) {
             if (sameWithoutCase(text, "BS")) {
                 m_findings
                     .add(ACCIDENTAL_MODE, token,
-                         "{} is read as Boundary Scan only because it is unknown; did you mean \"Bscan\"?",
-                         inQuotes(text))
-                    .fix = replacing(token, "Bscan");
+                         "{} is read as Boundary Scan only because it is unknown; did you mean \"{}\"?",
+                         inQuotes(text), schema::BOUNDARY_SCAN)
+                    .fix = replacing(token, schema::BOUNDARY_SCAN);
             } else if (!text.empty()) {
                 m_findings.addUnknown(UNKNOWN_MODE, token, token,
                                       m_findings.suggest(text, schema::tableModes()),
@@ -253,7 +253,8 @@ private:
             Finding& finding =
                 m_findings.add(MODE_WITHOUT_FAMILY, token, "{} of base.acd does not list the family {}",
                                vocabulary::modes()[mode], inQuotes(m_family.name));
-            finding.reports = finding.restsOn = fact::inMode(m_family.name, vocabulary::modes()[mode]);
+            finding.unlistedIn = vocabulary::modes()[mode];
+            finding.reports = finding.restsOn = fact::inMode(m_family.name, finding.unlistedIn);
         }
         return !isMissing;
     }

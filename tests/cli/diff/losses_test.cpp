@@ -1,18 +1,16 @@
 // Which differences are losses, on random pairs of databases against a plain definition; and the statuses of the command.
 // TARVIK_PROPERTY_DATABASES says how many pairs, TARVIK_PROPERTY_SEED which.
+#include "cli/support/Answers.h"
 #include "cli/support/DatabaseDirectory.h"
-#include "cli/support/OpenDatabase.h"
 #include "cli/support/SmallDatabase.h"
 #include "cli/support/ToolProcess.h"
 #include "reference/DatabaseGenerator.h"
+#include "support/Setting.h"
 
 #include "diff/Comparison.h"
 
-#include <TarvikException.h>
-
 #include <gmock/gmock.h>
 
-#include <cstdlib>
 #include <map>
 #include <optional>
 
@@ -22,11 +20,6 @@ namespace {
 
 using reference::Files;
 using Facts = std::set<std::tuple<std::string, diff::Question, std::string>>;
-
-std::uint64_t setting(const char* name, std::uint64_t usual) {
-    const char* const text = std::getenv(name);
-    return text == nullptr ? usual : std::strtoull(text, nullptr, 10);
-}
 
 /// Loses a piece of a line somewhere, or doubles one.
 void mutate(reference::RandomSource& pick, Files& files) {
@@ -39,15 +32,6 @@ void mutate(reference::RandomSource& pick, Files& files) {
         text.erase(begin, end - begin);
     } else if (end != text.npos) {
         text.insert(begin, text.substr(begin, end - begin) + "X");
-    }
-}
-
-std::optional<std::string> snapshot(const Files& files) {
-    const OpenDatabase open(files);
-    try {
-        return diff::takeSnapshot([](std::size_t, std::size_t) {});
-    } catch (const TarvikException&) {
-        return std::nullopt;
     }
 }
 
@@ -127,8 +111,8 @@ TEST(Losses, AreAnswersThatTheNewDatabaseDoesNotGive) {
             mutate(pick, after);
         }
         const bool isSwapped = pick.chance(50);
-        std::optional<std::string> first = snapshot(isSwapped ? after : before);
-        std::optional<std::string> second = snapshot(isSwapped ? before : after);
+        std::optional<std::string> first = answersOf(isSwapped ? after : before);
+        std::optional<std::string> second = answersOf(isSwapped ? before : after);
         if (!first || !second) {
             continue;
         }

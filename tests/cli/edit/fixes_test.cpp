@@ -123,9 +123,54 @@ TEST(Fixes, ThatChangeOtherAnswersAreMadeOnRequestOnly) {
                                        {"spi.acd", text}});
     const ProcessResult outcome = lint({"--fix", directory.path()});
     EXPECT_EQ(outcome.status, 1);
-    EXPECT_THAT(outcome.error, HasSubstr("not fixed without --unsafe-fixes: "));
-    EXPECT_THAT(outcome.error, HasSubstr("its fix would change answers about ABC, too"));
+    EXPECT_THAT(outcome.error, HasSubstr("not fixed: "));
+    EXPECT_THAT(outcome.error,
+                HasSubstr("its fix would change answers about ABC, too, and needs --unsafe-fixes"));
     EXPECT_EQ(read(directory.path("spi.acd")), text);
     EXPECT_EQ(lint({"--unsafe-fixes", directory.path()}).status, 0);
     EXPECT_THAT(read(directory.path("spi.acd")), HasSubstr("AB_PROPERTY = CD,1"));
+}
+
+TEST(Fixes, ThatAreLeftOutSayWhy) {
+    const std::string text = "[KS50] # the first\nPROPERTIES = PACKAGES,3,TQ100\n";
+    const DatabaseDirectory directory(withFamily(text));
+    const ProcessResult outcome = lint({"--fix", directory.path()});
+    EXPECT_THAT(outcome.error, HasSubstr("not fixed: " + directory.path("kestrel.acd") + ":1:7: "));
+    EXPECT_THAT(outcome.error,
+                HasSubstr("its fix would leave the finding: \"PACKAGES\" says 3 values and has 1 [P101]"));
+    EXPECT_EQ(read(directory.path("kestrel.acd")), text);
+}
+
+TEST(Fixes, ThatListANameAreGuesses) {
+    const DatabaseDirectory directory({{"base.acd", "DEVICE_SUPPORTED = base\n"
+                                                    "BS = outputs,USB2:families\n"
+                                                    "IDCODE = WR1,0x00000011\n"},
+                                       {"wren.acd", "OPERATION = PROGRAM,Bscan,USB2\n"
+                                                    "PROPERTIES = PROGRAM,1,BS\n"
+                                                    "[WR1]\n"
+                                                    "PROGRAM_OPTION = ERASE,Bscan,USB2\n"}});
+    const std::string before = read(directory.path("base.acd"));
+    EXPECT_EQ(lint({"--fix", directory.path()}).status, 1);
+    EXPECT_EQ(read(directory.path("base.acd")), before);
+    EXPECT_EQ(lint({"--unsafe-fixes", directory.path()}).output, "");
+    EXPECT_EQ(read(directory.path("base.acd")), "PROGRAM_OPTION_PACKAGE = base,wren,WR1\n"
+                                                "DEVICE_SUPPORTED = base,wren\n"
+                                                "BS = outputs,USB2:families,wren\n"
+                                                "IDCODE = WR1,0x00000011\n");
+}
+
+TEST(Fixes, ListAFamilyUnderAMode) {
+    const std::string lists = "DEVICE_SUPPORTED = base,wren\nPROGRAM_OPTION_PACKAGE = base,wren\n";
+    const DatabaseDirectory directory(
+        {{"base.acd", lists + "BS = outputs,USB2:families\nPFF = outputs,USB2:families\n"},
+         {"wren.acd", "OPERATION = PROGRAM,Bscan,USB2\nPROPERTIES = PROGRAM,2,BS,PFF\n"}});
+    EXPECT_THAT(lint({directory.path()}).output, AllOf(HasSubstr("[T112]"), HasSubstr("[P205]")));
+    EXPECT_EQ(lint({"--unsafe-fixes", directory.path()}).output, "");
+    EXPECT_EQ(read(directory.path("base.acd")),
+              lists + "BS = outputs,USB2:families,wren\nPFF = outputs,USB2:families,wren\n");
+    // A mode without families is another mistake, which hides this one.
+    const DatabaseDirectory without(
+        {{"base.acd", lists + "BS = outputs,USB2\n"}, {"wren.acd", "OPERATION = PROGRAM,Bscan,USB2\n"}});
+    EXPECT_THAT(lint({"--unsafe-fixes", without.path()}).output, HasSubstr("[M104]"));
+    EXPECT_EQ(read(without.path("base.acd")), lists + "BS = outputs,USB2\n");
 }

@@ -1,27 +1,20 @@
 // Formatting random databases changes no answer. TARVIK_PROPERTY_DATABASES says how many, TARVIK_PROPERTY_SEED which. All
 // must read alike, from which it follows; every one, or every TARVIK_PROPERTY_ANSWERS_EVERY-th, is asked everything as well.
 #include "cli/diff/DatabaseRewriter.h"
-#include "cli/support/OpenDatabase.h"
+#include "cli/support/Answers.h"
 #include "reference/DatabaseGenerator.h"
+#include "support/Setting.h"
 
 #include "diff/Comparison.h"
 #include "edit/Format.h"
 
-#include <TarvikException.h>
-
 #include <gtest/gtest.h>
 
-#include <cstdlib>
 #include <optional>
 
 namespace {
 
 using reference::Files;
-
-std::uint64_t setting(const char* name, std::uint64_t usual) {
-    const char* const text = std::getenv(name);
-    return text == nullptr ? usual : std::strtoull(text, nullptr, 10);
-}
 
 std::string familyOf(const std::string& file) { return file.substr(0, file.rfind('.')); }
 
@@ -37,20 +30,10 @@ Files formatted(const Files& files) {
     return all;
 }
 
-/// All answers; nothing if a damaged database raises before there are any.
-std::optional<std::string> snapshot(const Files& files) {
-    const OpenDatabase open(files);
-    try {
-        return diff::takeSnapshot([](std::size_t, std::size_t) {});
-    } catch (const TarvikException&) {
-        return std::nullopt;
-    }
-}
-
 /// Do both databases answer everything alike?
 bool answersAlike(const Files& files, const Files& others) {
-    std::optional<std::string> before = snapshot(files);
-    std::optional<std::string> after = snapshot(others);
+    std::optional<std::string> before = answersOf(files);
+    std::optional<std::string> after = answersOf(others);
     return before && after
                ? diff::compare(diff::Snapshot(*std::move(before)), diff::Snapshot(*std::move(after)))
                      .isEmpty()

@@ -176,6 +176,15 @@ class Names(unittest.TestCase):
         self.succeeds("remove", "sparrow")
         self.assertEqual(self.lint(), "")
 
+    def test_new_family_with_an_output_that_tables_cannot_have(self):
+        self.database = self.scratch / "nothing"
+        self.database.mkdir()
+        self.succeeds("new", "family", "sparrow", "--mode", "BS", "--output", "SVF,EXPRESSSVF", "--operation", "PROGRAM")
+        self.assertTrue(self.answer("check", "--mode", "BS", "--output", "EXPRESSSVF")["allowed"])
+        self.assertIn("PROGRAM,Bscan,SVF\n", (self.database / "sparrow.acd").read_text())
+        self.refuses(2, "a new device needs --idcode", "new", "device", "SW10", "--family", "sparrow")
+        self.assertEqual(self.lint(), "")
+
     def test_new_flash_from_nothing(self):
         self.database = self.scratch / "nothing"
         self.database.mkdir()
@@ -216,6 +225,11 @@ class Names(unittest.TestCase):
         self.refuses(2, "unknown mode", "new", "family", "falcon", "--mode", "XX", "--output", "USB2")
         self.refuses(2, "in mode SPI", "new", "family", "falcon", "--mode", "SPI", "--output", "USB2", "--operation",
                      "PROGRAM")
+        self.refuses(2, "a flash has no second package", "new", "flash", "OVD3", "--like", "OVD1", "--packages", "SO8,SO16")
+        self.refuses(2, "a family has no packages", "new", "family", "falcon", "--like", "kestrel", "--packages", "SO8")
+        self.refuses(2, "a family has no family", "new", "family", "falcon", "--like", "kestrel", "--family", "osprey")
+        self.refuses(2, "of a new family without --like", "new", "device", "KS75", "--like", "KS50", *code, "--mode", "BS")
+        self.refuses(2, "of a new family without --like", "new", "family", "falcon", "--like", "kestrel", "--mode", "BS")
         self.refuses(2, "there is no directory", "new", "device", "KS75", "--like", "KS50", *code, "--layer", "/nowhere")
 
     def test_new_in_a_layer(self):

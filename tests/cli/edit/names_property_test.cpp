@@ -1,8 +1,8 @@
 // Renames and removes the names of the demonstration and of random databases. TARVIK_PROPERTY_DATABASES says how many,
 // TARVIK_PROPERTY_SEED which. Of the demonstration every TARVIK_PROPERTY_NAMES_EVERY-th name is taken.
-#include "cli/diff/DatabaseRewriter.h"
-#include "cli/support/OpenDatabase.h"
+#include "cli/support/Answers.h"
 #include "reference/DatabaseGenerator.h"
+#include "support/Setting.h"
 
 #include "diff/Comparison.h"
 #include "diff/Presentation.h"
@@ -14,21 +14,13 @@
 #include "edit/Sort.h"
 #include "query/Demonstration.h"
 
-#include <TarvikException.h>
-
 #include <gtest/gtest.h>
 
-#include <cstdlib>
 #include <optional>
 
 namespace {
 
 using reference::Files;
-
-std::uint64_t setting(const char* name, std::uint64_t usual) {
-    const char* const text = std::getenv(name);
-    return text == nullptr ? usual : std::strtoull(text, nullptr, 10);
-}
 
 std::string familyOf(const std::string& file) { return file.substr(0, file.rfind('.')); }
 
@@ -48,16 +40,6 @@ Files filesOf(const edit::Draft& draft) {
         }
     }
     return files;
-}
-
-/// All answers; nothing if a damaged database raises before there are any.
-std::optional<std::string> answersOf(const Files& files) {
-    const OpenDatabase open(files);
-    try {
-        return diff::takeSnapshot([](std::size_t, std::size_t) {});
-    } catch (const TarvikException&) {
-        return std::nullopt;
-    }
 }
 
 /// The answers that an edit changes without meaning to, in words.
@@ -155,7 +137,7 @@ TEST_F(NamesOfTheDemonstration, AreRenamed) {
     forEachName([](const Files& files, const std::string& answers, const edit::KnownName& known) {
         edit::Draft draft = draftOf(files);
         EXPECT_EQ(renameName(files, answers, known, draft), "") << known.name;
-        EXPECT_EQ(edit::placeOf(draft, known.name), "") << known.name;
+        EXPECT_EQ(edit::placeOf(draft.model(), known.name), "") << known.name;
         renameIn(draft, newNameFor(known), known.name);
         EXPECT_EQ(filesOf(draft), files) << known.name;
     });
@@ -165,7 +147,7 @@ TEST_F(NamesOfTheDemonstration, AreRemoved) {
     forEachName([](const Files& files, const std::string& answers, const edit::KnownName& known) {
         edit::Draft draft = draftOf(files);
         EXPECT_EQ(removeName(files, answers, known, draft), "") << known.name;
-        EXPECT_EQ(edit::placeOf(draft, known.name), "") << known.name;
+        EXPECT_EQ(edit::placeOf(draft.model(), known.name), "") << known.name;
     });
 }
 

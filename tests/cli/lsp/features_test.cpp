@@ -145,7 +145,40 @@ TEST(LspFixes, AreOfferedWhereTheFindingIs) {
                       safe.at(0).at("edit").at("changes").at(editor.uri("finch.acd"))),
               "OPERATION = PROGRAM,Bscan,USB2:VERFIY,Bscan,USB2\n");
     EXPECT_FALSE(actions(30, 30).at(0).at("isPreferred").get<bool>());
+    EXPECT_EQ(actions(30, 30).at(0).at("title"), R"(T101: replace "VERFIY" with "VERIFY" (a guess))");
     EXPECT_TRUE(actions(0, 3).empty());
+}
+
+TEST(LspFixes, ChangeOtherFiles) {
+    Small editor("finch.acd");
+    const std::string text = "PROGRAM_OPTION = ERASE,Bscan,USB2\n";
+    editor.replaceText("finch.acd", SMALL.at("finch.acd") + text);
+    Json params = editor.document("finch.acd");
+    params["range"] = {{"start", {{"line", 6}, {"character", 0}}}, {"end", {{"line", 6}, {"character", 0}}}};
+    const Json actions = editor.ask("textDocument/codeAction", params);
+    ASSERT_EQ(actions.size(), 1U);
+    EXPECT_EQ(actions.at(0).at("title"), R"(K202: insert ",FN20" in base.acd (a guess))");
+    const Json& changes = actions.at(0).at("edit").at("changes");
+    ASSERT_EQ(changes.size(), 1U);
+    EXPECT_THAT(applied(SMALL.at("base.acd"), changes.at(editor.uri("base.acd"))),
+                HasSubstr("PROGRAM_OPTION_PACKAGE = FN10P48,base,finch,spi,FN20\n"));
+}
+
+TEST(LspFixes, ListAFamilyWhereverItIsUsed) {
+    Editor editor(DatabaseDirectory::Files{
+        {"base.acd",
+         "DEVICE_SUPPORTED = base\r\nBS = outputs,USB2:families\r\nSS = outputs,USB2:families\r\n"}});
+    editor.open("wren.acd", "OPERATION = PROGRAM,Bscan,USB2\nPROPERTIES = PROGRAM,1,BS\n");
+    EXPECT_THAT(editor.codes("wren.acd"), UnorderedElementsAre("B104", "T112"));
+    Json params = editor.document("wren.acd");
+    params["range"] = {{"start", {{"line", 0}, {"character", 0}}}, {"end", {{"line", 0}, {"character", 0}}}};
+    const Json actions = editor.ask("textDocument/codeAction", params);
+    ASSERT_EQ(actions.size(), 1U);
+    EXPECT_EQ(
+        applied("DEVICE_SUPPORTED = base\r\nBS = outputs,USB2:families\r\nSS = outputs,USB2:families\r\n",
+                actions.at(0).at("edit").at("changes").at(editor.uri("base.acd"))),
+        "PROGRAM_OPTION_PACKAGE = wren\nDEVICE_SUPPORTED = base,wren\r\n"
+        "BS = outputs,USB2:families,wren\r\nSS = outputs,USB2:families\r\n");
 }
 
 TEST(LspCompletion, OffersTheKeysOfTheFile) {
@@ -185,6 +218,8 @@ TEST(LspCompletion, OffersNames) {
     EXPECT_THAT(editor.completeAfter("base.acd", "BS = outputs,U"), ElementsAre("USB2"));
     EXPECT_THAT(editor.completeAfter("base.acd", "BS = outputs,USB2:families,f"), ElementsAre("finch"));
     EXPECT_THAT(editor.completeAfter("base.acd", "BS += ,f"), ElementsAre("finch"));
+    EXPECT_THAT(editor.completeAfter("base.acd", "BS = "), ElementsAre("outputs"));
+    EXPECT_THAT(editor.completeAfter("base.acd", "BS = outputs,USB2:"), ElementsAre("families"));
     const std::string part = "NOT_SUPPORTED_PART_IN_MODE = ";
     EXPECT_THAT(editor.completeAfter("base.acd", part + "SS"), ElementsAre("SS_"));
     EXPECT_THAT(editor.completeAfter("base.acd", part + "SS_FN1"), ElementsAre("SS_FN10_"));
@@ -200,6 +235,9 @@ TEST(LspCompletion, OffersNames) {
                 ElementsAre("PINS"));
     EXPECT_THAT(family.completeAfter("finch.acd", SMALL.at("finch.acd") + "PROPERTY += :PINS,4"),
                 ElementsAre("44"));
+    EXPECT_THAT(family.completeAfter("finch.acd", "[FN20]\n[F"), UnorderedElementsAre("FN10", "FN20"));
+    EXPECT_THAT(spi.completeAfter("spi.acd", "FLA_PROPERTY = PACKAGE,SO8\nFLB_PROPERTY = PACKAGE,S"),
+                ElementsAre("SO8"));
 }
 
 TEST(LspCompletion, ReplacesTheWholeField) {
@@ -222,6 +260,21 @@ TEST(LspHover, ShowsTheValueInForce) {
         HasSubstr("hides `PROGRAM,Bscan,PARALLEL,USB2:VERIFY,SSerial,PARALLEL` of the family, finch.acd:1"));
 }
 
+TEST(LspHover, ShowsThePropertyInForce) {
+    Small editor("finch.acd");
+    editor.replaceText("finch.acd", "PROPERTY = PINS,20\nPROPERTIES = PINS,1,30:OP_VERIFY,1,ERASE\n[FN10]\n"
+                                    "PROPERTY = PINS,44:PINS,48\n");
+    EXPECT_EQ(editor.hover("finch.acd", 3, 12), "In force: `PINS,48` of FN10, finch.acd:4\n\n"
+                                                "hides `PINS,1,30` of the family, finch.acd:2\n\n"
+                                                "hides `PINS,20` of the family, finch.acd:1");
+    EXPECT_THAT(
+        editor.hover("finch.acd", 0, 17),
+        HasSubstr("In force: `PINS,1,30` of the family, finch.acd:2\n\nhides `PINS,20` of the family"));
+    EXPECT_THAT(editor.hover("finch.acd", 1, 26), HasSubstr("the options of the operation `VERIFY`"));
+    Small base("base.acd");
+    EXPECT_EQ(base.hover("base.acd", 2, 6), "a label, which is skipped");
+}
+
 TEST(LspHover, ShowsLayersAndWhatTheyReplace) {
     const DatabaseDirectory below(SMALL);
     const DatabaseDirectory top(DatabaseDirectory::Files{{"finch.acd", "[FN20]\nPROPERTY = PINS,48\n"}});
@@ -241,7 +294,7 @@ TEST(LspHover, ExplainsWordsNamesAndFindings) {
     EXPECT_THAT(
         editor.hover("finch.acd", 2, 2),
         HasSubstr("device **FN10** of family finch, finch.acd:3; packages P48, P64; IDCODE `0x00000011`"));
-    EXPECT_EQ(editor.hover("finch.acd", 5, 17), "");
+    EXPECT_EQ(editor.hover("finch.acd", 5, 17), "In force: `PINS,44` of FN20, finch.acd:6");
     editor.replaceText("finch.acd", "OPERATION = VERFIY,Bscan,USB2\n");
     EXPECT_THAT(editor.hover("finch.acd", 0, 14), HasSubstr("**T101** (error, `unknown-operation`)"));
     Small spi("spi.acd");
@@ -293,11 +346,13 @@ TEST(LspNames, AreRenamedInAllFiles) {
 
 TEST(LspNames, AreNotRenamedToWhatTheyCannotBe) {
     Small editor("base.acd");
-    for (const char* const name :
-         {"", "A B", "A,B", "A:B", "A]", "A_B", "FN20", "fn20", "finch", "FLA", "../x"}) {
+    for (const char* const name : {"", "A B", "A,B", "A:B", "A]", "A_B", "FN20", "fn20", "finch", "FLA",
+                                   "../x", "fn10", "spi", "ABCDEFGHIJKLMNOP"}) {
         EXPECT_EQ(editor.renaming("base.acd", 5, 10, name).at("error").at("code"), -32803) << name;
     }
-    EXPECT_TRUE(editor.renaming("base.acd", 5, 10, "fn10").contains("result"));
+    EXPECT_TRUE(editor.renaming("base.acd", 5, 10, "FN11").contains("result"));
+    EXPECT_THAT(editor.renaming("base.acd", 5, 10, "fn11").at("error").at("message").get<std::string>(),
+                HasSubstr("in lower case, all others in upper case: \"FN11\""));
     // Not base, not a package, not a word; and no family where the editor cannot rename files.
     EXPECT_TRUE(editor.renaming("base.acd", 0, 20, "other").contains("error"));
     EXPECT_TRUE(editor.renaming("base.acd", 1, 31, "P49").contains("error"));

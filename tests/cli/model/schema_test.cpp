@@ -62,8 +62,9 @@ TEST(Schema, KnowsWhatEachFieldHolds) {
     EXPECT_EQ(content(File::FAMILY, "IDCODE", 0, 0), Content::NONE);
     EXPECT_EQ(content(File::BASE, "IDCODE", 9, 0), Content::DEVICE);
     EXPECT_EQ(content(File::BASE, "IDCODE", 9, 2), Content::NONE);
-    EXPECT_EQ(content(File::BASE, "SM", 0, 0), Content::TEXT);
+    EXPECT_EQ(content(File::BASE, "SM", 0, 0), Content::OUTPUT_LABEL);
     EXPECT_EQ(content(File::BASE, "SM", 0, 1), Content::MODE_OUTPUT);
+    EXPECT_EQ(content(File::BASE, "SM", 1, 0), Content::FAMILY_LABEL);
     EXPECT_EQ(content(File::BASE, "SM", 1, 1), Content::FAMILY);
     EXPECT_EQ(content(File::BASE, "SM", 2, 1), Content::NONE);
     EXPECT_EQ(content(File::SPI, "NV1_DEVICES", 0, 7), Content::FLASH);

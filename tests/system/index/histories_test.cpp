@@ -4,6 +4,7 @@
 
 #include "cli/support/DatabaseDirectory.h"
 #include "support/Fixtures.h"
+#include "support/Setting.h"
 
 #include "commands/IndexWriter.h"
 #include "database/Catalogue.h"
@@ -14,7 +15,6 @@
 #include <gtest/gtest.h>
 
 #include <cerrno>
-#include <cstdlib>
 #include <filesystem>
 #include <random>
 #include <utility>
@@ -346,11 +346,6 @@ private:
     std::string m_difference;
     std::vector<std::unique_ptr<Processes>> m_started;
 };
-
-std::uint64_t setting(const char* name, std::uint64_t usual) {
-    const char* const text = std::getenv(name);
-    return text == nullptr ? usual : std::strtoull(text, nullptr, 10);
-}
 
 /// TARVIK_PROPERTY_CALLS is about the number of questions, as in other tests; a history asks some fifty.
 TEST(IndexHistories, NeverChangeAnAnswer) {
