@@ -55,7 +55,8 @@ void use(const acd::DirectoryIndex& index) {
 }
 
 void decode(const std::string& bytes) {
-    if (const std::optional<acd::DirectoryIndex> index = acd::DirectoryIndex::decode(bytes)) {
+    acd::MemorySource source(bytes);
+    if (const std::optional<acd::DirectoryIndex> index = acd::DirectoryIndex::decode(acd::readAll(source))) {
         fuzz::expectSame("what is written again", bytes, format::encode(index->contents()));
         use(*index);
     }

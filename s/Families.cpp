@@ -12,18 +12,17 @@ StringBase ConstraintsManager::Implementation::getPartFamily(std::string_view de
     // Copies: the text may be that of m_partFamily itself.
     const StringBase name = toStringBase(device);
     const StringBase base = toStringBase(baseName(device));
-    m_partFamily = base;
-    m_partFamily.MakeLower();
-    const auto cached = m_deviceFamilyCache.find(view(m_partFamily));
+    StringBase key = base;
+    key.MakeLower();
+    const auto cached = m_deviceFamilyCache.find(view(key));
     if (cached != m_deviceFamilyCache.end() && cached->second.GetLength() != 0) {
         m_partFamily = cached->second;
-        return m_partFamily;
+        return cached->second;
     }
-    const StringBase key = m_partFamily;
     m_partFamily = "";
     m_partFamily = resolveFamily(name, base);
-    m_deviceFamilyCache.insert_or_assign(key, m_partFamily);
-    return m_partFamily;
+    m_deviceFamilyCache.insert_or_assign(key, m_partFamily.get());
+    return m_partFamily.get();
 }
 
 /// The family of a device that the cache does not hold. SPI flash takes precedence over the database, and is found by
@@ -43,7 +42,7 @@ StringBase ConstraintsManager::Implementation::resolveFamily(const StringBase& d
 void ConstraintsManager::Implementation::addCachedDeviceFamily(std::string_view device, const char* family) {
     // Looks up the latest resolution, not this device: hosts rely on a seed being refused while that one is
     // cached. The name keeps its case, although devices are looked up in lower case.
-    const auto latest = m_deviceFamilyCache.find(view(m_partFamily));
+    const auto latest = m_deviceFamilyCache.find(view(m_partFamily.get()));
     if (latest == m_deviceFamilyCache.end() || latest->second.GetLength() == 0) {
         m_deviceFamilyCache.insert_or_assign(toStringBase(baseName(device)), family);
         m_operationLookups.clear();

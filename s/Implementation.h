@@ -3,6 +3,7 @@
 // The manager itself, which the exported class only forwards to. Applications never see this file, so everything in it
 // is public.
 
+#include "LatestFamily.h"
 #include "LazyTexts.h"
 #include "LookupCache.h"
 #include "NameSequence.h"
@@ -164,7 +165,7 @@ public:
     Texts m_deviceFamilyCache; ///< lower-cased base name to family
     std::map<StringBase, int, ltptstr> m_programOptionPackageIndex;
     TextSet m_operationOptions; ///< stays empty: the result of a look-up that finds nothing
-    StringBase m_partFamily;    ///< the family resolved last
+    LatestFamily m_partFamily;
 
     PermissionTable m_operationTable;
     PermissionTable m_programOptionTable;

@@ -4,8 +4,6 @@
 
 #include <algorithm>
 #include <cstddef>
-#include <cstdint>
-#include <cstring>
 #include <iterator>
 #include <map>
 #include <memory>
@@ -19,21 +17,17 @@ class LazyTexts {
 public:
     using Map = std::map<StringBase, StringBase, ltptstr>;
 
-    /// Sets the value of a key, which need not be new.
+    /// Sets the value of a key, which need not be new. No text has a NUL in it: readers return C strings.
     /// @param owner the first part of the key
     /// @param name the rest of it
     /// @param value any text
     void set(std::string_view owner, std::string_view name, std::string_view value) {
-        const Lengths lengths{static_cast<std::uint32_t>(owner.size() + name.size()),
-                              static_cast<std::uint32_t>(value.size())};
-        char* end = reserve(sizeof lengths + owner.size() + name.size() + value.size());
-        std::memcpy(end, &lengths, sizeof lengths);
-        end += sizeof lengths;
-        end += owner.copy(end, owner.size());
-        if (!name.empty()) {
-            end += name.copy(end, name.size());
-        }
-        value.copy(end, value.size());
+        char* const entry = reserve(owner.size() + name.size() + 1 + value.size() + 1);
+        char* end = entry + owner.copy(entry, owner.size());
+        end += name.copy(end, name.size());
+        *end++ = '\0';
+        end += value.copy(end, value.size());
+        *end = '\0';
     }
 
     /// Sorts the log into the map, unless that was done before. If memory runs out, the next call does it again.
@@ -42,14 +36,12 @@ public:
         auto last = m_map.end();
         for (const Block& block : m_log) {
             for (const char* next = block.bytes.get(); next != block.bytes.get() + block.size;) {
-                Lengths lengths;
-                std::memcpy(&lengths, next, sizeof lengths);
-                const char* const key = next + sizeof lengths;
-                const char* const value = key + lengths.key;
+                const StringBase key(next);
+                next += key.GetLength() + 1;
+                const StringBase value(next);
+                next += value.GetLength() + 1;
                 // The lists of a database are nearly sorted, so most keys belong right after the one before.
-                last = m_map.insert_or_assign(last == m_map.end() ? last : std::next(last),
-                                              StringBase(key, lengths.key), StringBase(value, lengths.value));
-                next = value + lengths.value;
+                last = m_map.insert_or_assign(last == m_map.end() ? last : std::next(last), key, value);
             }
         }
         m_log.clear();
@@ -57,12 +49,6 @@ public:
     }
 
 private:
-    /// What is in front of the two texts of an entry. No text of a database is longer than 1 GiB.
-    struct Lengths {
-        std::uint32_t key;
-        std::uint32_t value;
-    };
-
     struct Block {
         std::unique_ptr<char[]> bytes;
         std::size_t capacity;

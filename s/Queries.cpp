@@ -24,7 +24,7 @@ const CachedLookup* ConstraintsManager::Implementation::findCachedLookup(const L
                                                                          std::string_view device) {
     const CachedLookup* const found = cache.find(device);
     if (found != nullptr && found->family != nullptr) {
-        m_partFamily = *found->family;
+        m_partFamily.refer(*found->family); // one of m_supportedDevices
     }
     return found;
 }

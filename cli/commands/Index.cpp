@@ -87,7 +87,7 @@ std::string asText(const Shown& shown, const Terminal& terminal) {
     Table table({"FILE", "SIZE", "CHANGED", "SECTIONS", ""});
     for (const acd::IndexedFile& file : shown.index.contents.files) {
         table.add({terminal.sanitised(file.name), std::to_string(file.status.size),
-                   asText(file.status.changed), std::to_string(file.sections.ends().size()),
+                   asText(file.status.changed), std::to_string(file.sections.count()),
                    shown.index.contents.isSettled(file) ? "" : "read each time: as young as the index"});
     }
     return text + table.text(terminal);
@@ -138,7 +138,7 @@ ExitCode run(Tool& tool, const Arguments& arguments) {
         Written& written = indexes.emplace_back(Written{indexPath(directory), 0, 0});
         for (const acd::IndexedFile& file : writeIndex(directory).files) {
             ++written.files;
-            written.sections += file.sections.ends().size();
+            written.sections += file.sections.count();
         }
     }
     return tool.answer(indexes);

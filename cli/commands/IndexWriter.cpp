@@ -14,6 +14,9 @@
 
 namespace {
 
+/// Begins the name of the file that tells the time.
+constexpr const char* PROBE = ".index.acx.";
+
 /// The status of a new file in the directory: which device it is on, and what time it is there.
 acd::FileStatus probe(const std::string& directory) {
     try {
@@ -23,11 +26,31 @@ acd::FileStatus probe(const std::string& directory) {
                 std::error_code ignored;
                 std::filesystem::remove(acd::toPath(path), ignored);
             }
-        } probe{createTemporaryFile(directory, fmt::format(".{}.", acd::indexFormat::FILE_NAME))};
+        } probe{createTemporaryFile(directory, PROBE)};
         return acd::FileSource(probe.path).status();
     } catch (const std::system_error& failure) {
         throw CommandError(ExitCode::FAULT, fmt::format("can't write \"{}\": {}", indexPath(directory),
                                                         failure.code().message()));
+    }
+}
+
+/// Removes what a run of the tool left that was killed while it wrote. What another run is writing now is younger.
+/// @param now by the clock of the directory
+void removeLeftovers(const std::string& directory, acd::FileTime now) {
+    constexpr std::int64_t SECONDS_AT_LEAST = 600;
+    for (const std::string& name : acd::listDirectory(directory)) {
+        if (!name.starts_with(PROBE) && !name.starts_with(TEMPORARY_FILE)) {
+            continue;
+        }
+        const std::string path = acd::joinPath(directory, name);
+        try {
+            if (acd::FileSource(path).status().changed.seconds + SECONDS_AT_LEAST < now.seconds) {
+                std::error_code ignored;
+                std::filesystem::remove(acd::toPath(path), ignored);
+            }
+        } catch (const acd::ReadError&) {
+            continue; // It is gone, or none of ours: the index can be made all the same.
+        }
     }
 }
 
@@ -45,6 +68,7 @@ acd::IndexContents writeIndex(const std::string& directory) {
         }
         // Before any file is read: what changes from here on is as young as the index.
         const acd::FileStatus now = probe(directory);
+        removeLeftovers(directory, now.changed);
         acd::IndexContents contents = acd::describeDirectory(directory, now.device, now.changed);
         writeFile(indexPath(directory), acd::indexFormat::encode(contents));
         return contents;

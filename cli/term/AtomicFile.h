@@ -3,6 +3,9 @@
 #include <string>
 #include <string_view>
 
+/// Begins the names of the files that `writeFile` writes next to others; a run that is killed may leave one.
+inline constexpr const char* TEMPORARY_FILE = ".tarvik.";
+
 /// Writes a file whole or not at all: under another name next to it, which then takes its place. Mode and owner stay.
 /// Links are followed, also to files that do not exist yet.
 ///

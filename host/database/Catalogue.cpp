@@ -1,6 +1,7 @@
 #include "database/Catalogue.h"
 
 #include "database/FileNames.h"
+#include "database/SectionScanner.h"
 
 #include <algorithm>
 #include <filesystem>
@@ -89,9 +90,15 @@ void Catalogue::addFile(std::string_view fileName, SourceFile file) {
     known->files.push_back(std::move(file));
 }
 
+/// Files are added in order; only those of an upper layer alone are behind their place.
 void Catalogue::sort() {
-    std::sort(m_families.begin(), m_families.end(),
-              [](const auto& left, const auto& right) { return left->fileName < right->fileName; });
+    const auto precedes = [](const auto& left, const auto& right) {
+        return left->fileName < right->fileName;
+    };
+    if (std::is_sorted(m_families.begin(), m_families.end(), precedes)) {
+        return;
+    }
+    std::sort(m_families.begin(), m_families.end(), precedes);
     m_names = {};
     for (const auto& family : m_families) {
         m_names.add(family->name);

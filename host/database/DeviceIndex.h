@@ -1,7 +1,7 @@
 #pragma once
 
 #include "database/CaseInsensitiveNameSet.h"
-#include "database/SectionScanner.h"
+#include "database/PackedStrings.h"
 
 #include <cstdint>
 #include <string_view>

@@ -23,26 +23,26 @@ std::optional<DirectoryIndex> DirectoryIndex::read(const std::string& directory)
         if (source.expectedSize() > MAX_INDEX_SIZE) {
             return std::nullopt;
         }
-        const Text text = readAll(source);
-        return decode({text.bytes.get(), text.size});
+        return decode(readAll(source));
     } catch (const ReadError&) {
         return std::nullopt;
     }
 }
 
-std::optional<DirectoryIndex> DirectoryIndex::decode(std::string_view bytes) {
-    std::uint32_t checksum = 0;
+std::optional<DirectoryIndex> DirectoryIndex::decode(Text text) {
+    const std::string_view bytes(text.bytes.get(), text.size);
+    std::uint64_t checksum = 0;
     if (!bytes.starts_with(indexFormat::SIGNATURE) ||
         bytes.size() < indexFormat::SIGNATURE.size() + sizeof checksum) {
         return std::nullopt;
     }
     const std::string_view covered = bytes.substr(0, bytes.size() - sizeof checksum);
-    indexFormat::Reader(bytes.substr(covered.size())).number(checksum);
+    indexFormat::Reader(bytes.substr(covered.size()), nullptr).number(checksum);
     if (checksum != indexFormat::checksum(covered)) {
         return std::nullopt;
     }
     DirectoryIndex index;
-    indexFormat::Reader reader(covered.substr(indexFormat::SIGNATURE.size()));
+    indexFormat::Reader reader(covered.substr(indexFormat::SIGNATURE.size()), std::move(text.bytes));
     indexFormat::transfer(reader, index.m_contents);
     if (!reader.isValid() || !reader.isAtEnd()) {
         return std::nullopt;

@@ -18,9 +18,9 @@ public:
     ///         answer as well
     [[nodiscard]] static std::optional<DirectoryIndex> read(const std::string& directory);
 
-    /// Decodes the bytes of an index file.
+    /// Decodes the bytes of an index file, and keeps them.
     /// @return nothing unless they are a whole index of this format
-    [[nodiscard]] static std::optional<DirectoryIndex> decode(std::string_view bytes);
+    [[nodiscard]] static std::optional<DirectoryIndex> decode(Text text);
 
     /// Whether the directory has the files that it had when the index was made, each with the same status, and this
     /// process may read them.

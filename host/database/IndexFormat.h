@@ -1,13 +1,14 @@
 #pragma once
 
 #include "database/FileReading.h"
-#include "database/SectionScanner.h"
+#include "database/LittleEndian.h"
+#include "database/PackedStrings.h"
 
-#include <StringBase.h>
-
+#include <bit>
 #include <concepts>
 #include <cstddef>
 #include <cstdint>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <type_traits>
@@ -46,7 +47,7 @@ inline constexpr const char* FILE_NAME = "index.acx";
 
 /// The first bytes of an index. The number changes with the format, and with the rules by which the names of sections
 /// are found: an index of other rules must not be used.
-inline constexpr std::string_view SIGNATURE = "tarvik index 1\n";
+inline constexpr std::string_view SIGNATURE = "tarvik index 2\n";
 
 /// Lists the members in the order in which they are stored.
 template <typename Stream, typename Time>
@@ -81,10 +82,7 @@ class Writer {
 public:
     template <std::integral Number>
     void number(Number number) {
-        const auto bits = static_cast<std::make_unsigned_t<Number>>(number);
-        for (std::size_t byte = 0; byte != sizeof bits; ++byte) {
-            m_bytes += static_cast<char>(bits >> (8 * byte));
-        }
+        appendLittleEndian(m_bytes, number);
     }
 
     void text(std::string_view text) {
@@ -92,13 +90,7 @@ public:
         m_bytes += text;
     }
 
-    void strings(const PackedStrings& strings) {
-        number(static_cast<std::uint32_t>(strings.ends().size()));
-        for (const std::uint32_t end : strings.ends()) {
-            number(end);
-        }
-        text({strings.bytes().data(), strings.bytes().size()});
-    }
+    void strings(const PackedStrings& strings) { text(strings.bytes()); }
 
     template <typename Item>
     void list(const std::vector<Item>& items) {
@@ -117,7 +109,9 @@ private:
 /// Reads the same. The first thing that does not fit into what is left makes everything after it fail, too.
 class Reader {
 public:
-    explicit Reader(std::string_view bytes) noexcept : m_rest(bytes) {}
+    /// @param owner of the bytes, for what refers to them
+    Reader(std::string_view bytes, std::shared_ptr<const char[]> owner) noexcept
+        : m_rest(bytes), m_owner(std::move(owner)) {}
 
     /// @return whether everything fitted
     [[nodiscard]] bool isValid() const noexcept { return m_isValid; }
@@ -127,23 +121,16 @@ public:
 
     template <std::integral Number>
     void number(Number& number) {
-        std::make_unsigned_t<Number> bits = 0;
-        const std::string_view bytes = take(sizeof bits);
-        for (std::size_t byte = 0; byte != bytes.size(); ++byte) {
-            bits = static_cast<decltype(bits)>(bits | std::uint64_t{static_cast<unsigned char>(bytes[byte])}
-                                                          << (8 * byte));
-        }
-        number = static_cast<Number>(bits);
+        const std::string_view bytes = take(sizeof number);
+        number = bytes.empty() ? 0 : loadLittleEndian<Number>(bytes.data());
     }
 
     void text(std::string& text) { text = takeText(); }
 
     void strings(PackedStrings& strings) {
-        std::vector<std::uint32_t> ends(count(sizeof(std::uint32_t)));
-        for (std::uint32_t& end : ends) {
-            number(end);
-        }
-        if (!strings.assign(takeText(), std::move(ends))) {
+        if (auto packed = PackedStrings::from(m_owner, takeText())) {
+            strings = std::move(*packed);
+        } else {
             fail();
         }
     }
@@ -158,7 +145,7 @@ public:
 
 private:
     /// The size of a file's entry without its texts.
-    static constexpr std::size_t MIN_FILE_SIZE = 3 * sizeof(std::uint32_t) + 3 * sizeof(std::uint64_t) +
+    static constexpr std::size_t MIN_FILE_SIZE = 2 * sizeof(std::uint32_t) + 3 * sizeof(std::uint64_t) +
                                                  2 * (sizeof(std::int64_t) + sizeof(std::uint32_t));
 
     void fail() noexcept {
@@ -194,12 +181,25 @@ private:
     }
 
     std::string_view m_rest;
+    std::shared_ptr<const char[]> m_owner;
     bool m_isValid = true;
 };
 
-/// Every single changed byte changes it.
-[[nodiscard]] inline std::uint32_t checksum(std::string_view bytes) noexcept {
-    return StringBase::CRC32(bytes.data(), bytes.size());
+/// Every single changed byte changes it, as each step has a different result for each sum and each word. It takes eight
+/// bytes a step, since a CRC would take longer than all else that is done with an index.
+[[nodiscard]] inline std::uint64_t checksum(std::string_view bytes) noexcept {
+    constexpr std::uint64_t FACTOR = 0x9E3779B97F4A7C15;
+    const auto step = [](std::uint64_t sum, std::uint64_t word) {
+        return std::rotl((sum ^ word) * FACTOR, 32);
+    };
+    std::uint64_t sum = bytes.size();
+    for (; bytes.size() >= sizeof sum; bytes.remove_prefix(sizeof sum)) {
+        sum = step(sum, loadLittleEndian<std::uint64_t>(bytes.data()));
+    }
+    for (const char byte : bytes) {
+        sum = step(sum, static_cast<unsigned char>(byte));
+    }
+    return sum;
 }
 
 /// The bytes of an index file: the signature, the contents and a checksum of both.

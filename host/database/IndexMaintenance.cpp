@@ -2,6 +2,7 @@
 
 #include "database/DirectoryIndex.h"
 #include "database/FileNames.h"
+#include "database/SectionScanner.h"
 
 #include <algorithm>
 #include <memory>

@@ -28,6 +28,10 @@ namespace {
     return text.substr(offset - std::min(offset, BEFORE));
 }
 
+[[nodiscard]] bool startsBehind(std::size_t offset, const SourceSpan& span) noexcept {
+    return offset < span.offset;
+}
+
 } // namespace
 
 std::string_view withoutTrailingBlanks(std::string_view text) noexcept {
@@ -155,7 +159,7 @@ void LineReader::readHeader(Line& line) const {
     line.location = locationOf(1);
 }
 
-void LineReader::readAssignment(Line& line) const {
+void LineReader::readAssignment(Line& line) {
     if (m_holdsNul) {
         if (const std::size_t nul = m_text.find('\0'); nul != m_text.npos) {
             fail(line, ParseErrorKind::NUL_BYTE, nul, contextAround(m_text, nul));
@@ -188,23 +192,27 @@ void LineReader::readAssignment(Line& line) const {
     locateValue(line);
 }
 
-/// Sets the spans of the value; an empty value is located right after the `=`.
-void LineReader::locateValue(Line& line) const {
-    const auto begin = static_cast<std::size_t>(line.value.data() - m_text.data());
-    line.spans.clear();
+/// Makes the spans of the line those of the value; an empty value is located right after the `=`.
+void LineReader::locateValue(Line& line) {
+    const auto begin = static_cast<std::uint32_t>(line.value.data() - m_text.data());
+    const auto end = static_cast<std::uint32_t>(begin + line.value.size());
     if (line.value.empty()) {
         SourceLocation location = locationOf(m_text.find('='));
         ++location.column;
-        line.spans.push_back({0, location});
+        m_spans.assign(1, {0, location});
+        line.spans = m_spans;
         return;
     }
-    line.spans.reserve(m_spans.size());
-    line.spans.push_back({0, locationOf(begin)});
-    for (const SourceSpan& span : m_spans) {
-        if (span.offset > begin && span.offset < begin + line.value.size()) {
-            line.spans.push_back({static_cast<std::uint32_t>(span.offset - begin), span.location});
-        }
+    const SourceLocation location = locationOf(begin);
+    const auto behind = std::upper_bound(m_spans.begin(), m_spans.end(), begin, startsBehind);
+    const auto first = std::prev(behind);
+    auto last = behind;
+    *first = {0, location};
+    while (last != m_spans.end() && last->offset < end) {
+        last->offset -= begin;
+        ++last;
     }
+    line.spans = {&*first, static_cast<std::size_t>(last - first)};
 }
 
 void LineReader::fail(Line& line, ParseErrorKind kind, std::size_t offset, std::string_view fragment) const {
@@ -216,10 +224,8 @@ void LineReader::fail(Line& line, ParseErrorKind kind, std::size_t offset, std::
 
 /// The place of a byte of the current line.
 SourceLocation LineReader::locationOf(std::size_t offset) const noexcept {
-    const auto behind =
-        std::upper_bound(m_spans.begin(), m_spans.end(), offset,
-                         [](std::size_t wanted, const SourceSpan& span) { return wanted < span.offset; });
-    const SourceSpan& span = *std::prev(behind);
+    const SourceSpan& span =
+        *std::prev(std::upper_bound(m_spans.begin(), m_spans.end(), offset, startsBehind));
     return {span.location.line, span.location.column + static_cast<std::uint32_t>(offset - span.offset)};
 }
 

@@ -4,6 +4,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <span>
 #include <string_view>
 #include <vector>
 
@@ -60,8 +61,8 @@ struct Line {
     std::string_view name;
     SourceLocation location{}; ///< of the name
     std::string_view value;
-    std::vector<SourceSpan> spans; ///< of the value, in order; one at least
-    ParseError error{};            ///< of kind `INVALID` only
+    std::span<const SourceSpan> spans; ///< of the value, in order; one at least
+    ParseError error{};                ///< of kind `INVALID` only
 };
 
 /// Walks over the text of a database file, line by line as they are meant. The one place that knows the
@@ -78,7 +79,7 @@ public:
     /// @param size at most 4 GiB
     LineReader(char* text, std::size_t size);
 
-    /// Reads the next line into `line`, whose memory is used again.
+    /// Reads the next line. Its spans are valid until the next call.
     /// @return false at the end of the text
     [[nodiscard]] bool next(Line& line);
 
@@ -98,8 +99,8 @@ private:
     [[nodiscard]] PhysicalLine takePhysicalLine() noexcept;
     [[nodiscard]] bool join(const PhysicalLine& first);
     void readHeader(Line& line) const;
-    void readAssignment(Line& line) const;
-    void locateValue(Line& line) const;
+    void readAssignment(Line& line);
+    void locateValue(Line& line);
     void fail(Line& line, ParseErrorKind kind, std::size_t offset, std::string_view fragment) const;
     [[nodiscard]] SourceLocation locationOf(std::size_t offset) const noexcept;
 
@@ -108,8 +109,8 @@ private:
     std::uint32_t m_lineNumber = 0;
     bool m_holdsNul;
 
-    std::string_view m_text; ///< the current line, joined, without blanks at its ends
-    std::vector<SourceSpan> m_spans;
+    std::string_view m_text;         ///< the current line, joined, without blanks at its ends
+    std::vector<SourceSpan> m_spans; ///< of that line; after it was read, those of its value
 };
 
 } // namespace acd

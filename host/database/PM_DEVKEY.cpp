@@ -10,19 +10,16 @@
 
 namespace {
 
-/// Whether a text that was kept is the one given, null being the empty one. Those are a few bytes: two calls into the
+/// Whether a text that was kept is the one given, null being the empty one. Those are a few bytes: a call into the
 /// C library would cost more than the comparison.
-[[nodiscard]] bool isSame(std::string_view kept, const char* text) noexcept {
-    if (text == nullptr) {
-        return kept.empty();
-    }
-    for (const char byte : kept) {
-        if (byte != *text) {
-            return false; // at the end of `text`, too: nothing that was kept holds a NUL
+[[nodiscard]] bool isSame(const std::string& kept, const char* text) noexcept {
+    const char* expected = kept.c_str();
+    for (text = nullToEmpty(text); *text == *expected; ++text, ++expected) {
+        if (*text == '\0') {
+            return true; // nothing that was kept holds a NUL
         }
-        ++text;
     }
-    return *text == '\0';
+    return false;
 }
 
 } // namespace
@@ -68,8 +65,11 @@ bool PM_DEVKEY::find(const char* key, const char* separator, const char* subSepa
         part = m_field.part(part);
     }
     // Half as much work as an assignment, which allows for a text that overlaps.
-    m_result.clear();
-    m_result.append(part);
+    if (part.size() >= m_result.size()) {
+        m_result.resize(part.size() + 1);
+    }
+    part.copy(m_result.data(), part.size());
+    m_result[part.size()] = '\0';
     return true;
 }
 

@@ -2,11 +2,8 @@
 
 #include "database/LineReader.h"
 
-#include <AcdText.h>
-
 #include <algorithm>
 #include <cstring>
-#include <utility>
 
 // The fast search for headers: from one `[` to the next, and a look at the line around it. Where more than
 // that line matters (one that is continued, or one that may itself be a continuation) the file is left
@@ -36,47 +33,16 @@ namespace {
 
 } // namespace
 
-void PackedStrings::add(std::string_view name) {
-    m_bytes.insert(m_bytes.end(), name.begin(), name.end());
-    m_ends.push_back(static_cast<std::uint32_t>(m_bytes.size()));
-}
-
-bool PackedStrings::assign(std::string_view bytes, std::vector<std::uint32_t> ends) {
-    // Each end is after the one before it, and the last one is that of the bytes.
-    const auto misplaced = std::adjacent_find(ends.begin(), ends.end(), std::greater_equal<>());
-    if (misplaced != ends.end() || (ends.empty() ? 0 : ends.back()) != bytes.size() ||
-        (!ends.empty() && ends.front() == 0)) {
-        return false;
-    }
-    m_bytes.assign(bytes.begin(), bytes.end());
-    m_ends = std::move(ends);
-    return true;
-}
-
-bool PackedStrings::containsIgnoreCase(std::string_view name) const noexcept {
-    std::uint32_t begin = 0;
-    for (const std::uint32_t end : m_ends) {
-        // Most names differ in their length or their last byte.
-        if (end - begin == name.size() &&
-            AcdText::toLower(m_bytes[end - 1]) == AcdText::toLower(name.back()) &&
-            AcdText::equalsIgnoreCase({m_bytes.data() + begin, name.size()}, name)) {
-            return true;
-        }
-        begin = end;
-    }
-    return false;
-}
-
 SectionScanner::SectionScanner(std::size_t bufferSize)
     : m_bufferSize(bufferSize), m_buffer(makeBuffer(bufferSize)) {}
 
-const PackedStrings& SectionScanner::names(const std::function<std::unique_ptr<ByteSource>()>& open) {
+PackedStrings SectionScanner::names(const std::function<std::unique_ptr<ByteSource>()>& open) {
     m_names.clear();
     if (!scan(*open())) {
         m_names.clear();
         parse(*open());
     }
-    return m_names;
+    return m_names.pack();
 }
 
 /// Scans a file buffer by buffer, each cut after its last whole line.

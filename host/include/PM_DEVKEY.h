@@ -81,5 +81,5 @@ private:
     AcdText::PartCursor m_field;
 
     Request m_request;
-    std::string m_result;
+    std::string m_result; ///< the text and a NUL, then what is left of longer ones
 };

@@ -48,7 +48,7 @@ TEST(PartFamily, OfALookUpThatRaisesIsEmpty) {
     AcdStore::setSearchPath({directory.path()});
     Port_MsgManData::setSink([](const Port_MsgManData::Message&) { throw std::runtime_error("no room"); });
     EXPECT_THROW(static_cast<void>(session->getPartFamily("KS50")), std::runtime_error);
-    EXPECT_EQ(text(session.members().m_partFamily), "");
+    EXPECT_EQ(text(session.members().m_partFamily.get()), "");
 }
 
 TEST(PartFamily, IsFoundInAnyCase) {
@@ -165,11 +165,11 @@ TEST(PartFamily, CachedEmptyTextCountsAsAMissAndIsOverwritten) {
 TEST(PartFamily, IsLeftInTheResultBuffer) {
     FamilySession session;
     EXPECT_EQ(session.familyOf("KS50"), "kestrel");
-    EXPECT_EQ(text(session.members().m_partFamily), "kestrel");
+    EXPECT_EQ(text(session.members().m_partFamily.get()), "kestrel");
     EXPECT_EQ(session.familyOf("nobody"), "base");
-    EXPECT_EQ(text(session.members().m_partFamily), "base");
+    EXPECT_EQ(text(session.members().m_partFamily.get()), "base");
     EXPECT_EQ(session.familyOf("KS50"), "kestrel");
-    EXPECT_EQ(text(session.members().m_partFamily), "kestrel");
+    EXPECT_EQ(text(session.members().m_partFamily.get()), "kestrel");
 }
 
 TEST(PartFamily, IsACopyThatLaterQuestionsLeaveAlone) {
@@ -182,17 +182,17 @@ TEST(PartFamily, IsACopyThatLaterQuestionsLeaveAlone) {
 TEST(PartFamily, OfTheResultBufferItself) {
     FamilySession session;
     session.members().m_partFamily = "KS50_a_package_that_is_longer_than_any_short_text";
-    EXPECT_EQ(session.familyOf(session.members().m_partFamily.c_str()), "kestrel");
+    EXPECT_EQ(session.familyOf(session.members().m_partFamily.get().c_str()), "kestrel");
     EXPECT_THAT(session.cache(), ElementsAre(Pair("ks50", "kestrel")));
-    EXPECT_EQ(session.familyOf(session.members().m_partFamily.c_str()), "kestrel");
+    EXPECT_EQ(session.familyOf(session.members().m_partFamily.get().c_str()), "kestrel");
 }
 
 TEST(PartFamily, OfAnSpiFlashInTheResultBufferItself) {
     FamilySession session;
     session.members().m_partFamily = "flash2_x";
-    EXPECT_EQ(session.familyOf(session.members().m_partFamily.c_str()), "spi");
+    EXPECT_EQ(session.familyOf(session.members().m_partFamily.get().c_str()), "spi");
     session.members().m_partFamily = "FLASH1";
-    EXPECT_EQ(session.familyOf(session.members().m_partFamily.c_str()), "spi");
+    EXPECT_EQ(session.familyOf(session.members().m_partFamily.get().c_str()), "spi");
 }
 
 TEST(PartFamily, OfAVeryLongName) {
@@ -234,7 +234,7 @@ TEST(Seeding, LeavesTheResultBufferAlone) {
     FamilySession session;
     EXPECT_EQ(session.familyOf("KS50"), "kestrel");
     session.seed("dev", "fam");
-    EXPECT_EQ(text(session.members().m_partFamily), "kestrel");
+    EXPECT_EQ(text(session.members().m_partFamily.get()), "kestrel");
 }
 
 TEST(Seeding, IsRefusedWhileTheLatestResolutionIsItselfCached) {
@@ -277,7 +277,7 @@ TEST(Seeding, EmptyValueOfTheLatestResolutionDoesNotRefuse) {
 
 TEST(Seeding, IsRefusedRightAfterAStartUpThatResolvedSpi) {
     ManagerFixture session(Base{""});
-    EXPECT_EQ(text(session.members().m_partFamily), "spi");
+    EXPECT_EQ(text(session.members().m_partFamily.get()), "spi");
     session->addCachedDeviceFamily("dev", "fam");
     EXPECT_THAT(entries(session.members().m_deviceFamilyCache), ElementsAre(Pair("spi", "spi")));
 }
@@ -298,7 +298,7 @@ TEST(Seeding, NullFamilyIsTheEmptyTextWhichIsNoAnswer) {
 TEST(Seeding, WithTheResultBufferItself) {
     FamilySession session;
     EXPECT_EQ(session.familyOf("KS50"), "kestrel");
-    session.seed(session.members().m_partFamily.c_str(), session.members().m_partFamily.c_str());
+    session.seed(session.members().m_partFamily.get().c_str(), session.members().m_partFamily.get().c_str());
     EXPECT_THAT(session.cache(), ElementsAre(Pair("kestrel", "kestrel"), Pair("ks50", "kestrel")));
 }
 

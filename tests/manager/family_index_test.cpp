@@ -98,9 +98,9 @@ TEST(FamilyIndex, FollowsTheFamilyCache) {
 TEST(FamilyIndex, OfTheResultBufferItself) {
     IndexSession session;
     EXPECT_EQ(text(session->getPartFamily("KS50")), "kestrel");
-    EXPECT_EQ(session.members().familyIndex(session.members().m_partFamily.c_str()), 1U);
+    EXPECT_EQ(session.members().familyIndex(session.members().m_partFamily.get().c_str()), 1U);
     session.members().m_partFamily = "ME1_PQ";
-    EXPECT_EQ(session.members().familyIndex(session.members().m_partFamily.c_str()), 2U);
+    EXPECT_EQ(session.members().familyIndex(session.members().m_partFamily.get().c_str()), 2U);
 }
 
 TEST(FamilyIndex, OfASupportedNameThatHoldsAnUnderscore) {

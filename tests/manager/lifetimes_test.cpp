@@ -71,7 +71,7 @@ TEST(Lifetimes, AQuestionAskedTwiceLoadsNothingMore) {
 TEST(Lifetimes, ArgumentsMayBeTextsOfTheManagerItself) {
     // A returned text is a valid argument, even where the answer changes the place it was read from.
     ManagerFixture manager(manyDevices());
-    const StringBase& family = manager.members().m_partFamily;
+    const StringBase& family = manager.members().m_partFamily.get();
     static_cast<void>(manager->getPartFamily("device0"));
     EXPECT_STREQ(manager->getDeviceStringProperty(family.c_str(), "SHARED"),
                  "a value of the family that is no short text");

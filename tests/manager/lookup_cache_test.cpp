@@ -65,7 +65,7 @@ TEST(CachedLookups, LeaveTheLatestResolutionAloneInSpiMode) {
         static_cast<void>(manager->getProgramOptions("dev2", SPI, PARALLEL, nullptr));
         static_cast<void>(manager->getDeviceOperations("dev2", SPI, PARALLEL));
         EXPECT_FALSE(mayProgram(manager, "dev2", SPI));
-        EXPECT_STREQ(manager.members().m_partFamily.c_str(), "fam1");
+        EXPECT_STREQ(manager.members().m_partFamily.get().c_str(), "fam1");
     }
 }
 
@@ -73,15 +73,15 @@ TEST(CachedLookups, LeaveTheSameResolutionAsLongOnes) {
     ManagerFixture manager(databases("", ""));
     for (int time = 0; time < 3; ++time) {
         EXPECT_EQ(manager->getProgramOptions("dev2", BS, PARALLEL, nullptr), maskOf(2));
-        EXPECT_STREQ(manager.members().m_partFamily.c_str(), "fam2");
+        EXPECT_STREQ(manager.members().m_partFamily.get().c_str(), "fam2");
         EXPECT_EQ(manager->getDeviceOperations("dev1", BS, PARALLEL), maskOf(0));
-        EXPECT_STREQ(manager.members().m_partFamily.c_str(), "fam1");
+        EXPECT_STREQ(manager.members().m_partFamily.get().c_str(), "fam1");
         EXPECT_EQ(manager->getBsdlOperations("dev3", PARALLEL), 0);
-        EXPECT_STREQ(manager.members().m_partFamily.c_str(), "fam2");
+        EXPECT_STREQ(manager.members().m_partFamily.get().c_str(), "fam2");
         EXPECT_TRUE(mayProgram(manager, "dev1"));
-        EXPECT_STREQ(manager.members().m_partFamily.c_str(), "fam1");
+        EXPECT_STREQ(manager.members().m_partFamily.get().c_str(), "fam1");
         EXPECT_EQ(manager->getDeviceOperations("fam2", BS, PARALLEL), maskOf(21));
-        EXPECT_STREQ(manager.members().m_partFamily.c_str(), "fam1");
+        EXPECT_STREQ(manager.members().m_partFamily.get().c_str(), "fam1");
     }
 }
 

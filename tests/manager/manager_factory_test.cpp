@@ -44,7 +44,7 @@ TEST_F(ManagerFactoryTest, MakesManagersThatShareNoState) {
     EXPECT_EQ(operations(*asked, "dev1"), maskOf(3));
     EXPECT_TRUE(TarvikTestPeer::members(*fresh).m_deviceFamilyCache.empty());
     EXPECT_TRUE(TarvikTestPeer::members(*fresh).m_loadedFamilies.empty());
-    EXPECT_STREQ(TarvikTestPeer::members(*fresh).m_partFamily.c_str(), "");
+    EXPECT_STREQ(TarvikTestPeer::members(*fresh).m_partFamily.get().c_str(), "");
     EXPECT_EQ(operations(*fresh, "dev1"), maskOf(0));
 }
 

@@ -118,7 +118,7 @@ TEST(PropertyValues, TheFamilyIsLeftAsTheOneResolvedLatest) {
     EXPECT_STREQ(manager->getDeviceStringProperty("dev1", "K"), "theirs");
     manager.members().m_partFamily = "something else";
     EXPECT_STREQ(manager->getDeviceStringProperty("dev1", "K"), "theirs");
-    EXPECT_STREQ(manager.members().m_partFamily.c_str(), "fam1");
+    EXPECT_STREQ(manager.members().m_partFamily.get().c_str(), "fam1");
 }
 
 TEST(PropertyValues, AnSpiFlashAnswersFromItsCatalogue) {

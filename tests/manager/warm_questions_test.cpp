@@ -105,11 +105,11 @@ TEST(WarmQuestions, LeaveTheLatestResolution) {
     for (const auto& question : {operations, options}) {
         manager.members().m_partFamily = "something else";
         question(manager, "dev1");
-        EXPECT_STREQ(manager.members().m_partFamily.c_str(), "fam1");
+        EXPECT_STREQ(manager.members().m_partFamily.get().c_str(), "fam1");
     }
     manager.members().m_partFamily = "something else";
     mayProgram(manager, "dev1");
-    EXPECT_STREQ(manager.members().m_partFamily.c_str(), "fam1");
+    EXPECT_STREQ(manager.members().m_partFamily.get().c_str(), "fam1");
 }
 
 TEST(WarmQuestions, AboutAFamilyLeaveTheLatestResolutionAlone) {
@@ -117,14 +117,14 @@ TEST(WarmQuestions, AboutAFamilyLeaveTheLatestResolutionAlone) {
     operations(manager, "fam1");
     manager.members().m_partFamily = "something else";
     EXPECT_EQ(operations(manager, "fam1"), PROGRAM);
-    EXPECT_STREQ(manager.members().m_partFamily.c_str(), "something else");
+    EXPECT_STREQ(manager.members().m_partFamily.get().c_str(), "something else");
 }
 
 TEST(WarmQuestions, MayHoldTheLatestResolutionItself) {
     const ManagerFixture manager(DATABASES);
     operations(manager, "dev1");
     manager.members().m_partFamily = "dev1";
-    EXPECT_EQ(operations(manager, manager.members().m_partFamily.c_str()), PROGRAM);
+    EXPECT_EQ(operations(manager, manager.members().m_partFamily.get().c_str()), PROGRAM);
 }
 
 TEST(WarmQuestions, FollowAFamilyThatIsSeededLater) {
@@ -148,7 +148,7 @@ TEST(WarmQuestions, OfAFamilyThatIsSeededWithAnotherAnswerAlike) {
     const int first = operations(manager, "dev4");
     manager.members().m_partFamily = "something else";
     EXPECT_EQ(operations(manager, "dev4"), first);
-    EXPECT_STREQ(manager.members().m_partFamily.c_str(), "fam2");
+    EXPECT_STREQ(manager.members().m_partFamily.get().c_str(), "fam2");
 }
 
 TEST(WarmQuestions, AboutADeviceOfAFamilyWithoutADatabaseAnswerAlike) {

@@ -193,7 +193,7 @@ std::vector<Member> members(ConstraintsManager& manager) {
         {"m_programOptionsLoaded", show(members.m_programOptionsLoaded)},
         {"m_deviceProperties", show(ordered(members.m_deviceProperties))},
         {"m_deviceFamilyCache", show(members.m_deviceFamilyCache)},
-        {"m_partFamily", show(members.m_partFamily)},
+        {"m_partFamily", show(members.m_partFamily.get())},
         {"m_spiProperties", show(members.m_spiProperties.get())},
         {"m_spiNames", show(members.m_spiNames)},
         {"m_spiFamilies", show(members.m_spiFamilies)},

@@ -88,7 +88,7 @@ mode_t usualPermissions() {
 /// Creates a file next to the target. Its name does not depend on the target's, which may be as long as names can be.
 /// @return its descriptor; -1 if it cannot be created
 int createBeside(const std::filesystem::path& target, std::string& name) {
-    name = (target.parent_path() / ".tarvik.XXXXXX").string();
+    name = (target.parent_path() / fmt::format("{}XXXXXX", TEMPORARY_FILE)).string();
     return ::mkostemp(name.data(), O_CLOEXEC);
 }
 

@@ -106,7 +106,7 @@ void writeFile(const std::string& path, std::string_view text) {
     const std::string directory(acd::directoryOf(path));
     std::wstring beside;
     try {
-        beside = toWide(createTemporaryFile(directory.empty() ? "." : directory, ".tarvik."));
+        beside = toWide(createTemporaryFile(directory.empty() ? "." : directory, TEMPORARY_FILE));
     } catch (const std::system_error& failure) {
         if (!exists) {
             raise(path, failure.code().default_error_condition());

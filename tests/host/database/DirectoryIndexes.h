@@ -6,6 +6,8 @@
 #include "database/IndexMaintenance.h"
 
 #include <limits>
+#include <optional>
+#include <string_view>
 
 // Indexes for tests: as the tool writes them, but with any contents.
 
@@ -20,11 +22,20 @@ inline constexpr acd::FileTime MUCH_LATER{std::numeric_limits<std::int64_t>::max
     return contents;
 }
 
+/// What the bytes of an index file mean.
+[[nodiscard]] inline std::optional<acd::DirectoryIndex> decodeIndex(std::string_view bytes) {
+    acd::MemorySource source(bytes);
+    return acd::DirectoryIndex::decode(acd::readAll(source));
+}
+
 /// Adds a section to what an index says about a file: who finds it has not looked into the file.
 inline void addGhost(acd::IndexContents& contents, const std::string& file, std::string_view name = "GHOST") {
     for (acd::IndexedFile& each : contents.files) {
         if (each.name == file) {
-            each.sections.add(name);
+            acd::StringPacker names;
+            each.sections.forEach([&names](std::string_view section) { names.add(section); });
+            names.add(name);
+            each.sections = names.pack();
         }
     }
 }

@@ -1,5 +1,6 @@
 #include "DatabaseFixtures.h"
 #include "HostileTexts.h"
+#include "PackedNames.h"
 #include "ReferenceParser.h"
 
 #include "database/Database.h"
@@ -43,16 +44,6 @@ private:
     std::string_view m_rest;
     HostileTexts m_random;
 };
-
-[[nodiscard]] std::vector<std::string> namesOf(const acd::PackedStrings& list) {
-    std::vector<std::string> names;
-    std::size_t begin = 0;
-    for (const std::size_t end : list.ends()) {
-        names.emplace_back(list.bytes().data() + begin, end - begin);
-        begin = end;
-    }
-    return names;
-}
 
 /// The names of all headers, by the full reader.
 [[nodiscard]] std::vector<std::string> parsedNames(std::string_view text) {

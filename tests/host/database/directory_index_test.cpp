@@ -1,4 +1,5 @@
 #include "DirectoryIndexes.h"
+#include "PackedNames.h"
 
 #include "database/DeviceIndex.h"
 
@@ -267,7 +268,7 @@ TEST_F(DirectoryIndexes, AreNotUsedIfTheyCannotBeRead) {
 TEST_F(DirectoryIndexes, AreNotUsedIfTheDirectoryCannotBeOpened) {
     IndexContents contents = withGhost();
     const std::vector<std::string_view> names{"base.acd", "kestrel.acd", "merlin.acd"};
-    const auto index = DirectoryIndex::decode(acd::indexFormat::encode(contents));
+    const auto index = decodeIndex(acd::indexFormat::encode(contents));
     EXPECT_TRUE(index->isCurrent(directory.path(), names));
     EXPECT_FALSE(index->isCurrent(directory.path("gone"), names));
     EXPECT_EQ(index->sections("gone.acd"), nullptr);
@@ -283,8 +284,7 @@ TEST_F(DirectoryIndexes, AreMadeOfWhatTheFilesSay) {
     const acd::IndexedFile& osprey = contents.files.back();
     EXPECT_EQ(osprey.name, "osprey.acd");
     EXPECT_EQ(osprey.status, acd::FileSource(directory.path("osprey.acd")).status());
-    EXPECT_EQ(std::string(osprey.sections.bytes().begin(), osprey.sections.bytes().end()), "OS1OS2OS2");
-    EXPECT_THAT(osprey.sections.ends(), ElementsAre(3, 6, 9));
+    EXPECT_THAT(namesOf(osprey.sections), ElementsAre("OS1", "OS2", "OS2"));
 }
 
 TEST_F(DirectoryIndexes, AreNotMadeOfFilesThatCannotBeRead) {
@@ -318,7 +318,9 @@ namespace {
     return writer.bytes();
 }
 
-[[nodiscard]] std::string unsealed(const std::string& bytes) { return bytes.substr(0, bytes.size() - 4); }
+[[nodiscard]] std::string unsealed(const std::string& bytes) {
+    return bytes.substr(0, bytes.size() - sizeof(acd::indexFormat::checksum({})));
+}
 
 } // namespace
 
@@ -328,7 +330,7 @@ protected:
 };
 
 TEST_F(IndexBytes, GiveBackWhatWasWritten) {
-    const auto index = DirectoryIndex::decode(bytes);
+    const auto index = decodeIndex(bytes);
     ASSERT_TRUE(index);
     EXPECT_EQ(acd::indexFormat::encode(index->contents()), bytes);
     EXPECT_EQ(index->contents().created, MUCH_LATER);
@@ -337,25 +339,25 @@ TEST_F(IndexBytes, GiveBackWhatWasWritten) {
 
 TEST_F(IndexBytes, AreRefusedIfOneIsMissingOrDiffers) {
     for (std::size_t size = 0; size != bytes.size(); ++size) {
-        EXPECT_FALSE(DirectoryIndex::decode(bytes.substr(0, size))) << size;
+        EXPECT_FALSE(decodeIndex(bytes.substr(0, size))) << size;
     }
     for (std::size_t place = 0; place != bytes.size(); ++place) {
         for (int value = 1; value != 256; ++value) {
             std::string changed = bytes;
             changed[place] = static_cast<char>(changed[place] ^ value);
-            EXPECT_FALSE(DirectoryIndex::decode(changed)) << place;
+            EXPECT_FALSE(decodeIndex(changed)) << place;
         }
     }
-    EXPECT_FALSE(DirectoryIndex::decode(bytes + '\0'));
-    EXPECT_FALSE(DirectoryIndex::decode(sealed(unsealed(bytes) + '\0')));
+    EXPECT_FALSE(decodeIndex(bytes + '\0'));
+    EXPECT_FALSE(decodeIndex(sealed(unsealed(bytes) + '\0')));
 }
 
 TEST_F(IndexBytes, AreRefusedIfTheyEndEarlyWithTheRightChecksum) {
     const std::string contents = unsealed(bytes);
     for (std::size_t size = 0; size != contents.size(); ++size) {
-        EXPECT_FALSE(DirectoryIndex::decode(sealed(contents.substr(0, size)))) << size;
+        EXPECT_FALSE(decodeIndex(sealed(contents.substr(0, size)))) << size;
     }
-    EXPECT_TRUE(DirectoryIndex::decode(sealed(contents)));
+    EXPECT_TRUE(decodeIndex(sealed(contents)));
 }
 
 TEST_F(IndexBytes, AskForNoMoreMemoryThanTheyFill) {
@@ -364,39 +366,17 @@ TEST_F(IndexBytes, AskForNoMoreMemoryThanTheyFill) {
     for (const char* const number : {"\xFF\xFF\xFF\xFF", "\xFF\xFF\xFF\x7F"}) {
         for (std::size_t place = count; place + 4 <= contents.size(); ++place) {
             // With any number replaced it ends somewhere else, or describes something else of the same size.
-            const auto index =
-                DirectoryIndex::decode(sealed(std::string(contents).replace(place, 4, number, 4)));
+            const auto index = decodeIndex(sealed(std::string(contents).replace(place, 4, number, 4)));
             EXPECT_TRUE(!index || acd::indexFormat::encode(index->contents()).size() == bytes.size());
         }
-        EXPECT_FALSE(DirectoryIndex::decode(sealed(std::string(contents).replace(count, 4, number, 4))));
+        EXPECT_FALSE(decodeIndex(sealed(std::string(contents).replace(count, 4, number, 4))));
     }
 }
 
-TEST(PackedStrings, TakesOnlyNamesThatFitTogether) {
-    acd::PackedStrings strings;
-    EXPECT_TRUE(strings.assign("abc", {1, 3}));
-    EXPECT_THAT(strings.ends(), ElementsAre(1, 3));
-    EXPECT_FALSE(strings.assign("abc", {1, 2}));
-    EXPECT_FALSE(strings.assign("abc", {1, 4}));
-    EXPECT_FALSE(strings.assign("abc", {0, 3}));
-    EXPECT_FALSE(strings.assign("abc", {1, 1, 3}));
-    EXPECT_FALSE(strings.assign("abc", {2, 1, 3}));
-    EXPECT_FALSE(strings.assign("abc", {}));
-    EXPECT_THAT(strings.ends(), ElementsAre(1, 3));
-    EXPECT_TRUE(strings.assign("", {}));
-    EXPECT_THAT(strings.bytes(), IsEmpty());
-}
-
 TEST(DeviceIndex, AnswersTheFirstLookUpsAsAllOthers) {
-    acd::PackedStrings first;
-    first.add("KS50");
-    first.add("ks100");
-    acd::PackedStrings second;
-    second.add("KS100");
-    second.add("ML1");
     acd::DeviceIndex index;
-    index.add(first, 3);
-    index.add(second, 5);
+    index.add(pack({"KS50", "ks100"}), 3);
+    index.add(pack({"KS100", "ML1"}), 5);
     for (int round = 0; round != 4; ++round) {
         EXPECT_EQ(index.family("ks50"), 3U) << round;
         EXPECT_EQ(index.family("KS100"), 3U) << round;

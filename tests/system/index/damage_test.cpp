@@ -13,6 +13,8 @@
 
 #include <cstdlib>
 #include <iterator>
+#include <optional>
+#include <string_view>
 
 namespace {
 
@@ -20,6 +22,11 @@ namespace {
 std::size_t stride() {
     const char* const calls = std::getenv("TARVIK_PROPERTY_CALLS");
     return calls != nullptr && std::strtol(calls, nullptr, 10) >= 1'000'000 ? 1 : 50;
+}
+
+std::optional<acd::DirectoryIndex> decodeIndex(std::string_view bytes) {
+    acd::MemorySource source(bytes);
+    return acd::DirectoryIndex::decode(acd::readAll(source));
 }
 
 /// Ten families with three hundred devices, and their index.
@@ -69,7 +76,7 @@ protected:
 };
 
 TEST_F(DamagedIndex, IsUsedAsLongAsItIsWhole) {
-    const auto index = acd::DirectoryIndex::decode(m_bytes);
+    const auto index = decodeIndex(m_bytes);
     ASSERT_TRUE(index);
     EXPECT_EQ(index->contents().files.size(), 12U);
     for (const acd::IndexedFile& file : index->contents().files) {
@@ -84,7 +91,7 @@ TEST_F(DamagedIndex, IsUsedAsLongAsItIsWhole) {
 TEST_F(DamagedIndex, IsRefusedWhereverItEnds) {
     const std::string expected = answers();
     for (std::size_t size = 0; size != m_bytes.size(); ++size) {
-        ASSERT_FALSE(acd::DirectoryIndex::decode(std::string_view(m_bytes).substr(0, size))) << size;
+        ASSERT_FALSE(decodeIndex(std::string_view(m_bytes).substr(0, size))) << size;
         if (size % stride() == 0) {
             useBytes(m_bytes.substr(0, size));
             ASSERT_EQ(answers(), expected) << size;
@@ -98,7 +105,7 @@ TEST_F(DamagedIndex, IsRefusedWhicheverByteDiffers) {
         std::string changed = m_bytes;
         for (std::size_t value = 1 + place % stride(); value < 256; value += stride()) {
             changed[place] = static_cast<char>(static_cast<std::size_t>(m_bytes[place]) ^ value);
-            ASSERT_FALSE(acd::DirectoryIndex::decode(changed)) << place << " by " << value;
+            ASSERT_FALSE(decodeIndex(changed)) << place << " by " << value;
         }
         if (place % stride() == 0) {
             useBytes(changed);

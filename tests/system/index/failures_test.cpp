@@ -91,6 +91,34 @@ TEST_F(IndexFailures, LeaveTheFormerIndex) {
     EXPECT_NE(index(), former);
 }
 
+TEST_F(IndexFailures, OfRunsThatWereKilledAreCleanedUpLater) {
+    constexpr std::int64_t SECOND = 1'000'000'000;
+    const std::vector<std::string> others{".index.acx", ".kestrel.acd.x", ".tarvik", "index.acx.a1b2c3"};
+    for (const std::string& name : others) {
+        virtualTime::write(m_directory.path(name), "");
+    }
+    virtualTime::write(m_directory.path(".index.acx.a1b2c3"), "");
+    virtualTime::write(m_directory.path(".tarvik.a1b2c3"), "half an ind");
+    std::filesystem::create_directory(m_directory.path(".tarvik.direct"));
+    std::filesystem::create_symlink("gone", m_directory.path(".tarvik.nolink"));
+    virtualTime::advance(598 * SECOND);
+    virtualTime::write(m_directory.path(".tarvik.d4e5f6"), "");
+    virtualTime::advance(SECOND);
+
+    std::vector<std::string> expected{"base.acd",          "index.acx",      "kestrel.acd",
+                                      ".index.acx.a1b2c3", ".tarvik.a1b2c3", ".tarvik.d4e5f6",
+                                      ".tarvik.direct",    ".tarvik.nolink"};
+    expected.insert(expected.end(), others.begin(), others.end());
+    EXPECT_EQ(failure(), "");
+    EXPECT_THAT(files(), testing::UnorderedElementsAreArray(expected));
+
+    virtualTime::advance(2 * SECOND);
+    std::erase(expected, ".index.acx.a1b2c3");
+    std::erase(expected, ".tarvik.a1b2c3");
+    EXPECT_EQ(failure(), "");
+    EXPECT_THAT(files(), testing::UnorderedElementsAreArray(expected));
+}
+
 TEST_F(IndexFailures, OfAFileThatMayNotGrow) {
     ASSERT_EQ(failure(), "");
     const std::string former = index();
