@@ -179,7 +179,8 @@ TEST(Faults, RecordThatEndsTheStartUpIsNamed) {
     const std::string note =
         "tarvik: " + database.path("spi.acd") + ":3:35: \"NOSUCH\" ends the start-up, in applications, too";
     for (const Words& words :
-         {Words{"families"}, Words{"which", "--operation", "ERASE"}, Words{"spi", "OV1"}}) {
+         {Words{"families"}, Words{"which", "--operation", "ERASE"}, Words{"spi", "OV1"},
+          Words{"why", "OV1", "--mode", "SPI", "--output", "USB2", "--option", "ERASE"}}) {
         Words all{"--database", database.path()};
         all.insert(all.end(), words.begin(), words.end());
         EXPECT_THAT(runTool(all).error, HasSubstr(note)) << words.front();
@@ -221,12 +222,12 @@ TEST(Faults, SurveysSayWhatAnApplicationGets) {
         const ProcessResult outcome = database.run(words);
         EXPECT_EQ(outcome.status, 0);
         EXPECT_THAT(outcome.error, StartsWith("tarvik: " + note + "\n"));
-        EXPECT_EQ(database.answer(words)["applicationFaults"], json{fault});
+        EXPECT_EQ(database.answer(words)["applicationFaults"], json::array({fault}));
     }
     const Words diff{"diff", sound.path(), database.path(), "--json"};
     EXPECT_THAT(runTool({diff.begin(), diff.end() - 1}).error, StartsWith("tarvik: " + note + "\n"));
     fault["database"] = "new";
-    EXPECT_EQ(json::parse(runTool(diff).output)["applicationFaults"], json{fault});
+    EXPECT_EQ(json::parse(runTool(diff).output)["applicationFaults"], json::array({fault}));
 }
 
 TEST(Faults, SurveysSayWhatADeviceWithoutATableGets) {
