@@ -6,9 +6,14 @@
 #include <filesystem>
 #include <string>
 
-inline int setenv(const char* name, const char* value, int /*overwrite*/) { return ::_putenv_s(name, value); }
+extern "C" __declspec(dllimport) int __stdcall SetEnvironmentVariableA(const char*, const char*);
 
-inline int unsetenv(const char* name) { return ::_putenv_s(name, ""); }
+/// Not by the C library, where an empty value removes the variable.
+inline int setenv(const char* name, const char* value, int /*overwrite*/) {
+    return ::SetEnvironmentVariableA(name, value) != 0 ? 0 : -1;
+}
+
+inline int unsetenv(const char* name) { return ::SetEnvironmentVariableA(name, nullptr) != 0 ? 0 : -1; }
 
 using uid_t = int;
 
