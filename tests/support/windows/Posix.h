@@ -6,14 +6,9 @@
 #include <filesystem>
 #include <string>
 
-extern "C" __declspec(dllimport) int __stdcall SetEnvironmentVariableA(const char*, const char*);
+inline int setenv(const char* name, const char* value, int /*overwrite*/) { return ::_putenv_s(name, value); }
 
-/// Not by the C library, where an empty value removes the variable.
-inline int setenv(const char* name, const char* value, int /*overwrite*/) {
-    return ::SetEnvironmentVariableA(name, value) != 0 ? 0 : -1;
-}
-
-inline int unsetenv(const char* name) { return ::SetEnvironmentVariableA(name, nullptr) != 0 ? 0 : -1; }
+inline int unsetenv(const char* name) { return ::_putenv_s(name, ""); }
 
 using uid_t = int;
 
