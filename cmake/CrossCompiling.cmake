@@ -16,9 +16,28 @@ tarvik_provide(CLI11 "add_library(CLI11::CLI11 INTERFACE IMPORTED GLOBAL)
 target_include_directories(CLI11::CLI11 INTERFACE ${headers})\n")
 tarvik_provide(nlohmann_json "add_library(nlohmann_json::nlohmann_json INTERFACE IMPORTED GLOBAL)
 target_include_directories(nlohmann_json::nlohmann_json INTERFACE ${headers})\n")
-tarvik_provide(fmt "add_library(fmt::fmt INTERFACE IMPORTED GLOBAL)
-target_include_directories(fmt::fmt INTERFACE ${headers})
-target_compile_definitions(fmt::fmt INTERFACE FMT_HEADER_ONLY)\n")
+tarvik_provide(fmt "")
+
+# fmt is compiled once: as headers alone it would double the time of the tool's compilation.
+file(CONFIGURE OUTPUT ${PROJECT_BINARY_DIR}/fmt.cpp CONTENT [[
+#include <fmt/format-inl.h>
+FMT_BEGIN_NAMESPACE
+namespace detail {
+template dragonbox::decimal_fp<float> dragonbox::to_decimal(float) noexcept;
+template dragonbox::decimal_fp<double> dragonbox::to_decimal(double) noexcept;
+template locale_ref::locale_ref(const std::locale&);
+template std::locale locale_ref::get<std::locale>() const;
+template thousands_sep_result<char> thousands_sep_impl(locale_ref);
+template char decimal_point_impl(locale_ref);
+template void buffer<char>::append(const char*, const char*);
+template void vformat_to(buffer<char>&, string_view, basic_format_args<buffer_context<char>>, locale_ref);
+} // namespace detail
+FMT_END_NAMESPACE
+]])
+add_library(tarvik_fmt STATIC EXCLUDE_FROM_ALL ${PROJECT_BINARY_DIR}/fmt.cpp)
+target_include_directories(tarvik_fmt SYSTEM PUBLIC ${headers})
+add_library(fmt::fmt ALIAS tarvik_fmt)
+
 tarvik_provide(GTest "set(INSTALL_GTEST OFF)
 add_subdirectory(/usr/src/googletest ${PROJECT_BINARY_DIR}/googletest EXCLUDE_FROM_ALL)\n")
 

@@ -3,6 +3,7 @@
 
 #include "lsp/Server.h"
 #include "query/Tool.h"
+#include "term/Streams.h"
 
 #include "database/SearchPath.h"
 
@@ -12,32 +13,18 @@
 #include <cerrno>
 #include <cstring>
 #include <memory>
-#include <poll.h>
-#include <unistd.h>
 
 namespace {
 
 /// Reads what there is, waiting for it.
 /// @return nothing at the end of the input
 std::string_view readSome(std::array<char, std::size_t{64} * 1024>& buffer) {
-    for (;;) {
-        const ssize_t count = ::read(STDIN_FILENO, buffer.data(), buffer.size());
-        if (count >= 0) {
-            return {buffer.data(), static_cast<std::size_t>(count)};
-        }
-        if (errno == EAGAIN) {
-            pollfd input{STDIN_FILENO, POLLIN, 0};
-            ::poll(&input, 1, -1);
-        } else if (errno != EINTR) {
-            throw CommandError(ExitCode::FAULT,
-                               fmt::format("cannot read standard input: {}", std::strerror(errno)));
-        }
+    const std::ptrdiff_t count = streams::readInput(buffer.data(), buffer.size());
+    if (count < 0) {
+        throw CommandError(ExitCode::FAULT,
+                           fmt::format("cannot read standard input: {}", std::strerror(errno)));
     }
-}
-
-bool isInputWaiting() {
-    pollfd input{STDIN_FILENO, POLLIN, 0};
-    return ::poll(&input, 1, 0) > 0;
+    return {buffer.data(), static_cast<std::size_t>(count)};
 }
 
 ExitCode run(Tool& tool) {
@@ -56,7 +43,7 @@ ExitCode run(Tool& tool) {
         const std::string_view bytes = readSome(*buffer);
         server.receive(bytes);
         // What has come already may cancel a request, or change a document again.
-        if (bytes.empty() || !isInputWaiting()) {
+        if (bytes.empty() || streams::isInputWaiting()) {
             server.settle();
             tool.output().flush();
         }

@@ -4,6 +4,9 @@
 #include "edit/Format.h"
 #include "edit/UnifiedDiff.h"
 
+#include "database/FileNames.h"
+#include "platform/Platform.h"
+
 #include <AcdStore.h>
 
 #include <algorithm>
@@ -22,9 +25,9 @@ std::string canonicalForm(const Draft::File& file) {
 }
 
 std::size_t layerOf(const std::string& path, const std::vector<std::string>& layers) {
-    const fs::path file(path);
+    const fs::path file = acd::toPath(path);
     const auto found = std::find_if(layers.begin(), layers.end(), [&file](const std::string& layer) {
-        return fs::path(layer) / file.filename() == file;
+        return acd::toPath(layer) / file.filename() == file;
     });
     return static_cast<std::size_t>(std::distance(layers.begin(), found));
 }
@@ -57,7 +60,7 @@ Draft Draft::ofDatabase() {
 Draft::File& Draft::fileOf(const std::string& family, std::size_t layer, const std::string& directory) {
     const auto isMeant = [&](const File& file) { return file.family == family && file.layer == layer; };
     if (std::none_of(m_files.begin(), m_files.end(), isMeant)) {
-        m_files.push_back({(fs::path(directory) / (family + ".acd")).string(), family, layer, {}, {}, {}});
+        m_files.push_back({acd::joinPath(directory, family + ".acd"), family, layer, {}, {}, {}});
         sort();
     }
     return *std::find_if(m_files.begin(), m_files.end(), isMeant);

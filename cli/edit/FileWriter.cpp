@@ -1,18 +1,17 @@
 // Writes the files of an edit. If one of them fails, those before it are put back.
 #include "edit/FileWriter.h"
 
+#include "database/FileNames.h"
 #include "edit/SourceFile.h"
+#include "platform/Platform.h"
 #include "term/AtomicFile.h"
 #include "term/ExitCode.h"
 #include "term/Terminal.h"
 
 #include <fmt/format.h>
 
-#include <cerrno>
-#include <cstring>
 #include <filesystem>
 #include <functional>
-#include <unistd.h>
 
 namespace edit {
 
@@ -21,16 +20,23 @@ namespace {
 namespace fs = std::filesystem;
 
 /// Where a removed file is until all is done. The readers ignore names that begin with a dot.
-fs::path hiddenPath(const fs::path& path) { return path.parent_path() / ("." + path.filename().string()); }
+std::string hiddenPath(std::string path) {
+    return path.insert(path.size() - acd::fileNameOf(path).size(), 1, '.');
+}
 
-void requireAccess(const fs::path& path) {
-    if (::access(path.c_str(), W_OK) != 0) {
+bool exists(const std::string& path) { return fs::exists(acd::toPath(path)); }
+
+void requireAccess(const std::string& path) {
+    if (const std::error_code failure = accessFailure(path)) {
         throw CommandError(ExitCode::FAULT, fmt::format("nothing is written, since \"{}\" is locked: {}",
-                                                        printable(path.string()), std::strerror(errno)));
+                                                        printable(path), failure.message()));
     }
 }
 
-fs::path directoryOf(const fs::path& path) { return path.has_parent_path() ? path.parent_path() : "."; }
+std::string directoryOf(const std::string& path) {
+    const std::string directory(acd::directoryOf(path));
+    return directory.empty() ? "." : directory;
+}
 
 class Transaction {
 public:
@@ -43,12 +49,12 @@ public:
         if (!rewrite.formerPath.empty()) {
             move(rewrite.formerPath, rewrite.path);
         }
-        const bool exists = fs::exists(rewrite.path);
-        const std::string former = exists ? readFile(rewrite.path) : std::string();
+        const bool isNew = !exists(rewrite.path);
+        const std::string former = isNew ? std::string() : readFile(rewrite.path);
         // Before it is written: a file that has no room may be written in part.
-        m_undo.emplace_back(rewrite.path, [path = rewrite.path, exists, former] {
-            if (!exists) {
-                fs::remove(path);
+        m_undo.emplace_back(rewrite.path, [path = rewrite.path, isNew, former] {
+            if (isNew) {
+                fs::remove(acd::toPath(path));
             } else if (readFile(path) != former) {
                 writeFile(path, former);
             }
@@ -57,8 +63,8 @@ public:
     }
 
     void commit() {
-        for (const fs::path& path : m_hidden) {
-            fs::remove(path);
+        for (const std::string& path : m_hidden) {
+            fs::remove(acd::toPath(path));
         }
     }
 
@@ -76,29 +82,29 @@ public:
     }
 
 private:
-    void move(const fs::path& from, const fs::path& to) {
-        if (fs::exists(fs::symlink_status(to))) {
-            throw CommandError(ExitCode::FAULT, fmt::format("\"{}\" exists", printable(to.string())));
+    void move(const std::string& from, const std::string& to) {
+        if (fs::exists(fs::symlink_status(acd::toPath(to)))) {
+            throw CommandError(ExitCode::FAULT, fmt::format("\"{}\" exists", printable(to)));
         }
-        fs::rename(from, to);
-        m_undo.emplace_back(from.string(), [from, to] { fs::rename(to, from); });
+        fs::rename(acd::toPath(from), acd::toPath(to));
+        m_undo.emplace_back(from, [from, to] { fs::rename(acd::toPath(to), acd::toPath(from)); });
     }
 
     std::vector<std::pair<std::string, std::function<void()>>> m_undo; ///< with the path of the file
-    std::vector<fs::path> m_hidden;
+    std::vector<std::string> m_hidden;
 };
 
 } // namespace
 
 void requireWritable(const std::vector<Rewrite>& rewrites) {
     for (const Rewrite& rewrite : rewrites) {
-        const bool isMoved = !rewrite.text || !rewrite.formerPath.empty() || !fs::exists(rewrite.path);
+        const bool isMoved = !rewrite.text || !rewrite.formerPath.empty() || !exists(rewrite.path);
         if (isMoved) {
             requireAccess(directoryOf(rewrite.path));
         }
         if (rewrite.text && !rewrite.formerPath.empty()) {
             requireAccess(rewrite.formerPath);
-        } else if (fs::exists(rewrite.path)) {
+        } else if (exists(rewrite.path)) {
             requireAccess(rewrite.path);
         }
     }

@@ -4,10 +4,11 @@
 #include "edit/Names.h"
 #include "text/Suggest.h"
 
+#include "database/FileNames.h"
+
 #include <fmt/format.h>
 
 #include <cctype>
-#include <filesystem>
 
 namespace edit {
 
@@ -72,8 +73,8 @@ void renameIn(Draft& draft, const std::string& from, const std::string& to) {
         }
         setText(file, changed(file.text, std::move(changes)));
         if (schema::fileOf(file.family) == schema::File::FAMILY && sameWithoutCase(file.family, from)) {
-            const std::filesystem::path path(file.path);
-            file.path = (path.parent_path() / to).string() + path.extension().string();
+            const std::string extension(acd::fileNameOf(file.path).substr(file.family.size()));
+            file.path = acd::joinPath(std::string(acd::directoryOf(file.path)), to + extension);
             file.family = to;
         }
     }

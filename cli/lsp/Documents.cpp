@@ -5,8 +5,9 @@
 #include "lsp/Params.h"
 #include "text/Uri.h"
 
+#include "database/FileNames.h"
+
 #include <algorithm>
-#include <filesystem>
 #include <utility>
 
 namespace lsp {
@@ -68,8 +69,7 @@ Workspace& Server::workspaceOf(const std::string& path) {
     }
     auto added = std::make_unique<Workspace>(m_directories);
     if (!added->contains(path)) {
-        added = std::make_unique<Workspace>(
-            std::vector<std::string>{std::filesystem::path(path).parent_path().string()});
+        added = std::make_unique<Workspace>(std::vector<std::string>{std::string(acd::directoryOf(path))});
     }
     added->reload(m_documents);
     return *m_workspaces.emplace_back(std::move(added));

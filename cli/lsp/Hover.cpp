@@ -6,11 +6,12 @@
 #include "model/Vocabulary.h"
 #include "text/Suggest.h"
 
+#include "database/FileNames.h"
+
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
 #include <algorithm>
-#include <filesystem>
 
 namespace lsp {
 
@@ -51,10 +52,10 @@ private:
 
     /// Where a text is: the file, and its layer if there are several.
     [[nodiscard]] std::string placeOf(const lint::SourceLocation& location) const {
-        const std::filesystem::path path = location.file->path();
+        const std::string& path = location.file->path();
         const bool hasLayers = m_view.workspace.directories().size() > 1;
-        return fmt::format("{}:{}{}", path.filename().string(), location.line,
-                           hasLayers ? fmt::format(" in {}", path.parent_path().string()) : std::string());
+        return fmt::format("{}:{}{}", acd::fileNameOf(path), location.line,
+                           hasLayers ? fmt::format(" in {}", acd::directoryOf(path)) : std::string());
     }
 
     void addFindings() {

@@ -7,12 +7,13 @@
 #include "term/ExitCode.h"
 #include "text/Suggest.h"
 
+#include "database/FileNames.h"
+
 #include <AcdText.h>
 
 #include <fmt/format.h>
 
 #include <algorithm>
-#include <filesystem>
 
 namespace lsp {
 
@@ -240,10 +241,9 @@ Json renamingOf(const View& view, const Name& name, const std::string& newName, 
             {{"textDocument", {{"uri", view.uri(path)}, {"version", version}}}, {"edits", list}});
     }
     for (const lint::Token& file : filesOf(view, name)) {
-        const std::filesystem::path path = file.location.file->path();
-        const std::string renamed = (path.parent_path() / (newName + ".acd")).string();
-        changes.push_back(
-            {{"kind", "rename"}, {"oldUri", view.uri(path.string())}, {"newUri", view.uri(renamed)}});
+        const std::string& path = file.location.file->path();
+        const std::string renamed = acd::joinPath(std::string(acd::directoryOf(path)), newName + ".acd");
+        changes.push_back({{"kind", "rename"}, {"oldUri", view.uri(path)}, {"newUri", view.uri(renamed)}});
     }
     return {{"documentChanges", changes}};
 }

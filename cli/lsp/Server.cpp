@@ -5,6 +5,7 @@
 #include "text/Uri.h"
 
 #include "database/SearchPath.h"
+#include "platform/Platform.h"
 
 #include <fmt/format.h>
 
@@ -36,9 +37,8 @@ std::vector<std::string> directoriesIn(const Json& option) {
 std::vector<std::string> normalised(const std::vector<std::string>& directories, const std::string& root) {
     std::vector<std::string> all;
     for (const std::string& directory : directories) {
-        const std::filesystem::path base =
-            root.empty() ? std::filesystem::current_path() : std::filesystem::path(root);
-        std::string path = (base / directory).lexically_normal().string();
+        const std::filesystem::path base = root.empty() ? std::filesystem::current_path() : acd::toPath(root);
+        std::string path = acd::fromPath((base / acd::toPath(directory)).lexically_normal());
         if (path.size() > 1 && path.ends_with('/')) {
             path.pop_back();
         }

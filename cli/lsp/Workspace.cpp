@@ -4,12 +4,12 @@
 #include "text/Json.h"
 
 #include "database/FileLines.h"
+#include "database/FileNames.h"
 
 #include <fmt/format.h>
 #include <fmt/ranges.h>
 
 #include <algorithm>
-#include <filesystem>
 #include <utility>
 
 namespace lsp {
@@ -32,8 +32,8 @@ AcdLines linesOf(const acd::Catalogue& catalogue, const acd::Family& family, con
 } // namespace
 
 bool Workspace::contains(const std::string& path) const {
-    return std::find(m_directories.begin(), m_directories.end(),
-                     std::filesystem::path(path).parent_path().string()) != m_directories.end();
+    return std::find(m_directories.begin(), m_directories.end(), acd::directoryOf(path)) !=
+           m_directories.end();
 }
 
 void Workspace::reload(const Documents& documents) {
@@ -50,9 +50,9 @@ void Workspace::reload(const Documents& documents) {
             const acd::DirectoryStatus status(directory);
             for (const auto& family : m_catalogue->families()) {
                 for (const acd::SourceFile& file : family->files) {
-                    const std::filesystem::path path = file.path;
-                    if (path.parent_path() == directory) {
-                        if (const auto found = status.ofReadableFile(path.filename().string())) {
+                    if (acd::directoryOf(file.path) == directory) {
+                        if (const auto found =
+                                status.ofReadableFile(std::string(acd::fileNameOf(file.path)))) {
                             m_statuses.emplace(file.path, *found);
                         }
                     }

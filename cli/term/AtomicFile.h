@@ -2,6 +2,7 @@
 
 #include <string>
 #include <string_view>
+#include <system_error>
 
 /// Begins the names of the files that `writeFile` writes next to others; a run that is killed may leave one.
 inline constexpr const char* TEMPORARY_FILE = ".tarvik.";
@@ -13,6 +14,10 @@ inline constexpr const char* TEMPORARY_FILE = ".tarvik.";
 /// owner cannot be kept or whose directory takes no new file.
 /// @throw CommandError (FAULT) if it cannot be written
 void writeFile(const std::string& path, std::string_view text);
+
+/// Why a file cannot be written to, or why no file can be created in a directory.
+/// @return no error if it can
+[[nodiscard]] std::error_code accessFailure(const std::string& path);
 
 /// Is it the file that standard output leads to, such as `/dev/stdout`?
 [[nodiscard]] bool isStandardOutput(const std::string& path);

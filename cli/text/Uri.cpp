@@ -59,5 +59,8 @@ std::string pathOf(std::string_view uri) {
     if (slash == uri.npos || (slash != 0 && uri.substr(0, slash) != "localhost")) {
         return {};
     }
-    return std::filesystem::path(decoded(uri.substr(slash))).lexically_normal().string();
+    std::string path = decoded(uri.substr(slash));
+    // A slash comes before the letter of a drive.
+    path.erase(0, acd::platform::isAbsolute(std::string_view(path).substr(1)) ? 1 : 0);
+    return acd::fromPath(acd::toPath(path).lexically_normal());
 }

@@ -1,11 +1,12 @@
 #!/usr/bin/env python3
 """Compares what two builds of the tool answer, byte for byte.
 
-    transcripts.py [--calls N] [--folder FOLDER] REFERENCE COMMAND...
+    transcripts.py [--calls N] [--batch] --folder FOLDER REFERENCE COMMAND...
 
 REFERENCE is the tool of this machine, COMMAND runs one that is built for another. Both answer the same random calls of
 `batch` about the demonstration, about all bad databases of the tests and about databases with random damage, and then
-some commands. FOLDER is where the databases are made.
+some commands. With --batch, COMMAND runs tarvik_batch, which answers the calls only. FOLDER is where the databases are
+made.
 """
 
 import argparse
@@ -90,22 +91,22 @@ def requests(calls, words, source):
     return "\n".join(lines) + "\n"
 
 
-def run(command, arguments, folder, text=""):
+def run(command, folder, text=""):
     """What a command prints, and how it ends."""
     environment = {name: value for name, value in os.environ.items()
                    if name not in ("TARVIK_DATABASE", "TARVIK_INDEX", "COLUMNS", "TERM")}
-    done = subprocess.run(command + arguments, input=text.encode(), capture_output=True, cwd=folder, env=environment,
+    done = subprocess.run(command, input=text.encode(), capture_output=True, cwd=folder, env=environment,
                           check=False, timeout=600)
     return done.stdout, done.stderr, done.returncode
 
 
-def compare(reference, command, arguments, folder, text=""):
+def compare(reference, command, folder, text=""):
     """@return whether both do the same"""
-    expected = run(reference, arguments, folder, text)
-    found = run(command, arguments, folder, text)
+    expected = run(reference, folder, text)
+    found = run(command, folder, text)
     if found == expected:
         return True
-    print(f"in {folder}: {' '.join(arguments)}")
+    print(f"in {folder}: {' '.join(command)}")
     for stream, wanted, got in zip(("standard output", "standard error", "exit status"), expected, found):
         if wanted != got and isinstance(wanted, int):
             print(f"  {stream}: {wanted} here, {got} there")
@@ -119,6 +120,7 @@ def compare(reference, command, arguments, folder, text=""):
 def main():
     parser = argparse.ArgumentParser()
     parser.add_argument("--calls", type=int, default=10_000)
+    parser.add_argument("--batch", action="store_true")
     parser.add_argument("--folder", type=pathlib.Path, required=True)
     parser.add_argument("reference")
     parser.add_argument("command", nargs=argparse.REMAINDER)
@@ -126,20 +128,22 @@ def main():
     # The calls are made in other folders.
     reference = [os.path.abspath(options.reference)]
     options.command = [os.path.abspath(word) if os.path.exists(word) else word for word in options.command]
-    help_text = run(reference, ["batch"], ROOT, '{"call": "help"}\n')[0]
-    calls = [call for call in json.loads(help_text)["result"]
-             if call["call"] not in ("help", "RemoveConstraintsManager")]
+    help_text = run(reference + ["batch"], ROOT, '{"call": "help"}\n')[0]
+    excluded = ["help", "RemoveConstraintsManager"] + (["show", "why"] if options.batch else [])
+    calls = [call for call in json.loads(help_text)["result"] if call["call"] not in excluded]
+    answer_calls = ["--database", "db", "batch"]
     results = []
     for number in range(-(-options.calls // CALLS_PER_DATABASE)):
         source = random.Random(number)
         folder = options.folder / str(number)
         words = make_database(folder / "db", number, source)
         text = requests(calls, words, source)
-        results.append(compare(reference, options.command, ["--database", "db", "batch"], folder, text))
+        results.append(compare(reference + answer_calls, options.command + (["db"] if options.batch else answer_calls),
+                               folder, text))
     make_database(options.folder / "commands/db", 0, random.Random(0))
-    for command in COMMANDS:
+    for command in [] if options.batch else COMMANDS:
         arguments = command if "db" in command else ["--database", "db"] + command
-        results.append(compare(reference, options.command, arguments, options.folder / "commands"))
+        results.append(compare(reference + arguments, options.command + arguments, options.folder / "commands"))
     print(f"{results.count(True)} passed, {results.count(False)} failed")
     return 0 if all(results) else 1
 

@@ -132,6 +132,11 @@ void writeFile(const std::string& path, std::string_view text) {
     }
 }
 
+std::error_code accessFailure(const std::string& path) {
+    return ::access(path.c_str(), W_OK) == 0 ? std::error_code()
+                                             : std::error_code(errno, std::generic_category());
+}
+
 bool isStandardOutput(const std::string& path) {
     struct stat file {};
     struct stat output {};

@@ -90,20 +90,6 @@ void Subprocess::start(const std::string& program, const std::vector<std::string
     m_process = process;
 }
 
-Subprocess::~Subprocess() {
-    if (m_process > 0) {
-        static_cast<void>(wait());
-    }
-}
-
-std::string Subprocess::output() {
-    std::string text;
-    if (!succeeds(text)) {
-        throw CommandError(ExitCode::FAULT, "a process that reads a database failed");
-    }
-    return text;
-}
-
 bool Subprocess::succeeds(std::string& text) {
     text = readAll(m_output);
     const int status = wait();

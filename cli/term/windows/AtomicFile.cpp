@@ -10,6 +10,7 @@
 #include <fmt/format.h>
 
 #include <algorithm>
+#include <cerrno>
 #include <io.h>
 #include <optional>
 #include <system_error>
@@ -128,6 +129,12 @@ void writeFile(const std::string& path, std::string_view text) {
         ::SetLastError(failure);
         raiseLastError(path);
     }
+}
+
+std::error_code accessFailure(const std::string& path) {
+    constexpr int WRITING = 2;
+    return ::_waccess(toWide(path).c_str(), WRITING) == 0 ? std::error_code()
+                                                          : std::error_code(errno, std::generic_category());
 }
 
 bool isStandardOutput(const std::string& path) {

@@ -121,20 +121,6 @@ void Subprocess::start(const std::string& program, const std::vector<std::string
     m_output = ::_open_osfhandle(reinterpret_cast<std::intptr_t>(reading), _O_RDONLY | _O_BINARY);
 }
 
-Subprocess::~Subprocess() {
-    if (m_process != -1) {
-        static_cast<void>(wait());
-    }
-}
-
-std::string Subprocess::output() {
-    std::string text;
-    if (!succeeds(text)) {
-        throw CommandError(ExitCode::FAULT, "a process that reads a database failed");
-    }
-    return text;
-}
-
 bool Subprocess::succeeds(std::string& text) {
     std::array<char, 65536> buffer{};
     int count = 0;

@@ -118,13 +118,6 @@ std::ptrdiff_t read(int descriptor, void* buffer, std::size_t size) {
 
 void close(int descriptor) noexcept { ::close(descriptor); }
 
-void raiseSystemError() {
-    if (errno == ENOMEM) {
-        throw std::bad_alloc();
-    }
-    throw ReadError(std::generic_category().message(errno));
-}
-
 std::string findOwnFile() {
     static const char anchor = 0;
     Dl_info information{};

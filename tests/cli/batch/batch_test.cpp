@@ -251,11 +251,4 @@ TEST(Batch, DatabaseIsOpenedBeforeTheFirstRequest) {
     EXPECT_EQ(outcome.output, "");
 }
 
-TEST(Batch, InputThatCannotBeReadIsAFault) {
-    const SmallDatabase database;
-    const std::string shell = std::string(TARVIK_TOOL) + " --database " + database.path() + " batch <" +
-                              database.path() + " >/dev/null 2>&1";
-    EXPECT_EQ(WEXITSTATUS(std::system(shell.c_str())), 2);
-}
-
 } // namespace

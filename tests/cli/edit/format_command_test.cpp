@@ -6,8 +6,6 @@
 
 #include <nlohmann/json.hpp>
 
-#include <sys/stat.h>
-
 using testing::HasSubstr;
 
 namespace {
@@ -72,25 +70,6 @@ TEST(FormatCommand, WritesALayerWithoutABase) {
     const DatabaseDirectory layer(DatabaseDirectory::Files{{"kestrel.acd", "[KS50]\nPROPERTY+=:A,1\n"}});
     EXPECT_EQ(format({layer.path()}).status, 0);
     EXPECT_EQ(read(layer.path("kestrel.acd")), "[KS50]\nPROPERTY += :A,1\n");
-}
-
-TEST(FormatCommand, KeepsModeAndLinks) {
-    const DatabaseDirectory directory(UNTIDY);
-    const DatabaseDirectory elsewhere(DatabaseDirectory::Files{{"real", UNTIDY.at("kestrel.acd")}});
-    std::filesystem::remove(directory.path("kestrel.acd"));
-    std::filesystem::create_symlink(elsewhere.path("real"), directory.path("kestrel.acd"));
-    ASSERT_EQ(::chmod(directory.path("base.acd").c_str(), 0640), 0);
-    EXPECT_EQ(format({directory.path()}).status, 0);
-    struct stat status {};
-    ASSERT_EQ(::stat(directory.path("base.acd").c_str(), &status), 0);
-    EXPECT_EQ(status.st_mode & 0777U, 0640U);
-    EXPECT_TRUE(std::filesystem::is_symlink(directory.path("kestrel.acd")));
-    EXPECT_EQ(read(elsewhere.path("real")), KESTREL);
-    std::size_t files = 0;
-    for (const auto& entry : std::filesystem::directory_iterator(directory.path())) {
-        files += entry.exists() ? 1U : 0U;
-    }
-    EXPECT_EQ(files, 2U);
 }
 
 TEST(FormatCommand, WritesNothingWhenOneFileCannotBeRead) {

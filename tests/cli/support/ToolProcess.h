@@ -1,9 +1,9 @@
 #pragma once
 
+#include <cstdint>
 #include <map>
 #include <ostream>
 #include <string>
-#include <sys/types.h>
 #include <vector>
 
 /// How the tool is started.
@@ -53,7 +53,7 @@ public:
     [[nodiscard]] int wait();
 
 private:
-    pid_t m_process;
+    std::intptr_t m_process;
     int m_input;
     int m_output;
     std::string m_read;

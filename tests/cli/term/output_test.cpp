@@ -1,7 +1,10 @@
-// Standard output without a reader, or on a full disk.
+// Standard input that cannot be read; standard output without a reader, or on a full disk.
 #include "cli/support/SmallDatabase.h"
 
 #include <gmock/gmock.h>
+
+#include <cstdlib>
+#include <sys/wait.h>
 
 namespace {
 
@@ -36,6 +39,13 @@ TEST(Output, ReaderThatLeavesAtOnceIsNoFault) {
     InteractiveProcess devices(database.start({"dump", "operations"}));
     devices.closeOutput();
     EXPECT_EQ(devices.wait(), 0);
+}
+
+TEST(Input, ThatCannotBeReadIsAFault) {
+    const SmallDatabase database;
+    const std::string shell = std::string(TARVIK_TOOL) + " --database " + database.path() + " batch <" +
+                              database.path() + " >/dev/null 2>&1";
+    EXPECT_EQ(WEXITSTATUS(std::system(shell.c_str())), 2);
 }
 
 } // namespace

@@ -193,6 +193,9 @@ TEST(AcdLines, AreFoundWhereTheSearchPathWasListed) {
 TEST(AcdLines, KnowWhichFilesDoNotCount) {
     const DatabaseDirectory directory(
         DatabaseDirectory::Files{{"kestrel.ACD", "[KS50]\n"}, {"kestrel.acd", "[KS75]\n"}});
+    if (std::filesystem::equivalent(directory.path("kestrel.ACD"), directory.path("kestrel.acd"))) {
+        GTEST_SKIP() << "names in any case are the same here";
+    }
     useDirectories({directory.path()});
     const std::vector<AcdLines> files = AcdLines::ofDatabase();
     ASSERT_EQ(files.size(), 1U);

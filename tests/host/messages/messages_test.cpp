@@ -184,6 +184,9 @@ TEST(DefaultOutput, OfTracesIsStandardErrorWhenAskedFor) {
 
 TEST(DefaultOutput, OfTracesIsAskedForByAnEmptyVariableToo) {
     setenv("TARVIK_DEBUG", "", 1);
+    if (std::getenv("TARVIK_DEBUG") == nullptr) {
+        GTEST_SKIP() << "no variable is empty here";
+    }
     EXPECT_EQ(writtenBy([] { Port_MsgManData::debugStub("trace\n"); }), (Written{"", "trace\n"}));
 }
 
