@@ -25,8 +25,9 @@ TEST(Dump, RecordedTablesAreWhatTheManagerRecords) {
     for (const auto& [table, method] : methods) {
         const ProcessResult outcome = database.run({"dump", table});
         EXPECT_EQ(outcome.status, 0);
-        EXPECT_EQ(outcome.error,
-                  "tarvik: no device is loaded, so the table has only what the manager reads when it starts\n");
+        EXPECT_EQ(
+            outcome.error,
+            "tarvik: no device is loaded, so the table has only what the manager reads when it starts\n");
         EXPECT_EQ(
             outcome.output,
             result(database, R"({"call": ")" + method + R"(", "args": ["recorder"]})").get<std::string>());
