@@ -38,13 +38,6 @@ Answers renamedAnswers(const Answers& answers, const Renaming& renamed) {
         for (std::string text : texts) {
             if (const auto found = renamed.find(text); contains(question.topic) && found != renamed.end()) {
                 text = found->second;
-            } else if (question.topic == FAULTS) {
-                for (const auto& [from, to] : renamed) {
-                    for (std::size_t at = text.find(from); at != text.npos;
-                         at = text.find(from, at + to.size())) {
-                        text.replace(at, from.size(), to);
-                    }
-                }
             }
             changed.insert(std::move(text));
         }

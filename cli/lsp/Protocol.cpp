@@ -100,13 +100,6 @@ std::size_t offsetOf(std::string_view text, const Position& position, Encoding e
     return start + bytesOf(lineAt(text, start), position.character, encoding);
 }
 
-Position positionOf(std::string_view text, std::size_t offset, Encoding encoding) {
-    const std::string_view before = text.substr(0, offset);
-    const std::size_t start = before.rfind('\n') + 1; // 0 on the first line
-    return {static_cast<std::size_t>(std::count(before.begin(), before.end(), '\n')),
-            unitsOf(before.substr(start), encoding)};
-}
-
 Json asJson(const Position& position) { return {{"line", position.line}, {"character", position.character}}; }
 
 Json asJson(const Range& range) { return {{"start", asJson(range.start)}, {"end", asJson(range.end)}}; }

@@ -83,9 +83,6 @@ private:
 /// The offset of a position in a text. Positions after the end of a line, or of the text, are at that end.
 [[nodiscard]] std::size_t offsetOf(std::string_view text, const Position& position, Encoding encoding);
 
-/// The position of an offset in a text.
-[[nodiscard]] Position positionOf(std::string_view text, std::size_t offset, Encoding encoding);
-
 [[nodiscard]] Json asJson(const Position& position);
 [[nodiscard]] Json asJson(const Range& range);
 

@@ -96,6 +96,8 @@ TEST(Spi, UnknownFlashIsANo) {
     EXPECT_EQ(one.status, 1);
     EXPECT_EQ(one.output, "");
     EXPECT_EQ(one.error, all.error);
+    EXPECT_EQ(database.run({"--literal", "spi", "ZZ1"}).status, 1);
+    EXPECT_EQ(database.run({"--literal", "spi", "ZZ1", "DENSITY"}).status, 1);
 }
 
 TEST(Spi, DeviceThatIsNoFlashIsANo) {

@@ -298,6 +298,10 @@ TEST(Diff, TellsTheSameInJson) {
     EXPECT_EQ(group.at("devices"), nlohmann::json({"KS50", "KS100", "KS150"}));
     EXPECT_EQ(group.at("whole"), true);
     EXPECT_EQ(group.at("changes").at(0).at("lost"), nlohmann::json({"BYPASS"}));
+    EXPECT_EQ(diff(database(), changed("kestrel.acd", "BYPASS,USB2", "HIGHZ,USB2"),
+                   {"--json", "--format", "markdown"})
+                  .output,
+              outcome.output);
 }
 
 namespace {

@@ -240,6 +240,27 @@ TEST(LspCompletion, OffersNames) {
                 ElementsAre("SO8"));
 }
 
+TEST(LspCompletion, OffersFlashesAndTheirClasses) {
+    Small spi("spi.acd");
+    EXPECT_THAT(spi.completeAfter("spi.acd", "DEVICE_FAMILY = B"),
+                UnorderedElementsAre("BPI1", "BPI2", "BPI3"));
+    EXPECT_THAT(spi.completeAfter("spi.acd", SMALL.at("spi.acd") + "ST2_DEVICES = F"),
+                UnorderedElementsAre("FLA", "FLB"));
+}
+
+TEST(LspCompletion, SaysWhenThereAreMore) {
+    Small editor("base.acd");
+    std::string sections;
+    for (int device = 0; device < 600; ++device) {
+        sections += fmt::format("[FN{}]\n", 1000 + device);
+    }
+    editor.open("finch.acd", sections);
+    editor.replaceText("base.acd", "IDCODE = FN1");
+    const Json list = editor.ask("textDocument/completion", editor.at("base.acd", 0, 12));
+    EXPECT_EQ(list.at("items").size(), 500U);
+    EXPECT_TRUE(list.at("isIncomplete").get<bool>());
+}
+
 TEST(LspCompletion, ReplacesTheWholeField) {
     Small editor("finch.acd");
     editor.replaceText("finch.acd", "OPERATION = VERIFY:PROG");
@@ -297,11 +318,17 @@ TEST(LspHover, ExplainsWordsNamesAndFindings) {
     EXPECT_EQ(editor.hover("finch.acd", 5, 17), "In force: `PINS,44` of FN20, finch.acd:6");
     editor.replaceText("finch.acd", "OPERATION = VERFIY,Bscan,USB2\n");
     EXPECT_THAT(editor.hover("finch.acd", 0, 14), HasSubstr("**T101** (error, `unknown-operation`)"));
+    editor.replaceText("finch.acd",
+                       "PROGRAM_OPTION = VERIFY,Bscan,USB2\nPROPERTIES = PINS,2,44,48\nPROPERTY =\n");
+    EXPECT_THAT(editor.hover("finch.acd", 0, 19), HasSubstr("option `VERIFY`"));
+    EXPECT_THAT(editor.hover("finch.acd", 0, 31), HasSubstr("output `USB2`"));
+    EXPECT_THAT(editor.hover("finch.acd", 1, 18), HasSubstr("the number of values of PINS"));
     Small spi("spi.acd");
     EXPECT_THAT(spi.hover("spi.acd", 4, 25), HasSubstr("flash **FLA** of ST1, spi.acd:2"));
     EXPECT_THAT(spi.hover("spi.acd", 0, 17), HasSubstr("family of flashes **ST1**: 2"));
     Small base("base.acd");
     EXPECT_THAT(base.hover("base.acd", 2, 38), HasSubstr("family **finch**: 2 devices"));
+    EXPECT_EQ(base.hover("base.acd", 1, 30), "package **P48**");
 }
 
 TEST(LspNames, HaveOneIndexForDefinitionsReferencesAndRename) {
@@ -358,6 +385,11 @@ TEST(LspNames, AreNotRenamedToWhatTheyCannotBe) {
     EXPECT_TRUE(editor.renaming("base.acd", 1, 31, "P49").contains("error"));
     EXPECT_TRUE(editor.renaming("base.acd", 2, 15, "X").contains("error"));
     EXPECT_TRUE(editor.renaming("base.acd", 0, 25, "wren").contains("error"));
+    // Nor where a line ends within the name.
+    editor.replaceText("base.acd", "IDCODE = FN\\\n10,0x00000011\n");
+    EXPECT_THAT(editor.renaming("base.acd", 0, 10, "FN11").at("error").at("message").get<std::string>(),
+                HasSubstr("base.acd:1: the name is continued in the next line"));
+    editor.replaceText("base.acd", SMALL.at("base.acd"));
     EXPECT_EQ(editor.ask("textDocument/prepareRename", editor.at("base.acd", 5, 10)).at("placeholder"),
               "FN10");
     EXPECT_TRUE(editor.ask("textDocument/prepareRename", editor.at("base.acd", 2, 15)).is_null());

@@ -251,7 +251,9 @@ TEST(LspDocuments, OfALayerBelongToAllLayers) {
     for (const bool isOption : {false, true}) {
         const DatabaseDirectory site(DatabaseDirectory::Files{{"base.acd", "IDCODE += :KS100,0xX4108FB7\n"}});
         const std::vector<std::string> layers{site.path(), below.path()};
-        const Json options{{"initializationOptions", {{"database", layers}}}};
+        // As the environment names them, too.
+        const std::string joined = site.path() + "/:" + below.path();
+        const Json options{{"initializationOptions", {{"database", joined}}}};
         Editor editor(DatabaseDirectory::Files{}, isOption ? options : Json::object(),
                       isOption ? std::vector<std::string>{} : layers);
         const std::string path = site.path("kestrel.acd");

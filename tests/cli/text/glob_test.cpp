@@ -25,6 +25,11 @@ TEST(Globs, MeanWhatShellsMean) {
     EXPECT_FALSE(matchesGlob("ks50?", "KS50"));
     EXPECT_FALSE(matchesGlob("", "KS50"));
     EXPECT_TRUE(matchesGlob("", ""));
+    // A bracket that is not closed means itself.
+    EXPECT_TRUE(matchesGlob("[a", "[a"));
+    EXPECT_TRUE(matchesGlob("x[a-", "x[A-"));
+    EXPECT_FALSE(matchesGlob("[a", "a"));
+    EXPECT_FALSE(matchesGlob("[a\\", "a"));
 }
 
 TEST(Globs, AgreeWithTheSystemOnRandomPatterns) {
