@@ -212,6 +212,7 @@ class Names(unittest.TestCase):
         code = ["--idcode", "0xX4105FB7"]
         self.refuses(2, "--family or --like", "new", "device", "KS75", *code)
         self.refuses(2, '--like needs a flash, which "KS50" is not', "new", "flash", "TMF3M", "--like", "KS50")
+        self.refuses(2, '--like needs a family, which "KS50" is not', "new", "family", "falcon", "--like", "KS50")
         self.refuses(2, '"TMF1M" is of family "ST1", so it cannot be copied to "AT1"', "new", "flash", "TMF3M", "--like",
                      "TMF1M", "--family", "AT1")
         self.refuses(2, "--idcode", "new", "device", "KS75", "--like", "KS50")
