@@ -15,11 +15,11 @@ def not_blocking(descriptor):
 
 
 def asleep(process):
-    """Waits until the process waits for something."""
-    while True:
+    """Waits until the process waits for something, and not just for a moment."""
+    times = 0
+    while times < 10:
         with open(f"/proc/{process.pid}/stat", encoding="utf-8") as file:
-            if file.read().rpartition(")")[2].split()[0] == "S":
-                return
+            times = times + 1 if file.read().rpartition(")")[2].split()[0] == "S" else 0
         time.sleep(0.01)
 
 
