@@ -1,5 +1,5 @@
 // What the steps of an explanation say: the record that decides, and the oddities on the way.
-#include "WhyFixtures.h"
+#include "StepsFixtures.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -11,29 +11,6 @@ using explanation::Conclusion;
 using explanation::Question;
 using testing::HasSubstr;
 using Kind = Question::Kind;
-
-Question about(Kind kind, const std::string& device) {
-    Question question;
-    question.kind = kind;
-    question.device = device;
-    return question;
-}
-
-Question programming(const std::string& device, MODE_TYPE mode, OUTPUT_TYPE output) {
-    Question question = about(Kind::OPERATION, device);
-    question.mode = mode;
-    question.output = output;
-    return question;
-}
-
-Files family(const std::string& keys, const std::string& base = "") {
-    return {{"base.acd", "DEVICE_SUPPORTED = fam\nPROGRAM_OPTION_PACKAGE = fam\n" + base},
-            {"fam.acd", keys + "\n[D1]\n"}};
-}
-
-std::string place(const explanation::Step& step) {
-    return step.place ? catalogue::asText(step.place->origin) + ": " + step.place->text : "nowhere";
-}
 
 TEST(WhySteps, TheDecidingRecordIsNamedWithItsPlace) {
     const Databases databases(family("# first\nOPERATION = ERASE,Bscan,SVF:PROGRAM,Bscan,SVF,USB2"));
@@ -311,150 +288,6 @@ TEST(WhySteps, APropertyOfTheFamilyMayReplaceThatOfTheDevice) {
     const explanation::Explanation found = explained(question);
     EXPECT_EQ(explanation::ask(Databases::freshManager(), question), Conclusion::YES);
     EXPECT_EQ(place(stepAbout(found.steps, "record")), "zor.acd:1:12: x_PINS,7");
-}
-
-TEST(WhyAlternatives, AllOtherDevicesOfTheFamilyAreCounted) {
-    const Databases databases(
-        Files{{"base.acd", "DEVICE_SUPPORTED = D1,fam\n"},
-              {"fam.acd", "OPERATION = PROGRAM,Bscan,USB2\n[D1]\nOPERATION = ERASE,Bscan,USB2\n"
-                          "[D2]\n[D3]\n"}});
-    EXPECT_EQ(
-        stepAbout(explanation::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "differs")
-            .text,
-        "yes for the other 2 devices of fam");
-}
-
-TEST(WhyAlternatives, TheRecordsThatAllowItElsewhere) {
-    const Databases databases(family("OPERATION = PROGRAM,Bscan,PARALLEL,USB2:PROGRAM,SS,SVF"));
-    const std::vector<explanation::Step> steps =
-        explanation::alternatives(programming("D1", MODE_TYPE::SM, OUTPUT_TYPE::USB2));
-    ASSERT_EQ(steps.size(), 2U);
-    EXPECT_EQ(steps[0].text, "yes in mode BS through PARALLEL, USB2");
-    EXPECT_EQ(place(steps[0]), "fam.acd:1:13: PROGRAM,Bscan,PARALLEL,USB2");
-    EXPECT_EQ(steps[1].text, "yes in mode SS through SVF");
-}
-
-TEST(WhyAlternatives, SeveralRecordsOfOneMode) {
-    const Databases databases(family("OPERATION = PROGRAM,Bscan,PARALLEL:PROGRAM,Bscan,USB2,SVF"));
-    const std::vector<explanation::Step> steps =
-        explanation::alternatives(programming("D1", MODE_TYPE::SM, OUTPUT_TYPE::USB2));
-    ASSERT_EQ(steps.size(), 2U);
-    EXPECT_EQ(steps[0].text, "yes in mode BS through PARALLEL");
-    EXPECT_EQ(place(steps[0]), "fam.acd:1:13: PROGRAM,Bscan,PARALLEL");
-    EXPECT_EQ(steps[1].text, "yes in mode BS through USB2, SVF");
-    EXPECT_EQ(place(steps[1]), "fam.acd:1:36: PROGRAM,Bscan,USB2,SVF");
-}
-
-TEST(WhyAlternatives, WhatElseIsAllowedThere) {
-    const Databases databases(family("OPERATION = VERIFY,Bscan,USB2:ERASE,Bscan,USB2"));
-    const std::vector<explanation::Step> steps =
-        explanation::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2));
-    ASSERT_EQ(steps.size(), 1U);
-    EXPECT_EQ(steps[0].text, "allowed there: VERIFY, ERASE");
-}
-
-TEST(WhyAlternatives, DevicesOfTheFamilyThatDiffer) {
-    Files files = family("PROPERTY = A,1\n[D2]\nPROPERTY = A,2");
-    const Databases databases(std::move(files));
-    Question question = about(Kind::PROPERTY, "D1");
-    question.property = "A";
-    question.value = "2";
-    EXPECT_EQ(stepAbout(explanation::alternatives(question), "differs").text, "in family fam, yes for D2");
-}
-
-TEST(WhyAlternatives, ADeviceWithATableOfItsOwnDiffers) {
-    Files files;
-    files["base.acd"] = "DEVICE_SUPPORTED = D2,fam\n";
-    files["fam.acd"] = "[D1]\n[D2]\nOPERATION = PROGRAM,Bscan,USB2\n";
-    const Databases databases(std::move(files));
-    EXPECT_EQ(
-        stepAbout(explanation::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "differs")
-            .text,
-        "in family fam, yes for D2");
-}
-
-TEST(WhyAlternatives, ThePackageThatHasTheOption) {
-    Files files;
-    files["base.acd"] = "DEVICE_SUPPORTED = fam\nPROGRAM_OPTION_PACKAGE = D1PQ,fam\n";
-    files["fam.acd"] = "[D1]\nPROGRAM_OPTION = VERIFY,Bscan,PARALLEL\n";
-    const Databases databases(std::move(files));
-    Question question = about(Kind::OPTION, "D1");
-    question.option = PROGRAM_OPTION::VERIFY;
-    question.package = "VS20";
-    EXPECT_EQ(explained(question).verdict, Conclusion::NO);
-    EXPECT_EQ(stepAbout(explanation::alternatives(question), "differs").text, "yes in package PQ");
-}
-
-TEST(WhyAlternatives, TheFamilyItselfMayDiffer) {
-    Files files;
-    files["base.acd"] = "DEVICE_SUPPORTED = D1,fam\n";
-    files["fam.acd"] = "OPERATION = PROGRAM,Bscan,USB2\n[D1]\nOPERATION = ERASE,Bscan,USB2\n";
-    const Databases databases(std::move(files));
-    EXPECT_EQ(
-        stepAbout(explanation::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "differs")
-            .text,
-        "in family fam, yes for the family itself");
-}
-
-TEST(WhyAlternatives, SpiModeAnswersForEveryDevice) {
-    Files files = family("");
-    files["base.acd"] = "DEVICE_SUPPORTED = fam,spi\n";
-    files["spi.acd"] = "OPERATION = PROGRAM,SPI,USB2\n";
-    const Databases databases(std::move(files));
-    EXPECT_EQ(
-        stepAbout(explanation::alternatives(programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2)), "instead")
-            .text,
-        "yes in mode SPI through USB2, for every device");
-}
-
-TEST(WhyAlternatives, TheKeyThatWasMeant) {
-    const Databases databases(family("PROPERTY = VENDOR,Korvel"));
-    Question question = about(Kind::PROPERTY, "D1");
-    question.property = "VENDER";
-    EXPECT_EQ(stepAbout(explanation::alternatives(question), "instead").text, "there is a property VENDOR");
-}
-
-TEST(WhyPresentation, StepsReadAsATableWithPlaces) {
-    const Databases databases(family("OPERATION = PROGRAM,Bscan,USB2"));
-    const Question question = programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2);
-    EXPECT_EQ(asPlainText({question, Conclusion::YES, explained(question)}),
-              "yes: PROGRAM of D1 in mode BS through USB2\n"
-              "  family    fam: section [D1] of fam.acd\n"
-              "  table     OPERATION of fam\n"
-              "            fam.acd:1:13: PROGRAM,Bscan,USB2\n"
-              "  record    PROGRAM is allowed in mode BS through USB2\n"
-              "            fam.acd:1:13: PROGRAM,Bscan,USB2\n");
-}
-
-TEST(WhyPresentation, LongTextsAreBrokenAndLongFragmentsCut) {
-    const Question question = programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2);
-    std::string words;
-    for (int number = 0; number < 30; ++number) {
-        words += "word ";
-    }
-    const std::string fragment = std::string(64, 'x') + "\xC3\xBC" + std::string(9, 'y');
-    explanation::Explanation explanation{
-        Conclusion::NO,
-        {{"absent", words + "end", explanation::SourceText{fragment, {std::string(60, 'f'), 12, 3}}}}};
-    const std::string text = asPlainText({question, Conclusion::NO, explanation});
-    EXPECT_THAT(text, HasSubstr("\n            " + std::string(60, 'f') + ":12:3:\n            "));
-    EXPECT_THAT(text, HasSubstr("xxx...\n"));
-    EXPECT_THAT(text, testing::Not(HasSubstr("\xC3")));
-    EXPECT_THAT(text, testing::Not(HasSubstr("\xBC")));
-}
-
-TEST(WhyPresentation, JsonTellsPlacesAndWhetherTheStepsAgree) {
-    const Databases databases(family("OPERATION = PROGRAM,Bscan,USB2"));
-    const Question question = programming("D1", MODE_TYPE::BS, OUTPUT_TYPE::USB2);
-    const Json object = explanation::asJson({question, Conclusion::NO, explained(question)});
-    EXPECT_EQ(object["allowed"], false);
-    EXPECT_EQ(object["agrees"], false);
-    EXPECT_EQ(object["steps"][2], (Json{{"topic", "record"},
-                                        {"text", "PROGRAM is allowed in mode BS through USB2"},
-                                        {"file", "fam.acd"},
-                                        {"line", 1},
-                                        {"column", 13},
-                                        {"fragment", "PROGRAM,Bscan,USB2"}}));
 }
 
 } // namespace
