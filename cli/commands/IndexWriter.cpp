@@ -14,7 +14,7 @@
 
 namespace {
 
-/// Begins the name of the file that tells the time.
+/// Prefix of the name of the file whose time is the directory's own clock.
 constexpr const char* PROBE = ".index.acx.";
 
 /// The status of a new file in the directory: which device it is on, and what time it is there.

@@ -50,8 +50,8 @@ struct Matches {
     const Filter& filter;
     std::vector<NamedDevice> devices;
     std::vector<std::string> faults; ///< devices at which the manager raises
-    std::size_t inSpiModeOnly =
-        0; ///< of the devices: those that are no flashes, and allow the operation nowhere else
+    /// How many of the devices are not flashes and allow the operation in SPI mode only.
+    std::size_t inSpiModeOnly = 0;
 };
 
 std::string asText(const Matches& matches, const Terminal& terminal) {

@@ -85,11 +85,11 @@ private:
 /// @return the answers in a form that another process can read
 [[nodiscard]] std::string takeSnapshot(const ProgressCallback& progress);
 
-/// Appends a part to a text of several, with its size before it.
+/// Appends a block to the text, preceded by its size.
 void putBlock(std::string& text, std::string_view block);
 
-/// Cuts the first part off.
-/// @throw CommandError (FAULT) if there is none
+/// Removes the first block from the text and returns it.
+/// @throw CommandError (FAULT) if the text does not begin with a block
 [[nodiscard]] std::string_view takeBlock(std::string_view& rest);
 
 /// Answers as lines of fields. Both ends are bytes that no text of a database holds.

@@ -179,7 +179,7 @@ private:
         return edited;
     }
 
-    /// A finding that the fixes leave, or that they add; null if there is none.
+    /// A finding that the fixes do not remove or that they add; null if each finding is removed and no other is added.
     [[nodiscard]] const Identity* findingAfter(const std::vector<Candidate>& used,
                                                const Counts& after) const {
         Counts left = m_counts;

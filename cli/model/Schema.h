@@ -46,7 +46,7 @@ inline constexpr const char* PROPERTY = "PROPERTY";
 inline constexpr const char* PROPERTIES = "PROPERTIES";
 inline constexpr const char* DEVICE_FAMILY = "DEVICE_FAMILY";
 
-/// The labels of the two lists of a mode key. The manager skips them, whatever they are.
+/// The labels of the two lists of a mode key. The manager ignores their text.
 inline constexpr const char* OUTPUTS_LABEL = "outputs";
 inline constexpr const char* FAMILIES_LABEL = "families";
 

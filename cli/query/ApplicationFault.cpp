@@ -68,7 +68,7 @@ Json asJson(const ApplicationFault& fault) {
     return object;
 }
 
-/// The sentence that tells the user about it.
+/// The note for the user.
 std::string noteOf(const ApplicationFault& fault, const std::optional<std::string>& answer) {
     return reasonOf(fault) + ": " + effectOf(fault, answer);
 }

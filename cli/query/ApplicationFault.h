@@ -59,5 +59,6 @@ void askForTables(ConstraintsManager& manager, const std::string& device);
 /// @return the faults that an application meets, each once: objects as in the answers, with a "note" in words
 [[nodiscard]] Json findApplicationFaults();
 
-/// Tells the user about such faults, if there are any, in notes and as the member "applicationFaults" of the JSON object.
+/// Prints a note for each of the first faults, and adds all as the member "applicationFaults" to the JSON object. Has no
+/// effect if the array is empty.
 void noteApplicationFaults(Tool& tool, const Json& faults);

@@ -26,7 +26,7 @@ struct DeviceTable {
 
         bool operator==(const Row&) const = default;
 
-        /// Is it there for SPI mode only, in which the manager answers for "spi", whatever the device?
+        /// Is it allowed in SPI mode only? In that mode the manager answers for "spi", whatever the device.
         [[nodiscard]] bool isOfSpiModeOnly() const;
     };
 

@@ -53,7 +53,7 @@ std::string headings(const std::vector<std::string>& texts) {
     return html + "</tr></thead>";
 }
 
-/// What the letters of a matrix stand for: "P PARALLEL, Z ZORVA".
+/// The meaning of the letters in a matrix: "P PARALLEL, Z ZORVA".
 std::string legend() {
     const std::string letters = outputLetters();
     std::vector<std::string> words;

@@ -90,7 +90,7 @@ void Catalogue::addFile(std::string_view fileName, SourceFile file) {
     known->files.push_back(std::move(file));
 }
 
-/// Files are added in order; only those of an upper layer alone are behind their place.
+/// Files are added in order; only files that exist in an upper layer alone are appended out of order.
 void Catalogue::sort() {
     const auto precedes = [](const auto& left, const auto& right) {
         return left->fileName < right->fileName;

@@ -28,7 +28,7 @@ namespace {
     return text.substr(offset - std::min(offset, BEFORE));
 }
 
-[[nodiscard]] bool startsBehind(std::size_t offset, const SourceSpan& span) noexcept {
+[[nodiscard]] bool startsAfter(std::size_t offset, const SourceSpan& span) noexcept {
     return offset < span.offset;
 }
 
@@ -204,9 +204,9 @@ void LineReader::locateValue(Line& line) {
         return;
     }
     const SourceLocation location = locationOf(begin);
-    const auto behind = std::upper_bound(m_spans.begin(), m_spans.end(), begin, startsBehind);
-    const auto first = std::prev(behind);
-    auto last = behind;
+    const auto after = std::upper_bound(m_spans.begin(), m_spans.end(), begin, startsAfter);
+    const auto first = std::prev(after);
+    auto last = after;
     *first = {0, location};
     while (last != m_spans.end() && last->offset < end) {
         last->offset -= begin;
@@ -225,7 +225,7 @@ void LineReader::fail(Line& line, ParseErrorKind kind, std::size_t offset, std::
 /// The place of a byte of the current line.
 SourceLocation LineReader::locationOf(std::size_t offset) const noexcept {
     const SourceSpan& span =
-        *std::prev(std::upper_bound(m_spans.begin(), m_spans.end(), offset, startsBehind));
+        *std::prev(std::upper_bound(m_spans.begin(), m_spans.end(), offset, startsAfter));
     return {span.location.line, span.location.column + static_cast<std::uint32_t>(offset - span.offset)};
 }
 

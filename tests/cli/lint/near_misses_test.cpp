@@ -116,8 +116,8 @@ TEST(NearMisses, OperatorsWithBlanks) { // F107
     constexpr const char* HINT = "1 can be fixed by --fix";
     EXPECT_THAT(lint(withFamily("PROPERTY =+ A,1\n[KS50]\n")).error, HasSubstr(HINT));
     // Here the sign may be meant as a part of the value.
-    const ProcessResult apart = lint(withFamily("PROPERTY = + A,1\n[KS50]\n"));
-    EXPECT_THAT(apart.error, testing::AllOf(HasSubstr("F107: 1"), testing::Not(HasSubstr(HINT))));
+    const ProcessResult separated = lint(withFamily("PROPERTY = + A,1\n[KS50]\n"));
+    EXPECT_THAT(separated.error, testing::AllOf(HasSubstr("F107: 1"), testing::Not(HasSubstr(HINT))));
 }
 
 TEST(NearMisses, EmptyNamesOfFlashFamilies) { // S101
